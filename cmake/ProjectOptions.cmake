@@ -1,0 +1,37 @@
+# What every target of this project is compiled with.
+set(CMAKE_CXX_STANDARD 20)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_POSITION_INDEPENDENT_CODE ON)
+set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
+set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
+# From a program to our libraries, and from one of these to another.
+set(CMAKE_INSTALL_RPATH "$ORIGIN/../${CMAKE_INSTALL_LIBDIR}/quorl" "$ORIGIN")
+
+if(NOT CMAKE_BUILD_TYPE)
+  set(CMAKE_BUILD_TYPE RelWithDebInfo CACHE STRING "" FORCE)
+endif()
+
+option(QUORL_WARNINGS_AS_ERRORS "A warning fails the build" ON)
+set(QUORL_SANITIZE "" CACHE STRING "Sanitizers to build with, for example address,undefined")
+
+# Link this to every target of the project, privately.
+add_library(project_options INTERFACE)
+target_include_directories(project_options INTERFACE ${PROJECT_SOURCE_DIR})
+target_compile_options(project_options INTERFACE
+  -fPIC -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Wnon-virtual-dtor -Woverloaded-virtual
+  -Wold-style-cast -Wcast-align -Wformat=2
+  # g++ 12 sees overlapping copies in its own std::string where none can be.
+  $<$<CXX_COMPILER_ID:GNU>:-Wno-restrict>
+  $<$<BOOL:${QUORL_WARNINGS_AS_ERRORS}>:-Werror>)
+if(QUORL_SANITIZE)
+  target_compile_options(project_options INTERFACE
+    -fsanitize=${QUORL_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer)
+  target_link_options(project_options INTERFACE -fsanitize=${QUORL_SANITIZE})
+endif()
+
+find_program(CCACHE ccache)
+if(CCACHE)
+  set(CMAKE_CXX_COMPILER_LAUNCHER ${CCACHE})
+endif()
