@@ -1,0 +1,42 @@
+#include "platform/Dispatch.h"
+
+namespace {
+
+using Closure = std::function<void()>;
+
+void runOnce(void* context) noexcept {
+    const std::unique_ptr<Closure> closure(static_cast<Closure*>(context));
+    (*closure)();
+}
+
+void run(void* context) noexcept { (*static_cast<Closure*>(context))(); }
+
+void destroy(void* context) noexcept { delete static_cast<Closure*>(context); }
+
+} // namespace
+
+void dispatch_once(dispatch_once_t* predicate, const std::function<void()>& initializer) {
+    auto* context = const_cast<Closure*>(&initializer); // libdispatch only hands it back
+    dispatch_once_f(predicate, context, run);
+}
+
+void dispatch_async(dispatch_queue_t queue, std::function<void()> work) {
+    dispatch_async_f(queue, std::make_unique<Closure>(std::move(work)).release(), runOnce);
+}
+
+void dispatch_after(dispatch_time_t when, dispatch_queue_t queue, std::function<void()> work) {
+    dispatch_after_f(when, queue, std::make_unique<Closure>(std::move(work)).release(), runOnce);
+}
+
+void dispatch_source_set_event_handler(dispatch_source_t source, std::function<void()> handler) {
+    dispatch_set_context(source, std::make_unique<Closure>(std::move(handler)).release());
+    dispatch_set_finalizer_f(source, destroy);
+    dispatch_source_set_event_handler_f(source, run);
+}
+
+dispatch_source_ref dispatch_take_source(dispatch_source_t source) {
+    if (source == nullptr) {
+        return nullptr;
+    }
+    return {source, [](dispatch_source_t owned) { dispatch_release(owned); }};
+}

@@ -1,0 +1,48 @@
+#pragma once
+
+#include "platform/PreferencesList.h"
+
+namespace quorl {
+
+/// The stack of panes, from the root pane up, as every host shows it. It owns the panes.
+class NavigationController : public PSRootController {
+  public:
+    /// Puts the root pane in. The stack is empty before.
+    void setRootPane(const std::shared_ptr<PSController>& pane);
+
+    /// From the root pane to the top one.
+    [[nodiscard]] const std::vector<std::shared_ptr<UIViewController>>& stack() const {
+        return stack_;
+    }
+
+    /// The top pane; null for an empty stack.
+    [[nodiscard]] std::shared_ptr<UIViewController> top() const;
+
+    /// The whole stack comes on the screen, or leaves it: tells the top pane.
+    void appear(bool animated);
+    void disappear(bool animated);
+
+    /// A tap on a row: opens the row's detail pane. False where the row has none, or where it could
+    /// not be made.
+    bool open(const std::shared_ptr<PSSpecifier>& specifier);
+
+    void pushController_animated(const std::shared_ptr<PSController>& controller,
+                                 bool animated) override;
+
+    /// Leaves the top pane and lets go of it; the root pane stays.
+    void pop(bool animated);
+
+    /// Lets go of every pane, the top one first.
+    void clear();
+
+    /// Hands the URL to the top pane; false for an empty stack.
+    bool openURL(const std::string& url) override;
+
+  private:
+    std::vector<std::shared_ptr<UIViewController>> stack_;
+};
+
+/// Draws whatever of a pane is marked for drawing: its list or its table.
+void draw(UIViewController& pane);
+
+} // namespace quorl

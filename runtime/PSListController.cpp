@@ -1,0 +1,116 @@
+#include <algorithm>
+
+#include "platform/HostApp.h"
+#include "runtime/Host.h"
+#include "runtime/PSListView.h"
+#include "runtime/Screen.h"
+
+namespace {
+
+quorl::Screen& screen() { return quorl::Host::required().screen(); }
+
+} // namespace
+
+PSListController::PSListController() = default;
+
+PSListController::~PSListController() = default;
+
+bool PSListController::init() {
+    _listView = std::make_shared<PSListView>(*this);
+    return UIViewController::init() && quorl::Host::current() != nullptr;
+}
+
+PSListAppearance PSListController::appearance() { return {screen().listTextColor()}; }
+
+NSArray<PSSpecifier> PSListController::specifiers() { return _specifiers; }
+
+void PSListController::reloadSpecifier(const std::shared_ptr<PSSpecifier>& specifier) {
+    screen().listWillReloadSpecifier(*this, specifier.get());
+    const auto rows = elements<PSSpecifier>(_specifiers);
+    if (specifier && std::find(rows.begin(), rows.end(), specifier) != rows.end()) {
+        _listView->update(specifier);
+    }
+}
+
+void PSListController::reload() {
+    screen().listWillReload(*this);
+    _listView->markForDrawing();
+}
+
+void PSListController::viewDidAppear(bool animated) {
+    UIViewController::viewDidAppear(animated);
+    _listView->setShown();
+}
+
+PSController* PSListController::parentController() const { return _parentController; }
+
+void PSListController::setParentController(PSController* controller) {
+    _parentController = controller;
+}
+
+PSRootController* PSListController::rootController() const { return _rootController; }
+
+void PSListController::setRootController(PSRootController* controller) {
+    _rootController = controller;
+}
+
+std::shared_ptr<PSSpecifier> PSListController::specifier() const { return _specifier; }
+
+void PSListController::setSpecifier(std::shared_ptr<PSSpecifier> specifier) {
+    _specifier = std::move(specifier);
+}
+
+void PSListController::showController(const std::shared_ptr<PSController>& controller) {
+    show(controller, std::nullopt);
+}
+
+void PSListController::showController_animate(const std::shared_ptr<PSController>& controller,
+                                              bool animate) {
+    show(controller, animate);
+}
+
+void PSListController::show(const std::shared_ptr<PSController>& controller,
+                            std::optional<bool> animate) {
+    screen().listWillShowController(*this, controller.get(), animate);
+    if (controller && _rootController) {
+        controller->setParentController(this);
+        controller->setRootController(_rootController);
+        _rootController->pushController_animated(controller, animate.value_or(true));
+    }
+}
+
+void PSListController::handleURL(const std::string& url) { screen().listWillHandleURL(*this, url); }
+
+std::shared_ptr<NSObject>
+PSListController::readPreferenceValue(const std::shared_ptr<PSSpecifier>& /*specifier*/) {
+    return nullptr;
+}
+
+void PSListController::setPreferenceValue_specifier(
+    const std::shared_ptr<NSObject>& /*value*/, const std::shared_ptr<PSSpecifier>& /*specifier*/) {
+}
+
+void PSListController::suspend() {}
+
+void PSListController::didLock() {}
+
+void PSListController::willUnlock() {}
+
+void PSListController::didUnlock() {}
+
+void PSListController::didWake() {}
+
+void PSListController::willBecomeActive() {}
+
+void PSListController::willResignActive() {}
+
+void PSListController::statusBarWillAnimateByHeight(double /*height*/) {}
+
+bool PSListController::canBeShownFromSuspendedState() { return true; }
+
+std::shared_ptr<PSSpecifier>
+QPSNotificationAppController::glanceSpecifierForIdentifier(const std::string& identifier) {
+    return quorl::Host::required().glanceSpecifier(identifier);
+}
+
+UIColor QPSQuorlTintColor() { return screen().tintColor(); }

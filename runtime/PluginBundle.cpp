@@ -1,0 +1,145 @@
+#include "runtime/PluginBundle.h"
+
+#include <algorithm>
+#include <fstream>
+
+#include <dlfcn.h>
+#include <nlohmann/json.hpp>
+
+#include "platform/InterfaceVersion.h"
+#include "runtime/Host.h"
+#include "runtime/SharedObjectFile.h"
+
+namespace quorl {
+
+namespace {
+
+using nlohmann::json;
+
+std::string textField(const json& object, const char* name, const std::filesystem::path& file) {
+    const auto field = object.find(name);
+    if (field == object.end() || !field->is_string() || field->get<std::string>().empty()) {
+        throw BundleError(file, std::string("the field \"") + name +
+                                    "\" is missing or not a text; install the plug-in again");
+    }
+    return field->get<std::string>();
+}
+
+json readObject(const std::filesystem::path& file) {
+    std::ifstream stream(file);
+    std::error_code ignored; // what is no file can be opened, but reading it throws
+    if (!stream || !std::filesystem::is_regular_file(file, ignored)) {
+        throw BundleError(file,
+                          "this file is missing or cannot be read; install the plug-in again");
+    }
+    auto object = json::parse(stream, nullptr, false);
+    if (!object.is_object()) {
+        throw BundleError(file, "this file is damaged: it is not a JSON object; "
+                                "install the plug-in again");
+    }
+    return object;
+}
+
+int interfaceVersion(const json& object, const std::filesystem::path& file) {
+    const auto field = object.find("interfaceVersion");
+    if (field == object.end() || !field->is_number_integer()) {
+        throw BundleError(file, "the field \"interfaceVersion\" is missing or not a whole number; "
+                                "install the plug-in again");
+    }
+    if (*field != QuorlInterfaceVersion) {
+        throw BundleError(file, "it was built against version " + field->dump() +
+                                    " of the interface and this app has version " +
+                                    std::to_string(QuorlInterfaceVersion) +
+                                    "; install the plug-in and the app from one release");
+    }
+    return QuorlInterfaceVersion;
+}
+
+} // namespace
+
+std::shared_ptr<PluginBundle> PluginBundle::open(const std::filesystem::path& directory) {
+    const auto file = directory / "registration.json";
+    const json object = readObject(file);
+    Registration registration;
+    registration.interfaceVersion = quorl::interfaceVersion(object, file);
+    registration.identifier = textField(object, "identifier", file);
+    registration.rootClass = textField(object, "rootClass", file);
+    registration.library = textField(object, "library", file);
+    if (registration.library.find('/') != std::string::npos) {
+        throw BundleError(file, "the field \"library\" must name a file of the bundle itself; "
+                                "install the plug-in again");
+    }
+    return std::make_shared<PluginBundle>(directory, std::move(registration));
+}
+
+PluginBundle::PluginBundle(std::filesystem::path directory, Registration registration)
+    : directory_(std::move(directory)),
+      registration_(std::move(registration)),
+      strings_(directory_ / "locale") {}
+
+void PluginBundle::load() const {
+    if (handle_) {
+        return;
+    }
+    const auto file = std::filesystem::absolute(directory_ / registration_.library);
+    if (const auto problem = problemOfSharedObject(file)) {
+        throw BundleError(file, *problem);
+    }
+    handle_ = dlopen(file.c_str(), RTLD_NOW | RTLD_LOCAL | RTLD_NODELETE);
+    if (!handle_) {
+        const char* reason = dlerror();
+        throw BundleError(file, std::string("this file cannot be loaded (") +
+                                    (reason ? reason : "no reason given") +
+                                    "); install the plug-in again");
+    }
+}
+
+Class PluginBundle::rootClass() const {
+    load();
+    const auto* root = static_cast<const Class*>(symbol("QuorlClass_" + registration_.rootClass));
+    if (!root) {
+        throw BundleError(directory_ / registration_.library,
+                          "it does not offer the class \"" + registration_.rootClass +
+                              "\" that its registration names; install the plug-in again");
+    }
+    return *root;
+}
+
+void* PluginBundle::symbol(const std::string& name) const {
+    return handle_ ? dlsym(handle_, name.c_str()) : nullptr;
+}
+
+std::optional<std::string> PluginBundle::bundleIdentifier() const {
+    return registration_.identifier;
+}
+
+std::string
+PluginBundle::localizedStringForKey_value_table(const std::string& key,
+                                                const std::optional<std::string>& value,
+                                                const std::optional<std::string>& table) const {
+    Host& host = Host::required();
+    const auto text = table ? strings_.text(host.languages(), *table, key)
+                            : host.textForKey(strings_, key, value);
+    if (text) {
+        return *text;
+    }
+    return value && !value->empty() ? *value : key;
+}
+
+std::vector<std::filesystem::path>
+findBundles(const std::vector<std::filesystem::path>& directories) {
+    std::vector<std::filesystem::path> bundles;
+    for (const auto& directory : directories) {
+        const auto first = static_cast<std::ptrdiff_t>(bundles.size());
+        std::error_code ignored; // a directory that is not there holds none
+        for (const auto& entry : std::filesystem::directory_iterator(directory, ignored)) {
+            if (entry.path().extension() == ".bundle" && entry.is_directory(ignored)) {
+                bundles.push_back(entry.path());
+            }
+        }
+        std::sort(bundles.begin() + first, bundles.end());
+    }
+    return bundles;
+}
+
+} // namespace quorl

@@ -1,0 +1,75 @@
+#pragma once
+
+#include <filesystem>
+#include <stdexcept>
+
+#include "platform/Foundation.h"
+#include "runtime/StringTable.h"
+
+namespace quorl {
+
+/// What is wrong with a bundle.
+class BundleError : public std::runtime_error {
+  public:
+    BundleError(std::filesystem::path file, const std::string& problem)
+        : std::runtime_error(file.string() + ": " + problem), file_(std::move(file)) {}
+
+    /// The file that the problem is in.
+    [[nodiscard]] const std::filesystem::path& file() const { return file_; }
+
+  private:
+    std::filesystem::path file_;
+};
+
+/// What a bundle says of itself in its file `registration.json`.
+struct Registration {
+    std::string identifier; ///< reverse-domain, one of its own for each bundle
+    std::string rootClass;
+    std::string library; ///< the shared object, a file of the bundle's directory
+    int interfaceVersion = 0;
+};
+
+/// A plug-in: a directory named `*.bundle` with a registration, a shared object and string tables.
+class PluginBundle : public NSBundle {
+  public:
+    /// Reads and checks the registration; nothing is loaded. Throws `BundleError` where it is
+    /// missing, malformed, or made for another version of the platform's interface.
+    [[nodiscard]] static std::shared_ptr<PluginBundle> open(const std::filesystem::path& directory);
+
+    /// Made by `open`.
+    PluginBundle(std::filesystem::path directory, Registration registration);
+
+    [[nodiscard]] const std::filesystem::path& directory() const { return directory_; }
+
+    [[nodiscard]] const Registration& registration() const { return registration_; }
+
+    /// The class that the registration names, loaded from the shared object at the first call. Code
+    /// that was loaded stays for the life of the process. Throws `BundleError` where the shared
+    /// object is missing, damaged, cannot be loaded, or does not offer that class.
+    [[nodiscard]] Class rootClass() const;
+
+    /// The address of a symbol of the shared object, which `rootClass` has loaded; null where it
+    /// has none of that name.
+    [[nodiscard]] void* symbol(const std::string& name) const;
+
+    [[nodiscard]] std::optional<std::string> bundleIdentifier() const override;
+    [[nodiscard]] std::string
+    localizedStringForKey_value_table(const std::string& key,
+                                      const std::optional<std::string>& value,
+                                      const std::optional<std::string>& table) const override;
+
+  private:
+    void load() const;
+
+    std::filesystem::path directory_;
+    Registration registration_;
+    StringTable strings_;
+    mutable void* handle_ = nullptr;
+};
+
+/// The directories named `*.bundle` in `directories`, in the order of those and then by name. A
+/// directory that does not exist holds none.
+[[nodiscard]] std::vector<std::filesystem::path>
+findBundles(const std::vector<std::filesystem::path>& directories);
+
+} // namespace quorl

@@ -1,0 +1,82 @@
+#include "runtime/Screen.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include "runtime/Host.h"
+
+namespace quorl {
+
+namespace {
+
+constexpr CGFloat margin = 16;
+constexpr CGFloat gap = 8;
+constexpr CGFloat checkmarkWidth = 28;
+
+CGRect centred(CGFloat x, CGFloat width, CGFloat height, CGFloat rowHeight) {
+    return {x, (rowHeight - height) / 2, width, height};
+}
+
+/// The title on the left as wide as it wants to be, the detail right-aligned in what remains.
+void layOutSideBySide(UILabel& title, UILabel& detail, CGSize titleSize, CGSize detailSize,
+                      CGFloat right, CGFloat rowHeight) {
+    const CGFloat width = std::max<CGFloat>(right - margin, 0);
+    titleSize.width = std::min(titleSize.width, width);
+    const CGFloat remaining = std::max<CGFloat>(width - titleSize.width - gap, 0);
+    detailSize.width = std::min(detailSize.width, remaining);
+    title.setFrame(centred(margin, titleSize.width, titleSize.height, rowHeight));
+    detail.setFrame(
+        centred(right - detailSize.width, detailSize.width, detailSize.height, rowHeight));
+}
+
+void layOutStacked(UILabel& title, UILabel& detail, CGSize titleSize, CGSize detailSize,
+                   CGFloat right, CGFloat rowHeight) {
+    const CGFloat width = std::max<CGFloat>(right - margin, 0);
+    const CGFloat top = (rowHeight - titleSize.height - detailSize.height) / 2;
+    title.setFrame({margin, top, std::min(titleSize.width, width), titleSize.height});
+    detail.setFrame(
+        {margin, top + titleSize.height, std::min(detailSize.width, width), detailSize.height});
+}
+
+} // namespace
+
+void Screen::layOutLabels(UITableViewCell& cell) {
+    const CGSize row = rowSize();
+    const bool hasAccessory = cell.accessoryType() != UITableViewCellAccessoryType::None;
+    const CGFloat right = row.width - margin - (hasAccessory ? checkmarkWidth : 0);
+    const CGSize titleSize = sizeOfText(cell.textLabel());
+    const CGSize detailSize = sizeOfText(cell.detailTextLabel());
+    const auto layOut =
+        cell.style() == UITableViewCellStyle::Subtitle ? layOutStacked : layOutSideBySide;
+    layOut(cell.textLabel(), cell.detailTextLabel(), titleSize, detailSize, right, row.height);
+}
+
+namespace {
+
+class MainScreen final : public UIScreen {
+  public:
+    [[nodiscard]] CGFloat scale() const override { return Host::required().screen().scale(); }
+};
+
+} // namespace
+
+} // namespace quorl
+
+UIScreen& UIScreen::mainScreen() {
+    static auto* const screen = new std::shared_ptr<UIScreen>(create<quorl::MainScreen>());
+    return **screen;
+}
+
+CGRect UIRectIntegralWithScale(const CGRect& rect, CGFloat scale) {
+    // What is a whole pixel but for the error of the calculation that led to it is one.
+    constexpr CGFloat tolerance = sizeof(CGFloat) == sizeof(double) ? 1e-6 : 1e-3F;
+    const auto before = [scale](CGFloat edge) {
+        return std::floor(edge * scale + tolerance) / scale;
+    };
+    const auto after = [scale](CGFloat edge) {
+        return std::ceil(edge * scale - tolerance) / scale;
+    };
+    const CGFloat x = before(rect.x);
+    const CGFloat y = before(rect.y);
+    return {x, y, after(rect.x + rect.width) - x, after(rect.y + rect.height) - y};
+}

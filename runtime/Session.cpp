@@ -1,0 +1,41 @@
+#include "runtime/Session.h"
+
+#include <algorithm>
+
+const std::string DVSessionTypeDeviceSync = "DVSessionTypeDeviceSync";
+const std::string DVDeviceSyncSessionAssetTaskGroupingKey =
+    "DVDeviceSyncSessionAssetTaskGroupingKey";
+
+namespace quorl {
+
+void Session::addObserver(const std::shared_ptr<DVSessionObserver>& observer) {
+    const std::lock_guard lock(mutex_);
+    const bool isAttached =
+        std::any_of(observers_.begin(), observers_.end(),
+                    [&observer](const auto& attached) { return attached.lock() == observer; });
+    if (!isAttached) {
+        observers_.push_back(observer);
+    }
+}
+
+void Session::removeObserver(const std::shared_ptr<DVSessionObserver>& observer) {
+    const std::lock_guard lock(mutex_);
+    std::erase_if(observers_, [&observer](const std::weak_ptr<DVSessionObserver>& attached) {
+        return attached.expired() || attached.lock() == observer;
+    });
+}
+
+void Session::tellObservers(const std::function<void(DVSessionObserver&)>& call) const {
+    std::vector<std::weak_ptr<DVSessionObserver>> attached;
+    {
+        const std::lock_guard lock(mutex_);
+        attached = observers_;
+    }
+    for (const auto& reference : attached) {
+        if (const auto observer = reference.lock()) {
+            call(*observer);
+        }
+    }
+}
+
+} // namespace quorl

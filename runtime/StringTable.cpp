@@ -1,0 +1,110 @@
+#include "runtime/StringTable.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <stdexcept>
+
+#include <boost/locale/generator.hpp>
+#include <boost/locale/message.hpp>
+
+namespace quorl {
+
+namespace {
+
+/// "de_AT@euro" is served by itself, "de_AT" and "de".
+std::vector<std::string> namesFor(const std::string& language) {
+    std::vector<std::string> names{language};
+    for (const char separator : {'@', '_'}) {
+        if (const auto at = names.back().rfind(separator); at != std::string::npos) {
+            names.push_back(names.back().substr(0, at));
+        }
+    }
+    return names;
+}
+
+/// A tag of either spelling ("de-AT", "de_AT.UTF-8") as the directories of catalogues are named;
+/// empty for the locales that stand for no language, and for what is no name at all.
+std::string languageName(std::string_view tag) {
+    const auto encoding = tag.find('.');
+    const auto modifier = tag.find('@');
+    std::string name(tag.substr(0, std::min(encoding, modifier)));
+    if (modifier != std::string_view::npos) {
+        name += tag.substr(modifier);
+    }
+    std::replace(name.begin(), name.end(), '-', '_');
+    const bool isPath = name.find('/') != std::string::npos;
+    return isPath || name == "C" || name == "POSIX" ? std::string() : name;
+}
+
+/// "sr_RS@latin" as a locale of UTF-8: "sr_RS.UTF-8@latin".
+std::string localeName(std::string language) {
+    return language.insert(std::min(language.find('@'), language.size()), ".UTF-8");
+}
+
+const char* environmentValue(std::initializer_list<const char*> names) {
+    for (const char* name : names) {
+        if (const char* value = std::getenv(name); value && *value) {
+            return value;
+        }
+    }
+    return "";
+}
+
+} // namespace
+
+std::vector<std::string> environmentLanguages() {
+    std::string_view list = environmentValue({"LANGUAGE", "LC_ALL", "LC_MESSAGES", "LANG"});
+    std::vector<std::string> languages;
+    while (!list.empty()) {
+        const auto length = std::min(list.find(':'), list.size());
+        if (auto name = languageName(list.substr(0, length)); !name.empty()) {
+            languages.push_back(std::move(name));
+        }
+        list.remove_prefix(std::min(length + 1, list.size()));
+    }
+    if (languages.empty()) {
+        languages.emplace_back("en");
+    }
+    return languages;
+}
+
+const std::locale* StringTable::catalogue(const std::string& language,
+                                          const std::string& domain) const {
+    auto [entry, isNew] = catalogues_.try_emplace({language, domain});
+    const auto file = directory_ / language / "LC_MESSAGES" / (domain + ".mo");
+    if (std::error_code ignored; isNew && std::filesystem::exists(file, ignored)) {
+        boost::locale::generator generator;
+        generator.categories(boost::locale::message_facet);
+        generator.add_messages_path(directory_.string());
+        generator.add_messages_domain(domain);
+        try {
+            entry->second = generator(localeName(language));
+        } catch (const std::runtime_error&) {
+            // A damaged catalogue counts as none: whoever asks for a text has a default for it.
+        }
+    }
+    return entry->second ? &*entry->second : nullptr;
+}
+
+std::optional<std::string> StringTable::text(const std::vector<std::string>& languages,
+                                             const std::string& domain,
+                                             const std::string& key) const {
+    if (key.empty()) {
+        return std::nullopt; // a catalogue keeps its own description under the empty key
+    }
+    for (const std::string& language : languages) {
+        for (const std::string& name : namesFor(languageName(language))) {
+            if (const std::locale* locale = catalogue(name, domain)) {
+                using Messages = boost::locale::message_format<char>;
+                const char* text = std::use_facet<Messages>(*locale).get(0, nullptr, key.c_str());
+                return text ? std::optional<std::string>(text) : std::nullopt;
+            }
+            if (name == "en") {
+                return std::nullopt; // the default texts are English
+            }
+        }
+    }
+    return std::nullopt;
+}
+
+} // namespace quorl

@@ -1,0 +1,353 @@
+#include <algorithm>
+#include <cstddef>
+#include <fstream>
+#include <functional>
+#include <random>
+#include <utility>
+
+#include <elf.h>
+#include <gmock/gmock.h>
+
+#include "platform/InterfaceVersion.h"
+#include "runtime/PluginBundle.h"
+#include "tests/runtime/TemporaryDirectory.h"
+#include "tests/support/TestHost.h"
+
+namespace {
+
+using quorl::BundleError;
+using quorl::PluginBundle;
+using quorl::tests::TemporaryDirectory;
+using quorl::tests::TestHost;
+using std::filesystem::path;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::StartsWith;
+
+const path builtPlugin = TEST_PLUGIN;
+const path builtTexts = TEST_TEXTS;
+
+std::string contentOf(const path& file) {
+    std::ifstream stream(file, std::ios::binary);
+    return {std::istreambuf_iterator<char>(stream), {}};
+}
+
+void write(const path& file, const std::string& content) {
+    std::ofstream(file, std::ios::binary) << content;
+}
+
+class OfThisProgram : public NSObject {};
+
+class Bundles : public testing::Test {
+  protected:
+    /// A registration in good order, but for what is replaced in its text.
+    static std::string registration(const std::string& replaced = {},
+                                    const std::string& replacement = {}) {
+        std::string text = R"({"identifier": "org.quorl.test", "interfaceVersion": VERSION,)"
+                           R"( "library": "libTestPlugin.so", "rootClass": "TestPane"})";
+        text.replace(text.find("VERSION"), 7, std::to_string(QuorlInterfaceVersion));
+        if (!replaced.empty()) {
+            text.replace(text.find(replaced), replaced.size(), replacement);
+        }
+        return text;
+    }
+
+    /// A bundle without fault.
+    void makeBundle() {
+        std::filesystem::create_directories(bundle_);
+        std::filesystem::copy(builtPlugin, library_);
+        std::filesystem::copy(builtTexts, bundle_ / "locale",
+                              std::filesystem::copy_options::recursive);
+        write(registration_, registration());
+    }
+
+    /// The problem that an act on a bundle ends with. Fails the test where there is none, and where
+    /// it is not about `file`.
+    static std::string problemIn(const path& file, const std::function<void()>& act) {
+        try {
+            act();
+        } catch (const BundleError& error) {
+            EXPECT_EQ(error.file(), file);
+            EXPECT_THAT(error.what(), StartsWith(file.string() + ": "));
+            return error.what();
+        }
+        ADD_FAILURE() << "no problem was found";
+        return {};
+    }
+
+    [[nodiscard]] std::string problemOfRegistration(const std::string& text) const {
+        write(registration_, text);
+        return problemIn(registration_, [this] { (void)PluginBundle::open(bundle_); });
+    }
+
+    [[nodiscard]] std::string problemOfLibrary() const {
+        const auto opened = PluginBundle::open(bundle_);
+        return problemIn(library_, [&opened] { (void)opened->rootClass(); });
+    }
+
+    TemporaryDirectory directory_;
+    const path bundle_ = directory_.path() / "Test.bundle";
+    const path registration_ = bundle_ / "registration.json";
+    const path library_ = bundle_ / "libTestPlugin.so";
+    std::shared_ptr<TestHost> host_ = TestHost::installed();
+};
+
+TEST_F(Bundles, SayWhatTheyAreBeforeTheirCodeIsLoaded) {
+    makeBundle();
+    std::filesystem::remove(library_);
+
+    const auto opened = PluginBundle::open(bundle_);
+
+    EXPECT_EQ(opened->directory(), bundle_);
+    EXPECT_EQ(opened->bundleIdentifier(), "org.quorl.test");
+    EXPECT_EQ(opened->registration().rootClass, "TestPane");
+    EXPECT_EQ(opened->registration().library, "libTestPlugin.so");
+    EXPECT_EQ(opened->registration().interfaceVersion, QuorlInterfaceVersion);
+}
+
+TEST_F(Bundles, GiveTheClassOfTheirRootPane) {
+    makeBundle();
+
+    const Class root = PluginBundle::open(bundle_)->rootClass();
+    const auto pane = std::dynamic_pointer_cast<QPSNotificationAppController>(root.create());
+
+    EXPECT_EQ(root.name(), "TestPane");
+    ASSERT_NE(pane, nullptr);
+    EXPECT_EQ(pane->title(), "A title from the table");
+}
+
+TEST_F(Bundles, GiveTheSameClassAtEachCall) {
+    makeBundle();
+    const auto opened = PluginBundle::open(bundle_);
+
+    EXPECT_TRUE(opened->rootClass() == opened->rootClass());
+}
+
+TEST_F(Bundles, AreFoundAgainFromTheClassesOfTheirCode) {
+    makeBundle();
+    const auto pane = PluginBundle::open(bundle_)->rootClass().create();
+
+    const auto found = NSBundle::bundleForClass(Class::ofObject(*pane));
+
+    EXPECT_EQ(found->bundleIdentifier(), "org.quorl.test");
+    EXPECT_EQ(NSBundle::bundleForClass(Class::ofObject(*pane)), found);
+}
+
+TEST_F(Bundles, OfTheProgramAndThePlatformHaveNoIdentifierAndNoTexts) {
+    for (const Class& cls : {Class::of<OfThisProgram>(), Class::of<NSObject>()}) {
+        const auto own = NSBundle::bundleForClass(cls);
+
+        EXPECT_EQ(own->bundleIdentifier(), std::nullopt);
+        EXPECT_EQ(own->localizedStringForKey_value_table("KEY", "value", std::nullopt), "value");
+        EXPECT_EQ(own->localizedStringForKey_value_table("KEY", "", std::nullopt), "KEY");
+        EXPECT_EQ(own->localizedStringForKey_value_table("KEY", std::nullopt, "table"), "KEY");
+    }
+}
+
+TEST_F(Bundles, LookATextUpInTheirTableThenTakeTheValueThenTheKey) {
+    makeBundle();
+    const auto opened = PluginBundle::open(bundle_);
+
+    EXPECT_EQ(opened->localizedStringForKey_value_table("TITLE", "value", std::nullopt),
+              "A title from the table");
+    EXPECT_EQ(opened->localizedStringForKey_value_table("MISSING", "value", std::nullopt), "value");
+    EXPECT_EQ(opened->localizedStringForKey_value_table("MISSING", "", std::nullopt), "MISSING");
+    EXPECT_EQ(opened->localizedStringForKey_value_table("MISSING", std::nullopt, std::nullopt),
+              "MISSING");
+}
+
+TEST_F(Bundles, LookATextUpInAnotherTableWhereOneIsNamed) {
+    makeBundle();
+    const auto opened = PluginBundle::open(bundle_);
+
+    EXPECT_EQ(opened->localizedStringForKey_value_table("TITLE", "value", "other"),
+              "A title from the other table");
+    EXPECT_EQ(opened->localizedStringForKey_value_table("TITLE", "value", "absent"), "value");
+}
+
+TEST_F(Bundles, WithoutARegistrationAreRefused) {
+    std::filesystem::create_directories(bundle_);
+
+    EXPECT_THAT(problemIn(registration_, [this] { (void)PluginBundle::open(bundle_); }),
+                HasSubstr("missing"));
+}
+
+TEST_F(Bundles, WhoseRegistrationIsNoJsonObjectAreRefused) {
+    makeBundle();
+
+    for (const std::string text :
+         {"", "{", "[]", "\"text\"", "null", "{} {}", "\xff\xfe", "{'a': 1}"}) {
+        EXPECT_THAT(problemOfRegistration(text), HasSubstr("not a JSON object")) << text;
+    }
+    EXPECT_THAT(problemOfRegistration(std::string(100'000, '[')), HasSubstr("not a JSON object"));
+}
+
+TEST_F(Bundles, WhoseRegistrationIsADirectoryAreRefused) {
+    std::filesystem::create_directories(registration_);
+
+    EXPECT_THAT(problemIn(registration_, [this] { (void)PluginBundle::open(bundle_); }),
+                HasSubstr("install the plug-in again"));
+}
+
+TEST_F(Bundles, WhoseRegistrationWasCutShortAreRefusedAtEveryLength) {
+    makeBundle();
+    const std::string whole = registration();
+
+    for (std::size_t length = 0; length < whole.size(); ++length) {
+        EXPECT_THAT(problemOfRegistration(whole.substr(0, length)), HasSubstr("damaged")) << length;
+    }
+}
+
+TEST_F(Bundles, ThatLackAFieldAreRefusedWithItsName) {
+    makeBundle();
+
+    for (const std::string field : {"identifier", "interfaceVersion", "library", "rootClass"}) {
+        EXPECT_THAT(problemOfRegistration(registration('"' + field + '"', "\"other\"")),
+                    HasSubstr('"' + field + '"'));
+    }
+}
+
+TEST_F(Bundles, WithAFieldOfAnotherKindAreRefusedWithItsName) {
+    makeBundle();
+
+    EXPECT_THAT(problemOfRegistration(registration("\"TestPane\"", "7")), HasSubstr("rootClass"));
+    EXPECT_THAT(problemOfRegistration(registration("\"TestPane\"", "\"\"")),
+                HasSubstr("rootClass"));
+    EXPECT_THAT(problemOfRegistration(registration("\"org.quorl.test\"", "[]")),
+                HasSubstr("identifier"));
+    const std::string version = std::to_string(QuorlInterfaceVersion);
+    EXPECT_THAT(problemOfRegistration(registration(version, version + ".0")),
+                HasSubstr("interfaceVersion"));
+    EXPECT_THAT(problemOfRegistration(registration(version, '"' + version + '"')),
+                HasSubstr("interfaceVersion"));
+}
+
+TEST_F(Bundles, MadeForAnotherVersionAreRefusedWithBothVersions) {
+    makeBundle();
+    const std::string own = std::to_string(QuorlInterfaceVersion);
+
+    for (const std::string other : {"0", "-1", "4711", "18446744073709551615"}) {
+        EXPECT_THAT(problemOfRegistration(registration(own, other)),
+                    testing::AllOf(HasSubstr("version " + other), HasSubstr("version " + own)));
+    }
+}
+
+TEST_F(Bundles, WhoseLibraryIsNotTheirsAreRefused) {
+    makeBundle();
+
+    for (const std::string name : {"../libTestPlugin.so", "/usr/lib/libc.so.6", "a/b.so"}) {
+        EXPECT_THAT(problemOfRegistration(registration("libTestPlugin.so", name)),
+                    HasSubstr("a file of the bundle itself"));
+    }
+}
+
+TEST_F(Bundles, WithoutTheirLibraryAreNotLoaded) {
+    makeBundle();
+    std::filesystem::remove(library_);
+    EXPECT_THAT(problemOfLibrary(), HasSubstr("missing"));
+
+    std::filesystem::create_directory(library_);
+    EXPECT_THAT(problemOfLibrary(), HasSubstr("missing"));
+}
+
+TEST_F(Bundles, WhoseLibraryWasCutShortAreNotLoadedAtAnyLength) {
+    makeBundle();
+    const std::string whole = contentOf(builtPlugin);
+    std::vector<std::size_t> lengths{0, 1, 4, 16, 63, 64, 65, whole.size() / 2, whole.size() - 1};
+    for (std::size_t length = 100; length < whole.size(); length += whole.size() / 50) {
+        lengths.push_back(length);
+    }
+
+    for (const std::size_t length : lengths) {
+        write(library_, whole.substr(0, length));
+        EXPECT_THAT(problemOfLibrary(), HasSubstr("damaged")) << length;
+    }
+}
+
+TEST_F(Bundles, WhoseLibraryNamesMoreThanItHoldsAreNotLoaded) {
+    makeBundle();
+    std::string longer = contentOf(builtPlugin);
+    auto* const header = reinterpret_cast<Elf64_Ehdr*>(longer.data());
+    auto* const segment = reinterpret_cast<Elf64_Phdr*>(longer.data() + header->e_phoff);
+    for (const auto field : {&Elf64_Phdr::p_offset, &Elf64_Phdr::p_filesz}) {
+        const auto sound = std::exchange(segment->*field, longer.size() + 1);
+        write(library_, longer);
+        EXPECT_THAT(problemOfLibrary(), HasSubstr("its end is missing"));
+        segment->*field = sound;
+    }
+}
+
+TEST_F(Bundles, WhoseLibraryIsSomethingElseAreNotLoaded) {
+    makeBundle();
+    std::mt19937 numbers; // the same garbage in each run
+    std::string garbage(10'000, '\0');
+    std::generate(garbage.begin(), garbage.end(), [&] { return static_cast<char>(numbers()); });
+
+    for (const std::string& content : {garbage, std::string("#!/bin/sh\n"),
+                                       std::string("\x7f"
+                                                   "ELF"),
+                                       "\x7f"
+                                       "ELF" +
+                                           garbage}) {
+        write(library_, content);
+        EXPECT_THAT(problemOfLibrary(), HasSubstr("install the plug-in"));
+    }
+    std::filesystem::copy("/proc/self/exe", library_,
+                          std::filesystem::copy_options::overwrite_existing);
+    EXPECT_THAT(problemOfLibrary(), HasSubstr("install the plug-in again"));
+}
+
+TEST_F(Bundles, ForAnotherKindOfMachineAreNotLoaded) {
+    makeBundle();
+    std::string foreign = contentOf(builtPlugin);
+    foreign[offsetof(Elf64_Ehdr, e_machine)] = EM_68K;
+    write(library_, foreign);
+
+    EXPECT_THAT(problemOfLibrary(), HasSubstr("another kind of machine"));
+}
+
+TEST_F(Bundles, WithoutTheClassThatTheyNameAreNotLoaded) {
+    makeBundle();
+    write(registration_, registration("TestPane", "OtherPane"));
+
+    EXPECT_THAT(problemOfLibrary(), HasSubstr("\"OtherPane\""));
+}
+
+TEST_F(Bundles, LoadAfterTheirLibraryWasMended) {
+    makeBundle();
+    write(library_, "damaged");
+    const auto opened = PluginBundle::open(bundle_);
+    EXPECT_THROW((void)opened->rootClass(), BundleError);
+
+    std::filesystem::copy(builtPlugin, library_, std::filesystem::copy_options::overwrite_existing);
+
+    EXPECT_EQ(opened->rootClass().name(), "TestPane");
+}
+
+TEST_F(Bundles, OfferTheSymbolsOfTheirLoadedCode) {
+    makeBundle();
+    const auto opened = PluginBundle::open(bundle_);
+
+    EXPECT_EQ(opened->symbol("QuorlClass_TestPane"), nullptr) << "nothing is loaded yet";
+    const Class root = opened->rootClass();
+    EXPECT_TRUE(*static_cast<const Class*>(opened->symbol("QuorlClass_TestPane")) == root);
+    EXPECT_EQ(opened->symbol("QuorlClass_OtherPane"), nullptr);
+}
+
+TEST_F(Bundles, AreFoundByDirectoryThenByName) {
+    const path first = directory_.path() / "first";
+    const path second = directory_.path() / "second";
+    for (const path& made : {second / "A.bundle", second / "B.bundle", first / "Z.bundle",
+                             first / "Y.bundle", first / "no bundle"}) {
+        std::filesystem::create_directories(made);
+    }
+    write(first / "A file.bundle", "");
+
+    EXPECT_THAT(quorl::findBundles({first, directory_.path() / "absent", second}),
+                ElementsAre(first / "Y.bundle", first / "Z.bundle", second / "A.bundle",
+                            second / "B.bundle"));
+    EXPECT_THAT(quorl::findBundles({}), IsEmpty());
+}
+
+} // namespace

@@ -1,0 +1,30 @@
+// A plug-in with nothing but a title, built against the interface of this tree.
+
+#include "platform/HostApp.h"
+
+class TestPane : public QPSNotificationAppController {
+  public:
+    [[nodiscard]] bool init() override;
+
+    [[nodiscard]] std::string localizedPaneTitle() override {
+        return bundle()->localizedStringForKey_value_table("TITLE", "Default title", std::nullopt);
+    }
+
+    [[nodiscard]] std::shared_ptr<NSBundle> bundle() override {
+        return NSBundle::bundleForClass(Class::ofObject(*this));
+    }
+
+    [[nodiscard]] std::optional<std::string> applicationBundleIdentifier() override {
+        return bundle()->bundleIdentifier();
+    }
+};
+
+bool TestPane::init() {
+    if (!QPSNotificationAppController::init()) {
+        return false;
+    }
+    setTitle(localizedPaneTitle());
+    return true;
+}
+
+QUORL_EXPORT_CLASS(TestPane)
