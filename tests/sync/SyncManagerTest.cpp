@@ -1,0 +1,573 @@
+#include "sync/LMQuorlSyncManager.h"
+
+#include <array>
+#include <limits>
+#include <thread>
+
+#include <gmock/gmock.h>
+
+#include "platform/UserInterface.h"
+#include "tests/support/MainQueueRun.h"
+#include "tests/support/TestHost.h"
+
+namespace {
+
+using quorl::SyncPreference;
+using quorl::tests::runMainQueueUntil;
+using quorl::tests::runQueuedWork;
+using quorl::tests::TestHost;
+using quorl::tests::TestPlaylist;
+using quorl::tests::TestSession;
+using quorl::tests::TestTask;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+constexpr auto largestWord = std::numeric_limits<NSUInteger>::max();
+
+/// Counts the status notifications and notes who sent the last one, and on which thread.
+class StatusObserver : public NSObject {
+  public:
+    void statusDidChange(const NSNotification& notification) {
+        ++count;
+        sender = notification.object;
+        thread = std::this_thread::get_id();
+    }
+
+    std::size_t count = 0;
+    const NSObject* sender = nullptr;
+    std::thread::id thread;
+};
+
+class SyncManager : public testing::Test {
+  protected:
+    /// The manager, attached to the sessions that there are, with its first status posted.
+    LMQuorlSyncManager& manager() {
+        const auto& shared = LMQuorlSyncManager::sharedManager();
+        if (!observer_) {
+            runQueuedWork();
+            observer_ = create<StatusObserver>();
+            NSNotificationCenter::defaultCenter().addObserver_selector_name_object(
+                observer_.get(),
+                NSNotificationSelector::of<&StatusObserver::statusDidChange>("statusDidChange:"),
+                LMQuorlSyncStatusDidChangeNotification, nullptr);
+            host_->journal.clear();
+        }
+        return *shared;
+    }
+
+    /// How many status notifications have come since the manager was there.
+    [[nodiscard]] std::size_t posts() const { return observer_->count; }
+
+    static void post(NSNotificationName name) {
+        NSNotificationCenter::defaultCenter().postNotificationName_object(name, nullptr);
+    }
+
+    void store(SyncPreference preference, std::optional<std::uint64_t> value) {
+        (void)host_->preferences.setValue(preference, value);
+    }
+
+    /// Sync is on and a playlist of this revision is chosen.
+    std::shared_ptr<TestPlaylist> choosePlaylist(std::uint64_t revision = 1) {
+        const auto playlist = host_->mediaLibrary().addPlaylist(7, "Morning");
+        playlist->setRevision(revision);
+        store(SyncPreference::AssetSyncEnabled, 1);
+        store(SyncPreference::AssetSyncPlaylistPersistentID, 7);
+        return playlist;
+    }
+
+    void storeLastSent(std::optional<std::uint64_t> persistentID,
+                       std::optional<std::uint64_t> version) {
+        store(SyncPreference::LastFullySentAssetSyncPlaylistPersistentID, persistentID);
+        store(SyncPreference::LastFullySentAssetSyncPlaylistVersion, version);
+    }
+
+    std::shared_ptr<TestHost> host_ = TestHost::installed();
+    std::shared_ptr<StatusObserver> observer_;
+};
+
+TEST_F(SyncManager, BeginsByListeningAndAttachingAndPostsAStatusLater) {
+    host_->addSession("A");
+    host_->addSession("B");
+
+    const auto& manager = LMQuorlSyncManager::sharedManager();
+
+    ASSERT_NE(manager, nullptr);
+    EXPECT_THAT(host_->journal.lines({"observe", "sessions", "session", "post"}),
+                ElementsAre("observe UIApplicationDidEnterBackgroundNotification "
+                            "_applicationDidEnterBackgroundNotification: any",
+                            "observe UIApplicationWillEnterForegroundNotification "
+                            "_applicationWillEnterForegroundNotification: any",
+                            "observe DVSessionsDidChangeNotification "
+                            "_drovanSessionsDidChangeNotification: any",
+                            "observe LMSyncPreferencesDidChangeNotification "
+                            "_syncPreferencesDidChangeNotification: any",
+                            "sessions DVSessionTypeDeviceSync", "session A add", "session B add"));
+    runQueuedWork();
+    EXPECT_EQ(host_->journal.count("post LMQuorlSyncStatusDidChangeNotification"), 1U);
+}
+
+TEST_F(SyncManager, IsOneForTheProcess) {
+    const auto first = LMQuorlSyncManager::sharedManager();
+
+    EXPECT_EQ(LMQuorlSyncManager::sharedManager(), first);
+    EXPECT_EQ(host_->journal.count("sessions DVSessionTypeDeviceSync"), 1U);
+}
+
+TEST_F(SyncManager, PublishesTheNameOfItsNotification) {
+    EXPECT_EQ(LMQuorlSyncStatusDidChangeNotification, "LMQuorlSyncStatusDidChangeNotification");
+}
+
+// What the status is.
+
+TEST_F(SyncManager, IsPendingWhereAPlaylistWasNeverSent) {
+    choosePlaylist();
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStagePending);
+    EXPECT_EQ(manager().progress(), 1.0F);
+    EXPECT_EQ(manager().completedAssetCount(), 0U);
+    EXPECT_EQ(manager().totalAssetCount(), 0U);
+}
+
+TEST_F(SyncManager, IsIdleWhileSyncIsOff) {
+    choosePlaylist();
+    store(SyncPreference::AssetSyncEnabled, 0);
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle);
+}
+
+TEST_F(SyncManager, IsIdleWhereThePlaylistWasSentAsItIsNow) {
+    choosePlaylist(5);
+    storeLastSent(7, 5);
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle);
+}
+
+TEST_F(SyncManager, IsPendingWhereThePlaylistHasChangedSinceItWasSent) {
+    choosePlaylist(6);
+    storeLastSent(7, 5);
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStagePending);
+}
+
+TEST_F(SyncManager, IsPendingWhereAnotherPlaylistWasSent) {
+    choosePlaylist(5);
+    storeLastSent(8, 5);
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStagePending);
+}
+
+TEST_F(SyncManager, TakesWhatIsMissingOnEitherSideForADifference) {
+    const auto playlist = choosePlaylist(5);
+    storeLastSent(7, std::nullopt);
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStagePending);
+
+    storeLastSent(std::nullopt, 5);
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStagePending);
+
+    storeLastSent(7, 5);
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle);
+    playlist->setProperty(MPMediaEntityPropertyEntityRevision, nullptr);
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStagePending);
+
+    storeLastSent(7, std::nullopt);
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStagePending) << "missing on both sides";
+}
+
+TEST_F(SyncManager, IsIdleWithoutAPlaylistWhateverWasSent) {
+    store(SyncPreference::AssetSyncEnabled, 1);
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle);
+
+    store(SyncPreference::AssetSyncPlaylistPersistentID, 99);
+    storeLastSent(7, 5);
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle) << "not in the library";
+}
+
+TEST_F(SyncManager, ComparesAll64BitsOfTheIds) {
+    choosePlaylist(5);
+    storeLastSent(0x1'0000'0007, 5);
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStagePending);
+}
+
+TEST_F(SyncManager, ReadsThePlaylistThenTheIdTheRevisionAndWhatWasSent) {
+    choosePlaylist();
+    (void)manager().syncStage(); // the playlist is remembered from here on
+    host_->journal.clear();
+
+    (void)manager().syncStage();
+
+    EXPECT_THAT(host_->journal.lines({"read", "property", "query"}),
+                ElementsAre("read assetSyncEnabled", "read assetSyncPlaylistPersistentID",
+                            "read assetSyncPlaylistPersistentID",
+                            "property 7 MPMediaEntityPropertyEntityRevision",
+                            "read lastFullySentAssetSyncPlaylistPersistentID",
+                            "read lastFullySentAssetSyncPlaylistVersion"));
+}
+
+TEST_F(SyncManager, ReadsNoPreferencesWhileSomethingIsRunning) {
+    choosePlaylist();
+    host_->addSession("A")->addOtherTask({.running = true});
+    (void)manager();
+
+    (void)manager().syncStage();
+
+    EXPECT_THAT(host_->journal.lines({"read", "query", "property"}), IsEmpty());
+}
+
+struct Stage {
+    const char* situation;
+    std::vector<TestTask::Figures> assetTasks;
+    std::vector<TestTask::Figures> otherTasks;
+    LMQuorlSyncStage expected;
+};
+
+class SyncStages : public SyncManager, public testing::WithParamInterface<Stage> {};
+
+TEST_P(SyncStages, FollowFromTheRunningTasks) {
+    choosePlaylist();
+    const auto session = host_->addSession("A");
+    for (const auto& figures : GetParam().assetTasks) {
+        session->addAssetTask(figures);
+    }
+    for (const auto& figures : GetParam().otherTasks) {
+        session->addOtherTask(figures);
+    }
+
+    EXPECT_EQ(manager().syncStage(), GetParam().expected) << GetParam().situation;
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Table, SyncStages,
+    testing::Values(
+        Stage{"no task", {}, {}, LMQuorlSyncStagePending},
+        Stage{"asset task that still counts",
+              {{.running = true, .total = 0}},
+              {},
+              LMQuorlSyncStageIndeterminateSyncing},
+        Stage{"other kind of task",
+              {},
+              {{.running = true, .total = 9}},
+              LMQuorlSyncStageIndeterminateSyncing},
+        Stage{"one asset task counts, one has counted",
+              {{.running = true, .total = 0}, {.running = true, .total = 5}},
+              {},
+              LMQuorlSyncStageSyncing},
+        Stage{"asset task beside another kind",
+              {{.running = true, .total = 5}},
+              {{.running = true, .total = 0}},
+              LMQuorlSyncStageSyncing},
+        Stage{"asset task that does not run", {{.total = 5}}, {}, LMQuorlSyncStagePending},
+        Stage{"asset task that does not run beside another kind that does",
+              {{.total = 5}},
+              {{.running = true}},
+              LMQuorlSyncStageIndeterminateSyncing},
+        Stage{"totals that wrap around to 0 count as 0",
+              {{.running = true, .total = largestWord}, {.running = true, .total = 1}},
+              {},
+              LMQuorlSyncStageIndeterminateSyncing}));
+
+TEST_F(SyncManager, LooksAtTheTasksOfAllSessionsForTheStage) {
+    host_->addSession("A")->addOtherTask({});
+    host_->addSession("B")->addAssetTask({.running = true, .total = 3});
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageSyncing);
+}
+
+TEST_F(SyncManager, LetsThePreferencesDecideWhereTheIdleTasksHaveItems) {
+    choosePlaylist(5);
+    storeLastSent(7, 5);
+    host_->addSession("A")->addAssetTask({.total = 5});
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle);
+}
+
+TEST_F(SyncManager, ComputesEachAnswerAnew) {
+    const auto task = host_->addSession("A")->addAssetTask({.running = true, .total = 0});
+    ASSERT_EQ(manager().syncStage(), LMQuorlSyncStageIndeterminateSyncing);
+
+    task->become({.running = true, .total = 8, .completed = 2, .progress = 0.25});
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageSyncing);
+    EXPECT_EQ(manager().progress(), 0.25F);
+    EXPECT_EQ(manager().completedAssetCount(), 2U);
+    EXPECT_EQ(manager().totalAssetCount(), 8U);
+}
+
+TEST_F(SyncManager, HasTheMeanProgressOfAllAssetTasks) {
+    const auto finished = host_->addSession("finished");
+    finished->addAssetTask({.total = 1, .progress = 1.0});
+    finished->finish();
+    const auto running = host_->addSession("running");
+    running->addAssetTask({.running = true, .total = 1000, .progress = 0.5});
+    running->addOtherTask({.running = true, .progress = 0.0});
+
+    EXPECT_EQ(manager().progress(), 0.75F);
+}
+
+TEST_F(SyncManager, CountsWaitingTasksIntoTheProgress) {
+    const auto session = host_->addSession("A");
+    session->addAssetTask({.running = true, .progress = 0.5});
+    session->addAssetTask({.running = false, .progress = 0.0});
+
+    EXPECT_EQ(manager().progress(), 0.25F);
+}
+
+TEST_F(SyncManager, HasAllProgressOnceEverySessionHasFinished) {
+    const auto session = host_->addSession("A");
+    session->addAssetTask({.progress = 0.2});
+    session->finish();
+
+    EXPECT_EQ(manager().progress(), 1.0F);
+}
+
+TEST_F(SyncManager, AsksEverySessionWhetherItHasFinished) {
+    host_->addSession("running");
+    host_->addSession("finished")->finish();
+    EXPECT_EQ(manager().progress(), 0.0F);
+}
+
+TEST_F(SyncManager, HasNoProgressWithoutAssetTasks) {
+    host_->addSession("A")->addOtherTask({.running = true, .progress = 0.9});
+
+    EXPECT_EQ(manager().progress(), 0.0F);
+}
+
+TEST_F(SyncManager, DoesNotHoldItsProgressBetween0And1) {
+    const auto task = host_->addSession("A")->addAssetTask({.running = true, .progress = 1.5});
+    EXPECT_EQ(manager().progress(), 1.5F);
+
+    task->become({.running = true, .progress = -0.5});
+    EXPECT_EQ(manager().progress(), -0.5F);
+}
+
+TEST_F(SyncManager, DividesInDoublePrecisionAndNarrowsAfterwards) {
+    const auto session = host_->addSession("A");
+    session->addAssetTask({.progress = 0.1});
+    session->addAssetTask({.progress = 0.2});
+    session->addAssetTask({.progress = 0.4});
+
+    EXPECT_EQ(manager().progress(), static_cast<float>((0.1 + 0.2 + 0.4) / 3.0));
+}
+
+TEST_F(SyncManager, CountsTheItemsOfAllAssetTasksRunningOrNot) {
+    const auto one = host_->addSession("A");
+    one->addAssetTask({.running = true, .total = 10, .completed = 4});
+    one->addAssetTask({.total = 5, .completed = 5});
+    one->addOtherTask({.running = true, .total = 100, .completed = 100});
+    const auto finished = host_->addSession("B");
+    finished->addAssetTask({.total = 3, .completed = 3});
+    finished->finish();
+
+    EXPECT_EQ(manager().completedAssetCount(), 12U);
+    EXPECT_EQ(manager().totalAssetCount(), 18U);
+}
+
+TEST_F(SyncManager, TakesMissingTaskListsForEmptyOnes) {
+    host_->addSession("A")->loseTasks();
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle);
+    EXPECT_EQ(manager().progress(), 0.0F);
+    EXPECT_EQ(manager().totalAssetCount(), 0U);
+}
+
+// When it is announced.
+
+using Callback = void (*)(DVSessionObserver& observer, DVSession& session, DVSessionTask& task);
+
+struct SessionEvent {
+    const char* name;
+    Callback tell;
+    std::size_t posts;
+};
+
+class SessionEvents : public SyncManager, public testing::WithParamInterface<SessionEvent> {};
+
+TEST_P(SessionEvents, AreAnsweredWithOnePostLater) {
+    const auto session = host_->addSession("A");
+    const auto task = session->addAssetTask({});
+    (void)manager();
+
+    session->tellObservers(
+        [&](DVSessionObserver& observer) { GetParam().tell(observer, *session, *task); });
+    EXPECT_EQ(posts(), 0U) << "never before the caller has gone on";
+    runQueuedWork();
+
+    EXPECT_EQ(posts(), GetParam().posts) << GetParam().name;
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Table, SessionEvents,
+    testing::Values(SessionEvent{"session begins",
+                                 [](auto& observer, auto& session, auto&) {
+                                     observer.sessionWillBegin(session);
+                                 },
+                                 1},
+                    SessionEvent{"session ends",
+                                 [](auto& observer, auto& session, auto&) {
+                                     observer.sessionDidFinish(session);
+                                 },
+                                 1},
+                    SessionEvent{"task is about to begin",
+                                 [](auto& observer, auto& session, auto& task) {
+                                     observer.session_willBeginSessionTask(session, task);
+                                 },
+                                 1},
+                    SessionEvent{"task has begun",
+                                 [](auto& observer, auto& session, auto& task) {
+                                     observer.session_didBeginSessionTask(session, task);
+                                 },
+                                 0},
+                    SessionEvent{"task goes on",
+                                 [](auto& observer, auto& session, auto& task) {
+                                     observer.session_didUpdateSessionTask(session, task);
+                                 },
+                                 1},
+                    SessionEvent{"task ends",
+                                 [](auto& observer, auto& session, auto& task) {
+                                     observer.session_didFinishSessionTask(session, task);
+                                 },
+                                 1}));
+
+TEST_F(SyncManager, PostsOncePerCauseOnTheMainThreadAsTheSender) {
+    const auto session = host_->addSession("A");
+    (void)manager();
+
+    for (int event = 0; event < 3; ++event) {
+        session->tellObservers(
+            [&](DVSessionObserver& observer) { observer.sessionWillBegin(*session); });
+    }
+    runQueuedWork();
+
+    EXPECT_EQ(posts(), 3U);
+    EXPECT_EQ(observer_->sender, &manager());
+    EXPECT_EQ(observer_->thread, std::this_thread::get_id());
+}
+
+TEST_F(SyncManager, PostsOnTheMainThreadWhatASessionTellsOnOthers) {
+    constexpr std::size_t threads = 4;
+    constexpr std::size_t events = 250;
+    const auto session = host_->addSession("A");
+    const auto task = session->addAssetTask({});
+    (void)manager();
+
+    {
+        std::array<std::jthread, threads> tellers;
+        for (auto& teller : tellers) {
+            teller = std::jthread([&] {
+                for (std::size_t event = 0; event < events; ++event) {
+                    session->tellObservers([&](DVSessionObserver& observer) {
+                        observer.session_didUpdateSessionTask(*session, *task);
+                    });
+                }
+            });
+        }
+    }
+    runMainQueueUntil([this] { return posts() >= threads * events; });
+    runQueuedWork();
+
+    EXPECT_EQ(posts(), threads * events);
+    EXPECT_EQ(observer_->thread, std::this_thread::get_id());
+}
+
+TEST_F(SyncManager, AnswersAPreferencesChangeWithOnePostAndNoFetch) {
+    (void)manager();
+
+    post(LMSyncPreferencesDidChangeNotification);
+    EXPECT_EQ(posts(), 0U);
+    runQueuedWork();
+
+    EXPECT_EQ(posts(), 1U);
+    EXPECT_THAT(host_->journal.lines({"sessions", "session"}), IsEmpty());
+}
+
+// Which sessions it is attached to.
+
+TEST_F(SyncManager, LeavesTheOldSessionsAndJoinsTheNewOnesWhenTheyChange) {
+    host_->addSession("A");
+    host_->addSession("B");
+    (void)manager();
+    host_->removeSessions();
+    const auto added = host_->addSession("C");
+    added->addAssetTask({.running = true, .total = 1});
+
+    post(DVSessionsDidChangeNotification);
+
+    EXPECT_THAT(host_->journal.lines({"sessions", "session"}),
+                ElementsAre("session A remove", "session B remove",
+                            "sessions DVSessionTypeDeviceSync", "session C add"));
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageSyncing);
+    runQueuedWork();
+    EXPECT_EQ(posts(), 1U);
+}
+
+TEST_F(SyncManager, KnowsANewSessionOnlyOnceItIsAnnounced) {
+    (void)manager();
+
+    host_->addSession("A")->addAssetTask({.running = true, .total = 1});
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle);
+
+    post(DVSessionsDidChangeNotification);
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageSyncing);
+}
+
+TEST_F(SyncManager, LeavesItsSessionsInTheBackgroundAndJoinsTheSameOnesAgain) {
+    const auto session = host_->addSession("A");
+    (void)manager();
+    host_->removeSessions(); // unannounced
+
+    post(UIApplicationDidEnterBackgroundNotification);
+    session->tellObservers(
+        [&](DVSessionObserver& observer) { observer.sessionDidFinish(*session); });
+    post(UIApplicationWillEnterForegroundNotification);
+    runQueuedWork();
+
+    EXPECT_THAT(host_->journal.lines({"sessions", "session"}),
+                ElementsAre("session A remove", "session A add"));
+    EXPECT_EQ(posts(), 0U);
+    session->tellObservers(
+        [&](DVSessionObserver& observer) { observer.sessionDidFinish(*session); });
+    runQueuedWork();
+    EXPECT_EQ(posts(), 1U);
+}
+
+TEST_F(SyncManager, AnswersQuestionsFromItsListInTheBackgroundToo) {
+    host_->addSession("A")->addAssetTask({.running = true, .total = 1});
+    (void)manager();
+
+    post(UIApplicationDidEnterBackgroundNotification);
+
+    EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageSyncing);
+}
+
+TEST_F(SyncManager, HearsOfPreferencesAndSessionsInTheBackgroundToo) {
+    (void)manager();
+    post(UIApplicationDidEnterBackgroundNotification);
+
+    post(LMSyncPreferencesDidChangeNotification);
+    runQueuedWork();
+    EXPECT_EQ(posts(), 1U);
+
+    const auto session = host_->addSession("A");
+    post(DVSessionsDidChangeNotification);
+    runQueuedWork();
+    EXPECT_EQ(posts(), 2U);
+    session->tellObservers(
+        [&](DVSessionObserver& observer) { observer.sessionDidFinish(*session); });
+    runQueuedWork();
+    EXPECT_EQ(posts(), 3U);
+}
+
+TEST_F(SyncManager, HearsASessionOnceHoweverOftenTheAppComesBack) {
+    const auto session = host_->addSession("A");
+    (void)manager();
+
+    post(UIApplicationWillEnterForegroundNotification);
+    post(UIApplicationWillEnterForegroundNotification);
+    session->tellObservers(
+        [&](DVSessionObserver& observer) { observer.sessionDidFinish(*session); });
+    runQueuedWork();
+
+    EXPECT_EQ(posts(), 1U);
+}
+
+} // namespace
