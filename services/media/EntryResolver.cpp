@@ -1,0 +1,140 @@
+#include "services/media/EntryResolver.h"
+
+#include "services/media/EntryReadings.h"
+#include "services/media/FileStatus.h"
+#include "services/media/MallocText.h"
+#include "services/media/Text.h"
+
+#include <sys/stat.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <cstdlib>
+#include <filesystem>
+
+namespace quorl::media {
+
+namespace {
+
+/// The directory that `path` reaches from `directory`, and what is left of `path` from its last
+/// component on. Null: the way leads through something that is not in the tree. As no directory in
+/// the tree is a symbolic link, `..` is the parent.
+Directory* follow(Directory& directory, std::string_view& path) {
+    Directory* at = &directory;
+    for (std::size_t slash = path.find('/'); at != nullptr && slash != std::string_view::npos;
+         slash = path.find('/')) {
+        const std::string_view component = path.substr(0, slash);
+        path.remove_prefix(slash + 1);
+        if (component == "..") {
+            at = at->parent;
+        } else if (!component.empty() && component != ".") {
+            at = at->child(component);
+        }
+    }
+    return at;
+}
+
+bool isHidden(std::string_view path) {
+    return path.starts_with('.') || path.find("/.") != std::string_view::npos;
+}
+
+bool isMissing(const Resolved& result) {
+    const Reason* const reason = std::get_if<Reason>(&result);
+    return reason != nullptr && *reason == Reason::Missing;
+}
+
+} // namespace
+
+EntryResolver::EntryResolver(const FolderTree& tree)
+    : tree_(tree), givenRoot_(tree.root() == "/" ? std::string() : tree.root().string()) {}
+
+Resolved EntryResolver::resolve(Directory& directory, std::string_view entry, Format format) const {
+    const auto read = readEntry(entry, format);
+    if (const Reason* const reason = std::get_if<Reason>(&read)) {
+        return *reason;
+    }
+    const auto& readings = std::get<EntryReadings>(read);
+    for (const std::string& path : readings) {
+        if (const auto found = locateInAnyNormalisation(directory, path)) {
+            return *found;
+        }
+    }
+    Resolved result = Reason::Missing;
+    for (const std::string& path : readings) {
+        if (isMissing(result)) {
+            result = examine(directory, path);
+        }
+    }
+    return result;
+}
+
+std::optional<FoundSong> EntryResolver::locateInAnyNormalisation(Directory& directory,
+                                                                 const std::string& path) const {
+    auto found = locate(directory, path);
+    if (!found && !isAscii(path)) {
+        found = locate(directory, composed(path));
+        if (!found) {
+            found = locate(directory, decomposed(path));
+        }
+    }
+    return found;
+}
+
+std::optional<FoundSong> EntryResolver::locate(Directory& directory, std::string_view path) const {
+    Directory* start = &directory;
+    if (path.starts_with('/')) {
+        const auto relative = relativeToRoot(path);
+        if (!relative) {
+            return std::nullopt;
+        }
+        start = tree_.top();
+        path = *relative;
+    }
+    Directory* const holder = follow(*start, path);
+    SongFile* const file = holder == nullptr ? nullptr : holder->song(path);
+    return file == nullptr ? std::nullopt : std::optional(FoundSong{holder, file});
+}
+
+Resolved EntryResolver::examine(const Directory& directory, const std::string& path) const {
+    const std::string absolute =
+        path.starts_with('/') ? path : tree_.absolute(directory.pathOf(path));
+    FileStatus status{};
+    if (stat(absolute.c_str(), &status) == 0) {
+        return examineExisting(absolute, S_ISREG(status.st_mode));
+    }
+    const bool denied = errno == EACCES;
+    if (!relativeToRoot(std::filesystem::path(absolute).lexically_normal().native())) {
+        return Reason::OutsideFolder;
+    }
+    return denied ? Reason::Unreachable : Reason::Missing;
+}
+
+Resolved EntryResolver::examineExisting(const std::string& path, bool regular) const {
+    const MallocText canonical(realpath(path.c_str(), nullptr));
+    if (!canonical) {
+        return Reason::Missing;
+    }
+    const std::string_view target = canonical.get();
+    if (!isWithin(target, tree_.canonicalRoot())) {
+        return Reason::OutsideFolder;
+    }
+    if (!regular) {
+        return Reason::NotRegularFile;
+    }
+    if (const auto found = locate(*tree_.top(), target)) {
+        return *found;
+    }
+    return isHidden(*relativeToRoot(target)) ? Reason::Hidden : Reason::NotMusic;
+}
+
+std::optional<std::string_view> EntryResolver::relativeToRoot(std::string_view path) const {
+    for (const std::string_view root :
+         {std::string_view(tree_.canonicalRoot()), std::string_view(givenRoot_)}) {
+        if (isWithin(path, root)) {
+            return path.substr(std::min(root.size() + 1, path.size()));
+        }
+    }
+    return std::nullopt;
+}
+
+} // namespace quorl::media

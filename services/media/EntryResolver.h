@@ -1,0 +1,48 @@
+#pragma once
+
+#include "services/media/FolderTree.h"
+#include "services/media/LeftOut.h"
+#include "services/media/PlaylistContent.h"
+
+#include <optional>
+#include <string>
+#include <string_view>
+#include <variant>
+
+namespace quorl::media {
+
+/// A song that an entry means.
+struct FoundSong {
+    Directory* directory;
+    SongFile* file;
+};
+
+using Resolved = std::variant<FoundSong, Reason>;
+
+/// Finds the song that an entry of a playlist means. Most entries are found in the tree, without
+/// asking the file system; only what is not there is looked at, to follow links and to tell why.
+class EntryResolver {
+  public:
+    /// `tree` is not changed and outlives the resolver; its `top` is not null.
+    explicit EntryResolver(const FolderTree& tree);
+
+    /// The song that `entry` means in a playlist of `format` that lies in `directory`, or why there
+    /// is none.
+    [[nodiscard]] Resolved resolve(Directory& directory, std::string_view entry,
+                                   Format format) const;
+
+  private:
+    [[nodiscard]] std::optional<FoundSong> locate(Directory& directory,
+                                                  std::string_view path) const;
+    [[nodiscard]] std::optional<FoundSong> locateInAnyNormalisation(Directory& directory,
+                                                                    const std::string& path) const;
+    [[nodiscard]] Resolved examine(const Directory& directory, const std::string& path) const;
+    [[nodiscard]] Resolved examineExisting(const std::string& path, bool regular) const;
+    [[nodiscard]] std::optional<std::string_view> relativeToRoot(std::string_view path) const;
+
+    const FolderTree& tree_;
+    /// The music folder as it was given, without a slash at its end: empty for "/".
+    std::string givenRoot_;
+};
+
+} // namespace quorl::media

@@ -1,0 +1,75 @@
+#pragma once
+
+#include "services/media/ContentKinds.h"
+#include "services/media/Directory.h"
+#include "services/media/DirectoryWatch.h"
+
+#include <cstddef>
+#include <filesystem>
+#include <memory>
+#include <stop_token>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+namespace quorl::media {
+
+/// The directories of a music folder as far as they were read, and which of them have to be read
+/// again. For one thread at a time. Holds nothing open in the folder, so that its disk can be
+/// unmounted.
+class FolderTree {
+  public:
+    /// `root` is absolute. `watch` is told of every directory and outlives the tree; null: nobody
+    /// watches. Reads nothing yet.
+    FolderTree(std::filesystem::path root, DirectoryWatch* watch);
+
+    /// Forgets everything: the folder, or a part of it, may be another one by now.
+    void reset();
+
+    /// Has every directory read again. Playlists whose files did not change keep their contents.
+    void markAll();
+
+    /// Has the directories read again that `changes` names.
+    void mark(const DirectoryWatch::Changes& changes);
+
+    /// Something was marked, or nothing was read yet.
+    [[nodiscard]] bool isDirty() const { return dirty_; }
+
+    /// Reads what is dirty. False: stopped before the end; call again to go on.
+    [[nodiscard]] bool refresh(const std::stop_token& stop);
+
+    /// The music folder as it was given.
+    [[nodiscard]] const std::filesystem::path& root() const { return root_; }
+
+    /// The music folder without symbolic links and without a slash at its end: empty for "/".
+    [[nodiscard]] const std::string& canonicalRoot() const { return canonicalRoot_; }
+
+    /// The music folder's own directory; null: it was not found.
+    [[nodiscard]] Directory* top() const { return top_.get(); }
+
+    /// All directories, each before those in it; among those of one directory, in order of names.
+    [[nodiscard]] std::vector<Directory*> directories() const;
+
+    /// How many directories could be read but not watched.
+    [[nodiscard]] std::size_t unwatchedDirectories() const;
+
+    /// The path by which to open `path`, which is relative to the music folder.
+    [[nodiscard]] std::string absolute(const std::string& path) const;
+
+  private:
+    void findTop();
+    void read(Directory& directory);
+    void startWatching(Directory& directory, const std::string& path);
+    void stopWatching(const Directory& directory);
+    void stopWatchingAll(Directory& top);
+
+    const std::filesystem::path root_;
+    DirectoryWatch* const watch_;
+    std::string canonicalRoot_;
+    std::unique_ptr<Directory> top_;
+    std::unordered_map<int, Directory*> watched_;
+    ContentKinds kinds_;
+    bool dirty_ = true;
+};
+
+} // namespace quorl::media

@@ -1,0 +1,62 @@
+#include "services/media/LeftOut.h"
+
+#include "services/media/Text.h"
+
+#include <algorithm>
+#include <array>
+
+namespace quorl::media {
+
+namespace {
+
+struct Explanation {
+    Reason reason;
+    std::string_view sentence;
+};
+
+constexpr std::array explanations{
+    Explanation{Reason::NoAddress, "The playlist names no file for this track."},
+    Explanation{Reason::RemoteAddress,
+                "It is not on this machine. Download it into the music folder."},
+    Explanation{Reason::OtherSystem, "It is a path of another system. Save the playlist again with "
+                                     "paths relative to it."},
+    Explanation{Reason::OutsideFolder,
+                "It is outside the music folder. Copy it into the music folder."},
+    Explanation{Reason::Missing,
+                "There is no such file. Put it back, or take it out of the playlist."},
+    Explanation{Reason::Unreachable, "A directory on the way to it may not be entered. Check the "
+                                     "permissions."},
+    Explanation{Reason::Hidden,
+                "It is hidden: a name on the way to it begins with a dot. Rename it."},
+    Explanation{Reason::NotRegularFile, "It is not a regular file."},
+    Explanation{Reason::NotMusic, "It is neither audio nor video."},
+    Explanation{Reason::PlaylistUnreadable,
+                "The playlist cannot be read. Check its permissions and the disk."},
+    Explanation{Reason::PlaylistTooLarge, "The playlist is larger than 64 MiB. Split it."},
+    Explanation{Reason::PlaylistBroken,
+                "The playlist is damaged. Save it again with the program that made it."},
+    Explanation{Reason::TooManyEntries,
+                "The playlist lists more than a million entries, and those after are ignored. "
+                "Split it."},
+    Explanation{Reason::SameAsAnother,
+                "Another playlist has the same name but for how its accents are stored. Rename one "
+                "of the two."},
+    Explanation{Reason::DirectoryUnreadable,
+                "The directory cannot be read. Check its permissions and the disk."},
+};
+
+} // namespace
+
+std::string_view sentence(Reason reason) {
+    return std::ranges::find(explanations, reason, &Explanation::reason)->sentence;
+}
+
+std::string describe(const LeftOut& leftOut) {
+    std::string line = leftOut.playlist.empty() ? "The music folder" : printable(leftOut.playlist);
+    if (!leftOut.entry.empty()) {
+        line += ": " + printable(leftOut.entry);
+    }
+    return line + ": " + std::string(sentence(leftOut.reason));
+}
+
+} // namespace quorl::media

@@ -1,0 +1,15 @@
+#pragma once
+
+#include <cstdlib>
+#include <memory>
+
+namespace quorl::media {
+
+struct FreeWithMalloc {
+    void operator()(char* text) const { std::free(text); }
+};
+
+/// A C string that the C library allocated, such as the result of `realpath`.
+using MallocText = std::unique_ptr<char, FreeWithMalloc>;
+
+} // namespace quorl::media

@@ -1,0 +1,209 @@
+#include "services/media/MusicFolder.h"
+
+#include "services/media/DirectoryWatch.h"
+#include "services/media/FileDescriptor.h"
+#include "services/media/FolderTree.h"
+#include "services/media/MountWatch.h"
+#include "services/media/RootWatch.h"
+#include "services/media/SnapshotBuilder.h"
+
+#include <malloc.h>
+#include <poll.h>
+#include <sys/eventfd.h>
+
+#include <array>
+#include <cerrno>
+#include <chrono>
+#include <mutex>
+#include <optional>
+#include <stop_token>
+#include <system_error>
+#include <thread>
+#include <utility>
+#include <vector>
+
+namespace quorl::media {
+
+namespace {
+
+using Clock = std::chrono::steady_clock;
+
+// A program that copies an album makes hundreds of changes within moments of each other. Building
+// the snapshot costs some milliseconds however small the change, so it waits until the folder has
+// been quiet for a moment; a copy that never rests is shown in steps all the same.
+constexpr std::chrono::milliseconds quietTime{50};
+constexpr std::chrono::milliseconds longestWait{500};
+
+std::filesystem::path absoluteRoot(const std::filesystem::path& root) {
+    std::filesystem::path path = std::filesystem::absolute(root).lexically_normal();
+    return path.has_filename() ? path : path.parent_path();
+}
+
+/// While a snapshot is built, the one before is still there. What that leaves free amounts to a
+/// third of all that a large folder needs, and the allocator would keep it for the rest of the
+/// process.
+void giveBackMemory() { malloc_trim(0); }
+
+FileDescriptor makeWakeUp() {
+    FileDescriptor descriptor(eventfd(0, EFD_NONBLOCK | EFD_CLOEXEC));
+    if (!descriptor) {
+        throw std::system_error(errno, std::generic_category(),
+                                "The music folder cannot be watched");
+    }
+    return descriptor;
+}
+
+} // namespace
+
+std::shared_ptr<const Snapshot> scan(const std::filesystem::path& root) {
+    FolderTree tree(absoluteRoot(root), nullptr);
+    const std::stop_token never;
+    static_cast<void>(tree.refresh(never));
+    return buildSnapshot(tree, never);
+}
+
+class MusicFolder::Worker {
+  public:
+    Worker(const std::filesystem::path& root, Changed changed)
+        : changed_(std::move(changed)),
+          tree_(root, &directoryWatch_),
+          thread_([this](const std::stop_token& stop) { run(stop); }) {}
+
+    std::shared_ptr<const Snapshot> snapshot() const {
+        const std::lock_guard lock(mutex_);
+        return snapshot_;
+    }
+
+    void rescan(std::function<void()> done) {
+        {
+            const std::lock_guard lock(mutex_);
+            rescans_.push_back(std::move(done));
+        }
+        wakeUp();
+    }
+
+  private:
+    using Rescans = std::vector<std::function<void()>>;
+
+    void run(const std::stop_token& stop) {
+        const std::stop_callback wakeForStop(stop, [this] { wakeUp(); });
+        rootWatch_.emplace(tree_.root());
+        mountWatch_.emplace(tree_.root());
+        while (!stop.stop_requested()) {
+            const Rescans rescans = takeRescans();
+            if (!rescans.empty()) {
+                tree_.markAll();
+            }
+            if (tree_.isDirty()) {
+                if (!update(stop)) {
+                    return;
+                }
+                giveBackMemory();
+            }
+            for (const auto& done : rescans) {
+                if (done) {
+                    done();
+                }
+            }
+            waitForChanges(stop);
+        }
+    }
+
+    /// Reads what changed, and hands out what comes of it. False: stopped.
+    bool update(const std::stop_token& stop) {
+        if (!tree_.refresh(stop)) {
+            return false;
+        }
+        auto next = buildSnapshot(tree_, stop);
+        if (!next) {
+            return false;
+        }
+        if (snapshot_ && *snapshot_ == *next) {
+            return true;
+        }
+        {
+            const std::lock_guard lock(mutex_);
+            snapshot_ = next;
+        }
+        if (changed_) {
+            changed_(std::move(next));
+        }
+        return true;
+    }
+
+    Rescans takeRescans() {
+        const std::lock_guard lock(mutex_);
+        return std::exchange(rescans_, {});
+    }
+
+    /// Returns once there is something to read again, or when woken up.
+    void waitForChanges(const std::stop_token& stop) {
+        using namespace std::chrono;
+        constexpr milliseconds forever{-1};
+        if (!takeChanges(forever)) {
+            return;
+        }
+        const Clock::time_point latest = Clock::now() + longestWait;
+        while (tree_.isDirty() && !stop.stop_requested() && Clock::now() < latest &&
+               takeChanges(quietTime)) {
+        }
+    }
+
+    /// Waits for a change for at most `patience`, and marks what changed. False: nothing changed in
+    /// that time, or the thread was woken up.
+    bool takeChanges(std::chrono::milliseconds patience) {
+        std::array<pollfd, 4> descriptors{pollfd{wakeUp_.get(), POLLIN, 0},
+                                          pollfd{rootWatch_->descriptor(), POLLIN, 0},
+                                          pollfd{directoryWatch_.descriptor(), POLLIN, 0},
+                                          pollfd{mountWatch_->descriptor(), POLLPRI, 0}};
+        const auto& [woken, root, directories, mounts] = descriptors;
+        if (poll(descriptors.data(), descriptors.size(), static_cast<int>(patience.count())) <= 0) {
+            return false;
+        }
+        if (woken.revents != 0) {
+            eventfd_t count = 0;
+            eventfd_read(wakeUp_.get(), &count);
+            return false;
+        }
+        if (directories.revents != 0) {
+            tree_.mark(directoryWatch_.take());
+        }
+        const bool rootChanged = root.revents != 0 && rootWatch_->take();
+        const bool mountsChanged = mounts.revents != 0 && mountWatch_->take();
+        if (rootChanged || mountsChanged) {
+            tree_.reset();
+        }
+        return true;
+    }
+
+    void wakeUp() { eventfd_write(wakeUp_.get(), 1); }
+
+    const Changed changed_;
+    const FileDescriptor wakeUp_ = makeWakeUp();
+
+    // The folder's own thread only. It also makes those that look at the folder when they are made,
+    // for a drive that does not answer may keep them waiting.
+    std::optional<RootWatch> rootWatch_;
+    std::optional<MountWatch> mountWatch_;
+    DirectoryWatch directoryWatch_;
+    FolderTree tree_;
+
+    mutable std::mutex mutex_;
+    /// Written by the folder's own thread only.
+    std::shared_ptr<const Snapshot> snapshot_;
+    Rescans rescans_;
+
+    /// Last, so that everything is there while it runs.
+    std::jthread thread_;
+};
+
+MusicFolder::MusicFolder(const std::filesystem::path& root, Changed changed)
+    : worker_(std::make_unique<Worker>(absoluteRoot(root), std::move(changed))) {}
+
+MusicFolder::~MusicFolder() = default;
+
+std::shared_ptr<const Snapshot> MusicFolder::snapshot() const { return worker_->snapshot(); }
+
+void MusicFolder::rescan(std::function<void()> done) { worker_->rescan(std::move(done)); }
+
+} // namespace quorl::media

@@ -1,0 +1,52 @@
+#pragma once
+
+#include "services/media/Snapshot.h"
+
+#include <filesystem>
+#include <functional>
+#include <memory>
+
+namespace quorl::media {
+
+/// Reads the music folder at `root` once, on the calling thread. Never null; a folder that is not
+/// there gives an empty snapshot with `rootFound` false.
+[[nodiscard]] std::shared_ptr<const Snapshot> scan(const std::filesystem::path& root);
+
+/// A music folder that is watched from construction to destruction, on a thread of its own.
+///
+/// A folder that is missing, deleted, moved away or unmounted is an empty one until it is there
+/// again.
+class MusicFolder {
+  public:
+    /// Is given each snapshot that differs from the one before, and the first. Called on the
+    /// folder's own thread, one call at a time. Must not throw, nor destroy the folder.
+    using Changed = std::function<void(std::shared_ptr<const Snapshot>)>;
+
+    /// Begins to read and watch `root`, which is taken as absolute, or relative to the working
+    /// directory of this moment. Throws `std::system_error` where the process may open no more
+    /// files or start no more threads.
+    MusicFolder(const std::filesystem::path& root, Changed changed);
+
+    /// Ends the thread and waits for it, also in the midst of reading; no call is made afterwards.
+    ~MusicFolder();
+
+    MusicFolder(const MusicFolder&) = delete;
+    MusicFolder& operator=(const MusicFolder&) = delete;
+
+    /// The last snapshot; null: the first is not ready yet. Any thread.
+    [[nodiscard]] std::shared_ptr<const Snapshot> snapshot() const;
+
+    /// Has everything read again, for changes that no watch tells: those made by other machines on
+    /// a network drive, and those in `Snapshot::unwatchedDirectories`. Returns at once; any thread.
+    ///
+    /// `done`, where given, is called on the folder's own thread once that has been read, after
+    /// `Changed` if it made a difference. It is never called when the folder is destroyed before.
+    void rescan(std::function<void()> done = {});
+
+  private:
+    class Worker;
+
+    std::unique_ptr<Worker> worker_;
+};
+
+} // namespace quorl::media

@@ -1,0 +1,32 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace quorl::media {
+
+/// `text` without ASCII white space at both ends.
+[[nodiscard]] std::string_view trimmed(std::string_view text);
+
+/// `text` itself where it is valid UTF-8, else `text` taken as Latin-1, in the reading that Windows
+/// programs write: bytes 0x80 to 0x9F, control characters in Latin-1, are quotation marks and the
+/// like.
+[[nodiscard]] std::string toUtf8(std::string_view text);
+
+/// `text` with every byte that is not part of valid UTF-8 replaced by U+FFFD.
+[[nodiscard]] std::string validUtf8(std::string_view text);
+
+/// `validUtf8` with the control characters replaced too: safe to print on a terminal.
+[[nodiscard]] std::string printable(std::string_view text);
+
+/// `text` in Unicode normalisation form C (composed) or D (decomposed). Text that is not valid
+/// UTF-8 is given back as it is.
+[[nodiscard]] std::string composed(std::string_view text);
+[[nodiscard]] std::string decomposed(std::string_view text);
+
+[[nodiscard]] bool isAscii(std::string_view text);
+
+/// Whether `path` is `root` or below it, by its text alone. Both absolute; `root` is empty for "/".
+[[nodiscard]] bool isWithin(std::string_view path, std::string_view root);
+
+} // namespace quorl::media
