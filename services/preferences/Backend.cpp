@@ -1,0 +1,104 @@
+// Asks GIO for the backend interface, which is stable but not part of gio.h.
+#define G_SETTINGS_ENABLE_BACKEND
+#include "services/preferences/Backend.h"
+
+#include "services/preferences/Preference.h"
+
+#include <gio/gsettingsbackend.h>
+
+#include <string_view>
+#include <utility>
+
+namespace quorl::preferences {
+namespace {
+
+/// GSettings does not say whether its backend shares anything; the name of the type does.
+constexpr std::string_view dconf = "DConfSettingsBackend";
+
+std::string notDconf(const char* backend) {
+    const std::string text =
+        "The settings are not shared with the sync engine and may be lost when "
+        "the program ends, because GSettings keeps them in " +
+        std::string{backend} + " instead of dconf. ";
+    if (const char* chosen = g_getenv("GSETTINGS_BACKEND")) {
+        return text + "Unset the environment variable GSETTINGS_BACKEND, which asks for '" +
+               chosen + "', and start the program again.";
+    }
+    return text + "Install the package dconf-gsettings-backend and start the program again.";
+}
+
+std::string noSessionBus(const std::string& reason) {
+    return "There is no session bus (" + reason +
+           "). Log in again, or start the program with dbus-run-session.";
+}
+
+} // namespace
+
+Backend::Backend(GSettingsSchema& schema) : backend_{g_settings_backend_get_default()} {
+    const char* const name = G_OBJECT_TYPE_NAME(backend_.get());
+    if (name != dconf) {
+        problem_ = notDconf(name);
+    } else if (const auto missing = connect(); !missing.empty()) {
+        problem_ = "The settings are not shared with the sync engine, and changes last only until "
+                   "the program ends. " +
+                   missing;
+        keepInMemory(schema);
+    }
+}
+
+void Backend::keepInMemory(GSettingsSchema& schema) {
+    BackendPointer memory{g_memory_settings_backend_new()};
+    const SettingsPointer source{g_settings_new_full(&schema, backend_.get(), nullptr)};
+    const SettingsPointer target{g_settings_new_full(&schema, memory.get(), nullptr)};
+    forEachPreference([&](const auto& preference) {
+        const VariantPointer value{g_settings_get_user_value(source.get(), preference.key)};
+        if (value) {
+            g_settings_set_value(target.get(), preference.key, value.get());
+        }
+    });
+    backend_ = std::move(memory);
+}
+
+std::string Backend::connect() {
+    if (!problem_.empty()) {
+        return {};
+    }
+    if (bus_ && g_dbus_connection_is_closed(bus_.get()) == FALSE) {
+        return {};
+    }
+    // GIO makes a new connection only when nobody holds the old one any more.
+    bus_.reset();
+    GError* failure = nullptr;
+    bus_.reset(g_bus_get_sync(G_BUS_TYPE_SESSION, nullptr, &failure));
+    if (const ErrorPointer error{failure}) {
+        return noSessionBus(error->message);
+    }
+    g_dbus_connection_set_exit_on_close(bus_.get(), FALSE);
+    return g_dbus_connection_is_closed(bus_.get()) == FALSE ? "" : noSessionBus("it went away");
+}
+
+std::string Backend::storingProblem() {
+    if (auto problem = connect(); !problem.empty()) {
+        return problem;
+    }
+    GError* failure = nullptr;
+    const VariantPointer started{g_dbus_connection_call_sync(
+        bus_.get(), "org.freedesktop.DBus", "/org/freedesktop/DBus", "org.freedesktop.DBus",
+        "StartServiceByName", g_variant_new("(su)", "ca.desrt.dconf", 0U), nullptr,
+        G_DBUS_CALL_FLAGS_NONE, -1, nullptr, &failure)};
+    const ErrorPointer error{failure};
+    if (!error) {
+        return std::string{
+                   "The dconf service did not store it. Log in again if it hangs; otherwise make "
+                   "room on the disk, and see to it that "} +
+               g_get_user_config_dir() +
+               "/dconf may be written and that the service runs for the same directory.";
+    }
+    if (g_dbus_connection_is_closed(bus_.get()) != FALSE) {
+        return noSessionBus(error->message);
+    }
+    return std::string{"The dconf service does not start ("} + error->message +
+           "). Install the package dconf-service, or log in again.";
+}
+
+} // namespace quorl::preferences

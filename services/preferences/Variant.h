@@ -1,0 +1,53 @@
+#pragma once
+
+#include "services/preferences/Pointers.h"
+
+#include <cstdint>
+#include <optional>
+
+namespace quorl::preferences {
+
+/// How a value of type T looks in the store: `type` is the GVariant type, `wrap` and `unwrap` go
+/// there and back. `unwrap` wants a value of that very type.
+template <typename T>
+struct Stored;
+
+template <>
+struct Stored<bool> {
+    static constexpr const char* type = "b";
+
+    static VariantPointer wrap(bool value) {
+        return VariantPointer{g_variant_ref_sink(g_variant_new_boolean(value ? TRUE : FALSE))};
+    }
+
+    static bool unwrap(GVariant& variant) { return g_variant_get_boolean(&variant) != FALSE; }
+};
+
+template <>
+struct Stored<std::uint64_t> {
+    static constexpr const char* type = "t";
+
+    static VariantPointer wrap(std::uint64_t value) {
+        return VariantPointer{g_variant_ref_sink(g_variant_new_uint64(value))};
+    }
+
+    static std::uint64_t unwrap(GVariant& variant) { return g_variant_get_uint64(&variant); }
+};
+
+template <>
+struct Stored<std::optional<std::uint64_t>> {
+    static constexpr const char* type = "mt";
+
+    static VariantPointer wrap(std::optional<std::uint64_t> value) {
+        GVariant* const child = value ? g_variant_new_uint64(*value) : nullptr;
+        return VariantPointer{
+            g_variant_ref_sink(g_variant_new_maybe(G_VARIANT_TYPE_UINT64, child))};
+    }
+
+    static std::optional<std::uint64_t> unwrap(GVariant& variant) {
+        const VariantPointer child{g_variant_get_maybe(&variant)};
+        return child ? std::optional{g_variant_get_uint64(child.get())} : std::nullopt;
+    }
+};
+
+} // namespace quorl::preferences
