@@ -1,0 +1,99 @@
+#include "services/wearable/AtomicFile.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <array>
+#include <cerrno>
+#include <cstdio>
+#include <system_error>
+
+namespace quorl::wearable {
+namespace {
+
+using media::FileDescriptor;
+
+[[noreturn]] void fail(const std::string& what) {
+    throw std::system_error{errno, std::generic_category(), what};
+}
+
+void writeAll(int file, std::string_view text, const std::string& name) {
+    while (!text.empty()) {
+        const auto written = write(file, text.data(), text.size());
+        if (written < 0 && errno != EINTR) {
+            fail(name);
+        }
+        text.remove_prefix(written > 0 ? static_cast<std::size_t>(written) : 0);
+    }
+}
+
+} // namespace
+
+FileDescriptor openDirectory(int parent, const char* name) {
+    constexpr mode_t forEverybodyToRead = 0755;
+    if (mkdirat(parent, name, forEverybodyToRead) != 0 && errno != EEXIST) {
+        fail(name);
+    }
+    FileDescriptor directory{openat(parent, name, O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC)};
+    if (!directory) {
+        fail(name);
+    }
+    return directory;
+}
+
+FileDescriptor openRoot(const char* path) {
+    FileDescriptor directory{open(path, O_RDONLY | O_DIRECTORY | O_CLOEXEC)};
+    if (!directory) {
+        fail(path);
+    }
+    return directory;
+}
+
+void syncToDevice(int descriptor) {
+    if (fsync(descriptor) != 0 && errno != EINVAL && errno != ENOTSUP) {
+        fail("fsync");
+    }
+}
+
+void replaceFile(int directory, const std::string& name, std::string_view text) {
+    const auto temporary = "." + name + ".new";
+    constexpr mode_t forEverybodyToRead = 0644;
+    const FileDescriptor file{openat(directory, temporary.c_str(),
+                                     O_WRONLY | O_CREAT | O_TRUNC | O_NOFOLLOW | O_CLOEXEC,
+                                     forEverybodyToRead)};
+    if (!file) {
+        fail(name);
+    }
+    writeAll(file.get(), text, name);
+    syncToDevice(file.get());
+    if (renameat(directory, temporary.c_str(), directory, name.c_str()) != 0) {
+        fail(name);
+    }
+    syncToDevice(directory);
+}
+
+std::string readFile(int directory, const std::string& name) {
+    const FileDescriptor file{
+        openat(directory, name.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC)};
+    if (!file) {
+        if (errno == ENOENT) {
+            return {};
+        }
+        fail(name);
+    }
+    std::string text;
+    std::array<char, 65536> buffer{};
+    for (;;) {
+        const auto size = read(file.get(), buffer.data(), buffer.size());
+        if (size < 0 && errno != EINTR) {
+            fail(name);
+        }
+        if (size == 0) {
+            return text;
+        }
+        text.append(buffer.data(), size > 0 ? static_cast<std::size_t>(size) : 0);
+    }
+}
+
+} // namespace quorl::wearable

@@ -1,0 +1,35 @@
+#include "services/wearable/Attachment.h"
+
+#include "services/wearable/AtomicFile.h"
+#include "services/wearable/Wearable.h"
+
+#include <nlohmann/json.hpp>
+
+#include <system_error>
+
+namespace quorl::wearable {
+namespace {
+
+constexpr auto fileName = "state.json";
+
+} // namespace
+
+Attachment loadAttachment(int root) {
+    try {
+        const auto text = readFile(root, std::string{ownDirectory} + "/" + fileName);
+        const auto value = nlohmann::json::parse(text);
+        return {value.at("connected").get<bool>(), value.at("onCharger").get<bool>()};
+    } catch (const nlohmann::json::exception&) {
+        return {};
+    } catch (const std::system_error&) {
+        return {};
+    }
+}
+
+void saveAttachment(int root, const Attachment& attachment) {
+    const nlohmann::json value{{"connected", attachment.connected},
+                               {"onCharger", attachment.onCharger}};
+    replaceFile(openDirectory(root, ownDirectory).get(), fileName, value.dump() + "\n");
+}
+
+} // namespace quorl::wearable

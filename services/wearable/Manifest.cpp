@@ -1,0 +1,158 @@
+#include "services/wearable/Manifest.h"
+
+#include "services/wearable/AtomicFile.h"
+#include "services/wearable/Wearable.h"
+
+#include <nlohmann/json.hpp>
+
+#include <algorithm>
+#include <charconv>
+
+namespace quorl::wearable {
+namespace {
+
+using nlohmann::json;
+
+constexpr auto fileName = "manifest.json";
+constexpr int format = 1;
+constexpr int hexadecimal = 16;
+
+/// Paths are bytes, and JSON is UTF-8: what is not plain ASCII is kept as %XX.
+std::string encoded(std::string_view bytes) {
+    constexpr std::string_view digits = "0123456789ABCDEF";
+    std::string text;
+    for (const char byte : bytes) {
+        const auto value = static_cast<unsigned char>(byte);
+        if (byte >= ' ' && byte <= '~' && byte != '%') {
+            text += byte;
+        } else {
+            text += '%';
+            text += digits[value / hexadecimal];
+            text += digits[value % hexadecimal];
+        }
+    }
+    return text;
+}
+
+std::string decoded(std::string_view text) {
+    std::string bytes;
+    while (!text.empty()) {
+        if (text.front() != '%') {
+            bytes += text.front();
+            text.remove_prefix(1);
+            continue;
+        }
+        unsigned char value = 0;
+        const auto digits = text.substr(1, 2);
+        const auto* const end = digits.data() + digits.size();
+        const auto read = std::from_chars(digits.data(), end, value, hexadecimal);
+        if (digits.size() != 2 || read.ec != std::errc{} || read.ptr != end) {
+            throw BadManifest{"a path is not well-formed"};
+        }
+        bytes += static_cast<char>(value);
+        text.remove_prefix(3);
+    }
+    return bytes;
+}
+
+json toJson(const Entry& entry) {
+    return {{"name", entry.name},
+            {"source", encoded(entry.source)},
+            {"size", entry.size},
+            {"modified", entry.modified},
+            {"hash", entry.hash}};
+}
+
+json toJson(const std::vector<Entry>& entries) {
+    auto list = json::array();
+    for (const auto& entry : entries) {
+        list.push_back(toJson(entry));
+    }
+    return list;
+}
+
+/// The device may have been in other hands, and names are used to remove files.
+std::string checkedName(std::string name) {
+    const bool leadsElsewhere = name.empty() || name == "." || name == ".." ||
+                                name.find('/') != std::string::npos ||
+                                name.find('\0') != std::string::npos;
+    if (leadsElsewhere) {
+        throw BadManifest{"a name leads out of the music directory"};
+    }
+    return name;
+}
+
+Entry entryOf(const json& value) {
+    return {checkedName(value.at("name").get<std::string>()),
+            decoded(value.at("source").get<std::string>()), value.at("size").get<std::uint64_t>(),
+            value.at("modified").get<std::int64_t>(), value.at("hash").get<std::string>()};
+}
+
+std::vector<Entry> entriesOf(const json& list) {
+    std::vector<Entry> entries;
+    std::ranges::transform(list, std::back_inserter(entries), entryOf);
+    return entries;
+}
+
+Manifest manifestOf(const json& value) {
+    if (value.at("format") != format) {
+        throw BadManifest{"a later version has written it"};
+    }
+    Manifest manifest{entriesOf(value.at("songs")), {}, entriesOf(value.at("strays")), {}};
+    if (value.contains("playlist")) {
+        manifest.playlist = entryOf(value.at("playlist"));
+    }
+    if (value.contains("sent")) {
+        const auto& sent = value.at("sent");
+        manifest.sent = Selection{
+            sent.at("playlist").get<std::uint64_t>(), sent.at("revision").get<std::uint64_t>(),
+            sent.at("limitType").get<std::uint64_t>(), sent.at("limit").get<std::uint64_t>()};
+    }
+    return manifest;
+}
+
+[[noreturn]] void reject(const std::string& why) {
+    throw BadManifest{"The list of the music on the " + std::string{wearableName} +
+                      " cannot be used (" + why + "). Remove the file " + ownDirectory + "/" +
+                      fileName + " from it to begin anew; the music that is on it then stays."};
+}
+
+} // namespace
+
+std::string toText(const Manifest& manifest) {
+    json value{
+        {"format", format}, {"songs", toJson(manifest.songs)}, {"strays", toJson(manifest.strays)}};
+    if (manifest.playlist) {
+        value["playlist"] = toJson(*manifest.playlist);
+    }
+    if (const auto& sent = manifest.sent) {
+        value["sent"] = {{"playlist", sent->playlist},
+                         {"revision", sent->revision},
+                         {"limitType", sent->limitType},
+                         {"limit", sent->limit}};
+    }
+    return value.dump(1) + "\n";
+}
+
+Manifest parseManifest(std::string_view text) {
+    if (text.empty()) {
+        return {};
+    }
+    try {
+        return manifestOf(json::parse(text));
+    } catch (const json::exception&) {
+        reject("it is not well-formed");
+    } catch (const BadManifest& error) {
+        reject(error.what());
+    }
+}
+
+Manifest loadManifest(int root) {
+    return parseManifest(readFile(root, std::string{ownDirectory} + "/" + fileName));
+}
+
+void saveManifest(int root, const Manifest& manifest) {
+    replaceFile(openDirectory(root, ownDirectory).get(), fileName, toText(manifest));
+}
+
+} // namespace quorl::wearable

@@ -1,0 +1,77 @@
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <stdexcept>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace quorl::wearable {
+
+/// A file in the wearable's music directory that we have put there, or are about to.
+struct Entry {
+    /// In the music directory itself, never in a directory below.
+    std::string name;
+    /// What it is a copy of: a path relative to the music folder, in the bytes of the file system.
+    /// For a playlist, its title.
+    std::string source;
+    /// In bytes.
+    std::uint64_t size = 0;
+    /// Modification time of the source, which the copy has too; nanoseconds since 1970.
+    std::int64_t modified = 0;
+    /// Of the contents; empty as long as it is not known.
+    std::string hash;
+
+    bool operator==(const Entry&) const = default;
+};
+
+/// Which songs are sent: those of a playlist as it was at one moment, up to a limit.
+struct Selection {
+    std::uint64_t playlist = 0;
+    std::uint64_t revision = 0;
+    /// As in the preferences.
+    std::uint64_t limitType = 0;
+    std::uint64_t limit = 0;
+
+    bool operator==(const Selection&) const = default;
+};
+
+/// Which files on a wearable are ours. Everything else there belongs to somebody else, and is
+/// neither changed nor removed.
+struct Manifest {
+    /// All of these are there, complete. Each source once.
+    std::vector<Entry> songs;
+    /// The playlist file; nothing where none was written.
+    std::optional<Entry> playlist;
+    /// Ours where they are there: about to be copied, or about to be removed, when the list was
+    /// written. Complete where they are there at all.
+    std::vector<Entry> strays;
+    /// What was sent, if the last sync got everything done.
+    std::optional<Selection> sent;
+
+    bool operator==(const Manifest&) const = default;
+};
+
+/// The list on a wearable says something that we have never written.
+class BadManifest : public std::runtime_error {
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+/// As text, to be read by `parseManifest`.
+[[nodiscard]] std::string toText(const Manifest& manifest);
+
+/// An empty text gives an empty manifest. Throws `BadManifest`, whose text says what to do. No name
+/// in the result leads out of the music directory.
+[[nodiscard]] Manifest parseManifest(std::string_view text);
+
+/// The manifest of the wearable whose top directory is open as `root`; empty where there is none.
+/// Throws `BadManifest` or `std::system_error`.
+[[nodiscard]] Manifest loadManifest(int root);
+
+/// Puts `manifest` in the place of the one that is there, and waits until it is on the device.
+/// Throws `std::system_error`.
+void saveManifest(int root, const Manifest& manifest);
+
+} // namespace quorl::wearable

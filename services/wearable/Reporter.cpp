@@ -1,0 +1,162 @@
+#include "services/wearable/Reporter.h"
+
+#include <algorithm>
+#include <condition_variable>
+#include <cstdint>
+#include <deque>
+#include <mutex>
+#include <thread>
+
+namespace quorl::wearable {
+namespace {
+
+using Clock = std::chrono::steady_clock;
+
+struct Question {
+    std::uint64_t number;
+    Reporter::Reply reply;
+    Clock::time_point deadline;
+    bool isLookedAt = false;
+};
+
+struct Answered {
+    Reporter::Reply reply;
+    Reporter::Answer answer;
+};
+
+Reporter::Answer answerOf(const Reporter::Look& look) {
+    try {
+        return look();
+    } catch (const std::exception& error) {
+        return std::string{error.what()};
+    }
+}
+
+} // namespace
+
+/// Shared by the reporter and the threads that look, the last of which may outlive it. Only the
+/// clerk, a thread that never touches the device, calls replies.
+class Reporter::Desk : public std::enable_shared_from_this<Desk> {
+  public:
+    Desk(Look look, std::chrono::milliseconds patience)
+        : look_{std::move(look)}, patience_{patience} {}
+
+    void open() {
+        clerk_ = std::thread{[this] { work(); }};
+    }
+
+    void close() {
+        {
+            const std::scoped_lock lock{mutex_};
+            closed_ = true;
+        }
+        changed_.notify_one();
+        clerk_.join();
+    }
+
+    void ask(Reply reply) {
+        {
+            const std::scoped_lock lock{mutex_};
+            questions_.push_back({++lastNumber_, std::move(reply), Clock::now() + patience_});
+        }
+        changed_.notify_one();
+    }
+
+  private:
+    static constexpr int mostLookers = 4;
+
+    void work() {
+        std::unique_lock lock{mutex_};
+        while (!closed_ || !questions_.empty() || !answered_.empty()) {
+            giveUpOnLateOnes();
+            sendLookers();
+            if (answered_.empty()) {
+                await(lock);
+                continue;
+            }
+            const auto [reply, answer] = std::move(answered_.front());
+            answered_.pop_front();
+            lock.unlock();
+            reply(answer);
+            lock.lock();
+        }
+    }
+
+    void await(std::unique_lock<std::mutex>& lock) {
+        if (closed_ && questions_.empty()) {
+            return;
+        }
+        if (questions_.empty()) {
+            changed_.wait(lock);
+        } else {
+            changed_.wait_until(lock, questions_.front().deadline);
+        }
+    }
+
+    /// They are in the order of their deadlines.
+    void giveUpOnLateOnes() {
+        const auto now = Clock::now();
+        while (!questions_.empty() && (closed_ || questions_.front().deadline <= now)) {
+            answered_.push_back({std::move(questions_.front().reply),
+                                 closed_ ? "The question was given up."
+                                         : "The " + std::string{wearableName} +
+                                               " does not answer. Check its connection."});
+            questions_.pop_front();
+        }
+    }
+
+    void sendLookers() {
+        for (auto& question : questions_) {
+            if (lookers_ == mostLookers) {
+                return;
+            }
+            if (!question.isLookedAt) {
+                question.isLookedAt = true;
+                ++lookers_;
+                // The thread keeps the desk, and with it `look_`, for as long as the device hangs.
+                std::thread{[desk = shared_from_this(), number = question.number] {
+                    desk->lookFor(number);
+                }}.detach();
+            }
+        }
+    }
+
+    void lookFor(std::uint64_t number) {
+        auto answer = answerOf(look_);
+        {
+            const std::scoped_lock lock{mutex_};
+            --lookers_;
+            const auto question = std::ranges::find(questions_, number, &Question::number);
+            if (question != questions_.end()) {
+                answered_.push_back({std::move(question->reply), std::move(answer)});
+                questions_.erase(question);
+            }
+        }
+        changed_.notify_one();
+    }
+
+    const Look look_;
+    const std::chrono::milliseconds patience_;
+    std::thread clerk_;
+
+    std::mutex mutex_;
+    std::condition_variable changed_;
+    std::deque<Question> questions_;
+    std::deque<Answered> answered_;
+    std::uint64_t lastNumber_ = 0;
+    int lookers_ = 0;
+    bool closed_ = false;
+};
+
+Reporter::Reporter(const Wearable& wearable) : Reporter{[wearable] { return report(wearable); }} {}
+
+Reporter::Reporter(Look look, std::chrono::milliseconds patience)
+    : desk_{std::make_shared<Desk>(std::move(look), patience)} {
+    desk_->open();
+}
+
+Reporter::~Reporter() { desk_->close(); }
+
+void Reporter::ask(Reply reply) { desk_->ask(std::move(reply)); }
+
+} // namespace quorl::wearable

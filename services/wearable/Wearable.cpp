@@ -1,0 +1,40 @@
+#include "services/wearable/Wearable.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+
+#include <cstdlib>
+#include <string_view>
+
+namespace quorl::wearable {
+namespace {
+
+std::filesystem::path dataDirectory() {
+    const char* const given = std::getenv("XDG_DATA_HOME");
+    if (given != nullptr && std::string_view{given}.starts_with('/')) {
+        return given;
+    }
+    const char* const home = std::getenv("HOME");
+    return std::filesystem::path{home == nullptr ? "/" : home} / ".local/share";
+}
+
+} // namespace
+
+Wearable Wearable::embedded(std::uint64_t capacity) {
+    return {dataDirectory() / "quorl/wearable", capacity, false};
+}
+
+Wearable Wearable::mounted(const std::filesystem::path& root) {
+    auto absolute = std::filesystem::absolute(root).lexically_normal();
+    const bool mountPoint = wearable::isMountPoint(absolute);
+    return {std::move(absolute), std::nullopt, mountPoint};
+}
+
+bool isMountPoint(const std::filesystem::path& directory) {
+    struct statx status {};
+
+    return statx(AT_FDCWD, directory.c_str(), 0, 0, &status) == 0 &&
+           (status.stx_attributes & STATX_ATTR_MOUNT_ROOT) != 0;
+}
+
+} // namespace quorl::wearable
