@@ -1,0 +1,33 @@
+#pragma once
+
+#include <sdbus-c++/sdbus-c++.h>
+
+#include <memory>
+
+namespace quorl::syncd {
+
+class Engine;
+
+/// The engine and its wearable as bus objects, and the manager of these and of the sessions. The
+/// bus loop's thread.
+class BusObjects {
+  public:
+    /// Both outlive the objects.
+    BusObjects(sdbus::IConnection& bus, Engine& engine);
+    ~BusObjects();
+
+    BusObjects(const BusObjects&) = delete;
+    BusObjects& operator=(const BusObjects&) = delete;
+
+    /// Tells which properties have changed since the last time.
+    void publish();
+
+  private:
+    class EngineObject;
+    class WearableObject;
+
+    const std::unique_ptr<EngineObject> engine_;
+    const std::unique_ptr<WearableObject> wearable_;
+};
+
+} // namespace quorl::syncd

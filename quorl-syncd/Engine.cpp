@@ -1,0 +1,344 @@
+#include "quorl-syncd/Engine.h"
+
+#include "quorl-syncd/SessionObject.h"
+#include "quorl-syncd/SleepInhibitor.h"
+#include "services/wearable/AtomicFile.h"
+
+#include <glib.h>
+#include <poll.h>
+
+#include <system_error>
+#include <thread>
+
+namespace quorl::syncd {
+namespace {
+
+using Clock = engine::BusLoop::Clock;
+using namespace std::chrono_literals;
+
+/// The app writes several values for one choice.
+constexpr auto settlingTime = 200ms;
+constexpr auto timeBetweenUpdates = 100ms;
+
+std::string userMusicFolder() {
+    const char* const folder = g_get_user_special_dir(G_USER_DIRECTORY_MUSIC);
+    return folder != nullptr ? folder : std::string{g_get_home_dir()} + "/Music";
+}
+
+wearable::Wearable wearableAt(const std::string& path, std::uint64_t embeddedCapacity) {
+    return path.empty() ? wearable::Wearable::embedded(embeddedCapacity)
+                        : wearable::Wearable::mounted(path);
+}
+
+std::uint64_t microsecondsNow() {
+    const auto now = std::chrono::system_clock::now().time_since_epoch();
+    return static_cast<std::uint64_t>(
+        std::chrono::duration_cast<std::chrono::microseconds>(now).count());
+}
+
+} // namespace
+
+/// A sync under way: its thread, and what the bus is told of it.
+struct Engine::Run {
+    Wish wish;
+    bool ignoresCharger;
+    std::string whyStopped;
+    std::unique_ptr<SessionObject> session;
+    std::jthread thread;
+};
+
+Engine::Engine(engine::BusLoop& loop, preferences::SharedPreferences& preferences,
+               const Options& options, Changed changed)
+    : loop_{loop},
+      preferences_{preferences},
+      embeddedCapacity_{options.embeddedCapacity},
+      changed_{std::move(changed)} {
+    setRateLimit(options.rateLimit);
+    setWearableDirectory(options.wearableDirectory);
+    setMusicFolder(options.musicFolder);
+}
+
+Engine::~Engine() {
+    unwatchWearable();
+    if (run_) {
+        stop("The sync engine was ended.");
+        run_->thread.join();
+        try {
+            run_->session->finish(false, run_->whyStopped);
+        } catch (const sdbus::Error&) {
+            // Without a bus there is nobody to tell.
+        }
+    }
+}
+
+void Engine::preferencesDidChange() {
+    givenUp_.reset();
+    settled_ = Clock::now() + settlingTime;
+    loop_.callAt(settled_, [this] { consider(); });
+    consider();
+}
+
+void Engine::startNow() {
+    if (run_) {
+        return;
+    }
+    if (!wish(true)) {
+        throw NotReady{obstacle_};
+    }
+    isStartRequested_ = true;
+    consider();
+}
+
+void Engine::cancel() {
+    if (run_) {
+        givenUp_ = run_->wish.selection;
+        stop("The sync was cancelled.");
+    }
+}
+
+void Engine::setMusicFolder(const std::string& path) {
+    status_.musicFolder = path.empty() ? userMusicFolder() : path;
+    // The old one first: what it has posted must not count for the new one.
+    folder_.reset();
+    library_.reset();
+    const auto folder = status_.musicFolder;
+    folder_ = std::make_unique<media::MusicFolder>(
+        folder, [this, folder](std::shared_ptr<const media::Snapshot> library) {
+            loop_.post([this, folder, library = std::move(library)] {
+                if (folder == status_.musicFolder) {
+                    library_ = library;
+                    consider();
+                }
+            });
+        });
+    consider();
+}
+
+void Engine::setRateLimit(std::uint64_t bytesPerSecond) {
+    status_.rateLimit = bytesPerSecond;
+    rate_.set(wearable_.isEmbedded() ? bytesPerSecond : 0);
+    publish();
+}
+
+void Engine::setWearableDirectory(const std::string& path) {
+    unwatchWearable();
+    wearable_ = wearableAt(path, embeddedCapacity_);
+    ++wearables_;
+    report_.reset();
+    givenUp_.reset();
+    wearableProblem_ = "Looking for the wearable…";
+    attachment_ = {};
+    rate_.set(wearable_.isEmbedded() ? status_.rateLimit : 0);
+    reporter_ = std::make_unique<wearable::Reporter>(wearable_);
+    if (wearable_.isEmbedded()) {
+        std::filesystem::create_directories(wearable_.root);
+        attachment_ = wearable::loadAttachment(wearable::openRoot(wearable_.root.c_str()).get());
+    } else {
+        watchWearable();
+    }
+    refreshWearable();
+    consider();
+}
+
+void Engine::attach(const wearable::Attachment& attachment) {
+    if (!wearable_.isEmbedded()) {
+        throw NotReady{"This wearable is a device; plug it in or out instead."};
+    }
+    try {
+        wearable::saveAttachment(wearable::openRoot(wearable_.root.c_str()).get(), attachment);
+    } catch (const std::system_error& error) {
+        throw NotReady{"The wearable could not remember it: " + error.code().message() + "."};
+    }
+    attachment_ = attachment;
+    givenUp_.reset();
+    consider();
+}
+
+void Engine::refreshWearable() {
+    reporter_->ask([this, number = wearables_](const wearable::Reporter::Answer& answer) {
+        loop_.post([this, number, answer] {
+            if (number == wearables_) {
+                takeReport(answer);
+            }
+        });
+    });
+}
+
+void Engine::takeReport(const wearable::Reporter::Answer& answer) {
+    if (const auto* const report = std::get_if<wearable::Report>(&answer)) {
+        if (!report_ || report_->available < report->available) {
+            givenUp_.reset();
+        }
+        report_ = *report;
+    } else {
+        report_.reset();
+        wearableProblem_ = std::get<std::string>(answer);
+    }
+    consider();
+}
+
+void Engine::watchWearable() {
+    rootWatch_.emplace(wearable_.root);
+    mountWatch_.emplace(wearable_.root);
+    loop_.watch(rootWatch_->descriptor(), POLLIN, [this] {
+        if (rootWatch_->take()) {
+            refreshWearable();
+        }
+    });
+    loop_.watch(mountWatch_->descriptor(), POLLPRI, [this] {
+        if (mountWatch_->take()) {
+            refreshWearable();
+        }
+    });
+}
+
+void Engine::unwatchWearable() {
+    if (rootWatch_) {
+        loop_.unwatch(rootWatch_->descriptor());
+        loop_.unwatch(mountWatch_->descriptor());
+        rootWatch_.reset();
+        mountWatch_.reset();
+    }
+}
+
+/// What is to be on the wearable; nothing where something stands in the way.
+std::optional<Wish> Engine::wish(bool ignoresCharger) {
+    const auto id = preferences_.get(preferences::assetSyncPlaylistPersistentID);
+    const auto* const playlist = library_ && id ? library_->playlist(*id) : nullptr;
+    obstacle_ = !preferences_.get(preferences::assetSyncEnabled) ? "Music sync is switched off."
+                : !id                                            ? "No playlist is chosen."
+                : !library_                                      ? "Reading the music folder…"
+                : playlist == nullptr    ? "The chosen playlist is not in the music folder."
+                : !report_               ? wearableProblem_
+                : !attachment_.connected ? "The wearable is not connected."
+                : !attachment_.onCharger && !ignoresCharger ? "The wearable is not on its charger."
+                                                            : "";
+    if (!obstacle_.empty()) {
+        return std::nullopt;
+    }
+    const wearable::Selection selection{playlist->id, playlist->revision,
+                                        preferences_.get(preferences::assetSyncLimitType),
+                                        preferences_.get(preferences::assetSyncLimit).value_or(0)};
+    return Wish{library_, selection, wearable_};
+}
+
+bool Engine::isSent(const Wish& wish) const {
+    using namespace preferences;
+    return report_->sent == wish.selection &&
+           preferences_.get(lastFullySentAssetSyncPlaylistPersistentID) ==
+               wish.selection.playlist &&
+           preferences_.get(lastFullySentAssetSyncPlaylistVersion) == wish.selection.revision;
+}
+
+bool Engine::isDue(const Wish& wish) const {
+    return isStartRequested_ ||
+           (Clock::now() >= settled_ && givenUp_ != wish.selection && !isSent(wish));
+}
+
+/// Begins or ends a sync, where what is wished for asks for it.
+void Engine::consider() {
+    const auto wanted = wish(run_ ? run_->ignoresCharger : isStartRequested_);
+    if (run_ && !wanted) {
+        stop(obstacle_);
+    } else if (run_) {
+        // Another revision of the playlist has its turn afterwards.
+        auto selection = run_->wish.selection;
+        selection.revision = wanted->selection.revision;
+        if (selection != wanted->selection || run_->wish.wearable != wanted->wearable) {
+            stop("Something else was chosen.");
+        }
+    } else if (wanted && isDue(*wanted)) {
+        begin(*wanted);
+    }
+    publish();
+}
+
+void Engine::begin(Wish wish) {
+    givenUp_.reset();
+    run_ = std::make_unique<Run>(Run{wish, std::exchange(isStartRequested_, false), {}, {}, {}});
+    run_->session = std::make_unique<SessionObject>(loop_.bus(), ++sessions_, [this] { cancel(); });
+    run_->thread = std::jthread{[this, wish = std::move(wish)](const std::stop_token& stop) {
+        const SleepInhibitor awake;
+        CopyProgress last;
+        Clock::time_point told;
+        const auto tell = [&](const CopyProgress& progress) {
+            const bool isStep = progress.songs != last.songs || told == Clock::time_point{};
+            if (!isStep && Clock::now() - told < timeBetweenUpdates) {
+                return;
+            }
+            last = progress;
+            told = Clock::now();
+            loop_.post([this, progress] { run_->session->copied(progress); });
+        };
+        const auto outcome = Sync{wish, rate_, stop, tell}.run();
+        loop_.post([this, outcome] { finish(outcome); });
+    }};
+}
+
+void Engine::stop(const std::string& why) {
+    if (run_->whyStopped.empty()) {
+        run_->whyStopped = why;
+    }
+    run_->thread.request_stop();
+}
+
+void Engine::finish(const Outcome& outcome) {
+    run_->thread.join();
+    const auto wish = run_->wish;
+    const bool isStopped = outcome.kind == Outcome::Kind::Stopped;
+    bool success = outcome.kind == Outcome::Kind::Sent;
+    auto message = isStopped ? run_->whyStopped : outcome.message;
+    if (success) {
+        const auto problem = remember(wish);
+        success = problem.empty();
+        message = success ? message : problem;
+    }
+    if (!success && !isStopped) {
+        givenUp_ = wish.selection;
+    }
+    status_.lastSuccess = success;
+    status_.lastMessage = message;
+    status_.lastTime = microsecondsNow();
+    run_->session->finish(success, message);
+    run_.reset();
+    if (outcome.isLibraryStale) {
+        folder_->rescan();
+    }
+    refreshWearable();
+    consider();
+}
+
+/// The last thing of all; gives back an empty text, or why it could not be done.
+std::string Engine::remember(const Wish& wish) {
+    using namespace preferences;
+    const auto id =
+        preferences_.set(lastFullySentAssetSyncPlaylistPersistentID, wish.selection.playlist);
+    if (!id.problem.empty()) {
+        return id.problem;
+    }
+    if (report_ && wish.wearable == wearable_) {
+        report_->sent = wish.selection;
+    }
+    return preferences_.set(lastFullySentAssetSyncPlaylistVersion, wish.selection.revision).problem;
+}
+
+void Engine::publish() {
+    status_.status = run_                ? "Syncing music."
+                     : obstacle_.empty() ? "Everything is up to date."
+                                         : obstacle_;
+    if (!run_ && obstacle_.empty() && givenUp_) {
+        status_.status = status_.lastMessage;
+    }
+    const auto report = report_.value_or(wearable::Report{});
+    wearableStatus_ = {wearable_.root,
+                       wearable::wearableName,
+                       wearable_.isEmbedded(),
+                       report_ && attachment_.connected,
+                       report_ && attachment_.onCharger,
+                       report.capacity,
+                       report.available,
+                       report.songs};
+    changed_();
+}
+
+} // namespace quorl::syncd

@@ -1,0 +1,138 @@
+#pragma once
+
+#include "quorl-syncd/RateLimit.h"
+#include "quorl-syncd/Sync.h"
+#include "quorl-syncd/Wish.h"
+#include "services/engine/BusLoop.h"
+#include "services/engine/Model.h"
+#include "services/media/MountWatch.h"
+#include "services/media/MusicFolder.h"
+#include "services/media/RootWatch.h"
+#include "services/preferences/SharedPreferences.h"
+#include "services/wearable/Attachment.h"
+#include "services/wearable/Reporter.h"
+
+#include <chrono>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+
+namespace quorl::syncd {
+
+class SessionObject;
+
+/// What the engine is started with.
+struct Options {
+    /// Empty for the user's music folder.
+    std::string musicFolder;
+    /// Empty for the wearable that is embedded in this machine.
+    std::string wearableDirectory;
+    /// Of the embedded wearable, in bytes.
+    std::uint64_t embeddedCapacity = wearable::embeddedCapacity;
+    /// In bytes a second; 0 for none.
+    std::uint64_t rateLimit = 0;
+};
+
+/// The engine cannot do what a client asks for now. The text is a sentence for the user.
+class NotReady : public std::runtime_error {
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+/// Decides when to sync what, and keeps the preferences up to date. Everything is called on the
+/// loop's thread; what comes from other threads goes through the loop.
+class Engine {
+  public:
+    /// Called when `status` or `wearable` may give something else.
+    using Changed = std::function<void()>;
+
+    /// @param loop outlives the engine.
+    /// @param preferences outlives the engine; its changes are to be told with
+    /// `preferencesDidChange`.
+    Engine(engine::BusLoop& loop, preferences::SharedPreferences& preferences,
+           const Options& options, Changed changed);
+
+    /// Ends a running sync in order, and waits for that.
+    ~Engine();
+
+    Engine(const Engine&) = delete;
+    Engine& operator=(const Engine&) = delete;
+
+    void preferencesDidChange();
+
+    [[nodiscard]] const engine::EngineStatus& status() const { return status_; }
+
+    [[nodiscard]] const engine::WearableStatus& wearable() const { return wearableStatus_; }
+
+    /// Throws `NotReady`.
+    void startNow();
+    void cancel();
+
+    void setMusicFolder(const std::string& path);
+    void setRateLimit(std::uint64_t bytesPerSecond);
+    /// Throws `std::filesystem::filesystem_error` or `std::system_error` where the embedded one
+    /// cannot be made.
+    void setWearableDirectory(const std::string& path);
+    /// Throws `NotReady` for a mounted wearable, and where it cannot be remembered.
+    void attach(const wearable::Attachment& attachment);
+
+    [[nodiscard]] const wearable::Attachment& attachment() const { return attachment_; }
+
+    void refreshWearable();
+
+  private:
+    struct Run;
+
+    void consider();
+    [[nodiscard]] std::optional<Wish> wish(bool ignoresCharger);
+    [[nodiscard]] bool isDue(const Wish& wish) const;
+    [[nodiscard]] bool isSent(const Wish& wish) const;
+
+    void begin(Wish wish);
+    void stop(const std::string& why);
+    void finish(const Outcome& outcome);
+    [[nodiscard]] std::string remember(const Wish& wish);
+
+    void takeReport(const wearable::Reporter::Answer& answer);
+    void watchWearable();
+    void unwatchWearable();
+    void publish();
+
+    engine::BusLoop& loop_;
+    preferences::SharedPreferences& preferences_;
+    const std::uint64_t embeddedCapacity_;
+    const Changed changed_;
+
+    engine::EngineStatus status_;
+    engine::WearableStatus wearableStatus_;
+    /// What stands in the way of a sync, in a sentence; empty where nothing does.
+    std::string obstacle_;
+
+    std::shared_ptr<const media::Snapshot> library_;
+
+    wearable::Wearable wearable_;
+    wearable::Attachment attachment_;
+    /// Nothing while it is not there or was not looked at yet; then the sentence says why.
+    std::optional<wearable::Report> report_;
+    std::string wearableProblem_;
+    std::optional<media::RootWatch> rootWatch_;
+    std::optional<media::MountWatch> mountWatch_;
+    /// Which reports still count.
+    std::uint64_t wearables_ = 0;
+
+    RateLimit rate_;
+    bool isStartRequested_ = false;
+    /// Did not work, and is not tried again until something changes.
+    std::optional<wearable::Selection> givenUp_;
+    /// When the preferences are thought to stay as they are for now.
+    engine::BusLoop::Clock::time_point settled_;
+    std::uint64_t sessions_ = 0;
+
+    // The last members, for their threads call this object through the loop.
+    std::unique_ptr<Run> run_;
+    std::unique_ptr<wearable::Reporter> reporter_;
+    std::unique_ptr<media::MusicFolder> folder_;
+};
+
+} // namespace quorl::syncd

@@ -1,0 +1,32 @@
+#include "quorl-syncd/SleepInhibitor.h"
+
+#include "services/wearable/Wearable.h"
+
+#include <chrono>
+#include <string>
+
+namespace quorl::syncd {
+namespace {
+
+constexpr auto loginManager = "org.freedesktop.login1";
+constexpr std::chrono::seconds patience{2};
+
+} // namespace
+
+SleepInhibitor::SleepInhibitor() {
+    try {
+        const auto bus = sdbus::createSystemBusConnection();
+        const auto manager = sdbus::createProxy(*bus, loginManager, "/org/freedesktop/login1");
+        manager->callMethod("Inhibit")
+            .onInterface("org.freedesktop.login1.Manager")
+            .withTimeout(patience)
+            .withArguments("sleep", "quorl-syncd",
+                           std::string{"Music is being synced to the "} + wearable::wearableName,
+                           "block")
+            .storeResultsTo(lock_);
+    } catch (const sdbus::Error&) {
+        // A machine without a login manager does not put itself to sleep.
+    }
+}
+
+} // namespace quorl::syncd

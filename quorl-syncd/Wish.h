@@ -1,0 +1,28 @@
+#pragma once
+
+#include "services/media/Snapshot.h"
+#include "services/wearable/Manifest.h"
+#include "services/wearable/Wearable.h"
+
+#include <memory>
+#include <vector>
+
+namespace quorl::syncd {
+
+/// What is to be on which wearable.
+struct Wish {
+    /// Not null; has the playlist in the revision of the selection.
+    std::shared_ptr<const media::Snapshot> library;
+    wearable::Selection selection;
+    wearable::Wearable wearable;
+
+    [[nodiscard]] const media::Playlist& playlist() const {
+        return *library->playlist(selection.playlist);
+    }
+};
+
+/// The songs from the top of the playlist to the first one that does not fit, as the pane's footer
+/// counts them; later ones are not tried. A song that is listed twice counts twice.
+[[nodiscard]] std::vector<media::SongIndex> songsWithinLimit(const Wish& wish);
+
+} // namespace quorl::syncd

@@ -1,0 +1,112 @@
+// quorl-syncd: brings the chosen playlist to the wearable.
+
+#include "quorl-syncd/BusObjects.h"
+#include "quorl-syncd/Engine.h"
+#include "services/engine/BusLoop.h"
+#include "services/engine/Names.h"
+#include "services/preferences/SharedPreferences.h"
+
+#include <CLI/CLI.hpp>
+
+#include <poll.h>
+#include <sys/signalfd.h>
+
+#include <csignal>
+#include <iostream>
+#include <memory>
+
+namespace {
+
+using namespace quorl;
+
+enum ExitCode { Ended = 0, CannotStart = 1, BusLost = 2, AlreadyRunning = 3 };
+
+int complain(ExitCode code, const std::string& problem) {
+    std::cerr << "quorl-syncd: " << problem << '\n';
+    return code;
+}
+
+/// Has the signals that end programs end the loop instead. Before any thread is started.
+media::FileDescriptor blockSignals() {
+    sigset_t signals;
+    sigemptyset(&signals);
+    sigaddset(&signals, SIGTERM);
+    sigaddset(&signals, SIGINT);
+    pthread_sigmask(SIG_BLOCK, &signals, nullptr);
+    return media::FileDescriptor{signalfd(-1, &signals, SFD_CLOEXEC)};
+}
+
+int serve(const syncd::Options& options) {
+    const auto signals = blockSignals();
+    engine::BusLoop loop{sdbus::createSessionBusConnection()};
+    loop.watch(signals.get(), POLLIN, [&] { loop.stop(); });
+
+    std::unique_ptr<syncd::Engine> engine;
+    auto opened = preferences::SharedPreferences::open(
+        [&](const auto& /*preferences*/, const auto& /*keys*/) {
+            loop.post([&] {
+                if (engine) {
+                    engine->preferencesDidChange();
+                }
+            });
+        });
+    if (!opened.preferences) {
+        return complain(CannotStart, opened.problem);
+    }
+    if (!opened.problem.empty()) {
+        complain(CannotStart, opened.problem);
+    }
+
+    std::unique_ptr<syncd::BusObjects> objects;
+    engine = std::make_unique<syncd::Engine>(loop, *opened.preferences, options, [&] {
+        if (objects) {
+            objects->publish();
+        }
+    });
+    objects = std::make_unique<syncd::BusObjects>(loop.bus(), *engine);
+    try {
+        loop.bus().requestName(engine::busName);
+    } catch (const sdbus::Error& error) {
+        return complain(AlreadyRunning, "Another sync engine is running, which has the name " +
+                                            std::string{engine::busName} +
+                                            ". End that one first. (" + error.getMessage() + ")");
+    }
+
+    const auto problem = loop.run();
+    return problem.empty()
+               ? Ended
+               : complain(BusLost, "The session bus is gone (" + problem +
+                                       "). Start the engine again in the next session.");
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    syncd::Options options;
+    CLI::App program{"Brings the chosen playlist to the Velora, and tells on the session bus how "
+                     "far it is."};
+    program.set_version_flag("--version", "quorl-syncd " QUORL_VERSION);
+    program.add_option("--music-folder", options.musicFolder,
+                       "the folder with songs and playlists, instead of the user's music folder");
+    program.add_option("--wearable", options.wearableDirectory,
+                       "the directory of a mounted wearable, instead of the embedded one");
+    program
+        .add_option("--embedded-capacity", options.embeddedCapacity,
+                    "what the embedded wearable holds, in bytes")
+        ->check(CLI::NonNegativeNumber);
+    program
+        .add_option("--rate-limit", options.rateLimit,
+                    "bytes a second that are copied to the embedded wearable at most; 0 for no "
+                    "limit")
+        ->check(CLI::NonNegativeNumber);
+    CLI11_PARSE(program, argc, argv);
+
+    try {
+        return serve(options);
+    } catch (const sdbus::Error& error) {
+        return complain(CannotStart, "There is no session bus (" + error.getMessage() +
+                                         "). Log in, or start one with dbus-run-session.");
+    } catch (const std::exception& error) {
+        return complain(CannotStart, error.what());
+    }
+}

@@ -1,0 +1,127 @@
+#include "services/engine/BusLoop.h"
+
+#include <poll.h>
+#include <sys/eventfd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <system_error>
+#include <utility>
+
+namespace quorl::engine {
+
+BusLoop::BusLoop(std::unique_ptr<sdbus::IConnection> bus)
+    : bus_{std::move(bus)},
+      wake_{eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK)},
+      isBusThere_{bus_ != nullptr} {
+    if (!wake_) {
+        throw std::system_error{errno, std::generic_category(), "eventfd"};
+    }
+    watch(wake_.get(), POLLIN, [this] {
+        eventfd_t count = 0;
+        static_cast<void>(eventfd_read(wake_.get(), &count));
+    });
+}
+
+void BusLoop::post(Task task) {
+    {
+        const std::scoped_lock lock{mutex_};
+        posted_.push_back(std::move(task));
+    }
+    static_cast<void>(eventfd_write(wake_.get(), 1));
+}
+
+void BusLoop::watch(int descriptor, short events, Task ready) {
+    watched_.insert_or_assign(descriptor, Watched{events, std::move(ready)});
+}
+
+void BusLoop::unwatch(int descriptor) { watched_.erase(descriptor); }
+
+void BusLoop::callAt(Clock::time_point time, Task task) { timers_.emplace(time, std::move(task)); }
+
+void BusLoop::stop() {
+    post([this] { stopped_ = true; });
+}
+
+std::string BusLoop::run() {
+    try {
+        while (!stopped_) {
+            serveBus();
+            callPosted();
+            callDue();
+            if (!stopped_) {
+                wait();
+            }
+        }
+        return {};
+    } catch (const sdbus::Error& error) {
+        isBusThere_ = false;
+        return error.getMessage();
+    }
+}
+
+void BusLoop::serveBus() {
+    while (isBusThere_ && !stopped_ && bus_->processPendingRequest()) {
+    }
+}
+
+int BusLoop::timeout() const {
+    const auto ofBus = isBusThere_ ? bus_->getEventLoopPollData().getPollTimeout() : -1;
+    if (timers_.empty()) {
+        return ofBus;
+    }
+    using std::chrono::milliseconds;
+    const auto left =
+        std::chrono::ceil<milliseconds>(timers_.begin()->first - Clock::now()).count();
+    const auto ofTimers = static_cast<int>(std::clamp<decltype(left)>(left, 0, 1'000'000));
+    return ofBus < 0 ? ofTimers : std::min(ofBus, ofTimers);
+}
+
+void BusLoop::wait() {
+    std::vector<pollfd> polled{{-1, 0, 0}};
+    if (isBusThere_) {
+        const auto data = bus_->getEventLoopPollData();
+        polled.front() = {data.fd, data.events, 0};
+    }
+    for (const auto& [descriptor, watched] : watched_) {
+        polled.push_back({descriptor, watched.events, 0});
+    }
+    if (poll(polled.data(), polled.size(), timeout()) < 0 && errno != EINTR) {
+        throw std::system_error{errno, std::generic_category(), "poll"};
+    }
+    for (std::size_t at = 1; at < polled.size(); ++at) {
+        if (polled[at].revents != 0) {
+            callReady(polled[at].fd);
+        }
+    }
+}
+
+void BusLoop::callReady(int descriptor) {
+    const auto found = watched_.find(descriptor);
+    if (found != watched_.end()) {
+        // A copy, for it may be unwatched meanwhile.
+        const auto ready = found->second.ready;
+        ready();
+    }
+}
+
+void BusLoop::callPosted() {
+    std::vector<Task> tasks;
+    {
+        const std::scoped_lock lock{mutex_};
+        tasks.swap(posted_);
+    }
+    for (const auto& task : tasks) {
+        task();
+    }
+}
+
+void BusLoop::callDue() {
+    while (!timers_.empty() && timers_.begin()->first <= Clock::now()) {
+        const auto task = std::move(timers_.begin()->second);
+        timers_.erase(timers_.begin());
+        task();
+    }
+}
+
+} // namespace quorl::engine

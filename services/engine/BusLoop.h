@@ -1,0 +1,76 @@
+#pragma once
+
+#include "services/media/FileDescriptor.h"
+
+#include <sdbus-c++/sdbus-c++.h>
+
+#include <chrono>
+#include <functional>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <string>
+#include <vector>
+
+namespace quorl::engine {
+
+/// The event loop of a thread: a bus connection, file descriptors, timers, and closures that other
+/// threads hand over. All of them are served on the thread that is in `run`, one at a time.
+class BusLoop {
+  public:
+    using Task = std::function<void()>;
+    using Clock = std::chrono::steady_clock;
+
+    /// @param bus nobody else runs a loop on it. Null: the loop serves everything else.
+    explicit BusLoop(std::unique_ptr<sdbus::IConnection> bus);
+
+    BusLoop(const BusLoop&) = delete;
+    BusLoop& operator=(const BusLoop&) = delete;
+
+    /// Not to be called without a bus.
+    [[nodiscard]] sdbus::IConnection& bus() { return *bus_; }
+
+    /// Has `task` called by `run`, after those that were handed over before. Any thread; never
+    /// waits. What was not called when the loop ended is destroyed with it.
+    void post(Task task);
+
+    /// Has `ready` called while the descriptor shows one of these events of poll(2). `ready` may
+    /// call `unwatch`.
+    void watch(int descriptor, short events, Task ready);
+    void unwatch(int descriptor);
+
+    /// Has `task` called once, no sooner than at this time.
+    void callAt(Clock::time_point time, Task task);
+
+    /// Serves everything until `stop` is called or the bus is gone. Gives back an empty text, or
+    /// says why the bus is gone; a further call then serves everything else.
+    [[nodiscard]] std::string run();
+
+    /// Makes `run` return. Any thread.
+    void stop();
+
+  private:
+    struct Watched {
+        short events;
+        Task ready;
+    };
+
+    void serveBus();
+    [[nodiscard]] int timeout() const;
+    void wait();
+    void callReady(int descriptor);
+    void callPosted();
+    void callDue();
+
+    const std::unique_ptr<sdbus::IConnection> bus_;
+    const media::FileDescriptor wake_;
+    std::map<int, Watched> watched_;
+    std::multimap<Clock::time_point, Task> timers_;
+
+    std::mutex mutex_;
+    std::vector<Task> posted_;
+    bool stopped_ = false;
+    bool isBusThere_;
+};
+
+} // namespace quorl::engine

@@ -1,0 +1,91 @@
+#pragma once
+
+#include <sdbus-c++/sdbus-c++.h>
+
+#include <cstdint>
+#include <map>
+#include <string>
+#include <vector>
+
+/// What a sync engine tells about itself, as plain values.
+namespace quorl::engine {
+
+/// A piece of a session's work.
+struct Task {
+    /// Tells it from all others for as long as the engine runs.
+    std::string path;
+    std::string groupingKey;
+    bool isRunning = false;
+    /// Songs to be copied; 0 as long as that is not known.
+    std::uint64_t totalItemCount = 0;
+    std::uint64_t completedItemCount = 0;
+    /// From 0 to 1.
+    double progress = 0.0;
+
+    bool operator==(const Task&) const = default;
+};
+
+/// One run of the engine.
+struct Session {
+    /// Tells it from all others for as long as the engine runs.
+    std::string path;
+    std::string typeIdentifier;
+    bool isFinished = false;
+    /// In the order in which they were announced.
+    std::vector<Task> tasks;
+
+    bool operator==(const Session&) const = default;
+};
+
+/// The wearable that the engine syncs to. Byte counts are as last looked at.
+struct WearableStatus {
+    std::string directory;
+    std::string name;
+    bool isEmbedded = false;
+    bool isConnected = false;
+    bool isOnCharger = false;
+    std::uint64_t capacity = 0;
+    std::uint64_t available = 0;
+    std::uint64_t songs = 0;
+
+    bool operator==(const WearableStatus&) const = default;
+};
+
+/// The engine itself.
+struct EngineStatus {
+    std::string musicFolder;
+    /// Bytes a second; 0 for no limit.
+    std::uint64_t rateLimit = 0;
+    /// A sentence for the user: what the engine does, or what it waits for.
+    std::string status;
+    /// What became of the last session; no text before the first.
+    bool lastSuccess = false;
+    std::string lastMessage;
+    /// Microseconds since 1970.
+    std::uint64_t lastTime = 0;
+
+    bool operator==(const EngineStatus&) const = default;
+};
+
+/// Everything, at one moment.
+struct State {
+    /// False: there is no engine, and everything below is empty.
+    bool isThere = false;
+    EngineStatus engine;
+    WearableStatus wearable;
+    /// In the order in which they began.
+    std::vector<Session> sessions;
+
+    bool operator==(const State&) const = default;
+};
+
+using Properties = std::map<std::string, sdbus::Variant>;
+
+/// Take over those of the properties that are known and of the right type; the others are left as
+/// they are, so that other engines may have more.
+void update(Task& task, const Properties& properties);
+void update(Session& session, const Properties& properties);
+void update(WearableStatus& wearable, const Properties& properties);
+void update(EngineStatus& engine, const Properties& properties);
+
+} // namespace quorl::engine

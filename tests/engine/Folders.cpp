@@ -1,0 +1,85 @@
+#include "tests/engine/Folders.h"
+
+#include "services/media/MusicFolder.h"
+#include "services/wearable/AtomicFile.h"
+
+#include <fcntl.h>
+
+#include <algorithm>
+#include <sstream>
+
+namespace quorl::syncd::testing {
+
+Contents contentsOf(const std::filesystem::path& directory) {
+    Contents contents;
+    if (std::filesystem::exists(directory)) {
+        for (const auto& entry : std::filesystem::recursive_directory_iterator{directory}) {
+            if (entry.is_regular_file()) {
+                const auto name = entry.path().lexically_relative(directory);
+                contents[name.native()] = textOf(entry.path());
+            }
+        }
+    }
+    return contents;
+}
+
+std::string textOf(const std::filesystem::path& file) {
+    std::ostringstream text;
+    text << std::ifstream{file, std::ios::binary}.rdbuf();
+    return text.str();
+}
+
+void Music::write(const std::string& name, const std::string& text) {
+    folder_.write(name, text);
+    const auto time = std::filesystem::file_time_type::clock::now() - std::chrono::hours{1000} +
+                      std::chrono::seconds{10 * ++writes_};
+    std::filesystem::last_write_time(path() / name, time);
+}
+
+void Music::remove(const std::string& name) const { std::filesystem::remove(path() / name); }
+
+void Music::list(const std::vector<std::string>& songs, const std::string& title) {
+    std::string text;
+    for (const auto& song : songs) {
+        text += song + "\n";
+    }
+    folder_.write(title + ".m3u8", text);
+}
+
+wearable::Manifest Player::manifest() const {
+    return wearable::loadManifest(wearable::openRoot(path().c_str()).get());
+}
+
+Wish wishFor(const Music& music, const Player& player, std::uint64_t limitType, std::uint64_t limit,
+             const std::string& title) {
+    auto library = media::scan(music.path());
+    const auto playlist = std::ranges::find(library->playlists, title, &media::Playlist::name);
+    if (playlist == library->playlists.end()) {
+        throw std::runtime_error{"no playlist " + title};
+    }
+    const wearable::Selection selection{playlist->id, playlist->revision, limitType, limit};
+    return {std::move(library), selection, player.wearable()};
+}
+
+Outcome sync(const Wish& wish, const Sync::Told& told, std::stop_token stop) {
+    RateLimit rate;
+    return Sync{wish, rate, std::move(stop), told ? told : [](const CopyProgress&) {}}.run();
+}
+
+std::string whatIsWrongWith(const std::filesystem::path& wearable) {
+    const auto root = wearable::openRoot(wearable.c_str());
+    const auto manifest = wearable::loadManifest(root.get());
+    const auto music = wearable / wearable::musicDirectory;
+    for (const auto& song : manifest.songs) {
+        const media::FileDescriptor file{open((music / song.name).c_str(), O_RDONLY | O_CLOEXEC)};
+        if (!file) {
+            return song.name + " is not there";
+        }
+        if (hashOf(file.get(), {}) != song.hash) {
+            return song.name + " is not complete";
+        }
+    }
+    return {};
+}
+
+} // namespace quorl::syncd::testing

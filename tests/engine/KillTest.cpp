@@ -1,0 +1,88 @@
+// The engine is killed again and again while it works.
+
+#include "services/wearable/AtomicFile.h"
+#include "tests/engine/EngineFixture.h"
+
+#include <chrono>
+#include <csignal>
+#include <random>
+#include <thread>
+
+namespace {
+
+using namespace quorl;
+using namespace quorl::syncd::testing;
+using Kind = Event::Kind;
+
+constexpr int kills = 200;
+constexpr int songs = 12;
+
+class KilledEngine : public EngineTest {
+  protected:
+    /// Another selection of songs, some of them with new contents, so that there is something to
+    /// copy and something to remove.
+    void changeThePlaylist() {
+        std::vector<std::string> names;
+        for (int song = 0; song < songs; ++song) {
+            const auto name = std::to_string(song) + ".mp3";
+            if (random_() % 3 == 0) {
+                music_.write(name, std::string(1000 + random_() % 100'000, 'x') +
+                                       std::to_string(random_()));
+            }
+            if (random_() % 2 == 0) {
+                names.push_back(name);
+            }
+        }
+        music_.list(names);
+    }
+
+    // Always the same numbers, so that a failure comes again.
+    std::mt19937 random_{20'240'229};
+};
+
+TEST_F(KilledEngine, LeavesNothingHalfAndNothingOfOthersTouchedAndCompletesInTheEnd) {
+    for (int song = 0; song < songs; ++song) {
+        music_.write(std::to_string(song) + ".mp3", std::to_string(song));
+    }
+    const Contents foreign{{"0.mp3", "not ours"}, {"5 (2).MP3", "not ours"}, {"x/y.mp3", "no"}};
+    for (const auto& [name, text] : foreign) {
+        std::filesystem::create_directories((wearable_ / "Music" / name).parent_path());
+        std::ofstream{wearable_ / "Music" / name} << text;
+    }
+    music_.list({"0.mp3"});
+    choose();
+    constexpr std::chrono::microseconds longest{40'000};
+
+    int interrupted = 0;
+    for (int kill = 0; kill < kills; ++kill) {
+        changeThePlaylist();
+        Process engine{{ENGINE_PROGRAM, "--music-folder", music_.path()}};
+        recorder_.next(Kind::EngineDidAppear);
+        // The moment is what this test is about; whichever it is, the same must hold.
+        std::this_thread::sleep_for(longest * (random_() % 1000) / 1000);
+        engine.signal(SIGKILL);
+        engine.wait();
+        recorder_.next(Kind::EngineDidVanish);
+
+        ASSERT_EQ(whatIsWrongWith(wearable_), "") << "at kill " << kill;
+        const auto root = wearable::openRoot(wearable_.c_str());
+        interrupted += wearable::loadManifest(root.get()).strays.empty() ? 0 : 1;
+        const auto there = onWearable();
+        for (const auto& [name, text] : foreign) {
+            ASSERT_TRUE(there.contains(name) && there.at(name) == text)
+                << name << " at kill " << kill;
+        }
+    }
+    RecordProperty("interrupted", interrupted);
+    EXPECT_GT(interrupted, 0) << "no kill came in the middle, so nothing was tested";
+    changeThePlaylist();
+    start();
+    EXPECT_TRUE(sessionEnd().success);
+
+    const auto wish = wishFor(music_, Player{});
+    EXPECT_EQ(onWearable().size(), foreign.size() + wish.playlist().songs.size() + 1)
+        << "nothing is left behind";
+    EXPECT_EQ(whatIsWrongWith(wearable_), "");
+}
+
+} // namespace
