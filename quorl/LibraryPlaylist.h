@@ -1,0 +1,44 @@
+#pragma once
+
+#include "platform/MediaLibrary.h"
+#include "services/media/Snapshot.h"
+
+namespace quorl {
+
+/// A playlist, or a folder of playlists, of a snapshot of the music folder. Main thread.
+class LibraryPlaylist final : public MPMediaPlaylist {
+  public:
+    /// `playlist` is one of `snapshot`, which is kept alive.
+    LibraryPlaylist(std::shared_ptr<const media::Snapshot> snapshot,
+                    const media::Playlist& playlist);
+
+    /// Whether `playlist`, of any snapshot, says what this one says.
+    [[nodiscard]] bool isSame(const media::Playlist& playlist) const;
+
+    /// Takes the place of `isSame` playlist in another snapshot, and lets go of the one before.
+    void moveTo(std::shared_ptr<const media::Snapshot> snapshot, const media::Playlist& playlist);
+
+    [[nodiscard]] std::uint64_t persistentID() const override;
+
+    /// Allocates nothing.
+    [[nodiscard]] std::shared_ptr<NSObject>
+    valueForProperty(MPMediaProperty property) const override;
+    [[nodiscard]] std::optional<std::string> name() const override;
+
+    /// Made at the first call.
+    [[nodiscard]] NSArray<MPMediaItem> items() const override;
+
+  private:
+    std::shared_ptr<const media::Snapshot> snapshot_;
+    const media::Playlist* playlist_; ///< in `snapshot_`
+    mutable NSArray<MPMediaItem> items_;
+
+    // Handed out; a number never changes.
+    mutable NSNumber identifier_;
+    mutable NSNumber revision_;
+    mutable NSNumber isFolder_;
+    mutable NSNumber isMix_;
+    mutable NSNumber isGenerated_;
+};
+
+} // namespace quorl

@@ -1,0 +1,53 @@
+#pragma once
+
+#include "runtime/NavigationController.h"
+
+namespace quorl {
+
+/// What a pane shows, as rows in sections, whichever kind of pane it is. Rows are counted over all
+/// sections. Knows no toolkit; main thread.
+class PaneContent {
+  public:
+    struct Section {
+        std::optional<std::string> title;  ///< above the rows; null for none
+        std::optional<std::string> footer; ///< below the rows; null for none
+        NSInteger rowCount = 0;
+    };
+
+    /// The content of `pane`, never null. `navigation` opens what a tap on a row opens, and
+    /// outlives the content.
+    [[nodiscard]] static std::unique_ptr<PaneContent>
+    of(const std::shared_ptr<UIViewController>& pane, NavigationController& navigation);
+
+    PaneContent() = default;
+    PaneContent(const PaneContent&) = delete;
+    PaneContent& operator=(const PaneContent&) = delete;
+    virtual ~PaneContent() = default;
+
+    [[nodiscard]] virtual UIViewController& pane() const = 0;
+
+    /// Draws the pane, with `rowsOnScreen` rows on the screen of which `firstRow` is the first as
+    /// far as the number of rows allows, and lays out their cells.
+    virtual void draw(NSInteger firstRow, NSInteger rowsOnScreen) = 0;
+
+    /// As last drawn.
+    [[nodiscard]] virtual const std::vector<Section>& sections() const = 0;
+
+    /// The cell of a row as last drawn; null for a row that is not on the screen.
+    [[nodiscard]] virtual std::shared_ptr<UITableViewCell> cell(NSInteger row) const = 0;
+
+    /// The cell of any row of the pane, made for this call where the row is not on the screen; null
+    /// for no such row.
+    [[nodiscard]] virtual std::shared_ptr<UITableViewCell> cellAnywhere(NSInteger row) = 0;
+
+    /// What a finger on a row of the screen does; nothing where there is no such row.
+    virtual void tap(NSInteger row) = 0;
+
+    /// The row at `path` of `table`, or null where that is another pane's table.
+    [[nodiscard]] virtual std::optional<NSInteger> row(const UITableView& table,
+                                                       const NSIndexPath& path) const = 0;
+
+    [[nodiscard]] NSInteger rowCount() const;
+};
+
+} // namespace quorl

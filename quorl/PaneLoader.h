@@ -1,0 +1,25 @@
+#pragma once
+
+#include <filesystem>
+#include <variant>
+
+#include "platform/HostApp.h"
+
+namespace quorl {
+
+/// Why there is no pane to show: sentences for the user that name the file.
+struct PaneProblem {
+    std::string text;
+};
+
+using LoadedPane = std::variant<Class, PaneProblem>;
+
+/// The directories that plug-ins are looked for in, the first one first. `preferred` is put before
+/// the others unless it is empty.
+[[nodiscard]] std::vector<std::filesystem::path>
+pluginDirectories(const std::filesystem::path& preferred);
+
+/// The class of the root pane of the first bundle in `directories`.
+[[nodiscard]] LoadedPane loadPane(const std::vector<std::filesystem::path>& directories);
+
+} // namespace quorl

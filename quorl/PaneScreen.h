@@ -1,0 +1,48 @@
+#pragma once
+
+#include <QObject>
+#include <QTimer>
+
+#include "runtime/Screen.h"
+
+namespace quorl {
+
+/// A screen that draws from Qt's event loop: however much changes in one turn of the loop, it is
+/// drawn once, after that. Main thread.
+class PaneScreen : public QObject, public Screen {
+    Q_OBJECT
+
+  public:
+    PaneScreen();
+
+    /// Has `drawing` emitted soon.
+    void scheduleDrawing();
+
+    [[nodiscard]] UIColor tintColor() const override;
+    [[nodiscard]] std::optional<UIColor> listTextColor() const override;
+
+    void specifierWillSetProperty(PSSpecifier& specifier, const std::optional<std::string>& value,
+                                  std::string_view key) override;
+    void listWillReloadSpecifier(PSListController& list, const PSSpecifier* specifier) override;
+    void listWillReload(PSListController& list) override;
+    void listWillShowController(PSListController& list, PSController* controller,
+                                std::optional<bool> animate) override;
+    void tableWillReloadData(UITableView& table) override;
+    void tableWillReloadRows(UITableView& table, const std::vector<NSIndexPath>& paths,
+                             UITableViewRowAnimation animation) override;
+    void tableWillDeselectRow(UITableView& table, const NSIndexPath& path, bool animated) override;
+
+  Q_SIGNALS:
+    /// The panes are to be drawn.
+    void drawing();
+
+    /// These rows still show what they showed; the next drawing takes them anew.
+    void rowsWillFade(const UITableView& table, const std::vector<NSIndexPath>& paths);
+
+    void rowWillBeDeselected(const UITableView& table, const NSIndexPath& path, bool animated);
+
+  private:
+    QTimer timer_;
+};
+
+} // namespace quorl

@@ -1,0 +1,30 @@
+#pragma once
+
+#include <memory>
+
+#include "runtime/LSSClient.h"
+#include "services/wearable/Wearable.h"
+
+namespace quorl {
+
+/// What is asked of the wearable, and answered without anybody waiting for a slow device. Main
+/// thread.
+class Wearable {
+  public:
+    explicit Wearable(const wearable::Wearable& wearable);
+
+    /// A connection for one client, which may outlive this object.
+    [[nodiscard]] std::unique_ptr<LSSClient> connect() const;
+
+    /// Whether every question that was asked through a connection has been answered, and the answer
+    /// has been taken on the main queue.
+    [[nodiscard]] bool isIdle() const;
+
+  private:
+    class Client;
+    struct Questions;
+
+    std::shared_ptr<Questions> questions_;
+};
+
+} // namespace quorl

@@ -1,0 +1,81 @@
+#include <cmath>
+
+#include <gmock/gmock.h>
+
+#include <QImage>
+
+#include "quorl/CellPainter.h"
+#include "quorl/CompanionHost.h"
+#include "quorl/WindowScreen.h"
+
+namespace quorl::tests {
+
+namespace {
+
+constexpr qreal width = 328;
+
+/// A row with a title at its start and a value at its end, on a screen of the given scale.
+class CellLayout : public testing::TestWithParam<double> {
+  protected:
+    CellLayout() {
+        screen_.setGeometry(width, GetParam());
+        Host::install(host_);
+    }
+
+    ~CellLayout() override { Host::install(nullptr); }
+
+    static std::shared_ptr<UITableViewCell> cellOf(const std::string& title,
+                                                   const std::string& value) {
+        auto cell = ::create<UITableViewCell>(&UITableViewCell::initWithStyle_reuseIdentifier,
+                                              UITableViewCellStyle::Value1, std::string());
+        cell->textLabel().setText(title);
+        cell->detailTextLabel().setText(value);
+        cell->layoutSubviews();
+        return cell;
+    }
+
+    [[nodiscard]] bool isOnPixels(CGFloat length) const {
+        const double pixels = static_cast<double>(length) * GetParam();
+        return std::abs(pixels - std::round(pixels)) < 1e-6;
+    }
+
+    WindowScreen screen_;
+    Notices notices_;
+    std::shared_ptr<CompanionHost> host_ =
+        std::make_shared<CompanionHost>(Options{}, screen_, notices_);
+};
+
+TEST_P(CellLayout, labelsAreOnWholeDevicePixels) {
+    const auto cell = cellOf("Road Trip", "Sync Pending…");
+    for (const UILabel* label : {&cell->textLabel(), &cell->detailTextLabel()}) {
+        const CGRect frame = label->frame();
+        for (const CGFloat length : {frame.x, frame.y, frame.width, frame.height}) {
+            EXPECT_TRUE(isOnPixels(length)) << length;
+        }
+    }
+}
+
+TEST_P(CellLayout, valueEndsAtTheMarginAndTitleBeginsThere) {
+    const auto cell = cellOf("Road Trip", "Synced");
+    const CGRect value = cell->detailTextLabel().frame();
+    EXPECT_NEAR(static_cast<double>(value.x + value.width), width - 16, 1);
+    EXPECT_NEAR(static_cast<double>(cell->textLabel().frame().x), 16, 1);
+}
+
+TEST_P(CellLayout, whatFitsIsGivenItsWholeWidth) {
+    const auto cell = cellOf("Road Trip", "Synced");
+    for (UILabel* label : {&cell->textLabel(), &cell->detailTextLabel()}) {
+        EXPECT_GE(label->frame().width + 1e-6, screen_.sizeOfText(*label).width);
+    }
+}
+
+TEST_P(CellLayout, rowIsAtLeastAsHighAsAFinger) {
+    EXPECT_GE(screen_.rowHeight(), 44);
+    EXPECT_TRUE(isOnPixels(static_cast<CGFloat>(screen_.rowHeight())));
+}
+
+INSTANTIATE_TEST_SUITE_P(Scales, CellLayout, testing::Values(1.0, 1.5, 2.0, 3.0));
+
+} // namespace
+
+} // namespace quorl::tests

@@ -1,0 +1,67 @@
+#include <gmock/gmock.h>
+
+#include "tests/quorl/Music.h"
+#include "tests/quorl/Program.h"
+
+namespace quorl::tests {
+
+namespace {
+
+using testing::HasSubstr;
+
+TEST(LibraryReport, namesEachPlaylistWithSongsSizeAndPath) {
+    const Music music;
+    Program quorl({"--library", "--music", music.path()});
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_THAT(quorl.output(), HasSubstr("3 playlists, 3 songs listed"));
+    EXPECT_THAT(quorl.output(), HasSubstr("Long Run: 3 songs, 3 MB, Long Run.m3u8\n"));
+    EXPECT_THAT(quorl.output(), HasSubstr("Road Trip: 1 song, 1 MB, Road Trip.m3u8\n"));
+    EXPECT_THAT(quorl.output(), HasSubstr("Morning Mix.m3u8 (generated mix)\n"));
+}
+
+TEST(LibraryReport, saysWhatWasLeftOutAndWhy) {
+    const Music music;
+    Program quorl({"--library", "--music", music.path()});
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_THAT(quorl.output(), HasSubstr("Left out: 1\n"));
+    EXPECT_THAT(quorl.output(), HasSubstr("Road Trip.m3u8: gone.flac: There is no such file."));
+}
+
+TEST(LibraryReport, marksFoldersOfPlaylists) {
+    const Music music;
+    music.folder().write("Workout/Intervals.m3u8", "../one.flac\n");
+    Program quorl({"--library", "--music", music.path()});
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_THAT(quorl.output(), HasSubstr("Workout: 1 song, 1 MB, Workout (folder)\n"));
+}
+
+TEST(LibraryReport, missingFolderEndsWithThreeAndSaysWhatToDo) {
+    Program quorl({"--library", "--music", "/nonexistent"});
+    EXPECT_EQ(quorl.end(), 3);
+    EXPECT_THAT(quorl.errors(), HasSubstr("/nonexistent"));
+    EXPECT_THAT(quorl.errors(), HasSubstr("--music"));
+}
+
+TEST(LibraryReport, withoutAnOptionReadsTheUsersMusicFolder) {
+    const Music music;
+    const media::test::TemporaryFolder configuration;
+    configuration.write("user-dirs.dirs", "XDG_MUSIC_DIR=\"" + music.path() + "\"\n");
+    Program quorl({"--library"}, {{"XDG_CONFIG_HOME", configuration.path().string()}});
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_THAT(quorl.output(), HasSubstr("Road Trip"));
+}
+
+TEST(LibraryReport, listThatCannotBeWrittenIsAFailure) {
+    const Music music;
+    QProcess shell;
+    shell.start(QStringLiteral("sh"),
+                {QStringLiteral("-c"),
+                 QStringLiteral("exec \"$0\" --library --music \"$1\" >/dev/full"),
+                 QStringLiteral(QUORL_PROGRAM), QString::fromStdString(music.path())});
+    ASSERT_TRUE(shell.waitForFinished());
+    EXPECT_EQ(shell.exitCode(), 1);
+}
+
+} // namespace
+
+} // namespace quorl::tests

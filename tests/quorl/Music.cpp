@@ -1,0 +1,16 @@
+#include "tests/quorl/Music.h"
+
+namespace quorl::tests {
+
+Music::Music() {
+    folder_.writeSongs({"one.flac", "two.flac", "three.flac"}, std::size_t{1} << 20U);
+    folder_.write("Long Run.m3u8", "#EXTM3U\none.flac\ntwo.flac\nthree.flac\n");
+    folder_.write("Morning Mix.m3u8", "#EXTM3U\n#GENERATED:mix\ntwo.flac\n");
+    folder_.write("Road Trip.m3u8", "#EXTM3U\none.flac\ngone.flac\n");
+}
+
+void Music::addPlaylist(const std::string& name) const {
+    folder_.replace(name + ".m3u8", "#EXTM3U\none.flac\n");
+}
+
+} // namespace quorl::tests

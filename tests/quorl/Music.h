@@ -1,0 +1,24 @@
+#pragma once
+
+#include "tests/media/TemporaryFolder.h"
+
+namespace quorl::tests {
+
+/// A music folder with two playlists, "Long Run" of three songs and "Road Trip" of one, a generated
+/// mix "Morning Mix", and a song that a playlist names and that is not there.
+class Music {
+  public:
+    Music();
+
+    [[nodiscard]] const media::test::TemporaryFolder& folder() const { return folder_; }
+
+    [[nodiscard]] std::string path() const { return folder_.path().string(); }
+
+    /// Adds a playlist of one song.
+    void addPlaylist(const std::string& name) const;
+
+  private:
+    media::test::TemporaryFolder folder_;
+};
+
+} // namespace quorl::tests

@@ -1,0 +1,103 @@
+#include "tests/quorl/Program.h"
+
+#include <stdexcept>
+
+namespace quorl::tests {
+
+namespace {
+
+constexpr int patience = 60'000; // milliseconds
+
+QProcessEnvironment environmentWith(const Environment& changes) {
+    auto environment = QProcessEnvironment::systemEnvironment();
+    environment.remove(QStringLiteral("QT_QPA_PLATFORM"));
+    for (const char* language : {"LANGUAGE", "LC_ALL", "LC_MESSAGES"}) {
+        environment.remove(QString::fromLatin1(language));
+    }
+    environment.insert(QStringLiteral("LANG"), QStringLiteral("C.UTF-8"));
+    for (const auto& [name, value] : changes) {
+        if (value.empty()) {
+            environment.remove(QString::fromStdString(name));
+        } else {
+            environment.insert(QString::fromStdString(name), QString::fromStdString(value));
+        }
+    }
+    return environment;
+}
+
+QStringList toList(const std::vector<std::string>& texts) {
+    QStringList list;
+    for (const std::string& text : texts) {
+        list << QString::fromStdString(text);
+    }
+    return list;
+}
+
+std::string gsettings(const std::vector<std::string>& arguments) {
+    QProcess process;
+    process.start(QStringLiteral("gsettings"),
+                  QStringList{QStringLiteral("--schemadir"), QStringLiteral(SCHEMA_DIRECTORY)} +
+                      toList(arguments));
+    if (!process.waitForFinished(patience) || process.exitCode() != 0) {
+        throw std::runtime_error("gsettings: " + process.readAllStandardError().toStdString());
+    }
+    return process.readAllStandardOutput().trimmed().toStdString();
+}
+
+constexpr const char* schema = "org.quorl.Velora.AssetSync";
+
+} // namespace
+
+Program::Program(const std::vector<std::string>& arguments, const Environment& environment) {
+    process_.setProcessEnvironment(environmentWith(environment));
+    process_.start(QStringLiteral(QUORL_PROGRAM), toList(arguments));
+    if (!process_.waitForStarted(patience)) {
+        throw std::runtime_error("quorl does not start");
+    }
+}
+
+void Program::say(const std::string& line) {
+    process_.write((line + "\n").c_str());
+    process_.waitForBytesWritten(patience);
+}
+
+void Program::closeInput() { process_.closeWriteChannel(); }
+
+void Program::takeOutput() {
+    output_ += process_.readAllStandardOutput().toStdString();
+    errors_ += process_.readAllStandardError().toStdString();
+}
+
+std::string Program::readUntil(const std::string& text) {
+    takeOutput();
+    auto found = output_.find(text);
+    while (found == std::string::npos) {
+        if (!process_.waitForReadyRead(patience)) {
+            throw std::runtime_error("quorl has not written \"" + text + "\" but: " + output_ +
+                                     errors_);
+        }
+        takeOutput();
+        found = output_.find(text);
+    }
+    std::string read = output_.substr(0, found + text.size());
+    output_.erase(0, found + text.size());
+    return read;
+}
+
+int Program::end() {
+    closeInput();
+    if (!process_.waitForFinished(patience)) {
+        process_.kill();
+        throw std::runtime_error("quorl does not end");
+    }
+    takeOutput();
+    return process_.exitStatus() == QProcess::NormalExit ? process_.exitCode() : -1;
+}
+
+std::string storedPreference(const std::string& key) { return gsettings({"get", schema, key}); }
+
+void storePreference(const std::string& key, const std::string& value) {
+    gsettings({"set", schema, key, value});
+}
+
+} // namespace quorl::tests

@@ -1,0 +1,52 @@
+#pragma once
+
+#include <map>
+#include <string>
+#include <vector>
+
+#include <QProcess>
+
+namespace quorl::tests {
+
+using Environment = std::map<std::string, std::string>;
+
+/// A program that runs beside the test: `quorl` itself unless it says otherwise. Whatever takes
+/// longer than a minute throws, with what the program has said.
+class Program {
+  public:
+    /// Starts `quorl` with `arguments`. An empty value takes a variable out of the environment.
+    explicit Program(const std::vector<std::string>& arguments,
+                     const Environment& environment = {});
+
+    /// Writes a line to its standard input.
+    void say(const std::string& line);
+
+    void closeInput();
+
+    /// Waits until it has written `text` to its standard output since the last call, and gives
+    /// back all up to and with that.
+    std::string readUntil(const std::string& text);
+
+    /// Closes its input, waits for its end and gives back how it ended: the exit code.
+    int end();
+
+    /// What it wrote, as far as `readUntil` did not take it; after `end`, all.
+    [[nodiscard]] const std::string& output() const { return output_; }
+
+    [[nodiscard]] const std::string& errors() const { return errors_; }
+
+  private:
+    void takeOutput();
+
+    QProcess process_;
+    std::string output_;
+    std::string errors_;
+};
+
+/// The value of a shared preference, as another program reads it.
+[[nodiscard]] std::string storedPreference(const std::string& key);
+
+/// Writes a shared preference as another program does.
+void storePreference(const std::string& key, const std::string& value);
+
+} // namespace quorl::tests

@@ -1,0 +1,146 @@
+#include <sstream>
+
+#include <gmock/gmock.h>
+
+#include "tests/quorl/Music.h"
+#include "tests/quorl/Program.h"
+
+namespace quorl::tests {
+
+namespace {
+
+using testing::HasSubstr;
+using testing::Not;
+
+class Text : public testing::Test {
+  protected:
+    [[nodiscard]] std::vector<std::string> arguments() const {
+        return {"--text", "--music", music_.path()};
+    }
+
+    Music music_;
+};
+
+TEST_F(Text, rootPaneHasNumberedRowsWithTheirValues) {
+    Program quorl(arguments());
+    quorl.say("q");
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_THAT(quorl.output(), HasSubstr("Music\n\nMusic Syncing\n  1  Synced Playlist: None\n"));
+    EXPECT_THAT(quorl.output(), HasSubstr("  2  Playlist Limit: 500 MB\n"));
+}
+
+TEST_F(Text, footersAreWrappedToEightyColumnsWithoutATerminal) {
+    Program quorl(arguments());
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_THAT(quorl.output(), HasSubstr("      This playlist syncs when"));
+    std::istringstream lines(quorl.output());
+    for (std::string line; std::getline(lines, line);) {
+        EXPECT_LE(line.size(), 80U) << line;
+    }
+}
+
+TEST_F(Text, endOfInputLeaves) {
+    Program quorl(arguments());
+    quorl.closeInput();
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST_F(Text, tappedPlaylistIsCheckedAndStored) {
+    Program quorl(arguments());
+    quorl.say("1");
+    quorl.readUntil("  3  ✓ None\n");
+    quorl.say("2");
+    quorl.readUntil("  2  ✓ Road Trip: Sync Pending…\n");
+    quorl.say("b");
+    quorl.readUntil("Synced Playlist: Sync Pending…\n");
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_EQ(storedPreference("asset-sync-enabled"), "true");
+    EXPECT_THAT(storedPreference("asset-sync-playlist-persistent-id"), Not(HasSubstr("nothing")));
+}
+
+TEST_F(Text, generatedPlaylistsCannotBeChosen) {
+    Program quorl(arguments());
+    quorl.say("1");
+    EXPECT_THAT(quorl.readUntil("None\n\n"), Not(HasSubstr("Morning Mix")));
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST_F(Text, lastLineWithoutALineFeedCountsToo) {
+    QProcess shell;
+    shell.start(QStringLiteral("sh"),
+                {QStringLiteral("-c"), QStringLiteral("printf 2 | \"$0\" --text --music \"$1\""),
+                 QStringLiteral(QUORL_PROGRAM), QString::fromStdString(music_.path())});
+    ASSERT_TRUE(shell.waitForFinished());
+    EXPECT_THAT(shell.readAllStandardOutput().toStdString(), HasSubstr("✓ 500 MB"));
+}
+
+TEST_F(Text, whatIsNoCommandGetsAHint) {
+    Program quorl(arguments());
+    for (const char* line : {"hello", "0", "7", "", "-1", "bb"}) {
+        quorl.say(line);
+        quorl.readUntil("A number taps the row, b goes back, q leaves.\n");
+    }
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST_F(Text, preferenceChangedByAnotherProgramShowsUp) {
+    Program quorl(arguments());
+    quorl.readUntil("Playlist Limit: 500 MB");
+    storePreference("asset-sync-limit", "just 1024");
+    quorl.readUntil("Playlist Limit: 1 GB");
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST_F(Text, playlistAddedOnDiskShowsUpInTheChooser) {
+    Program quorl(arguments());
+    quorl.say("1");
+    quorl.readUntil("  3  ✓ None");
+    music_.addPlaylist("Quiet Evening");
+    quorl.readUntil("  2  Quiet Evening");
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST_F(Text, limitByNumberOfSongsIsShownOnTheRootPane) {
+    Program quorl(arguments());
+    for (const char* line : {"2", "2", "5", "b"}) {
+        quorl.say(line);
+    }
+    quorl.readUntil("Playlist Limit: 125 Songs\n");
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_EQ(storedPreference("asset-sync-limit"), "@mt 125");
+}
+
+TEST_F(Text, controlCharactersInNamesDoNotReachTheTerminal) {
+    music_.folder().write("Evil.m3u8", "#PLAYLIST:Evil\x1b[2J\none.flac\n");
+    Program quorl(arguments());
+    quorl.say("1");
+    const auto shown = quorl.readUntil("✓ None");
+    EXPECT_THAT(shown, HasSubstr("Evil"));
+    EXPECT_THAT(shown, Not(HasSubstr("\x1b")));
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST_F(Text, missingMusicFolderIsToldOnStandardError) {
+    Program quorl({"--text", "--music", "/nonexistent"});
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_THAT(quorl.errors(), HasSubstr("/nonexistent"));
+    EXPECT_THAT(quorl.output(), HasSubstr("Synced Playlist: None"));
+}
+
+TEST_F(Text, withoutASessionBusItSaysSoAndWorksForItself) {
+    Program quorl(arguments(), {{"DBUS_SESSION_BUS_ADDRESS", ""}, {"XDG_RUNTIME_DIR", ""}});
+    quorl.say("1");
+    quorl.say("2");
+    quorl.readUntil("✓ Road Trip");
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_THAT(quorl.errors(), HasSubstr("quorl: "));
+}
+
+TEST_F(Text, neverLooksForADisplay) {
+    Program quorl(arguments(), {{"DISPLAY", ":99"}, {"QT_QPA_PLATFORM", "none-such"}});
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+} // namespace
+
+} // namespace quorl::tests

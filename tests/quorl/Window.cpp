@@ -1,0 +1,60 @@
+#include "tests/quorl/Window.h"
+
+#include <stdexcept>
+
+#include <QTest>
+
+namespace quorl::tests {
+
+namespace {
+
+constexpr int patience = 60'000; // milliseconds
+
+Options optionsFor(const Music& music) {
+    Options options;
+    options.music = music.path();
+    return options;
+}
+
+} // namespace
+
+Window::Window() : companion_(optionsFor(music_), screen_, notices_), window_(companion_, screen_) {
+    window_.resize(360, 720);
+    companion_.start();
+    window_.show();
+    if (!QTest::qWaitFor([this] { return companion_.isSettled() && window_.topView(); },
+                         patience)) {
+        throw std::runtime_error("the music folder is not read: " + companion_.problem());
+    }
+}
+
+std::string Window::title() { return view().content().pane().title().value_or(""); }
+
+void Window::click(NSInteger row) {
+    const auto place = view().onViewport(view().layout().rowRect(row)).center().toPoint();
+    QTest::mouseClick(view().viewport(), Qt::LeftButton, Qt::NoModifier, place);
+    QCoreApplication::processEvents();
+}
+
+void Window::press(Qt::Key key) {
+    QTest::keyClick(&view(), key);
+    QCoreApplication::processEvents();
+}
+
+bool Window::waitForRow(const QString& text) {
+    return QTest::qWaitFor([this, &text] { return rows().contains(text); }, patience);
+}
+
+QStringList Window::rows() {
+    QStringList rows;
+    for (NSInteger row = 0; row < view().content().rowCount(); ++row) {
+        if (const auto cell = view().content().cell(row)) {
+            const RowTexts texts = textsOf(*cell);
+            rows << (texts.isChecked ? QStringLiteral("✓ ") : QString()) + texts.title +
+                        (texts.value.isEmpty() ? QString() : QStringLiteral(": ") + texts.value);
+        }
+    }
+    return rows;
+}
+
+} // namespace quorl::tests

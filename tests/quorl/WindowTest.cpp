@@ -1,0 +1,104 @@
+#include "tests/quorl/Window.h"
+
+#include <gmock/gmock.h>
+
+#include <QScrollBar>
+#include <QTest>
+#include <QToolButton>
+
+#include "tests/quorl/Program.h"
+
+namespace quorl::tests {
+
+namespace {
+
+TEST(Window, rootPaneShowsPlaylistAndLimit) {
+    Window window;
+    EXPECT_TRUE(window.waitForRow("Synced Playlist: None"));
+    EXPECT_TRUE(window.waitForRow("Playlist Limit: 500 MB"));
+    EXPECT_EQ(window.title(), "Music");
+    EXPECT_EQ(window.widget().windowTitle(), "Velora");
+}
+
+TEST(Window, clickOnAPlaylistChecksItAndStoresIt) {
+    Window window;
+    window.click(0);
+    ASSERT_EQ(window.title(), "Synced Playlist");
+    ASSERT_TRUE(window.waitForRow("✓ None"));
+    window.click(1);
+    EXPECT_TRUE(window.waitForRow("✓ Road Trip: Sync Pending…"));
+    EXPECT_TRUE(window.waitForRow("None"));
+    EXPECT_EQ(storedPreference("asset-sync-enabled"), "true");
+}
+
+TEST(Window, keysAloneChooseALimit) {
+    Window window;
+    window.press(Qt::Key_End);
+    window.press(Qt::Key_Return);
+    ASSERT_EQ(window.title(), "Playlist Limit");
+    window.press(Qt::Key_End);
+    window.press(Qt::Key_Space);
+    EXPECT_TRUE(window.waitForRow("✓ 2 GB"));
+    window.press(Qt::Key_Escape);
+    EXPECT_EQ(window.title(), "Music");
+    EXPECT_TRUE(window.waitForRow("Playlist Limit: 2 GB"));
+}
+
+TEST(Window, backButtonIsNamedAfterThePaneBelow) {
+    Window window;
+    auto* back = window.widget().findChild<QToolButton*>(QStringLiteral("back"));
+    ASSERT_TRUE(back);
+    EXPECT_EQ(back->text(), "Velora");
+    window.click(1);
+    EXPECT_TRUE(back->isVisible());
+    EXPECT_EQ(back->text(), "Music");
+    back->click();
+    QCoreApplication::processEvents();
+    EXPECT_EQ(window.title(), "Music");
+    back->click();
+    QCoreApplication::processEvents();
+    EXPECT_EQ(window.title(), "Velora");
+    EXPECT_FALSE(back->isVisible());
+}
+
+TEST(Window, fingerThatMovesOffARowTapsNothing) {
+    Window window;
+    auto* viewport = window.view().viewport();
+    const auto row = window.view().onViewport(window.view().layout().rowRect(0));
+    QTest::mousePress(viewport, Qt::LeftButton, Qt::NoModifier, row.center().toPoint());
+    QTest::mouseMove(viewport, row.center().toPoint() + QPoint(0, 200));
+    QTest::mouseRelease(viewport, Qt::LeftButton, Qt::NoModifier,
+                        row.center().toPoint() + QPoint(0, 200));
+    QCoreApplication::processEvents();
+    EXPECT_EQ(window.title(), "Music");
+}
+
+TEST(Window, phoneSizedWindowScrollsOnlyUpAndDown) {
+    Window window;
+    window.widget().resize(360, 300);
+    QCoreApplication::processEvents();
+    EXPECT_EQ(window.view().horizontalScrollBar()->maximum(), 0);
+    EXPECT_GT(window.view().verticalScrollBar()->maximum(), 0);
+    for (const auto& section : window.view().layout().sections()) {
+        EXPECT_LE(section.footer.right(), window.view().viewport()->width());
+    }
+}
+
+TEST(Window, playlistThatArrivesOnDiskIsListedInTheOpenChooser) {
+    Window window;
+    window.click(0);
+    window.music().addPlaylist("Quiet Evening");
+    EXPECT_TRUE(window.waitForRow("Quiet Evening"));
+}
+
+TEST(Window, closedInTheMidstOfEverythingEndsCleanly) {
+    Window window;
+    window.click(0);
+    window.click(1);
+    window.press(Qt::Key_Escape);
+    window.click(1);
+}
+
+} // namespace
+
+} // namespace quorl::tests
