@@ -1,0 +1,30 @@
+#pragma once
+
+#include "quorl-script/Field.h"
+#include "quorl-script/Panes.h"
+#include "quorl-script/Plugin.h"
+#include "quorl-script/ScriptedHost.h"
+
+namespace quorl {
+
+/// What commands work on.
+struct Stage {
+    ScriptedHost& host;
+    const Plugin& plugin;
+    Panes panes;
+};
+
+/// Carries a command out and gives back what its reply has besides the trace: an object, or null
+/// for nothing. Everything of the command is checked first: where it is not right a `CommandError`
+/// is thrown and nothing has changed.
+using Command = Json (*)(Stage& stage, const Field& command);
+
+/// The command of this name, or null: of those that settle the situation, and of those that are a
+/// user's or the host's doing. `batch` is neither.
+[[nodiscard]] Command situationCommand(std::string_view name);
+[[nodiscard]] Command paneCommand(std::string_view name);
+
+/// One of the latter, which has its own file.
+[[nodiscard]] Json send(Stage& stage, const Field& command);
+
+} // namespace quorl

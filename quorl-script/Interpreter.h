@@ -1,0 +1,38 @@
+#pragma once
+
+#include <string_view>
+
+#include "quorl-script/Commands.h"
+
+namespace quorl {
+
+/// Plays a script, line by line. Main thread; one for the process, since its host is installed as
+/// the host of the process.
+class Interpreter {
+  public:
+    /// `plugin` outlives the interpreter; `host` is installed.
+    Interpreter(ScriptedHost& host, const Plugin& plugin)
+        : stage_{host, plugin, Panes(host.screen(), host.trace())} {}
+
+    /// The reply to a line, without the end of the line. What is not a command has a reply too.
+    [[nodiscard]] std::string reply(std::string_view line);
+
+    /// The reply to a line that was not read because it is too long.
+    [[nodiscard]] std::string replyToTooLongLine(std::size_t limit);
+
+    /// Whether any command so far, or a step of one, was not carried out.
+    [[nodiscard]] bool hasFailed() const { return hasFailed_; }
+
+  private:
+    [[nodiscard]] Json carryOut(std::string_view line);
+    [[nodiscard]] Json perform(const Field& command);
+    [[nodiscard]] Json performSteps(const Field& steps);
+    [[nodiscard]] Json performStep(const Field& step);
+    [[nodiscard]] Json failure(const std::exception& error);
+    void settle();
+
+    Stage stage_;
+    bool hasFailed_ = false;
+};
+
+} // namespace quorl

@@ -1,0 +1,172 @@
+// The commands that are a user's or the host's doing, and those that look at what came of it.
+
+#include <unordered_map>
+
+#include "quorl-script/Commands.h"
+#include "quorl-script/Naming.h"
+#include "quorl-script/Snapshot.h"
+
+namespace quorl {
+
+namespace {
+
+Json create(Stage& stage, const Field& /*command*/) {
+    stage.panes.createRoot(stage.plugin.rootClass());
+    return nullptr;
+}
+
+Json specifiers(Stage& stage, const Field& /*command*/) {
+    stage.panes.askForSpecifiers();
+    return nullptr;
+}
+
+Json appear(Stage& stage, const Field& command) {
+    stage.panes.appear(command["animated"].booleanOr(false));
+    return nullptr;
+}
+
+Json disappear(Stage& stage, const Field& command) {
+    stage.panes.disappear(command["animated"].booleanOr(false));
+    return nullptr;
+}
+
+Json open(Stage& stage, const Field& /*command*/) {
+    stage.panes.createRoot(stage.plugin.rootClass());
+    stage.panes.askForSpecifiers();
+    stage.panes.appear(false);
+    return nullptr;
+}
+
+NSIndexPath pathOf(const Field& field) {
+    constexpr auto largest = std::numeric_limits<std::int32_t>::max();
+    const auto indices = field.elements();
+    if (indices.size() != 2) {
+        field.refuse("a list of a section and a row");
+    }
+    return {static_cast<NSInteger>(indices[0].count(largest)),
+            static_cast<NSInteger>(indices[1].count(largest))};
+}
+
+Json tap(Stage& stage, const Field& command) {
+    const Field specifier = command["specifier"];
+    if (specifier.isGiven()) {
+        stage.panes.tapSpecifier(specifier.text());
+    } else if (command["path"].isGiven()) {
+        stage.panes.tapRow(pathOf(command["path"]));
+    } else {
+        specifier.refuse("the title of a row, or \"path\" its place in the table");
+    }
+    return nullptr;
+}
+
+Json back(Stage& stage, const Field& /*command*/) {
+    stage.panes.back();
+    return nullptr;
+}
+
+Json scroll(Stage& stage, const Field& command) {
+    constexpr auto largest = std::numeric_limits<std::int32_t>::max();
+    const auto row = static_cast<NSInteger>(command["to"].count(largest));
+    stage.panes.scrollTo(row);
+    return nullptr;
+}
+
+Json release(Stage& stage, const Field& /*command*/) {
+    stage.panes.releaseAll();
+    return nullptr;
+}
+
+Json rows(Stage& stage, const Field& command) {
+    const std::int64_t section = command["section"].integer();
+    if (!std::in_range<NSInteger>(section)) {
+        command["section"].refuse("the index of a section");
+    }
+    UITableViewController& pane = stage.panes.topTable();
+    return {{"result", pane.tableView_numberOfRowsInSection(pane.tableView(),
+                                                            static_cast<NSInteger>(section))}};
+}
+
+Json query(Stage& stage, const Field& /*command*/) { return stage.plugin.status(); }
+
+Json snapshot(Stage& stage, const Field& /*command*/) {
+    return {{"stack", snapshotOf(stage.panes.stack())}};
+}
+
+Json trace(Stage& stage, const Field& command) {
+    std::optional<std::set<std::string, std::less<>>> classes;
+    if (const Field field = command["classes"]; field.isGiven()) {
+        classes.emplace();
+        for (const Field& element : field.elements()) {
+            classes->insert(element.text());
+        }
+    }
+    stage.host.trace()->select(std::move(classes));
+    return nullptr;
+}
+
+CGRect frameOf(const Field& field) {
+    const auto sides = field.elements();
+    if (sides.size() != 4) {
+        field.refuse("a list of four numbers: x, y, width, height");
+    }
+    const auto side = [&sides](std::size_t index) {
+        return static_cast<CGFloat>(sides[index].number());
+    };
+    return {side(0), side(1), side(2), side(3)};
+}
+
+Json frameOf(const UILabel& label) {
+    const CGRect frame = label.frame();
+    Json sides = Json::array();
+    for (const CGFloat side : {frame.x, frame.y, frame.width, frame.height}) {
+        sides.push_back(numberOf(static_cast<double>(side)));
+    }
+    return sides;
+}
+
+CellLayout layoutOf(const ScriptedScreen& screen, const Field& command) {
+    CellLayout layout;
+    layout.title = frameOf(command["title"]);
+    layout.detail = frameOf(command["detail"]);
+    layout.detailWidth = static_cast<CGFloat>(command["fits"].number());
+    const Field scale = command["scale"];
+    layout.scale = static_cast<CGFloat>(scale.numberOr(static_cast<double>(screen.looks().scale)));
+    if (!(layout.scale > 0)) {
+        scale.refuse("a number above 0");
+    }
+    return layout;
+}
+
+Json layout(Stage& stage, const Field& command) {
+    ScriptedScreen& screen = stage.host.screen();
+    const CellLayout layout = layoutOf(screen, command);
+
+    const auto cell = ::create<UITableViewCell>(&UITableViewCell::initWithStyle_reuseIdentifier,
+                                                UITableViewCellStyle::Value1, "PC");
+    watchLife(*cell, "LMQuorlPlaylistCell", stage.host.trace());
+    const auto labels = screen.tryLayout(*cell, layout, [&stage](UITableViewCell& laidOut) {
+        stage.plugin.layOutPlaylistCell(laidOut);
+    });
+    Json set = Json::array();
+    for (const UILabel* label : labels) {
+        set.push_back(label == &cell->textLabel() ? "title" : "detail");
+    }
+    return {{"title", frameOf(cell->textLabel())},
+            {"detail", frameOf(cell->detailTextLabel())},
+            {"set", std::move(set)}};
+}
+
+} // namespace
+
+Command paneCommand(std::string_view name) {
+    static const std::unordered_map<std::string_view, Command> commands{
+        {"appear", appear},         {"back", back},       {"create", create},
+        {"disappear", disappear},   {"layout", layout},   {"open", open},
+        {"query", query},           {"release", release}, {"rows", rows},
+        {"scroll", scroll},         {"send", send},       {"snapshot", snapshot},
+        {"specifiers", specifiers}, {"tap", tap},         {"trace", trace}};
+    const auto found = commands.find(name);
+    return found == commands.end() ? nullptr : found->second;
+}
+
+} // namespace quorl

@@ -1,0 +1,77 @@
+#include "quorl-script/ScriptedWearable.h"
+
+#include <utility>
+
+namespace quorl {
+
+namespace {
+
+class Connection final : public LSSClient {
+  public:
+    explicit Connection(ScriptedWearable& wearable) : wearable_(wearable) {}
+
+    void requestUsage(LSSManager::UsageHandler reply) override {
+        wearable_.request(std::move(reply));
+    }
+
+  private:
+    ScriptedWearable& wearable_;
+};
+
+NSDictionary<NSNumber> dictionaryOf(const UsageFigures& figures) {
+    std::map<std::string, std::shared_ptr<NSNumber>, std::less<>> usage;
+    if (figures.available) {
+        usage.emplace(kLSSUsageAvailableStorageKey, NSNumber::numberWithDouble(*figures.available));
+    }
+    if (figures.songs) {
+        usage.emplace(kLSSUsageSongsKey, NSNumber::numberWithDouble(*figures.songs));
+    }
+    return std::make_shared<const decltype(usage)>(std::move(usage));
+}
+
+void tell(const LSSManager::UsageHandler& reply, const std::optional<UsageFigures>& figures) {
+    if (figures) {
+        reply(dictionaryOf(*figures), nullptr);
+    } else {
+        reply(nullptr, std::make_shared<NSError>("The wearable does not answer. Bring it closer."));
+    }
+}
+
+} // namespace
+
+std::unique_ptr<LSSClient> ScriptedWearable::connect(dispatch_queue_t queue) {
+    const bool isMain = queue == dispatch_get_main_queue();
+    trace_->record("LSSManager", "initWithQueue:", isMain ? "main" : "other");
+    return std::make_unique<Connection>(*this);
+}
+
+void ScriptedWearable::setAnswer(const UsageAnswer& answer) {
+    answer_ = answer;
+    if (!answer.isHeld) {
+        for (auto& reply : std::exchange(held_, {})) {
+            this->answer(std::move(reply));
+        }
+    }
+}
+
+void ScriptedWearable::request(LSSManager::UsageHandler reply) {
+    trace_->record("LSSManager", "getUsage:");
+    if (answer_.isHeld) {
+        held_.push_back(std::move(reply));
+    } else {
+        answer(std::move(reply));
+    }
+}
+
+void ScriptedWearable::answer(LSSManager::UsageHandler reply) const {
+    if (answer_.delay == 0) {
+        tell(reply, answer_.figures);
+        return;
+    }
+    // The answer is the one of the moment of asking; the closure owns the request until then.
+    VirtualTime::shared().schedule(
+        answer_.delay,
+        [reply = std::move(reply), figures = answer_.figures] { tell(reply, figures); });
+}
+
+} // namespace quorl

@@ -1,0 +1,60 @@
+#include "quorl-script/Trace.h"
+
+#include <cmath>
+
+namespace quorl {
+
+namespace {
+
+constexpr std::string_view lifeReceiver = "life";
+
+} // namespace
+
+void Trace::recordDealloc(const std::string& className) {
+    add(lifeReceiver, Json::array({"dealloc", className}));
+}
+
+void Trace::add(std::string_view receiver, Json entry) {
+    const std::lock_guard lock(mutex_);
+    if (!isSelected(receiver)) {
+        return;
+    }
+    if (std::this_thread::get_id() != mainThread_) {
+        entry.push_back("thread:other");
+    }
+    entries_.push_back(std::move(entry));
+}
+
+void Trace::select(std::optional<std::set<std::string, std::less<>>> receivers) {
+    const std::lock_guard lock(mutex_);
+    receivers_ = std::move(receivers);
+}
+
+Json Trace::take() {
+    const std::lock_guard lock(mutex_);
+    return std::exchange(entries_, Json::array());
+}
+
+bool Trace::isSelected(std::string_view receiver) const {
+    return pauses_ == 0 && (!receivers_ || receivers_->contains(receiver));
+}
+
+void Trace::pause(int change) {
+    const std::lock_guard lock(mutex_);
+    pauses_ += change;
+}
+
+Json numberOf(double value) {
+    constexpr double limit = 18446744073709551616.0; // 2^64
+    if (std::trunc(value) != value || std::abs(value) >= limit) {
+        return value;
+    }
+    if (value >= 0) {
+        return static_cast<std::uint64_t>(value);
+    }
+    return value >= -limit / 2 ? Json(static_cast<std::int64_t>(value)) : Json(value);
+}
+
+Json textOf(const std::optional<std::string>& text) { return text ? Json(*text) : Json(nullptr); }
+
+} // namespace quorl
