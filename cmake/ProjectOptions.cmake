@@ -20,6 +20,7 @@ set(QUORL_SANITIZE "" CACHE STRING "Sanitizers to build with, for example addres
 add_library(project_options INTERFACE)
 target_include_directories(project_options INTERFACE ${PROJECT_SOURCE_DIR})
 target_compile_options(project_options INTERFACE
+  -ffile-prefix-map=${PROJECT_SOURCE_DIR}=.
   -fPIC -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Wnon-virtual-dtor -Woverloaded-virtual
   -Wold-style-cast -Wcast-align -Wformat=2
   # g++ 12 sees overlapping copies in its own std::string where none can be.
@@ -31,7 +32,9 @@ if(QUORL_SANITIZE)
   target_link_options(project_options INTERFACE -fsanitize=${QUORL_SANITIZE})
 endif()
 
+# What was compiled in one copy of this tree need not be compiled again in another one.
 find_program(CCACHE ccache)
 if(CCACHE)
-  set(CMAKE_CXX_COMPILER_LAUNCHER ${CCACHE})
+  set(CMAKE_CXX_COMPILER_LAUNCHER
+    ${CMAKE_COMMAND} -E env CCACHE_BASEDIR=${PROJECT_SOURCE_DIR} ${CCACHE})
 endif()
