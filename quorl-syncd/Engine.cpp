@@ -7,6 +7,7 @@
 #include <glib.h>
 #include <poll.h>
 
+#include <iostream>
 #include <system_error>
 #include <thread>
 
@@ -23,6 +24,10 @@ constexpr auto timeBetweenUpdates = 100ms;
 std::string userMusicFolder() {
     const char* const folder = g_get_user_special_dir(G_USER_DIRECTORY_MUSIC);
     return folder != nullptr ? folder : std::string{g_get_home_dir()} + "/Music";
+}
+
+std::filesystem::path stateDirectory() {
+    return std::filesystem::path{g_get_user_state_dir()} / "quorl";
 }
 
 wearable::Wearable wearableAt(const std::string& path, std::uint64_t embeddedCapacity) {
@@ -52,7 +57,9 @@ Engine::Engine(engine::BusLoop& loop, preferences::SharedPreferences& preference
     : loop_{loop},
       preferences_{preferences},
       embeddedCapacity_{options.embeddedCapacity},
-      changed_{std::move(changed)} {
+      changed_{std::move(changed)},
+      retry_{options.retryDelay},
+      results_{stateDirectory()} {
     setRateLimit(options.rateLimit);
     setWearableDirectory(options.wearableDirectory);
     setMusicFolder(options.musicFolder);
@@ -64,7 +71,7 @@ Engine::~Engine() {
         stop("The sync engine was ended.");
         run_->thread.join();
         try {
-            run_->session->finish(false, run_->whyStopped);
+            conclude(false, run_->whyStopped);
         } catch (const sdbus::Error&) {
             // Without a bus there is nobody to tell.
         }
@@ -128,6 +135,7 @@ void Engine::setWearableDirectory(const std::string& path) {
     givenUp_.reset();
     wearableProblem_ = "Looking for the wearable…";
     attachment_ = {};
+    tellLastResult();
     rate_.set(wearable_.isEmbedded() ? status_.rateLimit : 0);
     reporter_ = std::make_unique<wearable::Reporter>(wearable_);
     if (wearable_.isEmbedded()) {
@@ -213,7 +221,7 @@ std::optional<Wish> Engine::wish(bool ignoresCharger) {
                 : !attachment_.connected ? "The wearable is not connected."
                 : !attachment_.onCharger && !ignoresCharger ? "The wearable is not on its charger."
                                                             : "";
-    if (!obstacle_.empty()) {
+    if (playlist == nullptr || !obstacle_.empty()) {
         return std::nullopt;
     }
     const wearable::Selection selection{playlist->id, playlist->revision,
@@ -285,27 +293,56 @@ void Engine::stop(const std::string& why) {
 void Engine::finish(const Outcome& outcome) {
     run_->thread.join();
     const auto wish = run_->wish;
-    const bool isStopped = outcome.kind == Outcome::Kind::Stopped;
-    bool success = outcome.kind == Outcome::Kind::Sent;
-    auto message = isStopped ? run_->whyStopped : outcome.message;
-    if (success) {
-        const auto problem = remember(wish);
-        success = problem.empty();
-        message = success ? message : problem;
-    }
-    if (!success && !isStopped) {
+    const bool isSent = outcome.kind == Outcome::Kind::Sent;
+    const auto problem = isSent ? remember(wish) : "";
+    if (isSent && problem.empty()) {
+        retry_.reset();
+        conclude(true, outcome.message);
+    } else if (outcome.kind == Outcome::Kind::Stopped) {
+        conclude(false, run_->whyStopped);
+    } else {
         givenUp_ = wish.selection;
+        if (run_->whyStopped.empty() && (isSent || outcome.mayPass)) {
+            tryAgainLater();
+        }
+        conclude(false, isSent ? problem : outcome.message);
     }
-    status_.lastSuccess = success;
-    status_.lastMessage = message;
-    status_.lastTime = microsecondsNow();
-    run_->session->finish(success, message);
     run_.reset();
     if (outcome.isLibraryStale) {
         folder_->rescan();
     }
     refreshWearable();
     consider();
+}
+
+/// Tells the result of the running session, here and on the bus.
+void Engine::conclude(bool success, const std::string& message) {
+    const LastResult result{success, message, microsecondsNow()};
+    try {
+        results_.remember(run_->wish.wearable.root, result);
+    } catch (const std::system_error& error) {
+        std::cerr << "quorl-syncd: What became of the sync is forgotten when the engine ends ("
+                  << error.what() << ").\n";
+    }
+    tellLastResult();
+    run_->session->finish(success, message);
+}
+
+void Engine::tellLastResult() {
+    const auto result = results_.of(wearable_.root);
+    status_.lastSuccess = result.success;
+    status_.lastMessage = result.message;
+    status_.lastTime = result.time;
+}
+
+void Engine::tryAgainLater() {
+    loop_.callAt(Clock::now() + retry_.next(), [this, failed = sessions_] {
+        // Where there was another session since, that one counts.
+        if (failed == sessions_) {
+            givenUp_.reset();
+            consider();
+        }
+    });
 }
 
 /// The last thing of all; gives back an empty text, or why it could not be done.

@@ -1,6 +1,8 @@
 #pragma once
 
+#include "quorl-syncd/LastResults.h"
 #include "quorl-syncd/RateLimit.h"
+#include "quorl-syncd/RetryDelay.h"
 #include "quorl-syncd/Sync.h"
 #include "quorl-syncd/Wish.h"
 #include "services/engine/BusLoop.h"
@@ -32,6 +34,8 @@ struct Options {
     std::uint64_t embeddedCapacity = wearable::embeddedCapacity;
     /// In bytes a second; 0 for none.
     std::uint64_t rateLimit = 0;
+    /// After which a sync that did not work is tried again for the first time.
+    std::chrono::seconds retryDelay{60};
 };
 
 /// The engine cannot do what a client asks for now. The text is a sentence for the user.
@@ -93,6 +97,9 @@ class Engine {
     void stop(const std::string& why);
     void finish(const Outcome& outcome);
     [[nodiscard]] std::string remember(const Wish& wish);
+    void conclude(bool success, const std::string& message);
+    void tellLastResult();
+    void tryAgainLater();
 
     void takeReport(const wearable::Reporter::Answer& answer);
     void watchWearable();
@@ -123,8 +130,10 @@ class Engine {
 
     RateLimit rate_;
     bool isStartRequested_ = false;
-    /// Did not work, and is not tried again until something changes.
+    /// Did not work, and is not tried again until something changes or some time has passed.
     std::optional<wearable::Selection> givenUp_;
+    RetryDelay retry_;
+    LastResults results_;
     /// When the preferences are thought to stay as they are for now.
     engine::BusLoop::Clock::time_point settled_;
     std::uint64_t sessions_ = 0;

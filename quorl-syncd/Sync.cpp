@@ -111,9 +111,9 @@ Outcome Sync::run() {
     } catch (const Stopped&) {
         return {Kind::Stopped, "The sync was stopped.", false};
     } catch (const std::system_error& error) {
-        return {Kind::Failed, sentence(error.code()), false};
+        return {Kind::Failed, sentence(error.code()), false, true};
     } catch (const std::exception& error) {
-        return {Kind::Failed, error.what(), false};
+        return {Kind::Failed, error.what(), false, true};
     }
 }
 

@@ -35,6 +35,8 @@ struct Outcome {
     std::string message;
     /// The music folder is no longer as the wish has it.
     bool isLibraryStale = false;
+    /// What was in the way may go away by itself.
+    bool mayPass = false;
 };
 
 /// Brings what is wished for onto a wearable.

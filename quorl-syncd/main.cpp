@@ -99,7 +99,16 @@ int main(int argc, char** argv) {
                     "bytes a second that are copied to the embedded wearable at most; 0 for no "
                     "limit")
         ->check(CLI::NonNegativeNumber);
+    std::int64_t retryDelay = options.retryDelay.count();
+    program
+        .add_option("--retry-after", retryDelay,
+                    "seconds after which a sync that did not work is tried again, twice as many "
+                    "after each further one, up to an hour; " +
+                        std::to_string(retryDelay) + " unless given")
+        ->check(CLI::Range(1, 3600));
     CLI11_PARSE(program, argc, argv);
+
+    options.retryDelay = std::chrono::seconds{retryDelay};
 
     try {
         return serve(options);

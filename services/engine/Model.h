@@ -58,7 +58,7 @@ struct EngineStatus {
     std::uint64_t rateLimit = 0;
     /// A sentence for the user: what the engine does, or what it waits for.
     std::string status;
-    /// What became of the last session; no text before the first.
+    /// What became of the last session with this wearable; no text before the first.
     bool lastSuccess = false;
     std::string lastMessage;
     /// Microseconds since 1970.

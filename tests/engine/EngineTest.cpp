@@ -1,11 +1,14 @@
 // The engine as the app meets it: over the session bus.
 
 #include "tests/engine/EngineFixture.h"
+#include "tests/engine/SlowDevice.h"
 
 #include "services/engine/Names.h"
 #include "services/wearable/AtomicFile.h"
 
 #include <sdbus-c++/sdbus-c++.h>
+
+#include <sys/file.h>
 
 #include <algorithm>
 #include <csignal>
@@ -192,13 +195,16 @@ TEST_F(Engine, BeginsAnewWhenAnotherPlaylistIsChosenInTheMiddle) {
                                       {"Other.m3u8", "#EXTM3U\n#PLAYLIST:Other\nother.mp3\n"}}));
 }
 
-TEST_F(Engine, SendsTheLastOfTenQuickChoices) {
+TEST_F(Engine, SendsTheLastOfTenQuickChoicesDuringASync) {
     for (int number = 0; number < 10; ++number) {
         const auto name = std::to_string(number);
         music_.write(name + ".mp3", std::string(200'000, 'x') + name);
         music_.list({name + ".mp3"}, "List " + name);
     }
-    start();
+    listLargeSongs();
+    start({"--rate-limit", slowly});
+    choose();
+    nextOfAssets(Kind::TaskDidUpdate);
 
     for (int number = 0; number < 10; ++number) {
         limitTo(1000 - static_cast<std::uint64_t>(number), LimitType::Songs);
@@ -210,8 +216,8 @@ TEST_F(Engine, SendsTheLastOfTenQuickChoices) {
                get(lastFullySentAssetSyncPlaylistPersistentID) == idOf("List 9");
     });
     recorder_.awaitStatus(upToDate);
-    EXPECT_EQ(onWearable().size(), 2);
-    EXPECT_EQ(onWearable().count("9.mp3"), 1);
+    EXPECT_EQ(onWearable(), (Contents{{"9.mp3", std::string(200'000, 'x') + "9"},
+                                      {"List 9.m3u8", "#EXTM3U\n#PLAYLIST:List 9\n9.mp3\n"}}));
 }
 
 TEST_F(Engine, RecordsTheRevisionThatItHasSentAndSendsTheNewOneAfterwards) {
@@ -328,6 +334,69 @@ TEST_F(Engine, SaysThatThereIsNotEnoughSpaceAndTellsTheSizes) {
     EXPECT_THAT(finished.message, HasSubstr("not enough space"));
     recorder_.awaitStatus(finished.message);
     EXPECT_TRUE(onWearable().empty());
+}
+
+TEST_F(Engine, TriesAgainByItselfWhatDidNotWork) {
+    listLargeSongs();
+    std::filesystem::create_directories(wearable_);
+    auto others = wearable::openDirectory(wearable::openRoot(wearable_.c_str()).get(),
+                                          wearable::ownDirectory);
+    ASSERT_EQ(flock(others.get(), LOCK_EX), 0);
+    start({"--retry-after", "1"});
+    choose();
+    const auto failed = sessionEnd();
+    EXPECT_THAT(failed.message, HasSubstr("Another program is syncing"));
+    recorder_.awaitStatus(failed.message);
+
+    others = {};
+
+    recorder_.next(
+        [](const Event& event) { return event.kind == Kind::SessionDidFinish && event.success; });
+    EXPECT_EQ(onWearable().size(), 4);
+}
+
+TEST_F(Engine, TellsTheLastResultAlsoAfterARestartAndOfEachWearableItsOwn) {
+    listLargeSongs();
+    start();
+    choose();
+    sessionEnd();
+    end();
+    const TemporaryDirectory other;
+
+    start();
+
+    const auto status = recorder_.client().state().engine;
+    EXPECT_TRUE(status.lastSuccess);
+    EXPECT_EQ(status.lastMessage, "3 songs synced to Velora.");
+    EXPECT_GT(status.lastTime, 0);
+    set(assetSyncEnabled, false);
+    recorder_.awaitStatus("Music sync is switched off.");
+    EXPECT_EQ(recorder_.ask(&engine::Client::setWearableDirectory, other.path().string()), "");
+    recorder_.awaitState([](const auto& state) { return state.engine.lastTime == 0; });
+    EXPECT_EQ(recorder_.client().state().engine.lastMessage, "");
+}
+
+TEST_F(Engine, AnswersWhileTheWearableStallsAndCompletesTheSyncAfterwards) {
+    SlowDevice device;
+    if (!device.isThere()) {
+        GTEST_SKIP() << "only root may mount";
+    }
+    listLargeSongs();
+    start({"--wearable", device.path()});
+    recorder_.awaitState([](const auto& state) { return state.wearable.isConnected; });
+
+    device.stall();
+    choose();
+    recorder_.next(Kind::SessionWillBegin);
+    device.awaitStalled();
+
+    EXPECT_EQ(recorder_.ask(&engine::Client::setRateLimit, 5), "");
+    EXPECT_EQ(recorder_.client().state().sessions.size(), 1);
+    EXPECT_EQ(get(lastFullySentAssetSyncPlaylistVersion), std::nullopt);
+    device.goOn();
+    EXPECT_TRUE(sessionEnd().success);
+    EXPECT_EQ(whatIsWrongWith(device.path()), "");
+    EXPECT_EQ(get(lastFullySentAssetSyncPlaylistVersion), revisionOf("List"));
 }
 
 TEST_F(Engine, SyncsToADeviceThatIsPluggedInAndNoticesWhenItGoes) {

@@ -1,0 +1,72 @@
+// What the engine remembers of its syncs, and when it tries again.
+
+#include "quorl-syncd/LastResults.h"
+#include "quorl-syncd/RetryDelay.h"
+#include "tests/wearable/TemporaryDirectory.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+using namespace quorl::syncd;
+using namespace std::chrono_literals;
+using quorl::wearable::testing::TemporaryDirectory;
+
+const LastResult sent{true, "3 songs synced to Velora.", 1'700'000'000'000'000};
+const LastResult full{false, "The Velora is full.", 1'700'000'001'000'000};
+
+class Results : public ::testing::Test {
+  protected:
+    TemporaryDirectory folder_;
+    std::filesystem::path place_ = folder_.path() / "state/quorl";
+};
+
+TEST_F(Results, AreThereForEachWearableWhenTheFileIsReadAgain) {
+    {
+        LastResults results{place_};
+        EXPECT_EQ(results.of("/one"), LastResult{});
+        results.remember("/one", full);
+        results.remember("/two", full);
+        results.remember("/one", sent);
+        EXPECT_EQ(results.of("/one"), sent);
+    }
+    const LastResults results{place_};
+    EXPECT_EQ(results.of("/one"), sent);
+    EXPECT_EQ(results.of("/two"), full);
+    EXPECT_EQ(results.of("/three"), LastResult{});
+}
+
+TEST_F(Results, AFileThatCannotBeReadIsReplacedByTheNextResult) {
+    folder_.write("state/quorl/last-sync.json", "{\"/one\": {\"success\": tr");
+    LastResults results{place_};
+    EXPECT_EQ(results.of("/one"), LastResult{});
+
+    results.remember("/one", sent);
+
+    EXPECT_EQ(LastResults{place_}.of("/one"), sent);
+}
+
+TEST_F(Results, AResultOfTheWrongShapeCountsAsNone) {
+    folder_.write("state/quorl/last-sync.json", R"({"/one": {"success": "yes"}})");
+    EXPECT_EQ(LastResults{place_}.of("/one"), LastResult{});
+}
+
+TEST_F(Results, AreRememberedForThisRunWhereTheyCannotBeWritten) {
+    folder_.write("state", "a file in the place of the directory");
+    LastResults results{place_};
+
+    EXPECT_THROW(results.remember("/one", sent), std::system_error);
+
+    EXPECT_EQ(results.of("/one"), sent);
+}
+
+TEST(Delay, DoublesAfterEachFailureUpToAnHourAndBeginsAnewAfterASuccess) {
+    RetryDelay delay{60s};
+    for (const auto expected : {60s, 120s, 240s, 480s, 960s, 1920s, 3600s, 3600s}) {
+        EXPECT_EQ(delay.next(), expected);
+    }
+    delay.reset();
+    EXPECT_EQ(delay.next(), 60s);
+}
+
+} // namespace

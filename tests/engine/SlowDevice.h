@@ -1,0 +1,52 @@
+#pragma once
+
+#include "services/media/FileDescriptor.h"
+#include "tests/wearable/TemporaryDirectory.h"
+
+#include <condition_variable>
+#include <mutex>
+#include <thread>
+
+namespace quorl::syncd::testing {
+
+/// A mounted file system on which every opening of a file can be held up. Wants the rights to mount
+/// and to watch; all that is held up goes on when it is destroyed.
+class SlowDevice {
+  public:
+    SlowDevice();
+    ~SlowDevice();
+
+    SlowDevice(const SlowDevice&) = delete;
+    SlowDevice& operator=(const SlowDevice&) = delete;
+
+    /// False: the rights are not there.
+    [[nodiscard]] bool isThere() const { return watch_ && end_; }
+
+    [[nodiscard]] std::string path() const { return folder_.path().string(); }
+
+    /// Holds up whoever opens a file on the device from now on; not for the test itself.
+    void stall();
+
+    /// Waits until somebody is held up.
+    void awaitStalled();
+
+    /// Has all go on.
+    void goOn();
+
+  private:
+    void answer();
+
+    wearable::testing::TemporaryDirectory folder_;
+    bool isMounted_ = false;
+    media::FileDescriptor watch_;
+    media::FileDescriptor end_;
+
+    std::mutex mutex_;
+    std::condition_variable changed_;
+    bool isStalling_ = false;
+    bool isSomebodyWaiting_ = false;
+
+    std::jthread thread_;
+};
+
+} // namespace quorl::syncd::testing
