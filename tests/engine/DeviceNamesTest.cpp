@@ -11,7 +11,6 @@ namespace {
 
 using namespace quorl::syncd;
 using ::testing::EndsWith;
-using ::testing::StartsWith;
 
 struct Named {
     std::string song;

@@ -11,10 +11,7 @@ namespace {
 
 using namespace quorl::syncd;
 using namespace quorl::syncd::testing;
-using ::testing::Contains;
 using ::testing::IsEmpty;
-using ::testing::Key;
-using ::testing::Not;
 using Kind = Outcome::Kind;
 
 class SyncedWearable : public ::testing::Test {

@@ -3,8 +3,11 @@
 #include <gmock/gmock.h>
 #include <nlohmann/json.hpp>
 
+#include "services/engine/Client.h"
+#include "tests/engine/Process.h"
 #include "tests/quorl/Music.h"
 #include "tests/quorl/Program.h"
+#include "tests/quorl/Window.h"
 
 namespace quorl::tests {
 
@@ -15,8 +18,8 @@ using testing::HasSubstr;
 /// The real engine beside the real app, on a bus of their own.
 class WithEngine : public testing::Test {
   protected:
-    WithEngine() {
-        engine_.start(QStringLiteral(QUORL_ENGINE), QStringList());
+    explicit WithEngine(const QStringList& options = {}) {
+        engine_.start(QStringLiteral(QUORL_ENGINE), options);
         if (!engine_.waitForStarted()) {
             throw std::runtime_error("the engine does not start");
         }
@@ -39,6 +42,73 @@ class WithEngine : public testing::Test {
     Music music_;
     QProcess engine_;
 };
+
+/// A sync of "Road Trip" takes longer than any test.
+class WithSlowEngine : public WithEngine {
+  protected:
+    WithSlowEngine() : WithEngine({QStringLiteral("--rate-limit"), QStringLiteral("20000")}) {}
+
+    /// Chooses "Road Trip" in `quorl`, and waits until its songs are being copied.
+    static void choose(Program& quorl) {
+        quorl.say("1");
+        quorl.say("2");
+        quorl.readUntil("% Synced…");
+    }
+};
+
+TEST_F(WithSlowEngine, appThatIsKilledAndOpenedAgainShowsTheRunningSessionToItsEnd) {
+    {
+        Program quorl(arguments("--text"));
+        choose(quorl);
+        quorl.kill();
+    }
+    Window window(music_.path());
+    window.press(Qt::Key_Return);
+    EXPECT_TRUE(window.waitForRow(QRegularExpression("✓ Road Trip: [0-9]+% Synced…")));
+    EXPECT_FALSE(std::filesystem::exists(onWearable("Road Trip.m3u8")));
+
+    engine::Listener listener;
+    engine::Client client(listener);
+    client.setRateLimit(0);
+
+    EXPECT_TRUE(window.waitForRow(QRegularExpression("✓ Road Trip: Synced")));
+    EXPECT_TRUE(std::filesystem::exists(onWearable("Road Trip.m3u8")));
+}
+
+TEST_F(WithSlowEngine, engineThatIsKilledLeavesNoSessionOnTheScreen) {
+    Program quorl(arguments("--text"));
+    choose(quorl);
+    engine_.kill();
+    quorl.readUntil("  2  ✓ Road Trip: Sync Pending…\n");
+    quorl.say("b");
+    quorl.say("b");
+    quorl.readUntil("The sync engine is not running");
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST(WithBusOfItsOwn, busThatGoesAwayIsToldAndTheAppNeitherEndsNorSpins) {
+    const Music music;
+    syncd::testing::SecondBus bus;
+    Program quorl({"--text", "--music", music.path()},
+                  {{"DBUS_SESSION_BUS_ADDRESS", bus.address()}});
+    quorl.say("1");
+    quorl.readUntil("  3  ✓ None\n");
+
+    bus.kill();
+
+    quorl.readErrorsUntil("quorl: The session bus is gone");
+    std::optional<std::string> before;
+    int tries = 0;
+    do {
+        before = quorl.wakeUpsOfSleepingThreads();
+        quorl.say("?");
+        quorl.readUntil("A number taps the row");
+    } while ((!before || before != quorl.wakeUpsOfSleepingThreads()) && ++tries < 1000);
+    EXPECT_LT(tries, 1000) << "a thread is still busy";
+    quorl.say("2");
+    quorl.readErrorsUntil("was not changed. There is no session bus");
+    EXPECT_EQ(quorl.end(), 0);
+}
 
 TEST_F(WithEngine, chosenPlaylistIsSyncedOnlyWhenItIsOnTheWearable) {
     Program quorl(arguments("--text"));

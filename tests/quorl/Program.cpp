@@ -1,5 +1,7 @@
 #include "tests/quorl/Program.h"
 
+#include <filesystem>
+#include <fstream>
 #include <stdexcept>
 
 namespace quorl::tests {
@@ -69,19 +71,51 @@ void Program::takeOutput() {
 }
 
 std::string Program::readUntil(const std::string& text) {
+    return take(output_, QProcess::StandardOutput, text);
+}
+
+std::string Program::readErrorsUntil(const std::string& text) {
+    return take(errors_, QProcess::StandardError, text);
+}
+
+std::string Program::take(std::string& from, QProcess::ProcessChannel channel,
+                          const std::string& text) {
+    process_.setReadChannel(channel);
     takeOutput();
-    auto found = output_.find(text);
+    auto found = from.find(text);
     while (found == std::string::npos) {
         if (!process_.waitForReadyRead(patience)) {
             throw std::runtime_error("quorl has not written \"" + text + "\" but: " + output_ +
                                      errors_);
         }
         takeOutput();
-        found = output_.find(text);
+        found = from.find(text);
     }
-    std::string read = output_.substr(0, found + text.size());
-    output_.erase(0, found + text.size());
+    std::string read = from.substr(0, found + text.size());
+    from.erase(0, found + text.size());
     return read;
+}
+
+std::optional<std::string> Program::wakeUpsOfSleepingThreads() const {
+    const auto id = std::to_string(process_.processId());
+    std::string wakeUps;
+    for (const auto& thread : std::filesystem::directory_iterator("/proc/" + id + "/task")) {
+        std::ifstream status(thread.path() / "status");
+        for (std::string line; thread.path().filename() != id && std::getline(status, line);) {
+            if (line.starts_with("State:") && line.find("sleeping") == std::string::npos) {
+                return std::nullopt;
+            }
+            if (line.find("ctxt_switches:") != std::string::npos) {
+                wakeUps += thread.path().filename().string() + ' ' + line + '\n';
+            }
+        }
+    }
+    return wakeUps;
+}
+
+void Program::kill() {
+    process_.kill();
+    process_.waitForFinished(patience);
 }
 
 int Program::end() {

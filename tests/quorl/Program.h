@@ -1,6 +1,7 @@
 #pragma once
 
 #include <map>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -27,6 +28,16 @@ class Program {
     /// back all up to and with that.
     std::string readUntil(const std::string& text);
 
+    /// The same for its standard error.
+    std::string readErrorsUntil(const std::string& text);
+
+    /// Ends it at once, as SIGKILL does, and waits for that.
+    void kill();
+
+    /// How often each of its threads was awake so far, other than the main thread; nothing while
+    /// one of them is.
+    [[nodiscard]] std::optional<std::string> wakeUpsOfSleepingThreads() const;
+
     /// Closes its input, waits for its end and gives back how it ended: the exit code.
     int end();
 
@@ -37,6 +48,7 @@ class Program {
 
   private:
     void takeOutput();
+    std::string take(std::string& from, QProcess::ProcessChannel channel, const std::string& text);
 
     QProcess process_;
     std::string output_;

@@ -10,15 +10,17 @@ namespace {
 
 constexpr int patience = 60'000; // milliseconds
 
-Options optionsFor(const Music& music) {
+Options optionsFor(const std::filesystem::path& music) {
     Options options;
-    options.music = music.path();
+    options.music = music;
     return options;
 }
 
 } // namespace
 
-Window::Window() : companion_(optionsFor(music_), screen_, notices_), window_(companion_, screen_) {
+Window::Window(const std::filesystem::path& music)
+    : companion_(optionsFor(music.empty() ? music_.folder().path() : music), screen_, notices_),
+      window_(companion_, screen_) {
     window_.resize(360, 720);
     companion_.start();
     window_.show();
@@ -42,7 +44,12 @@ void Window::press(Qt::Key key) {
 }
 
 bool Window::waitForRow(const QString& text) {
-    return QTest::qWaitFor([this, &text] { return rows().contains(text); }, patience);
+    return waitForRow(QRegularExpression(QRegularExpression::escape(text)));
+}
+
+bool Window::waitForRow(const QRegularExpression& pattern) {
+    const QRegularExpression whole(QRegularExpression::anchoredPattern(pattern.pattern()));
+    return QTest::qWaitFor([this, &whole] { return rows().indexOf(whole) >= 0; }, patience);
 }
 
 QStringList Window::rows() {

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <QRegularExpression>
+
 #include "quorl/MainWindow.h"
 #include "tests/quorl/Music.h"
 
@@ -8,8 +10,9 @@ namespace quorl::tests {
 /// The app's window over a music folder of its own, with the real plug-in and the real services.
 class Window {
   public:
-    /// Shows the window, phone-sized, and waits until the music folder has been read.
-    Window();
+    /// Shows the window, phone-sized, and waits until the music folder has been read: the one
+    /// given here, or one of its own.
+    explicit Window(const std::filesystem::path& music = {});
 
     [[nodiscard]] Music& music() { return music_; }
 
@@ -31,6 +34,9 @@ class Window {
     /// Runs the event loop until the top pane has this among its `rows`; false where that does not
     /// come.
     [[nodiscard]] bool waitForRow(const QString& text);
+
+    /// The same for a row that as a whole is like the pattern.
+    [[nodiscard]] bool waitForRow(const QRegularExpression& pattern);
 
     /// The rows on the screen: "title", "title: value", and "✓ " before one that is checked.
     [[nodiscard]] QStringList rows();
