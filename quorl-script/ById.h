@@ -14,7 +14,7 @@ template <class T, class Id>
     if (found == objects.end()) {
         return nullptr;
     }
-    const auto object = *found;
+    auto object = *found;
     objects.erase(found);
     return object;
 }

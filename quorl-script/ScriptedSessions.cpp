@@ -73,7 +73,7 @@ std::shared_ptr<ScriptedSession> ScriptedSessions::find(const std::string& id) c
         }
     }
     for (const auto& reference : earlier_) {
-        if (const auto session = reference.lock(); session && session->id() == id) {
+        if (auto session = reference.lock(); session && session->id() == id) {
             return session;
         }
     }

@@ -11,7 +11,7 @@ namespace quorl {
 
 namespace {
 
-constexpr const char* indent = "      ";
+constexpr const char* rowIndent = "      ";
 
 std::string textOfLabel(const UILabel& label) {
     return media::printable(label.text().value_or(""));
@@ -44,7 +44,7 @@ std::string textOfSection(const PaneContent& content, const PaneContent::Section
         }
     }
     if (section.footer && !section.footer->empty()) {
-        text += wrapped(media::printable(*section.footer), width, indent);
+        text += wrapped(media::printable(*section.footer), width, rowIndent);
     }
     return text;
 }
@@ -73,14 +73,15 @@ std::string wrapped(const std::string& text, int width, const std::string& inden
     std::string lines;
     std::string line;
     for (std::string word; words >> word;) {
-        const auto length = QString::fromStdString(indent + line + ' ' + word).size();
-        if (!line.empty() && length > width) {
-            lines += indent + line + '\n';
-            line.clear();
+        std::string longer = line.empty() ? indent : line + ' ';
+        longer += word;
+        if (!line.empty() && QString::fromStdString(longer).size() > width) {
+            lines += line + '\n';
+            longer = indent + word;
         }
-        line += (line.empty() ? "" : " ") + word;
+        line.swap(longer);
     }
-    return line.empty() ? lines : lines + indent + line + '\n';
+    return line.empty() ? lines : lines + line + '\n';
 }
 
 std::string textOf(const PaneContent& content, int width) {

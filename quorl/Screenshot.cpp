@@ -10,8 +10,8 @@
 
 namespace quorl {
 
-Screenshot::Screenshot(const Options& options, Companion& companion, MainWindow& window)
-    : options_(options), companion_(companion), window_(window) {
+Screenshot::Screenshot(Options options, Companion& companion, MainWindow& window)
+    : options_(std::move(options)), companion_(companion), window_(window) {
     connect(&companion, &Companion::idle, this, &Screenshot::beginWhenSettled);
 }
 

@@ -13,7 +13,7 @@ class Screenshot final : public QObject {
 
   public:
     /// Both outlive the picture.
-    Screenshot(const Options& options, Companion& companion, MainWindow& window);
+    Screenshot(Options options, Companion& companion, MainWindow& window);
 
   private:
     void beginWhenSettled();

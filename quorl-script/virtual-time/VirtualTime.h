@@ -60,13 +60,13 @@ class VirtualTime {
     // is none of theirs and libdispatch is to be asked.
 
     void async(void* context, dispatch_function_t work);
-    void after(dispatch_time_t when, dispatch_queue_t queue, void* context,
+    void after(dispatch_time_t when, dispatch_queue_t target, void* context,
                dispatch_function_t work);
     [[nodiscard]] dispatch_time_t time(dispatch_time_t when, std::int64_t delta) const;
     [[nodiscard]] dispatch_source_t createTimer(dispatch_queue_t queue);
-    bool setTimer(dispatch_source_t source, dispatch_time_t start, std::uint64_t interval,
+    bool setTimer(dispatch_source_t object, dispatch_time_t start, std::uint64_t interval,
                   std::uint64_t leeway);
-    bool setHandler(dispatch_source_t source, dispatch_function_t handler);
+    bool setHandler(dispatch_source_t object, dispatch_function_t handler);
     bool setContext(const void* object, void* context);
     bool setFinalizer(const void* object, dispatch_function_t finalizer);
     bool resume(const void* object);
@@ -83,7 +83,8 @@ class VirtualTime {
         Nanoseconds due;
         std::uint64_t order;
 
-        [[nodiscard]] auto operator<=>(const Moment&) const = default;
+        // The check takes the defaulted comparison with zero for a pointer.
+        [[nodiscard]] auto operator<=>(const Moment&) const = default; // NOLINT(modernize-use-nullptr)
     };
 
     using Work = std::function<void()>;
@@ -94,7 +95,7 @@ class VirtualTime {
     void tell(std::string_view function, std::initializer_list<std::uint64_t> figures) const;
     [[nodiscard]] std::uint64_t fromNow(dispatch_time_t when) const;
     [[nodiscard]] std::shared_ptr<Source> find(const void* object) const;
-    void queue(dispatch_queue_t queue, Work work);
+    void queue(dispatch_queue_t target, Work work);
     void arm(Moment moment, Work fire);
     void arm(const std::shared_ptr<Source>& source);
     void disarm(Source& source);

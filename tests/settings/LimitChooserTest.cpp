@@ -12,7 +12,6 @@ using quorl::tests::checked;
 using quorl::tests::row;
 using quorl::tests::TablePaneTest;
 using testing::ElementsAre;
-using testing::IsEmpty;
 
 class LimitChooser : public TablePaneTest {
   protected:

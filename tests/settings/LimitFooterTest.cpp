@@ -12,7 +12,6 @@ using quorl::SyncPreference;
 using quorl::tests::PaneTest;
 using quorl::tests::runQueuedWork;
 using testing::ElementsAre;
-using testing::IsEmpty;
 using testing::StartsWith;
 
 constexpr std::uint64_t megabyte = 1ULL << 20U;

@@ -15,7 +15,6 @@ using quorl::SyncPreference;
 using quorl::tests::PaneTest;
 using quorl::tests::runMainQueuePast;
 using quorl::tests::runQueuedWork;
-using quorl::tests::TestHost;
 using std::chrono::milliseconds;
 using testing::Contains;
 using testing::ElementsAre;

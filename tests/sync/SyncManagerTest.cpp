@@ -17,7 +17,6 @@ using quorl::tests::runMainQueueUntil;
 using quorl::tests::runQueuedWork;
 using quorl::tests::TestHost;
 using quorl::tests::TestPlaylist;
-using quorl::tests::TestSession;
 using quorl::tests::TestTask;
 using testing::ElementsAre;
 using testing::IsEmpty;
