@@ -94,9 +94,11 @@ void addPictureOptions(CLI::App& app, Options& options) {
                                                             {"playlist", Options::Pane::Playlist},
                                                             {"limit", Options::Pane::Limit},
                                                             {"front", Options::Pane::Front}};
-    app.add_option("--pane", options.pane, "Picture this pane (default root)")
+    app.add_option_function<std::string>(
+           "--pane", [&options](const std::string& name) { options.pane = panes.at(name); },
+           "Picture this pane (default root)")
         ->type_name("root|playlist|limit|front")
-        ->transform(CLI::CheckedTransformer(panes).description(""))
+        ->check(CLI::IsMember(panes).description(""))
         ->needs(screenshot);
 }
 

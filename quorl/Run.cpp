@@ -5,6 +5,7 @@
 #include <optional>
 
 #include <QApplication>
+#include <QCursor>
 #include <QLocale>
 
 #include "quorl/MainWindow.h"
@@ -87,6 +88,9 @@ ExitCode takeScreenshot(char* program, const Options& options) {
     Arguments arguments(program);
     QApplication application(arguments.count, arguments.values.data());
     followUsersLanguage();
+    if (QGuiApplication::platformName() == QStringLiteral("offscreen")) {
+        QCursor::setPos(options.width, options.height); // nobody's pointer, out of the picture
+    }
     if (options.dark) {
         QApplication::setPalette(darkPalette());
     }

@@ -84,7 +84,8 @@ class VirtualTime {
         std::uint64_t order;
 
         // The check takes the defaulted comparison with zero for a pointer.
-        [[nodiscard]] auto operator<=>(const Moment&) const = default; // NOLINT(modernize-use-nullptr)
+        // NOLINTNEXTLINE(modernize-use-nullptr)
+        [[nodiscard]] auto operator<=>(const Moment&) const = default;
     };
 
     using Work = std::function<void()>;
