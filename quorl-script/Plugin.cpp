@@ -1,8 +1,5 @@
 #include "quorl-script/Plugin.h"
 
-#include <algorithm>
-#include <cstdlib>
-
 #include "platform/MediaLibrary.h"
 #include "platform/SyncPreferences.h"
 #include "quorl-script/Field.h"
@@ -33,27 +30,7 @@ using CountOfManager = NSUInteger(const LMQuorlSyncManager*);
 using PlaylistOfDefaults = std::shared_ptr<MPMediaPlaylist>(LMSyncDefaults&);
 using LayOutCell = void(UITableViewCell*);
 
-std::filesystem::path homeDirectory() {
-    const char* home = std::getenv("HOME");
-    return home ? home : "";
-}
-
 } // namespace
-
-std::vector<std::filesystem::path> pluginDirectories(const std::filesystem::path& preferred) {
-    std::error_code ignored; // without /proc the other places remain
-    const auto program = std::filesystem::read_symlink("/proc/self/exe", ignored);
-    const auto prefix = program.parent_path().parent_path();
-    std::vector<std::filesystem::path> directories;
-    for (const auto& directory :
-         {preferred, prefix / "lib/quorl/plugins", prefix / QUORL_LIBDIR "/quorl/plugins",
-          homeDirectory() / ".local/lib/quorl/plugins"}) {
-        if (!directory.empty() && std::ranges::find(directories, directory) == directories.end()) {
-            directories.push_back(directory);
-        }
-    }
-    return directories;
-}
 
 Plugin Plugin::load(const std::vector<std::filesystem::path>& directories) {
     const auto bundles = findBundles(directories);

@@ -6,11 +6,6 @@
 
 namespace quorl {
 
-/// The directories that plug-ins are looked for in, the first one first. `preferred` is put before
-/// the others unless it is empty.
-[[nodiscard]] std::vector<std::filesystem::path>
-pluginDirectories(const std::filesystem::path& preferred);
-
 /// The plug-in under trial and what of its own a script may ask. Main thread; wants an installed
 /// host.
 class Plugin {

@@ -2,6 +2,7 @@
 
 #include "quorl/FrontPage.h"
 #include "quorl/PaneLoader.h"
+#include "runtime/PluginBundle.h"
 
 namespace quorl {
 

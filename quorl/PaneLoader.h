@@ -14,11 +14,6 @@ struct PaneProblem {
 
 using LoadedPane = std::variant<Class, PaneProblem>;
 
-/// The directories that plug-ins are looked for in, the first one first. `preferred` is put before
-/// the others unless it is empty.
-[[nodiscard]] std::vector<std::filesystem::path>
-pluginDirectories(const std::filesystem::path& preferred);
-
 /// The class of the root pane of the first bundle in `directories`.
 [[nodiscard]] LoadedPane loadPane(const std::vector<std::filesystem::path>& directories);
 

@@ -1,6 +1,7 @@
 #include "runtime/PluginBundle.h"
 
 #include <algorithm>
+#include <cstdlib>
 #include <fstream>
 
 #include <dlfcn.h>
@@ -124,6 +125,22 @@ PluginBundle::localizedStringForKey_value_table(const std::string& key,
         return *text;
     }
     return value && !value->empty() ? *value : key;
+}
+
+std::vector<std::filesystem::path> pluginDirectories(const std::filesystem::path& preferred) {
+    std::error_code ignored; // without /proc the other places remain
+    const auto program = std::filesystem::read_symlink("/proc/self/exe", ignored);
+    const auto prefix = program.parent_path().parent_path();
+    const char* const home = std::getenv("HOME");
+    std::vector<std::filesystem::path> directories;
+    for (const auto& directory :
+         {preferred, prefix / "lib/quorl/plugins", prefix / QUORL_LIBDIR "/quorl/plugins",
+          std::filesystem::path(home ? home : "") / ".local/lib/quorl/plugins"}) {
+        if (!directory.empty() && std::ranges::find(directories, directory) == directories.end()) {
+            directories.push_back(directory);
+        }
+    }
+    return directories;
 }
 
 std::vector<std::filesystem::path>

@@ -67,6 +67,11 @@ class PluginBundle : public NSBundle {
     mutable void* handle_ = nullptr;
 };
 
+/// The directories that plug-ins are looked for in, the first one first: `preferred` unless it is
+/// empty, then those beside this program's own directory, then that of the user.
+[[nodiscard]] std::vector<std::filesystem::path>
+pluginDirectories(const std::filesystem::path& preferred);
+
 /// The directories named `*.bundle` in `directories`, in the order of those and then by name. A
 /// directory that does not exist holds none.
 [[nodiscard]] std::vector<std::filesystem::path>

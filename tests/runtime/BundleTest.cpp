@@ -335,6 +335,20 @@ TEST_F(Bundles, OfferTheSymbolsOfTheirLoadedCode) {
     EXPECT_EQ(opened->symbol("QuorlClass_OtherPane"), nullptr);
 }
 
+TEST_F(Bundles, AreLookedForWhereOneIsToldThenBesideTheProgramThenInTheHomeDirectory) {
+    const path beside =
+        std::filesystem::read_symlink("/proc/self/exe").parent_path().parent_path() /
+        "lib/quorl/plugins";
+    const path home = path(std::getenv("HOME")) / ".local/lib/quorl/plugins";
+
+    const auto told = quorl::pluginDirectories("/told");
+    EXPECT_EQ(told.front(), "/told");
+    EXPECT_EQ(told.at(1), beside);
+    EXPECT_EQ(told.back(), home);
+    EXPECT_EQ(quorl::pluginDirectories("").front(), beside);
+    EXPECT_EQ(quorl::pluginDirectories(beside), quorl::pluginDirectories("")) << "each once";
+}
+
 TEST_F(Bundles, AreFoundByDirectoryThenByName) {
     const path first = directory_.path() / "first";
     const path second = directory_.path() / "second";
