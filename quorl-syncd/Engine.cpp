@@ -195,9 +195,18 @@ void Engine::watchWearable() {
     });
     loop_.watch(mountWatch_->descriptor(), POLLPRI, [this] {
         if (mountWatch_->take()) {
-            refreshWearable();
+            mountsDidChange();
         }
     });
+}
+
+/// A directory that once was a mounted wearable is none without it.
+void Engine::mountsDidChange() {
+    if (!wearable_.isMountPoint && wearable::isMountPoint(wearable_.root)) {
+        setWearableDirectory(wearable_.root);
+    } else {
+        refreshWearable();
+    }
 }
 
 void Engine::unwatchWearable() {

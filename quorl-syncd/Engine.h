@@ -103,6 +103,7 @@ class Engine {
 
     void takeReport(const wearable::Reporter::Answer& answer);
     void watchWearable();
+    void mountsDidChange();
     void unwatchWearable();
     void publish();
 

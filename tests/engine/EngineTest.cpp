@@ -9,6 +9,7 @@
 #include <sdbus-c++/sdbus-c++.h>
 
 #include <sys/file.h>
+#include <sys/mount.h>
 
 #include <algorithm>
 #include <csignal>
@@ -421,6 +422,24 @@ TEST_F(Engine, SyncsToADeviceThatIsPluggedInAndNoticesWhenItGoes) {
     std::filesystem::remove_all(device);
     recorder_.awaitState([](const auto& state) { return !state.wearable.isConnected; });
     EXPECT_TRUE(onWearable().empty()) << "the embedded one is left alone";
+}
+
+TEST_F(Engine, DoesNotTakeTheDirectoryBelowForADeviceThatWasMountedAndIsGone) {
+    listLargeSongs();
+    const TemporaryDirectory place;
+    start({"--wearable", place.path()});
+    recorder_.awaitState([](const auto& state) { return state.wearable.isConnected; });
+    if (mount("tmpfs", place.path().c_str(), "tmpfs", 0, "size=16m") != 0) {
+        GTEST_SKIP() << "only root may mount";
+    }
+    recorder_.awaitState([](const auto& state) { return state.wearable.capacity == 16 << 20; });
+    choose();
+    EXPECT_TRUE(sessionEnd().success);
+
+    ASSERT_EQ(umount2(place.path().c_str(), MNT_DETACH), 0);
+
+    recorder_.awaitState([](const auto& state) { return !state.wearable.isConnected; });
+    EXPECT_TRUE(contentsOf(place.path()).empty());
 }
 
 TEST_F(Engine, TakesAnotherMusicFolderAtRunTime) {
