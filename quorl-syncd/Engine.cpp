@@ -174,7 +174,7 @@ void Engine::refreshWearable() {
 
 void Engine::takeReport(const wearable::Reporter::Answer& answer) {
     if (const auto* const report = std::get_if<wearable::Report>(&answer)) {
-        if (!report_ || report_->available < report->available) {
+        if (!report_) {
             givenUp_.reset();
         }
         report_ = *report;
