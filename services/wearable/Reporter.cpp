@@ -1,6 +1,5 @@
 #include "services/wearable/Reporter.h"
 
-#include <algorithm>
 #include <condition_variable>
 #include <cstdint>
 #include <deque>
@@ -122,14 +121,15 @@ class Reporter::Desk : public std::enable_shared_from_this<Desk> {
     }
 
     void lookFor(std::uint64_t number) {
-        auto answer = answerOf(look_);
+        const auto answer = answerOf(look_);
         {
             const std::scoped_lock lock{mutex_};
             --lookers_;
-            const auto question = std::ranges::find(questions_, number, &Question::number);
-            if (question != questions_.end()) {
-                answered_.push_back({std::move(question->reply), std::move(answer)});
-                questions_.erase(question);
+            // Whoever asked before gets this answer too: an earlier look that ends later would tell
+            // what is no longer true.
+            while (!questions_.empty() && questions_.front().number <= number) {
+                answered_.push_back({std::move(questions_.front().reply), answer});
+                questions_.pop_front();
             }
         }
         changed_.notify_one();

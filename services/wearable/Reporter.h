@@ -20,8 +20,8 @@ class Reporter {
     /// The figures, or a sentence for the user that says why there are none.
     using Answer = std::variant<Report, std::string>;
 
-    /// Called exactly once, on a thread of the reporter's own, one call at a time. Must not throw,
-    /// nor destroy the reporter.
+    /// Called exactly once, on a thread of the reporter's own, one call at a time and in the order
+    /// of the questions. Must not throw, nor destroy the reporter.
     using Reply = std::function<void(const Answer&)>;
 
     /// Looks at the device. Called on threads that may outlive the reporter, several at a time, so

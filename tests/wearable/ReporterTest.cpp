@@ -97,6 +97,33 @@ TEST(Reporter, AnswersWithASentenceWhenTheDeviceGoesInTheMiddleOfTheQuestion) {
     EXPECT_THAT(std::get<std::string>(asked.answer()), ::testing::HasSubstr("cannot be reached"));
 }
 
+TEST(Reporter, NeverAnswersWithAnEarlierLookAfterALaterOne) {
+    struct Device {
+        std::atomic<int> looks = 0;
+        std::latch isLookedAt{1};
+        std::counting_semaphore<> release{0};
+    };
+
+    const auto device = std::make_shared<Device>();
+    Reporter reporter{[device] {
+                          if (device->looks++ > 0) {
+                              return Report{2, 2, 2, {}};
+                          }
+                          device->isLookedAt.count_down();
+                          device->release.acquire();
+                          return Report{1, 1, 1, {}};
+                      },
+                      forever};
+    Asked first{reporter};
+    device->isLookedAt.wait();
+
+    Asked second{reporter};
+
+    EXPECT_EQ(std::get<Report>(second.answer()).capacity, 2);
+    EXPECT_EQ(std::get<Report>(first.answer()).capacity, 2);
+    device->release.release();
+}
+
 TEST(Reporter, AnswersEveryQuestionInTimeThoughTheDeviceHangs) {
     const auto device = std::make_shared<Hanging>();
     Reporter reporter{device->look(device), 1ms};
