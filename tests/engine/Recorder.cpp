@@ -46,13 +46,18 @@ void Recorder::awaitStatus(const std::string& status) {
 
 void Recorder::awaitState(const std::function<bool(const engine::State&)>& isWanted) {
     std::unique_lock lock{mutex_};
-    // Each change of the state is followed by an event.
-    more_.wait(lock, [&] {
+    for (;;) {
+        // Each change of the state is followed by an event; one that comes while the state is
+        // looked at has it looked at again.
+        const auto seen = events_.size();
         lock.unlock();
-        const bool is = client_ && isWanted(client_->state());
+        const bool is = isWanted(client_->state());
         lock.lock();
-        return is;
-    });
+        if (is) {
+            return;
+        }
+        more_.wait(lock, [&] { return events_.size() > seen; });
+    }
 }
 
 std::vector<Event> Recorder::all() {
