@@ -1,9 +1,9 @@
 #include <iostream>
 
-#include "quorl/CommandLine.h"
-#include "quorl/LibraryReport.h"
-#include "quorl/Run.h"
-#include "quorl/StatusReport.h"
+#include "quorl/app/CommandLine.h"
+#include "quorl/reports/LibraryReport.h"
+#include "quorl/app/Run.h"
+#include "quorl/reports/StatusReport.h"
 
 namespace {
 

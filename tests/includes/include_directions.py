@@ -116,7 +116,7 @@ class PlantedInclude(unittest.TestCase):
         "settings/Pane.h",
         "runtime/Loader.h",
         "services/media/MusicFolder.h",
-        "quorl/MainWindow.h",
+        "quorl/window/MainWindow.h",
         "quorl-script/Script.h",
     )
 
@@ -161,7 +161,7 @@ class PlantedInclude(unittest.TestCase):
         ("quorl/A.cpp", '"sync/SyncManager.h"'),
         ("quorl/A.cpp", '"settings/Pane.h"'),
         ("quorl/A.cpp", '"quorl-script/Script.h"'),
-        ("quorl-script/A.cpp", '"quorl/MainWindow.h"'),
+        ("quorl-script/A.cpp", '"quorl/window/MainWindow.h"'),
         ("quorl-syncd/A.cpp", '"../quorl/MainWindow.h"'),
         ("quorl/A.cpp", '"tests/Fake.h"'),
         ("elsewhere/A.cpp", "<vector>"),

@@ -1,6 +1,6 @@
 #include <gmock/gmock.h>
 
-#include "quorl/RowTexts.h"
+#include "quorl/window/RowTexts.h"
 
 namespace quorl::tests {
 

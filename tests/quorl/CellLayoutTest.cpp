@@ -4,9 +4,9 @@
 
 #include <QImage>
 
-#include "quorl/CellPainter.h"
-#include "quorl/CompanionHost.h"
-#include "quorl/WindowScreen.h"
+#include "quorl/window/CellPainter.h"
+#include "quorl/app/CompanionHost.h"
+#include "quorl/window/WindowScreen.h"
 
 namespace quorl::tests {
 

@@ -1,10 +1,10 @@
-#include "quorl/Library.h"
+#include "quorl/adapters/Library.h"
 
 #include <gmock/gmock.h>
 
 #include <QTest>
 
-#include "quorl/MainQueueNotifier.h"
+#include "quorl/app/MainQueueNotifier.h"
 #include "tests/quorl/Music.h"
 
 namespace quorl::tests {

@@ -3,8 +3,8 @@
 #include <QScrollBar>
 #include <QTest>
 
-#include "quorl/CompanionHost.h"
-#include "quorl/RowsView.h"
+#include "quorl/app/CompanionHost.h"
+#include "quorl/window/RowsView.h"
 
 namespace quorl::tests {
 

@@ -2,7 +2,7 @@
 
 #include <QRegularExpression>
 
-#include "quorl/MainWindow.h"
+#include "quorl/window/MainWindow.h"
 #include "tests/quorl/Music.h"
 
 namespace quorl::tests {

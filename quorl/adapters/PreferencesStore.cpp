@@ -1,0 +1,74 @@
+#include "quorl/adapters/PreferencesStore.h"
+
+#include <stdexcept>
+
+namespace quorl {
+
+namespace {
+
+using namespace preferences;
+
+/// Calls `use` with the stored preference that stands for `preference`.
+template <class Use>
+auto with(SyncPreference preference, Use use) {
+    switch (preference) {
+    case SyncPreference::AssetSyncEnabled:
+        return use(assetSyncEnabled);
+    case SyncPreference::AssetSyncPlaylistPersistentID:
+        return use(assetSyncPlaylistPersistentID);
+    case SyncPreference::AssetSyncLimitType:
+        return use(assetSyncLimitType);
+    case SyncPreference::AssetSyncLimit:
+        return use(assetSyncLimit);
+    case SyncPreference::LastFullySentAssetSyncPlaylistPersistentID:
+        return use(lastFullySentAssetSyncPlaylistPersistentID);
+    case SyncPreference::LastFullySentAssetSyncPlaylistVersion:
+        return use(lastFullySentAssetSyncPlaylistVersion);
+    }
+    throw std::invalid_argument("no such preference");
+}
+
+/// A preference that always has a value stores 0 in place of null.
+template <class T>
+T stored(const Preference<T>& /*preference*/, std::optional<std::uint64_t> value) {
+    if constexpr (std::is_same_v<T, bool>) {
+        return value.value_or(0) != 0;
+    } else if constexpr (std::is_same_v<T, std::uint64_t>) {
+        return value.value_or(0);
+    } else {
+        return value;
+    }
+}
+
+} // namespace
+
+PreferencesStore::PreferencesStore(Notices& notices) : notices_(notices) {
+    auto opened =
+        SharedPreferences::open([](SharedPreferences& /*preferences*/, const KeySet& /*keys*/) {
+            SyncDefaults::announceChange();
+        });
+    preferences_ = std::move(opened.preferences);
+    notices_.set(Notices::Topic::Preferences, opened.problem);
+}
+
+std::optional<std::uint64_t> PreferencesStore::value(SyncPreference preference) const {
+    return with(preference, [this](const auto& key) {
+        return std::optional<std::uint64_t>(preferences_ ? preferences_->get(key)
+                                                         : key.defaultValue);
+    });
+}
+
+bool PreferencesStore::setValue(SyncPreference preference, std::optional<std::uint64_t> value) {
+    if (!preferences_) {
+        return false; // the notice stands since the opening
+    }
+    const auto result = with(preference, [this, value](const auto& key) {
+        return preferences_->set(key, stored(key, value));
+    });
+    if (!result.problem.empty()) {
+        notices_.set(Notices::Topic::Preferences, result.problem);
+    }
+    return result.problem.empty();
+}
+
+} // namespace quorl

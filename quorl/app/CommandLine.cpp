@@ -1,0 +1,153 @@
+#include "quorl/app/CommandLine.h"
+
+#include <charconv>
+#include <iostream>
+#include <map>
+#include <optional>
+
+#include <CLI/CLI.hpp>
+#include <QStandardPaths>
+
+namespace quorl {
+
+namespace {
+
+constexpr const char* exitCodes = "Exit codes:\n"
+                                  "  0  done\n"
+                                  "  1  it could not be done; standard error says why\n"
+                                  "  2  the command line is wrong\n"
+                                  "  3  --library: the music folder is missing";
+
+constexpr int smallestSide = 200;
+constexpr int largestSide = 8192;
+
+std::optional<int> side(std::string_view digits) {
+    int value = 0;
+    const char* end = digits.data() + digits.size();
+    const auto parsed = std::from_chars(digits.data(), end, value);
+    const bool isSide = parsed.ec == std::errc() && parsed.ptr == end && value >= smallestSide &&
+                        value <= largestSide;
+    return isSide ? std::optional(value) : std::nullopt;
+}
+
+/// Takes "360x720"; gives what is wrong back, empty for nothing.
+std::string takeSize(const std::string& text, Options& options) {
+    const auto separator = text.find('x');
+    const auto width = side(std::string_view(text).substr(0, separator));
+    const auto height = separator == std::string::npos
+                            ? std::nullopt
+                            : side(std::string_view(text).substr(separator + 1));
+    if (!width || !height) {
+        return "give the size as WIDTHxHEIGHT, each from " + std::to_string(smallestSide) + " to " +
+               std::to_string(largestSide) + ", for instance 360x720";
+    }
+    options.width = *width;
+    options.height = *height;
+    return {};
+}
+
+void addModes(CLI::App& app, Options& options, bool& text, bool& library, bool& status) {
+    auto* textFlag =
+        app.add_flag("--text", text, "Show the pane in the terminal, without any display");
+    auto* screenshot = app.add_option("--screenshot", options.screenshot,
+                                      "Write a picture of the pane to FILE (PNG) and end")
+                           ->type_name("FILE");
+    auto* libraryFlag = app.add_flag(
+        "--library", library, "Print what the music folder holds and what was left out, and end");
+    auto* statusFlag =
+        app.add_flag("--status", status, "Print how the sync and the wearable stand, and end");
+    app.add_flag("--json", options.json, "Print the status as JSON")->needs(statusFlag);
+    textFlag->excludes(screenshot)->excludes(libraryFlag)->excludes(statusFlag);
+    screenshot->excludes(libraryFlag)->excludes(statusFlag);
+    libraryFlag->excludes(statusFlag);
+}
+
+void addPlaces(CLI::App& app, Options& options) {
+    app.add_option("--music", options.music, "The music folder, instead of the user's own")
+        ->type_name("DIR");
+    app.add_option("--wearable", options.wearable,
+                   "The directory of a mounted Velora, instead of the one in this machine")
+        ->type_name("DIR");
+    app.add_option("--plugins", options.plugins, "Look for plug-ins here before all other places")
+        ->type_name("DIR")
+        ->check(CLI::ExistingDirectory);
+}
+
+void addPictureOptions(CLI::App& app, Options& options) {
+    auto* screenshot = app.get_option("--screenshot");
+    app.add_option_function<std::string>(
+           "--size",
+           [&options](const std::string& size) {
+               if (const auto problem = takeSize(size, options); !problem.empty()) {
+                   throw CLI::ValidationError("--size", problem);
+               }
+           },
+           "Size of the picture in points (default 360x720)")
+        ->type_name("WxH")
+        ->needs(screenshot);
+    app.add_option("--scale", options.scale, "Pixels of the picture to the point (default 1)")
+        ->type_name("N")
+        ->check(CLI::Range(1.0, 4.0))
+        ->needs(screenshot);
+    app.add_flag("--dark", options.dark, "Picture the dark look")->needs(screenshot);
+    static const std::map<std::string, Options::Pane> panes{{"root", Options::Pane::Root},
+                                                            {"playlist", Options::Pane::Playlist},
+                                                            {"limit", Options::Pane::Limit},
+                                                            {"front", Options::Pane::Front}};
+    app.add_option_function<std::string>(
+           "--pane", [&options](const std::string& name) { options.pane = panes.at(name); },
+           "Picture this pane (default root)")
+        ->type_name("root|playlist|limit|front")
+        ->check(CLI::IsMember(panes).description(""))
+        ->needs(screenshot);
+}
+
+void finish(Options& options, bool text, bool library, bool status) {
+    if (text) {
+        options.mode = Options::Mode::Text;
+    } else if (library) {
+        options.mode = Options::Mode::Library;
+    } else if (status) {
+        options.mode = Options::Mode::Status;
+    } else if (!options.screenshot.empty()) {
+        options.mode = Options::Mode::Screenshot;
+    }
+    if (!options.wearable.empty()) {
+        options.wearable = absolute(options.wearable).lexically_normal();
+    }
+    if (options.music.empty()) {
+        options.music =
+            QStandardPaths::writableLocation(QStandardPaths::MusicLocation).toStdString();
+    }
+    options.music = absolute(options.music).lexically_normal();
+}
+
+} // namespace
+
+std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* argv) {
+    Options options;
+    bool text = false;
+    bool library = false;
+    bool status = false;
+    CLI::App app("Chooses the music that goes to your Velora.", "quorl");
+    app.set_version_flag("--version", "quorl " QUORL_VERSION, "Print the version and end");
+    app.set_help_flag("-h,--help", "Print this help and end");
+    app.footer(exitCodes);
+    addModes(app, options, text, library, status);
+    addPlaces(app, options);
+    addPictureOptions(app, options);
+    try {
+        app.parse(argc, argv);
+    } catch (const CLI::ParseError& error) {
+        if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) {
+            app.exit(error); // help or version
+            return ExitCode::Success;
+        }
+        std::cerr << "quorl: " << error.what() << "\nRun \"quorl --help\" for the options.\n";
+        return ExitCode::Usage;
+    }
+    finish(options, text, library, status);
+    return options;
+}
+
+} // namespace quorl

@@ -1,0 +1,71 @@
+#include "quorl/app/Companion.h"
+
+#include "quorl/app/FrontPage.h"
+#include "quorl/app/PaneLoader.h"
+#include "runtime/PluginBundle.h"
+
+namespace quorl {
+
+Companion::Companion(Options options, PaneScreen& screen, Notices& notices)
+    : options_(std::move(options)),
+      screen_(screen),
+      notices_(notices),
+      host_(std::make_shared<CompanionHost>(options_, screen, notices)),
+      navigation_(::create<NavigationController>()) {
+    connect(&mainQueue_, &MainQueueNotifier::drained, this, &Companion::idle);
+    Host::install(host_);
+    makeFrontPage();
+}
+
+Companion::~Companion() {
+    host_->setEngineObserver({});
+    navigation_->disappear(false);
+    navigation_->clear();
+    Host::install(nullptr);
+}
+
+void Companion::makeFrontPage() {
+    const auto loaded = loadPane(pluginDirectories(options_.plugins));
+    if (const auto* problem = std::get_if<PaneProblem>(&loaded)) {
+        problem_ = problem->text;
+        return;
+    }
+    frontPage_ = FrontPage::over(host_->syncEngine(), std::get<Class>(loaded), "Music",
+                                 options_.wearable.empty());
+    navigation_->setRootPane(frontPage_);
+    (void)frontPage_->specifiers(); // builds the rows before the page is shown
+    host_->setEngineObserver([this] { frontPage_->refresh(); });
+}
+
+void Companion::start() {
+    navigation_->appear(false);
+    if (frontPage_ && !navigation_->open(frontPage_->paneRow())) {
+        notices_.set(Notices::Topic::Pane,
+                     "The Music pane cannot be shown. Install its plug-in again.");
+    }
+    screen_.scheduleDrawing();
+    host_->openLibrary(options_.music, [this] { Q_EMIT libraryRead(); });
+}
+
+void Companion::enterBackground() {
+    for (const auto& pane : navigation_->stack()) {
+        if (auto* controller = dynamic_cast<PSController*>(pane.get())) {
+            controller->willResignActive();
+            controller->suspend();
+        }
+    }
+    NSNotificationCenter::defaultCenter().postNotificationName_object(
+        UIApplicationDidEnterBackgroundNotification, nullptr);
+}
+
+void Companion::enterForeground() {
+    NSNotificationCenter::defaultCenter().postNotificationName_object(
+        UIApplicationWillEnterForegroundNotification, nullptr);
+    for (const auto& pane : navigation_->stack()) {
+        if (auto* controller = dynamic_cast<PSController*>(pane.get())) {
+            controller->willBecomeActive();
+        }
+    }
+}
+
+} // namespace quorl

@@ -1,0 +1,68 @@
+#pragma once
+
+#include "quorl/app/CommandLine.h"
+#include "quorl/app/CompanionHost.h"
+#include "quorl/app/MainQueueNotifier.h"
+#include "quorl/app/Notices.h"
+#include "quorl/app/PaneScreen.h"
+#include "runtime/NavigationController.h"
+
+namespace quorl {
+
+class FrontPage;
+
+/// The app apart from how it shows itself: its services, and the stack of panes with the root pane
+/// in it. One per process, made before another thread is started. Main thread.
+class Companion final : public QObject {
+    Q_OBJECT
+
+  public:
+    /// Installs the host and makes the root pane. `screen` and `notices` outlive the companion.
+    Companion(Options options, PaneScreen& screen, Notices& notices);
+
+    /// Takes the panes off the screen, lets go of them and takes the host back.
+    ~Companion() override;
+
+    /// The panes; none where the plug-in has a problem.
+    [[nodiscard]] NavigationController& navigation() { return *navigation_; }
+
+    /// Why there is no pane, for the user; empty where there is one.
+    [[nodiscard]] const std::string& problem() const { return problem_; }
+
+    [[nodiscard]] Notices& notices() { return notices_; }
+
+    [[nodiscard]] PaneScreen& screen() { return screen_; }
+
+    /// Brings the Music pane on the screen, over the front page, and begins to read the music
+    /// folder. Throws `std::system_error` where the process may open no more files or start no more
+    /// threads.
+    void start();
+
+    /// Whether the services have given what they were asked for when the panes came on the screen.
+    [[nodiscard]] bool isSettled() const { return host_->isSettled(); }
+
+    /// Tells the panes, and whoever else listens, that the app leaves the screen, or comes back.
+    void enterBackground();
+    void enterForeground();
+
+  Q_SIGNALS:
+    /// The library has taken what is in the music folder now.
+    void libraryRead();
+
+    /// libdispatch's main queue has just been emptied.
+    void idle();
+
+  private:
+    void makeFrontPage();
+
+    const Options options_;
+    PaneScreen& screen_;
+    Notices& notices_;
+    MainQueueNotifier mainQueue_;
+    std::shared_ptr<CompanionHost> host_;
+    std::shared_ptr<NavigationController> navigation_;
+    std::shared_ptr<FrontPage> frontPage_; ///< null where the plug-in has a problem
+    std::string problem_;
+};
+
+} // namespace quorl

@@ -1,0 +1,55 @@
+#pragma once
+
+#include "quorl/app/CommandLine.h"
+#include "quorl/adapters/Library.h"
+#include "quorl/adapters/PreferencesStore.h"
+#include "quorl/adapters/SyncEngine.h"
+#include "quorl/adapters/Wearable.h"
+#include "runtime/Host.h"
+#include "runtime/Screen.h"
+
+namespace quorl {
+
+/// The services that this app gives to panes. Main thread.
+class CompanionHost final : public Host {
+  public:
+    /// `screen` and `notices` outlive the host.
+    CompanionHost(const Options& options, Screen& screen, Notices& notices);
+
+    [[nodiscard]] SyncEngine& syncEngine() { return engine_; }
+
+    /// `changed` is called after the engine, its sessions or the wearable have changed; empty for
+    /// nobody.
+    void setEngineObserver(std::function<void()> changed) { engineChanged_ = std::move(changed); }
+
+    /// Begins to read the music folder. `taken` is called after each reading.
+    void openLibrary(const std::filesystem::path& music, std::function<void()> taken);
+
+    /// Whether the music folder has been read for the first time, the wearable has answered all
+    /// that it was asked, and the sync engine has been heard of.
+    [[nodiscard]] bool isSettled() const {
+        return library_->isRead() && wearable_.isIdle() && isEngineHeardOf_;
+    }
+
+    [[nodiscard]] LMSyncDefaults& syncDefaults() override;
+    [[nodiscard]] MediaLibrary& mediaLibrary() override;
+    [[nodiscard]] NSArray<DVSession> sessions(const std::string& type) override;
+    [[nodiscard]] std::unique_ptr<LSSClient> connectToWearable(dispatch_queue_t queue) override;
+    [[nodiscard]] Screen& screen() override;
+
+  private:
+    void noticeProblems(const media::Snapshot& snapshot);
+    void engineDidChange(const std::string& problem);
+
+    Screen& screen_;
+    Notices& notices_;
+    PreferencesStore store_;
+    std::shared_ptr<SyncDefaults> syncDefaults_;
+    std::shared_ptr<Library> library_;
+    Wearable wearable_;
+    std::function<void()> engineChanged_;
+    bool isEngineHeardOf_ = false; ///< or of there being none
+    SyncEngine engine_;
+};
+
+} // namespace quorl

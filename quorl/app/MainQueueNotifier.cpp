@@ -1,0 +1,14 @@
+#include "quorl/app/MainQueueNotifier.h"
+
+#include "runtime/MainQueue.h"
+
+namespace quorl {
+
+MainQueueNotifier::MainQueueNotifier() : notifier_(mainQueueDescriptor(), QSocketNotifier::Read) {
+    connect(&notifier_, &QSocketNotifier::activated, this, [this] {
+        drainMainQueue();
+        Q_EMIT drained();
+    });
+}
+
+} // namespace quorl

@@ -1,0 +1,59 @@
+#include "quorl/app/PaneScreen.h"
+
+namespace quorl {
+
+namespace {
+
+/// Shows at least 4:1 against white and against the darkest grey that rows are painted on.
+constexpr const char* tint = "#5b6ef5";
+
+} // namespace
+
+PaneScreen::PaneScreen() {
+    timer_.setSingleShot(true);
+    timer_.setInterval(0);
+    connect(&timer_, &QTimer::timeout, this, &PaneScreen::drawing);
+}
+
+void PaneScreen::scheduleDrawing() {
+    if (!timer_.isActive()) {
+        timer_.start();
+    }
+}
+
+UIColor PaneScreen::tintColor() const { return tint; }
+
+std::optional<UIColor> PaneScreen::listTextColor() const { return std::nullopt; }
+
+void PaneScreen::specifierWillSetProperty(PSSpecifier& /*specifier*/,
+                                          const std::optional<std::string>& /*value*/,
+                                          std::string_view /*key*/) {
+    scheduleDrawing();
+}
+
+void PaneScreen::listWillReloadSpecifier(PSListController& /*list*/,
+                                         const PSSpecifier* /*specifier*/) {
+    scheduleDrawing();
+}
+
+void PaneScreen::listWillReload(PSListController& /*list*/) { scheduleDrawing(); }
+
+void PaneScreen::listWillShowController(PSListController& /*list*/, PSController* /*controller*/,
+                                        std::optional<bool> /*animate*/) {
+    scheduleDrawing();
+}
+
+void PaneScreen::tableWillReloadData(UITableView& /*table*/) { scheduleDrawing(); }
+
+void PaneScreen::tableWillReloadRows(UITableView& table, const std::vector<NSIndexPath>& paths,
+                                     UITableViewRowAnimation /*animation*/) {
+    Q_EMIT rowsWillFade(table, paths);
+    scheduleDrawing();
+}
+
+void PaneScreen::tableWillDeselectRow(UITableView& table, const NSIndexPath& path, bool animated) {
+    Q_EMIT rowWillBeDeselected(table, path, animated);
+    scheduleDrawing();
+}
+
+} // namespace quorl

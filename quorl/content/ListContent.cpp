@@ -1,0 +1,105 @@
+#include "quorl/content/ListContent.h"
+
+#include <limits>
+
+#include "quorl/content/SwitchCell.h"
+#include "runtime/PSListView.h"
+
+namespace quorl {
+
+namespace {
+
+std::shared_ptr<UITableViewCell> switchOf(const PSListView::Row& row) {
+    auto cell = ::create<SwitchCell>(&UITableViewCell::initWithStyle_reuseIdentifier,
+                                     UITableViewCellStyle::Value1, std::string());
+    cell->textLabel().setText(row.specifier->name());
+    cell->textLabel().setTextColor(PSListController::appearance().textColor);
+    cell->setOn(row.value == PSSwitchOnValue);
+    cell->layoutSubviews();
+    return cell;
+}
+
+std::shared_ptr<UITableViewCell> makeCell(const PSListView::Row& row, UITableViewCellStyle style) {
+    auto cell = ::create<UITableViewCell>(&UITableViewCell::initWithStyle_reuseIdentifier, style,
+                                          std::string());
+    cell->textLabel().setText(row.specifier->name());
+    cell->textLabel().setTextColor(PSListController::appearance().textColor);
+    cell->detailTextLabel().setText(row.value);
+    if (row.specifier->detailControllerClass()) {
+        cell->setAccessoryType(UITableViewCellAccessoryType::DisclosureIndicator);
+    }
+    cell->layoutSubviews();
+    return cell;
+}
+
+bool isShortened(const UILabel& label) {
+    constexpr CGFloat unbounded = std::numeric_limits<CGFloat>::max();
+    constexpr CGFloat roundingError = CGFloat(0.01);
+    return label.sizeThatFits({unbounded, unbounded}).width > label.frame().width + roundingError;
+}
+
+/// The value is beside the title where there is room for both, else below it.
+std::shared_ptr<UITableViewCell> cellOf(const PSListView::Row& row) {
+    if (row.specifier->cellType() == PSCellType::Switch) {
+        return switchOf(row);
+    }
+    auto cell = makeCell(row, UITableViewCellStyle::Value1);
+    return isShortened(cell->detailTextLabel()) ? makeCell(row, UITableViewCellStyle::Subtitle)
+                                                : cell;
+}
+
+} // namespace
+
+void ListContent::draw(NSInteger /*firstRow*/, NSInteger /*rowsOnScreen*/) {
+    sections_.clear();
+    rows_.clear();
+    const auto* list = dynamic_cast<PSListController*>(pane_.get());
+    if (!list) {
+        return;
+    }
+    quorl::draw(*pane_);
+    for (const auto& row : list->listView().rows()) {
+        if (row.specifier->cellType() == PSCellType::Group) {
+            sections_.push_back({row.specifier->name(), row.footer, 0});
+            continue;
+        }
+        if (sections_.empty()) {
+            sections_.emplace_back(); // rows before the first group
+        }
+        ++sections_.back().rowCount;
+        rows_.push_back({row.specifier, cellOf(row)});
+    }
+}
+
+const ListContent::Row* ListContent::rowAt(NSInteger row) const {
+    return row >= 0 && row < static_cast<NSInteger>(rows_.size())
+               ? &rows_[static_cast<std::size_t>(row)]
+               : nullptr;
+}
+
+std::shared_ptr<UITableViewCell> ListContent::cell(NSInteger row) const {
+    const Row* found = rowAt(row);
+    return found ? found->cell : nullptr;
+}
+
+std::shared_ptr<UITableViewCell> ListContent::cellAnywhere(NSInteger row) { return cell(row); }
+
+void ListContent::tap(NSInteger row) {
+    const Row* found = rowAt(row);
+    if (!found) {
+        return;
+    }
+    const std::shared_ptr specifier = found->specifier;
+    if (const auto* toggle = dynamic_cast<const SwitchCell*>(found->cell.get())) {
+        specifier->setValue(NSNumber::numberWithBool(!toggle->isOn()));
+    } else {
+        navigation_.open(specifier);
+    }
+}
+
+std::optional<NSInteger> ListContent::row(const UITableView& /*table*/,
+                                          const NSIndexPath& /*path*/) const {
+    return std::nullopt;
+}
+
+} // namespace quorl

@@ -1,0 +1,90 @@
+#include "quorl/reports/LibraryReport.h"
+
+#include <iostream>
+#include <numeric>
+
+#include "runtime/SizeText.h"
+#include "runtime/StringTable.h"
+#include "services/media/MusicFolder.h"
+#include "services/media/Text.h"
+
+namespace quorl {
+
+namespace {
+
+std::string countOf(std::size_t count, const std::string& singular) {
+    return std::to_string(count) + " " + singular + (count == 1 ? "" : "s");
+}
+
+std::uint64_t bytesOf(const media::Playlist& playlist, const media::Snapshot& snapshot) {
+    return std::accumulate(playlist.songs.begin(), playlist.songs.end(), std::uint64_t{0},
+                           [&snapshot](std::uint64_t sum, media::SongIndex song) {
+                               return sum + snapshot.songs[song].size;
+                           });
+}
+
+std::string_view kindOf(const media::Playlist& playlist) {
+    if (playlist.folder) {
+        return "folder";
+    }
+    switch (playlist.generated) {
+    case media::Generated::Mix:
+        return "generated mix";
+    case media::Generated::Playlist:
+        return "generated playlist";
+    case media::Generated::No:
+        break;
+    }
+    return {};
+}
+
+std::string describe(const media::Playlist& playlist, const media::Snapshot& snapshot,
+                     const std::string& language) {
+    std::string line = media::printable(playlist.name) + ": " +
+                       countOf(playlist.songs.size(), "song") + ", " +
+                       sizeText(static_cast<double>(bytesOf(playlist, snapshot)), language) + ", " +
+                       media::printable(playlist.path);
+    const auto kind = kindOf(playlist);
+    return kind.empty() ? line : line + " (" + std::string(kind) + ")";
+}
+
+void printPlaylists(const media::Snapshot& snapshot) {
+    const std::string language = environmentLanguages().front();
+    std::cout << media::printable(snapshot.root.string()) << ": "
+              << countOf(snapshot.playlists.size(), "playlist") << ", "
+              << countOf(snapshot.songs.size(), "song") << " listed\n";
+    for (const auto& playlist : snapshot.playlists) {
+        std::cout << "  " << describe(playlist, snapshot, language) << '\n';
+    }
+}
+
+void printLeftOut(const media::Snapshot& snapshot) {
+    std::cout << "\nLeft out: " << snapshot.leftOut.size() << '\n';
+    for (const auto& leftOut : snapshot.leftOut) {
+        std::cout << "  " << media::describe(leftOut) << '\n';
+    }
+}
+
+} // namespace
+
+ExitCode printLibrary(const Options& options) {
+    const auto snapshot = media::scan(options.music);
+    if (!snapshot->rootFound) {
+        std::cerr << "quorl: There is no music folder at "
+                  << media::printable(options.music.string())
+                  << ". Create it, or name another one with --music.\n";
+        return ExitCode::NoMusicFolder;
+    }
+    printPlaylists(*snapshot);
+    if (!snapshot->leftOut.empty()) {
+        printLeftOut(*snapshot);
+    }
+    std::cout.flush();
+    if (!std::cout) {
+        std::cerr << "quorl: The list could not be written to standard output.\n";
+        return ExitCode::Failure;
+    }
+    return ExitCode::Success;
+}
+
+} // namespace quorl

@@ -1,0 +1,147 @@
+#include "quorl/terminal/TextSession.h"
+
+#include <array>
+#include <charconv>
+#include <iostream>
+#include <sstream>
+
+#include <QCoreApplication>
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include "quorl/terminal/PaneText.h"
+#include "services/media/Text.h"
+
+namespace quorl {
+
+namespace {
+
+constexpr int usualWidth = 80;
+constexpr NSInteger rowsOnScreen = 200;
+constexpr const char* hint = "A number taps the row, b goes back, q leaves.\n";
+
+int terminalWidth() {
+    winsize size{};
+    const bool isTerminal = ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_col > 0;
+    return isTerminal ? size.ws_col : usualWidth;
+}
+
+std::optional<NSInteger> numberIn(const std::string& text) {
+    NSInteger number = 0;
+    const char* end = text.data() + text.size();
+    const auto parsed = std::from_chars(text.data(), end, number);
+    return parsed.ec == std::errc() && parsed.ptr == end ? std::optional(number) : std::nullopt;
+}
+
+std::string textOfProblem(const std::string& problem, int width) {
+    std::istringstream lines(problem);
+    std::string text;
+    for (std::string line; std::getline(lines, line);) {
+        text += line.empty() ? "\n" : wrapped(media::printable(line), width, "");
+    }
+    return text;
+}
+
+} // namespace
+
+TextSession::TextSession(Companion& companion)
+    : companion_(companion), input_(STDIN_FILENO, QSocketNotifier::Read) {
+    input_.setEnabled(false);
+    nextLine_.setSingleShot(true);
+    connect(&companion, &Companion::libraryRead, this, [this] { input_.setEnabled(!isAtEnd_); });
+    connect(&companion.notices(), &Notices::added, this,
+            [](const std::string& text) { std::cerr << "quorl: " << text << std::endl; });
+    for (const std::string& text : companion.notices().texts()) {
+        std::cerr << "quorl: " << text << std::endl;
+    }
+    connect(&companion.screen(), &PaneScreen::drawing, this, &TextSession::show);
+    connect(&input_, &QSocketNotifier::activated, this, &TextSession::readInput);
+    connect(&nextLine_, &QTimer::timeout, this, &TextSession::takeNextLine);
+}
+
+void TextSession::readInput() {
+    std::array<char, 4096> buffer; // NOLINT(cppcoreguidelines-pro-type-member-init): read fills it
+    const ssize_t length = read(STDIN_FILENO, buffer.data(), buffer.size());
+    if (length > 0) {
+        unread_.append(buffer.data(), static_cast<std::size_t>(length));
+    } else if (length == 0 || (errno != EINTR && errno != EAGAIN)) {
+        isAtEnd_ = true;
+        input_.setEnabled(false);
+    }
+    nextLine_.start(0);
+}
+
+/// One line in each turn of the loop, so that each finds what the one before has led to.
+void TextSession::takeNextLine() {
+    if (isAtEnd_ && !unread_.empty() && unread_.back() != '\n') {
+        unread_ += '\n';
+    }
+    const auto end = unread_.find('\n');
+    if (end != std::string::npos) {
+        const std::string command(media::trimmed(unread_.substr(0, end)));
+        unread_.erase(0, end + 1);
+        nextLine_.start(0);
+        take(command);
+    } else if (isAtEnd_) {
+        QCoreApplication::quit();
+    }
+}
+
+void TextSession::take(const std::string& command) {
+    if (command == "q") {
+        QCoreApplication::quit();
+        nextLine_.stop();
+    } else if (command == "b" && companion_.navigation().stack().size() > 1) {
+        companion_.navigation().pop(false);
+        firstRow_ = 0;
+        show();
+    } else if (command == "+" || command == "-") {
+        scroll(command == "+" ? rowsOnScreen : -rowsOnScreen);
+    } else if (const auto number = numberIn(command);
+               number && content_ && *number >= 1 && *number <= content_->rowCount()) {
+        tap(*number - 1);
+    } else {
+        print(hint);
+    }
+}
+
+void TextSession::tap(NSInteger row) {
+    if (!content_->cell(row)) {
+        firstRow_ = row;
+        drawContent();
+    }
+    const auto* pane = companion_.navigation().top().get();
+    content_->tap(row);
+    if (pane != companion_.navigation().top().get()) {
+        firstRow_ = 0;
+    }
+    show();
+}
+
+void TextSession::scroll(NSInteger rows) {
+    const NSInteger count = content_ ? content_->rowCount() : 0;
+    firstRow_ = std::clamp<NSInteger>(firstRow_ + rows, 0, std::max<NSInteger>(count - 1, 0));
+    show();
+}
+
+void TextSession::show() {
+    const auto top = companion_.navigation().top();
+    if (top && (!content_ || &content_->pane() != top.get())) {
+        content_ = PaneContent::of(top, companion_.navigation());
+    }
+    if (top) {
+        drawContent();
+    }
+    const auto text = top ? textOf(*content_, terminalWidth())
+                          : textOfProblem(companion_.problem(), terminalWidth());
+    if (text != shown_) {
+        shown_ = text;
+        print(text + '\n');
+    }
+}
+
+void TextSession::drawContent() { content_->draw(firstRow_, rowsOnScreen); }
+
+void TextSession::print(const std::string& text) { std::cout << text << std::flush; }
+
+} // namespace quorl

@@ -1,0 +1,41 @@
+#pragma once
+
+#include <QStackedWidget>
+#include <QWidget>
+
+#include "quorl/app/Companion.h"
+#include "quorl/window/ForegroundWatch.h"
+#include "quorl/window/HeaderBar.h"
+#include "quorl/window/RowsView.h"
+
+namespace quorl {
+
+/// The window: a header, notices, and the top pane of the companion's stack. Main thread.
+class MainWindow final : public QWidget {
+    Q_OBJECT
+
+  public:
+    /// Both outlive the window.
+    MainWindow(Companion& companion, WindowScreen& screen);
+
+    /// The view of the top pane; null where the plug-in has a problem.
+    [[nodiscard]] RowsView* topView() const;
+
+    /// Leaves the top pane; the root pane stays.
+    void goBack();
+
+  private:
+    void addShortcuts();
+    void draw();
+    void showTopPane();
+    void showTitles();
+
+    Companion& companion_;
+    WindowScreen& screen_;
+    HeaderBar* header_;
+    QStackedWidget* pages_;
+    std::vector<RowsView*> views_; ///< of the panes of the stack, in its order; owned by `pages_`
+    ForegroundWatch foreground_;
+};
+
+} // namespace quorl

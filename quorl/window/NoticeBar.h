@@ -1,0 +1,30 @@
+#pragma once
+
+#include <QFrame>
+#include <QLabel>
+
+#include "quorl/app/Notices.h"
+
+namespace quorl {
+
+/// Shows the notices at the top of a window until they are put away or have become void. Never
+/// takes the focus. Main thread.
+class NoticeBar final : public QFrame {
+    Q_OBJECT
+
+  public:
+    /// `notices` outlives the bar.
+    NoticeBar(Notices& notices, const QColor& tint, QWidget* parent);
+
+  protected:
+    void paintEvent(QPaintEvent* event) override;
+
+  private:
+    void showNotices();
+
+    Notices& notices_;
+    const QColor tint_;
+    QLabel* label_;
+};
+
+} // namespace quorl

@@ -1,0 +1,62 @@
+#include "quorl/window/WindowScreen.h"
+
+#include <cmath>
+
+#include <QFontInfo>
+#include <QFontMetricsF>
+#include <QGuiApplication>
+
+namespace quorl {
+
+namespace {
+
+constexpr qreal smallestRowHeight = 44;
+constexpr qreal rowPadding = 8;
+constexpr qreal smallestTextHeight = 15; // pixels of the font's size
+
+qreal upToPixel(qreal length, qreal scale) { return std::ceil(length * scale - 1e-6) / scale; }
+
+} // namespace
+
+WindowScreen::WindowScreen() { setFont(QGuiApplication::font()); }
+
+void WindowScreen::setFont(const QFont& applicationFont) {
+    font_ = applicationFont;
+    if (QFontInfo(font_).pixelSize() < smallestTextHeight) {
+        font_.setPixelSize(static_cast<int>(smallestTextHeight));
+    }
+}
+
+qreal WindowScreen::rowHeight() const {
+    const qreal wanted =
+        std::max(smallestRowHeight, 2 * QFontMetricsF(font_).height() + rowPadding);
+    return upToPixel(wanted, scale_);
+}
+
+void WindowScreen::setGeometry(qreal rowWidth, qreal scale) {
+    rowWidth_ = rowWidth;
+    scale_ = scale;
+}
+
+CGSize WindowScreen::rowSize() const {
+    return {static_cast<CGFloat>(rowWidth_), static_cast<CGFloat>(rowHeight())};
+}
+
+CGSize WindowScreen::sizeOfText(const UILabel& label) const {
+    if (!label.text() || label.text()->empty()) {
+        return {};
+    }
+    const QFontMetricsF metrics(font_);
+    const qreal width = metrics.horizontalAdvance(QString::fromStdString(*label.text()));
+    return {static_cast<CGFloat>(upToPixel(width, scale_)),
+            static_cast<CGFloat>(upToPixel(metrics.height(), scale_))};
+}
+
+void WindowScreen::layOutLabels(UITableViewCell& cell) {
+    PaneScreen::layOutLabels(cell);
+    for (UILabel* label : {&cell.textLabel(), &cell.detailTextLabel()}) {
+        label->setFrame(UIRectIntegralWithScale(label->frame(), scale()));
+    }
+}
+
+} // namespace quorl

@@ -1,0 +1,41 @@
+#include "quorl/window/WrappedText.h"
+
+#include <QFontMetricsF>
+#include <QTextLayout>
+
+namespace quorl {
+
+QStringList wrappedLines(const QString& text, const QFont& font, qreal width) {
+    QTextOption option;
+    option.setWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
+    QTextLayout layout(text, font);
+    layout.setTextOption(option);
+    layout.beginLayout();
+    QStringList lines;
+    for (QTextLine line = layout.createLine(); line.isValid(); line = layout.createLine()) {
+        line.setLineWidth(width);
+        lines << text.mid(line.textStart(), line.textLength()).trimmed();
+    }
+    layout.endLayout();
+    return lines;
+}
+
+qreal heightOfLines(const QStringList& lines, const QFont& font) {
+    return QFontMetricsF(font).lineSpacing() * static_cast<qreal>(lines.size());
+}
+
+void paintWrapped(QPainter& painter, const QString& text, const QRectF& place,
+                  Qt::LayoutDirection direction) {
+    const auto side = direction == Qt::RightToLeft ? Qt::AlignRight : Qt::AlignLeft;
+    const int flags = static_cast<int>(side | Qt::AlignAbsolute | Qt::AlignTop) |
+                      Qt::TextSingleLine | Qt::TextDontClip;
+    const qreal lineHeight = QFontMetricsF(painter.font()).lineSpacing();
+    QRectF line(place.left(), place.top(), place.width(), lineHeight);
+    painter.setLayoutDirection(text.isRightToLeft() ? Qt::RightToLeft : Qt::LeftToRight);
+    for (const QString& words : wrappedLines(text, painter.font(), place.width())) {
+        painter.drawText(line, flags, words);
+        line.translate(0, lineHeight);
+    }
+}
+
+} // namespace quorl
