@@ -4,7 +4,7 @@
 
 #include "quorl-script/Field.h"
 #include "quorl-script/Naming.h"
-#include "runtime/TableView.h"
+#include "runtime/lists/TableView.h"
 
 namespace quorl {
 

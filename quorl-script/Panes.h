@@ -1,7 +1,7 @@
 #pragma once
 
 #include "quorl-script/ScriptedScreen.h"
-#include "runtime/NavigationController.h"
+#include "runtime/lists/NavigationController.h"
 
 namespace quorl {
 

@@ -2,7 +2,7 @@
 
 #include "platform/UserInterface.h"
 #include "quorl-script/Trace.h"
-#include "runtime/PluginBundle.h"
+#include "runtime/plugins/PluginBundle.h"
 
 namespace quorl {
 

@@ -6,7 +6,7 @@
 #include "quorl-script/ScriptedSessions.h"
 #include "quorl-script/ScriptedWearable.h"
 #include "quorl-script/Trace.h"
-#include "runtime/Host.h"
+#include "runtime/host/Host.h"
 
 namespace quorl {
 

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "quorl-script/Trace.h"
-#include "runtime/MediaLibrary.h"
+#include "runtime/services/MediaLibrary.h"
 
 namespace quorl {
 

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "quorl-script/Trace.h"
-#include "runtime/SyncDefaults.h"
+#include "runtime/services/SyncDefaults.h"
 
 namespace quorl {
 

@@ -3,7 +3,7 @@
 #include <functional>
 
 #include "quorl-script/Trace.h"
-#include "runtime/Screen.h"
+#include "runtime/host/Screen.h"
 
 namespace quorl {
 

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "quorl-script/Trace.h"
-#include "runtime/Session.h"
+#include "runtime/services/Session.h"
 
 namespace quorl {
 

@@ -4,7 +4,7 @@
 
 #include "quorl-script/Trace.h"
 #include "quorl-script/virtual-time/VirtualTime.h"
-#include "runtime/LSSClient.h"
+#include "runtime/services/LSSClient.h"
 
 namespace quorl {
 

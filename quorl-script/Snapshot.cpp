@@ -1,8 +1,8 @@
 #include "quorl-script/Snapshot.h"
 
 #include "quorl-script/Naming.h"
-#include "runtime/PSListView.h"
-#include "runtime/TableView.h"
+#include "runtime/lists/PSListView.h"
+#include "runtime/lists/TableView.h"
 
 namespace quorl {
 

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "quorl-script/Trace.h"
-#include "runtime/NotificationCenter.h"
+#include "runtime/objects/NotificationCenter.h"
 
 namespace quorl {
 

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "runtime/Host.h"
-#include "runtime/MediaLibrary.h"
+#include "runtime/host/Host.h"
+#include "runtime/services/MediaLibrary.h"
 #include "tests/support/TestPreferences.h"
 #include "tests/support/TestScreen.h"
 #include "tests/support/TestWearable.h"

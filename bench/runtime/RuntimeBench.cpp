@@ -8,8 +8,8 @@
 #include <benchmark/benchmark.h>
 
 #include "bench/runtime/QuietHost.h"
-#include "runtime/MainQueue.h"
-#include "runtime/NotificationCenter.h"
+#include "runtime/objects/MainQueue.h"
+#include "runtime/objects/NotificationCenter.h"
 #include "settings/LMQuorlSettingsController.h"
 #include "sync/LMSyncDefaults+Extras.h"
 #include "tests/support/MainQueueRun.h"

@@ -4,7 +4,7 @@
 #include <map>
 #include <mutex>
 
-#include "runtime/Session.h"
+#include "runtime/services/Session.h"
 #include "services/engine/Model.h"
 
 namespace quorl {

@@ -2,7 +2,7 @@
 
 #include <filesystem>
 
-#include "runtime/MediaLibrary.h"
+#include "runtime/services/MediaLibrary.h"
 #include "services/media/MusicFolder.h"
 
 namespace quorl {

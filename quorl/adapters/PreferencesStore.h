@@ -1,7 +1,7 @@
 #pragma once
 
 #include "quorl/app/Notices.h"
-#include "runtime/SyncDefaults.h"
+#include "runtime/services/SyncDefaults.h"
 #include "services/preferences/SharedPreferences.h"
 
 namespace quorl {

@@ -2,7 +2,7 @@
 
 #include <memory>
 
-#include "runtime/LSSClient.h"
+#include "runtime/services/LSSClient.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl {

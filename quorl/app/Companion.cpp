@@ -2,7 +2,7 @@
 
 #include "quorl/app/FrontPage.h"
 #include "quorl/app/PaneLoader.h"
-#include "runtime/PluginBundle.h"
+#include "runtime/plugins/PluginBundle.h"
 
 namespace quorl {
 

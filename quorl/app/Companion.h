@@ -5,7 +5,7 @@
 #include "quorl/app/MainQueueNotifier.h"
 #include "quorl/app/Notices.h"
 #include "quorl/app/PaneScreen.h"
-#include "runtime/NavigationController.h"
+#include "runtime/lists/NavigationController.h"
 
 namespace quorl {
 

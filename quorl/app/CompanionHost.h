@@ -5,8 +5,8 @@
 #include "quorl/adapters/PreferencesStore.h"
 #include "quorl/adapters/SyncEngine.h"
 #include "quorl/adapters/Wearable.h"
-#include "runtime/Host.h"
-#include "runtime/Screen.h"
+#include "runtime/host/Host.h"
+#include "runtime/host/Screen.h"
 
 namespace quorl {
 

@@ -1,6 +1,6 @@
 #include "quorl/app/MainQueueNotifier.h"
 
-#include "runtime/MainQueue.h"
+#include "runtime/objects/MainQueue.h"
 
 namespace quorl {
 

@@ -1,6 +1,6 @@
 #include "quorl/app/PaneLoader.h"
 
-#include "runtime/PluginBundle.h"
+#include "runtime/plugins/PluginBundle.h"
 
 namespace quorl {
 

@@ -3,7 +3,7 @@
 #include <QObject>
 #include <QTimer>
 
-#include "runtime/Screen.h"
+#include "runtime/host/Screen.h"
 
 namespace quorl {
 

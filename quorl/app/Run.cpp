@@ -12,7 +12,7 @@
 #include "quorl/reports/Screenshot.h"
 #include "quorl/terminal/TextScreen.h"
 #include "quorl/terminal/TextSession.h"
-#include "runtime/StringTable.h"
+#include "runtime/plugins/StringTable.h"
 
 namespace quorl {
 

@@ -3,7 +3,7 @@
 #include <limits>
 
 #include "quorl/content/SwitchCell.h"
-#include "runtime/PSListView.h"
+#include "runtime/lists/PSListView.h"
 
 namespace quorl {
 

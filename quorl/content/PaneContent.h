@@ -1,6 +1,6 @@
 #pragma once
 
-#include "runtime/NavigationController.h"
+#include "runtime/lists/NavigationController.h"
 
 namespace quorl {
 

@@ -2,7 +2,7 @@
 
 #include <numeric>
 
-#include "runtime/TableView.h"
+#include "runtime/lists/TableView.h"
 
 namespace quorl {
 

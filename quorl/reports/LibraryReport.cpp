@@ -3,8 +3,8 @@
 #include <iostream>
 #include <numeric>
 
-#include "runtime/SizeText.h"
-#include "runtime/StringTable.h"
+#include "runtime/services/SizeText.h"
+#include "runtime/plugins/StringTable.h"
 #include "services/media/MusicFolder.h"
 #include "services/media/Text.h"
 

@@ -1,7 +1,7 @@
 #include <QApplication>
 #include <gtest/gtest.h>
 
-#include "runtime/MainQueue.h"
+#include "runtime/objects/MainQueue.h"
 
 int main(int argc, char** argv) {
     testing::InitGoogleTest(&argc, argv);

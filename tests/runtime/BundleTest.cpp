@@ -9,7 +9,7 @@
 #include <gmock/gmock.h>
 
 #include "platform/InterfaceVersion.h"
-#include "runtime/PluginBundle.h"
+#include "runtime/plugins/PluginBundle.h"
 #include "tests/runtime/TemporaryDirectory.h"
 #include "tests/support/TestHost.h"
 

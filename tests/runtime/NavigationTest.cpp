@@ -1,8 +1,8 @@
-#include "runtime/NavigationController.h"
+#include "runtime/lists/NavigationController.h"
 
 #include <gmock/gmock.h>
 
-#include "runtime/PSListView.h"
+#include "runtime/lists/PSListView.h"
 #include "tests/support/TestHost.h"
 
 namespace {

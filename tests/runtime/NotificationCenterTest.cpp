@@ -1,4 +1,4 @@
-#include "runtime/NotificationCenter.h"
+#include "runtime/objects/NotificationCenter.h"
 
 #include <atomic>
 #include <functional>

@@ -1,4 +1,4 @@
-#include "runtime/Session.h"
+#include "runtime/services/Session.h"
 
 #include <atomic>
 #include <latch>

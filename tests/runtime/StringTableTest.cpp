@@ -1,4 +1,4 @@
-#include "runtime/StringTable.h"
+#include "runtime/plugins/StringTable.h"
 
 #include <cstdlib>
 #include <fstream>

@@ -1,4 +1,4 @@
-#include "runtime/TableView.h"
+#include "runtime/lists/TableView.h"
 
 #include <set>
 

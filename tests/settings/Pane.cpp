@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "runtime/PSListView.h"
+#include "runtime/lists/PSListView.h"
 #include "sync/LMQuorlSyncManager.h"
 
 namespace quorl::tests {

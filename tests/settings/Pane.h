@@ -2,7 +2,7 @@
 
 #include <gmock/gmock.h>
 
-#include "runtime/NavigationController.h"
+#include "runtime/lists/NavigationController.h"
 #include "settings/LMQuorlSettingsController.h"
 #include "tests/support/MainQueueRun.h"
 #include "tests/support/TestHost.h"

@@ -3,7 +3,7 @@
 #include <gmock/gmock.h>
 
 #include "platform/PreferencesList.h"
-#include "runtime/TableView.h"
+#include "runtime/lists/TableView.h"
 #include "tests/settings/Pane.h"
 
 namespace quorl::tests {

@@ -5,7 +5,7 @@
 #include <poll.h>
 
 #include "platform/Dispatch.h"
-#include "runtime/MainQueue.h"
+#include "runtime/objects/MainQueue.h"
 
 namespace quorl::tests {
 

@@ -1,6 +1,6 @@
 #include "tests/support/TestHost.h"
 
-#include "runtime/MainQueue.h"
+#include "runtime/objects/MainQueue.h"
 
 namespace quorl::tests {
 

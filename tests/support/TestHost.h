@@ -1,7 +1,7 @@
 #pragma once
 
-#include "runtime/Host.h"
-#include "runtime/NotificationCenter.h"
+#include "runtime/host/Host.h"
+#include "runtime/objects/NotificationCenter.h"
 #include "tests/support/Journal.h"
 #include "tests/support/TestLibrary.h"
 #include "tests/support/TestPreferences.h"

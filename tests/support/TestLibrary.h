@@ -1,6 +1,6 @@
 #pragma once
 
-#include "runtime/MediaLibrary.h"
+#include "runtime/services/MediaLibrary.h"
 #include "tests/support/Journal.h"
 
 namespace quorl::tests {

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "runtime/SyncDefaults.h"
+#include "runtime/services/SyncDefaults.h"
 #include "tests/support/Journal.h"
 
 namespace quorl::tests {

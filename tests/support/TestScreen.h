@@ -1,6 +1,6 @@
 #pragma once
 
-#include "runtime/Screen.h"
+#include "runtime/host/Screen.h"
 #include "tests/support/Journal.h"
 
 namespace quorl::tests {

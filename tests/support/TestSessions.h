@@ -1,6 +1,6 @@
 #pragma once
 
-#include "runtime/Session.h"
+#include "runtime/services/Session.h"
 #include "tests/support/Journal.h"
 
 namespace quorl::tests {

@@ -2,7 +2,7 @@
 
 #include <deque>
 
-#include "runtime/LSSClient.h"
+#include "runtime/services/LSSClient.h"
 #include "tests/support/Journal.h"
 
 namespace quorl::tests {

@@ -1,9 +1,9 @@
 #include <algorithm>
 
 #include "platform/HostApp.h"
-#include "runtime/Host.h"
-#include "runtime/PSListView.h"
-#include "runtime/Screen.h"
+#include "runtime/host/Host.h"
+#include "runtime/lists/PSListView.h"
+#include "runtime/host/Screen.h"
 
 namespace {
 

@@ -1,6 +1,6 @@
 #include "platform/PreferencesList.h"
-#include "runtime/Host.h"
-#include "runtime/Screen.h"
+#include "runtime/host/Host.h"
+#include "runtime/host/Screen.h"
 
 const std::string_view PSSwitchOnValue = "on";
 const std::string_view PSSwitchOffValue = "off";

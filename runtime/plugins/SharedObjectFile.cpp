@@ -1,4 +1,4 @@
-#include "runtime/SharedObjectFile.h"
+#include "runtime/plugins/SharedObjectFile.h"
 
 #include <memory>
 

@@ -1,9 +1,9 @@
-#include "runtime/Label.h"
+#include "runtime/lists/Label.h"
 
 #include <algorithm>
 
-#include "runtime/Host.h"
-#include "runtime/Screen.h"
+#include "runtime/host/Host.h"
+#include "runtime/host/Screen.h"
 
 namespace quorl {
 

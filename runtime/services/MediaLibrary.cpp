@@ -1,8 +1,8 @@
-#include "runtime/MediaLibrary.h"
+#include "runtime/services/MediaLibrary.h"
 
 #include <algorithm>
 
-#include "runtime/Host.h"
+#include "runtime/host/Host.h"
 
 // The trace and the messages of hosts name a property by its constant, so that is its value too.
 const MPMediaProperty MPMediaPlaylistPropertyPersistentID = "MPMediaPlaylistPropertyPersistentID";

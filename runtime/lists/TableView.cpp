@@ -1,10 +1,10 @@
-#include "runtime/TableView.h"
+#include "runtime/lists/TableView.h"
 
 #include <algorithm>
 #include <numeric>
 
-#include "runtime/Host.h"
-#include "runtime/Screen.h"
+#include "runtime/host/Host.h"
+#include "runtime/host/Screen.h"
 
 namespace quorl {
 

@@ -1,5 +1,5 @@
-#include "runtime/Host.h"
-#include "runtime/TableView.h"
+#include "runtime/host/Host.h"
+#include "runtime/lists/TableView.h"
 
 void UIViewController::setTitle(std::optional<std::string> title) { _title = std::move(title); }
 

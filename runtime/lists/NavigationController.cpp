@@ -1,7 +1,7 @@
-#include "runtime/NavigationController.h"
+#include "runtime/lists/NavigationController.h"
 
-#include "runtime/PSListView.h"
-#include "runtime/TableView.h"
+#include "runtime/lists/PSListView.h"
+#include "runtime/lists/TableView.h"
 
 namespace quorl {
 

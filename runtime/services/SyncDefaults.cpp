@@ -1,4 +1,4 @@
-#include "runtime/SyncDefaults.h"
+#include "runtime/services/SyncDefaults.h"
 
 #include "platform/Dispatch.h"
 

@@ -1,6 +1,6 @@
 #include <dlfcn.h>
 
-#include "runtime/PluginBundle.h"
+#include "runtime/plugins/PluginBundle.h"
 
 namespace {
 

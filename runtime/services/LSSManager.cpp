@@ -1,5 +1,5 @@
-#include "runtime/Host.h"
-#include "runtime/LSSClient.h"
+#include "runtime/host/Host.h"
+#include "runtime/services/LSSClient.h"
 
 const std::string_view kLSSUsageAvailableStorageKey = "kLSSUsageAvailableStorageKey";
 const std::string_view kLSSUsageSongsKey = "kLSSUsageSongsKey";

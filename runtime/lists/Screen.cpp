@@ -1,9 +1,9 @@
-#include "runtime/Screen.h"
+#include "runtime/host/Screen.h"
 
 #include <algorithm>
 #include <cmath>
 
-#include "runtime/Host.h"
+#include "runtime/host/Host.h"
 
 namespace quorl {
 

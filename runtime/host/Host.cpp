@@ -1,12 +1,12 @@
-#include "runtime/Host.h"
+#include "runtime/host/Host.h"
 
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
 
-#include "runtime/NotificationCenter.h"
-#include "runtime/SizeText.h"
-#include "runtime/StringTable.h"
+#include "runtime/objects/NotificationCenter.h"
+#include "runtime/services/SizeText.h"
+#include "runtime/plugins/StringTable.h"
 
 namespace quorl {
 

@@ -1,4 +1,4 @@
-#include "runtime/PluginBundle.h"
+#include "runtime/plugins/PluginBundle.h"
 
 #include <algorithm>
 #include <cstdlib>
@@ -8,8 +8,8 @@
 #include <nlohmann/json.hpp>
 
 #include "platform/InterfaceVersion.h"
-#include "runtime/Host.h"
-#include "runtime/SharedObjectFile.h"
+#include "runtime/host/Host.h"
+#include "runtime/plugins/SharedObjectFile.h"
 
 namespace quorl {
 

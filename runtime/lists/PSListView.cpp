@@ -1,4 +1,4 @@
-#include "runtime/PSListView.h"
+#include "runtime/lists/PSListView.h"
 
 #include <algorithm>
 

@@ -6,8 +6,8 @@
 #include <unicode/measunit.h>
 #include <unicode/numberformatter.h>
 
-#include "runtime/Host.h"
-#include "runtime/SizeText.h"
+#include "runtime/host/Host.h"
+#include "runtime/services/SizeText.h"
 
 namespace quorl {
 

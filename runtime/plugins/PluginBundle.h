@@ -4,7 +4,7 @@
 #include <stdexcept>
 
 #include "platform/Foundation.h"
-#include "runtime/StringTable.h"
+#include "runtime/plugins/StringTable.h"
 
 namespace quorl {
 

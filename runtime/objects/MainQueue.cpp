@@ -1,4 +1,4 @@
-#include "runtime/MainQueue.h"
+#include "runtime/objects/MainQueue.h"
 
 #include <cstdint>
 

@@ -4,7 +4,7 @@
 #include <unicode/numberformatter.h>
 
 #include "platform/Foundation.h"
-#include "runtime/Host.h"
+#include "runtime/host/Host.h"
 
 namespace {
 

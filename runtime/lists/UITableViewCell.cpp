@@ -1,6 +1,6 @@
-#include "runtime/Host.h"
-#include "runtime/Label.h"
-#include "runtime/Screen.h"
+#include "runtime/host/Host.h"
+#include "runtime/lists/Label.h"
+#include "runtime/host/Screen.h"
 
 UITableViewCell::UITableViewCell() = default;
 
