@@ -1,7 +1,7 @@
 #include "quorl-syncd/Device.h"
 
 #include "quorl-syncd/SongFile.h"
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 #include "services/wearable/Report.h"
 
 #include <dirent.h>

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "services/media/FileDescriptor.h"
+#include "services/base/FileDescriptor.h"
 #include "services/wearable/Manifest.h"
 #include "services/wearable/Wearable.h"
 

@@ -1,6 +1,6 @@
 #include "quorl-syncd/DeviceNames.h"
 
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 #include <unicode/unistr.h>
 

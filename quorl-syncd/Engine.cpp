@@ -2,7 +2,7 @@
 
 #include "quorl-syncd/SessionObject.h"
 #include "quorl-syncd/SleepInhibitor.h"
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 
 #include <glib.h>
 #include <poll.h>

@@ -1,6 +1,6 @@
 #include "quorl-syncd/LastResults.h"
 
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 
 #include <nlohmann/json.hpp>
 

@@ -2,7 +2,7 @@
 
 #include "quorl-syncd/ContentHash.h"
 #include "quorl-syncd/RateLimit.h"
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 #include <fcntl.h>
 #include <linux/fs.h>

@@ -3,7 +3,7 @@
 #include "quorl-syncd/ContentHash.h"
 #include "quorl-syncd/DeviceNames.h"
 #include "quorl-syncd/RateLimit.h"
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 
 #include <algorithm>
 #include <cerrno>

@@ -3,10 +3,10 @@
 //
 //     quorl-media-fuzz -max_total_time=60 CORPUS fuzz/media/seeds
 
-#include "services/media/EntryReadings.h"
-#include "services/media/LeftOut.h"
-#include "services/media/PlaylistContent.h"
-#include "services/media/Text.h"
+#include "services/media/playlists/EntryReadings.h"
+#include "services/media/playlists/LeftOut.h"
+#include "services/media/playlists/PlaylistContent.h"
+#include "services/base/Text.h"
 
 #include <glib.h>
 

@@ -1,6 +1,6 @@
 #include "quorl/app/CompanionHost.h"
 
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 namespace quorl {
 

@@ -6,7 +6,7 @@
 #include "runtime/services/SizeText.h"
 #include "runtime/plugins/StringTable.h"
 #include "services/media/MusicFolder.h"
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 namespace quorl {
 

@@ -5,7 +5,7 @@
 #include <QString>
 
 #include "quorl/content/SwitchCell.h"
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 namespace quorl {
 

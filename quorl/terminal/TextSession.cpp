@@ -10,7 +10,7 @@
 #include <unistd.h>
 
 #include "quorl/terminal/PaneText.h"
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 namespace quorl {
 

@@ -1,7 +1,7 @@
 #include "services/media/ContentKinds.h"
 
-#include "services/media/FileDescriptor.h"
-#include "services/media/FileStatus.h"
+#include "services/base/FileDescriptor.h"
+#include "services/base/FileStatus.h"
 
 #include <gio/gio.h>
 

@@ -1,9 +1,9 @@
 #include "services/media/Directory.h"
 
-#include "services/media/FileDescriptor.h"
-#include "services/media/FileStatus.h"
-#include "services/media/MallocText.h"
-#include "services/media/Text.h"
+#include "services/base/FileDescriptor.h"
+#include "services/base/FileStatus.h"
+#include "services/base/MallocText.h"
+#include "services/base/Text.h"
 
 #include <dirent.h>
 #include <fcntl.h>

@@ -1,9 +1,9 @@
 #pragma once
 
 #include "services/media/ContentKinds.h"
-#include "services/media/PlaylistContent.h"
+#include "services/media/playlists/PlaylistContent.h"
 #include "services/media/Snapshot.h"
-#include "services/media/TextList.h"
+#include "services/media/playlists/TextList.h"
 
 #include <sys/types.h>
 

@@ -1,9 +1,9 @@
 #include "services/media/EntryResolver.h"
 
-#include "services/media/EntryReadings.h"
-#include "services/media/FileStatus.h"
-#include "services/media/MallocText.h"
-#include "services/media/Text.h"
+#include "services/media/playlists/EntryReadings.h"
+#include "services/base/FileStatus.h"
+#include "services/base/MallocText.h"
+#include "services/base/Text.h"
 
 #include <sys/stat.h>
 

@@ -1,8 +1,8 @@
 #pragma once
 
 #include "services/media/FolderTree.h"
-#include "services/media/LeftOut.h"
-#include "services/media/PlaylistContent.h"
+#include "services/media/playlists/LeftOut.h"
+#include "services/media/playlists/PlaylistContent.h"
 
 #include <optional>
 #include <string>

@@ -2,7 +2,7 @@
 
 #include "services/media/ContentKinds.h"
 #include "services/media/Directory.h"
-#include "services/media/DirectoryWatch.h"
+#include "services/base/DirectoryWatch.h"
 
 #include <cstddef>
 #include <filesystem>

@@ -1,10 +1,10 @@
 #include "services/media/MusicFolder.h"
 
-#include "services/media/DirectoryWatch.h"
-#include "services/media/FileDescriptor.h"
+#include "services/base/DirectoryWatch.h"
+#include "services/base/FileDescriptor.h"
 #include "services/media/FolderTree.h"
-#include "services/media/MountWatch.h"
-#include "services/media/RootWatch.h"
+#include "services/base/MountWatch.h"
+#include "services/base/RootWatch.h"
 #include "services/media/SnapshotBuilder.h"
 
 #include <malloc.h>

@@ -1,6 +1,6 @@
 #include "services/media/PlaylistIdentity.h"
 
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 #include <glib.h>
 

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "services/media/Generated.h"
-#include "services/media/LeftOut.h"
-#include "services/media/TextList.h"
+#include "services/media/playlists/Generated.h"
+#include "services/media/playlists/LeftOut.h"
+#include "services/media/playlists/TextList.h"
 
 #include <cstddef>
 #include <cstdint>

@@ -3,7 +3,7 @@
 #include "services/media/Collation.h"
 #include "services/media/EntryResolver.h"
 #include "services/media/PlaylistIdentity.h"
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 #include <algorithm>
 #include <unordered_map>

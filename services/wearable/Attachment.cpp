@@ -1,6 +1,6 @@
 #include "services/wearable/Attachment.h"
 
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 #include "services/wearable/Wearable.h"
 
 #include <nlohmann/json.hpp>

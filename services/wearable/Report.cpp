@@ -1,6 +1,6 @@
 #include "services/wearable/Report.h"
 
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 
 #include <fcntl.h>
 #include <sys/stat.h>

@@ -4,7 +4,7 @@
 #include "tests/engine/SlowDevice.h"
 
 #include "services/engine/Names.h"
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 
 #include <sdbus-c++/sdbus-c++.h>
 

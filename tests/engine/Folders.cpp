@@ -1,7 +1,7 @@
 #include "tests/engine/Folders.h"
 
 #include "services/media/MusicFolder.h"
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 
 #include <fcntl.h>
 

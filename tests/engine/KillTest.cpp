@@ -1,6 +1,6 @@
 // The engine is killed again and again while it works.
 
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 #include "tests/engine/EngineFixture.h"
 
 #include <chrono>

@@ -1,6 +1,6 @@
-#include "services/media/LeftOut.h"
+#include "services/media/playlists/LeftOut.h"
 #include "services/media/MusicFolder.h"
-#include "services/media/PlaylistContent.h"
+#include "services/media/playlists/PlaylistContent.h"
 #include "tests/media/TemporaryFolder.h"
 
 #include <gmock/gmock.h>

@@ -1,7 +1,7 @@
 // The list of our files on a wearable, which others may have had in their hands.
 
 #include "services/wearable/Manifest.h"
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 #include "services/wearable/Attachment.h"
 #include "tests/wearable/TemporaryDirectory.h"
 

@@ -1,7 +1,7 @@
 // How much room a wearable says it has.
 
 #include "services/wearable/Report.h"
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 #include "tests/wearable/TemporaryDirectory.h"
 
 #include <gmock/gmock.h>

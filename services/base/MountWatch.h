@@ -1,6 +1,6 @@
 #pragma once
 
-#include "services/media/FileDescriptor.h"
+#include "services/base/FileDescriptor.h"
 
 #include <filesystem>
 #include <string>

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "services/media/LeftOut.h"
-#include "services/media/PlaylistContent.h"
+#include "services/media/playlists/LeftOut.h"
+#include "services/media/playlists/PlaylistContent.h"
 
 #include <string>
 #include <string_view>

@@ -1,6 +1,6 @@
-#include "services/media/LeftOut.h"
+#include "services/media/playlists/LeftOut.h"
 
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 #include <algorithm>
 #include <array>

@@ -1,4 +1,4 @@
-#include "services/media/EntryReadings.h"
+#include "services/media/playlists/EntryReadings.h"
 
 #include <glib.h>
 

@@ -1,6 +1,6 @@
-#include "services/media/PlaylistContent.h"
+#include "services/media/playlists/PlaylistContent.h"
 
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 #include <glib.h>
 #include <pugixml.hpp>

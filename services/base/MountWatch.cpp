@@ -1,7 +1,7 @@
-#include "services/media/MountWatch.h"
+#include "services/base/MountWatch.h"
 
-#include "services/media/FileStatus.h"
-#include "services/media/Text.h"
+#include "services/base/FileStatus.h"
+#include "services/base/Text.h"
 
 #include <fcntl.h>
 #include <sys/stat.h>

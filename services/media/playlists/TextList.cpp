@@ -1,4 +1,4 @@
-#include "services/media/TextList.h"
+#include "services/media/playlists/TextList.h"
 
 #include <limits>
 #include <stdexcept>

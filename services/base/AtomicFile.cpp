@@ -1,4 +1,4 @@
-#include "services/wearable/AtomicFile.h"
+#include "services/base/AtomicFile.h"
 
 #include <fcntl.h>
 #include <sys/stat.h>

@@ -1,6 +1,6 @@
-#include "services/media/RootWatch.h"
+#include "services/base/RootWatch.h"
 
-#include "services/media/InotifyEvents.h"
+#include "services/base/InotifyEvents.h"
 
 #include <utility>
 

@@ -1,4 +1,4 @@
-#include "services/media/Text.h"
+#include "services/base/Text.h"
 
 #include <glib.h>
 

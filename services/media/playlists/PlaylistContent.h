@@ -1,7 +1,7 @@
 #pragma once
 
-#include "services/media/Generated.h"
-#include "services/media/TextList.h"
+#include "services/media/playlists/Generated.h"
+#include "services/media/playlists/TextList.h"
 
 #include <cstddef>
 #include <cstdint>

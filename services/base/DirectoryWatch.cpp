@@ -1,6 +1,6 @@
-#include "services/media/DirectoryWatch.h"
+#include "services/base/DirectoryWatch.h"
 
-#include "services/media/InotifyEvents.h"
+#include "services/base/InotifyEvents.h"
 
 namespace quorl::media {
 
