@@ -1,7 +1,7 @@
 // quorl-syncd: brings the chosen playlist to the wearable.
 
-#include "quorl-syncd/BusObjects.h"
-#include "quorl-syncd/Engine.h"
+#include "quorl-syncd/bus/BusObjects.h"
+#include "quorl-syncd/engine/Engine.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Names.h"
 #include "services/preferences/SharedPreferences.h"

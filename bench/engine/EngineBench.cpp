@@ -5,8 +5,8 @@
 //
 // Everything is made in DIRECTORY, which must not exist yet, or in a temporary one, and deleted.
 
-#include "quorl-syncd/RateLimit.h"
-#include "quorl-syncd/Sync.h"
+#include "quorl-syncd/transfer/RateLimit.h"
+#include "quorl-syncd/transfer/Sync.h"
 #include "services/media/MusicFolder.h"
 
 #include <unistd.h>

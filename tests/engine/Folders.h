@@ -1,7 +1,7 @@
 #pragma once
 
-#include "quorl-syncd/RateLimit.h"
-#include "quorl-syncd/Sync.h"
+#include "quorl-syncd/transfer/RateLimit.h"
+#include "quorl-syncd/transfer/Sync.h"
 #include "services/preferences/Preference.h"
 #include "tests/wearable/TemporaryDirectory.h"
 

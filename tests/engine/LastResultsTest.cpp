@@ -1,7 +1,7 @@
 // What the engine remembers of its syncs, and when it tries again.
 
-#include "quorl-syncd/LastResults.h"
-#include "quorl-syncd/RetryDelay.h"
+#include "quorl-syncd/engine/LastResults.h"
+#include "quorl-syncd/engine/RetryDelay.h"
 #include "tests/wearable/TemporaryDirectory.h"
 
 #include <gtest/gtest.h>

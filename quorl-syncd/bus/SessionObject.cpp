@@ -1,4 +1,4 @@
-#include "quorl-syncd/SessionObject.h"
+#include "quorl-syncd/bus/SessionObject.h"
 
 #include "services/engine/Names.h"
 

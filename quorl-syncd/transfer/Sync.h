@@ -1,8 +1,8 @@
 #pragma once
 
-#include "quorl-syncd/Device.h"
-#include "quorl-syncd/SongFile.h"
-#include "quorl-syncd/Wish.h"
+#include "quorl-syncd/transfer/Device.h"
+#include "quorl-syncd/transfer/SongFile.h"
+#include "quorl-syncd/transfer/Wish.h"
 
 #include <chrono>
 #include <functional>

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "quorl-syncd/LastResults.h"
-#include "quorl-syncd/RateLimit.h"
-#include "quorl-syncd/RetryDelay.h"
-#include "quorl-syncd/Sync.h"
-#include "quorl-syncd/Wish.h"
+#include "quorl-syncd/engine/LastResults.h"
+#include "quorl-syncd/transfer/RateLimit.h"
+#include "quorl-syncd/engine/RetryDelay.h"
+#include "quorl-syncd/transfer/Sync.h"
+#include "quorl-syncd/transfer/Wish.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Model.h"
 #include "services/base/MountWatch.h"

@@ -1,4 +1,4 @@
-#include "quorl-syncd/LastResults.h"
+#include "quorl-syncd/engine/LastResults.h"
 
 #include "services/base/AtomicFile.h"
 

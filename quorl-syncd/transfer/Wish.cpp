@@ -1,4 +1,4 @@
-#include "quorl-syncd/Wish.h"
+#include "quorl-syncd/transfer/Wish.h"
 
 #include "services/preferences/Preference.h"
 

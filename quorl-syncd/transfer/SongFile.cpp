@@ -1,7 +1,7 @@
-#include "quorl-syncd/SongFile.h"
+#include "quorl-syncd/transfer/SongFile.h"
 
-#include "quorl-syncd/ContentHash.h"
-#include "quorl-syncd/RateLimit.h"
+#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/RateLimit.h"
 #include "services/base/Text.h"
 
 #include <fcntl.h>

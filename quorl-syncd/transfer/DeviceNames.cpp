@@ -1,4 +1,4 @@
-#include "quorl-syncd/DeviceNames.h"
+#include "quorl-syncd/transfer/DeviceNames.h"
 
 #include "services/base/Text.h"
 

@@ -1,4 +1,4 @@
-#include "quorl-syncd/ContentHash.h"
+#include "quorl-syncd/transfer/ContentHash.h"
 
 #include <xxhash.h>
 

@@ -1,4 +1,4 @@
-#include "quorl-syncd/SleepInhibitor.h"
+#include "quorl-syncd/bus/SleepInhibitor.h"
 
 #include "services/wearable/Wearable.h"
 

@@ -1,8 +1,8 @@
-#include "quorl-syncd/Sync.h"
+#include "quorl-syncd/transfer/Sync.h"
 
-#include "quorl-syncd/ContentHash.h"
-#include "quorl-syncd/DeviceNames.h"
-#include "quorl-syncd/RateLimit.h"
+#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/DeviceNames.h"
+#include "quorl-syncd/transfer/RateLimit.h"
 #include "services/base/AtomicFile.h"
 
 #include <algorithm>

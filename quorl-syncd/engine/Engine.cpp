@@ -1,7 +1,7 @@
-#include "quorl-syncd/Engine.h"
+#include "quorl-syncd/engine/Engine.h"
 
-#include "quorl-syncd/SessionObject.h"
-#include "quorl-syncd/SleepInhibitor.h"
+#include "quorl-syncd/bus/SessionObject.h"
+#include "quorl-syncd/bus/SleepInhibitor.h"
 #include "services/base/AtomicFile.h"
 
 #include <glib.h>

@@ -1,6 +1,6 @@
-#include "quorl-syncd/BusObjects.h"
+#include "quorl-syncd/bus/BusObjects.h"
 
-#include "quorl-syncd/Engine.h"
+#include "quorl-syncd/engine/Engine.h"
 #include "services/engine/Names.h"
 
 #include <Engine-adaptor.h>

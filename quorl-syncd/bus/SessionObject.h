@@ -1,6 +1,6 @@
 #pragma once
 
-#include "quorl-syncd/Sync.h"
+#include "quorl-syncd/transfer/Sync.h"
 
 #include <sdbus-c++/sdbus-c++.h>
 

@@ -1,6 +1,6 @@
-#include "quorl-syncd/Device.h"
+#include "quorl-syncd/transfer/Device.h"
 
-#include "quorl-syncd/SongFile.h"
+#include "quorl-syncd/transfer/SongFile.h"
 #include "services/base/AtomicFile.h"
 #include "services/wearable/Report.h"
 
