@@ -27,13 +27,13 @@ int complain(ExitCode code, const std::string& problem) {
 }
 
 /// Has the signals that end programs end the loop instead. Before any thread is started.
-media::FileDescriptor blockSignals() {
+base::FileDescriptor blockSignals() {
     sigset_t signals;
     sigemptyset(&signals);
     sigaddset(&signals, SIGTERM);
     sigaddset(&signals, SIGINT);
     pthread_sigmask(SIG_BLOCK, &signals, nullptr);
-    return media::FileDescriptor{signalfd(-1, &signals, SFD_CLOEXEC)};
+    return base::FileDescriptor{signalfd(-1, &signals, SFD_CLOEXEC)};
 }
 
 int serve(const syncd::Options& options) {

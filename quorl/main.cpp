@@ -1,8 +1,8 @@
 #include <iostream>
 
 #include "quorl/app/CommandLine.h"
-#include "quorl/reports/LibraryReport.h"
 #include "quorl/app/Run.h"
+#include "quorl/reports/LibraryReport.h"
 #include "quorl/reports/StatusReport.h"
 
 namespace {

@@ -3,10 +3,10 @@
 //
 //     quorl-media-fuzz -max_total_time=60 CORPUS fuzz/media/seeds
 
+#include "services/base/Utf8.h"
 #include "services/media/playlists/EntryReadings.h"
 #include "services/media/playlists/LeftOut.h"
 #include "services/media/playlists/PlaylistContent.h"
-#include "services/base/Text.h"
 
 #include <glib.h>
 
@@ -48,8 +48,8 @@ void readAs(quorl::media::Format format, std::string_view bytes) {
             demand(!readings->empty());
             for (const std::string& path : *readings) {
                 demand(path.find('\0') == std::string::npos);
-                static_cast<void>(quorl::media::composed(path));
-                static_cast<void>(quorl::media::decomposed(path));
+                static_cast<void>(quorl::base::composed(path));
+                static_cast<void>(quorl::base::decomposed(path));
             }
         }
         demand(isUtf8(
@@ -61,7 +61,7 @@ void readAs(quorl::media::Format format, std::string_view bytes) {
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     const std::string_view bytes(std::bit_cast<const char*>(data), size);
-    demand(isUtf8(quorl::media::printable(bytes)));
+    demand(isUtf8(quorl::base::printable(bytes)));
     readAs(quorl::media::Format::M3u, bytes);
     readAs(quorl::media::Format::Pls, bytes);
     readAs(quorl::media::Format::Xspf, bytes);

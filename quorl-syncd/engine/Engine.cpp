@@ -140,7 +140,7 @@ void Engine::setWearableDirectory(const std::string& path) {
     reporter_ = std::make_unique<wearable::Reporter>(wearable_);
     if (wearable_.isEmbedded()) {
         std::filesystem::create_directories(wearable_.root);
-        attachment_ = wearable::loadAttachment(wearable::openRoot(wearable_.root.c_str()).get());
+        attachment_ = wearable::loadAttachment(base::openRoot(wearable_.root.c_str()).get());
     } else {
         watchWearable();
     }
@@ -153,7 +153,7 @@ void Engine::attach(const wearable::Attachment& attachment) {
         throw NotReady{"This wearable is a device; plug it in or out instead."};
     }
     try {
-        wearable::saveAttachment(wearable::openRoot(wearable_.root.c_str()).get(), attachment);
+        wearable::saveAttachment(base::openRoot(wearable_.root.c_str()).get(), attachment);
     } catch (const std::system_error& error) {
         throw NotReady{"The wearable could not remember it: " + error.code().message() + "."};
     }

@@ -1,15 +1,15 @@
 #pragma once
 
 #include "quorl-syncd/engine/LastResults.h"
-#include "quorl-syncd/transfer/RateLimit.h"
 #include "quorl-syncd/engine/RetryDelay.h"
+#include "quorl-syncd/transfer/RateLimit.h"
 #include "quorl-syncd/transfer/Sync.h"
 #include "quorl-syncd/transfer/Wish.h"
+#include "services/base/MountWatch.h"
+#include "services/base/RootWatch.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Model.h"
-#include "services/base/MountWatch.h"
 #include "services/media/MusicFolder.h"
-#include "services/base/RootWatch.h"
 #include "services/preferences/SharedPreferences.h"
 #include "services/wearable/Attachment.h"
 #include "services/wearable/Reporter.h"
@@ -124,8 +124,8 @@ class Engine {
     /// Nothing while it is not there or was not looked at yet; then the sentence says why.
     std::optional<wearable::Report> report_;
     std::string wearableProblem_;
-    std::optional<media::RootWatch> rootWatch_;
-    std::optional<media::MountWatch> mountWatch_;
+    std::optional<base::RootWatch> rootWatch_;
+    std::optional<base::MountWatch> mountWatch_;
     /// Which reports still count.
     std::uint64_t wearables_ = 0;
 

@@ -19,8 +19,7 @@ NLOHMANN_DEFINE_TYPE_NON_INTRUSIVE(LastResult, success, message, time)
 
 LastResults::LastResults(std::filesystem::path directory) : directory_{std::move(directory)} {
     try {
-        const auto text =
-            wearable::readFile(wearable::openRoot(directory_.c_str()).get(), fileName);
+        const auto text = base::readFile(base::openRoot(directory_.c_str()).get(), fileName);
         results_ = Json::parse(text).get<std::map<std::string, LastResult>>();
     } catch (const Json::exception&) {
         results_.clear();
@@ -38,7 +37,7 @@ void LastResults::remember(const std::string& wearable, LastResult result) {
     results_[wearable] = std::move(result);
     std::filesystem::create_directories(directory_);
     const auto text = Json(results_).dump(2, ' ', false, Json::error_handler_t::replace);
-    wearable::replaceFile(wearable::openRoot(directory_.c_str()).get(), fileName, text + "\n");
+    base::replaceFile(base::openRoot(directory_.c_str()).get(), fileName, text + "\n");
 }
 
 } // namespace quorl::syncd

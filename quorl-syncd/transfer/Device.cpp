@@ -19,7 +19,7 @@
 namespace quorl::syncd {
 namespace {
 
-using media::FileDescriptor;
+using base::FileDescriptor;
 using wearable::Entry;
 
 constexpr std::string_view unfinishedEnding = ".part";
@@ -34,7 +34,7 @@ FileDescriptor openWearable(const wearable::Wearable& wearable) {
         errno = ENODEV;
         fail(wearable.root);
     }
-    return wearable::openRoot(wearable.root.c_str());
+    return base::openRoot(wearable.root.c_str());
 }
 
 std::vector<std::string> namesIn(int directory) {
@@ -83,8 +83,8 @@ bool isSameTime(std::int64_t first, std::int64_t second) {
 Device::Device(const wearable::Wearable& wearable)
     : wearable_{wearable},
       root_{openWearable(wearable)},
-      music_{wearable::openDirectory(root_.get(), wearable::musicDirectory)},
-      own_{wearable::openDirectory(root_.get(), wearable::ownDirectory)} {
+      music_{base::openDirectory(root_.get(), wearable::musicDirectory)},
+      own_{base::openDirectory(root_.get(), wearable::ownDirectory)} {
     if (flock(own_.get(), LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK) {
         throw std::runtime_error{"Another program is syncing to this " +
                                  std::string{wearable::wearableName} +
@@ -166,12 +166,12 @@ void Device::removeUnfinished() const {
     }
 }
 
-void Device::syncMusic() const { wearable::syncToDevice(music_.get()); }
+void Device::syncMusic() const { base::syncToDevice(music_.get()); }
 
 void Device::writeUnfinished(const std::string& name, std::string_view text) const {
     const auto file = createUnfinished(name);
     writeAll(file.get(), std::as_bytes(std::span{text}));
-    wearable::syncToDevice(file.get());
+    base::syncToDevice(file.get());
 }
 
 void Device::writeMusic(const std::string& name, std::string_view text) const {

@@ -46,12 +46,12 @@ class Device {
     [[nodiscard]] bool isOurs(const wearable::Entry& stray) const;
 
     /// Opens a file of the music directory for reading.
-    [[nodiscard]] media::FileDescriptor openMusic(const std::string& name) const;
+    [[nodiscard]] base::FileDescriptor openMusic(const std::string& name) const;
 
     void removeMusic(const std::string& name) const;
 
     /// Makes an empty file that is not in the music directory yet.
-    [[nodiscard]] media::FileDescriptor createUnfinished(const std::string& name) const;
+    [[nodiscard]] base::FileDescriptor createUnfinished(const std::string& name) const;
 
     /// Moves a complete file into the music directory. Throws `EEXIST` where there is a file of
     /// that name. Only outlives a loss of power after `syncMusic`.
@@ -73,9 +73,9 @@ class Device {
     void writeUnfinished(const std::string& name, std::string_view text) const;
 
     wearable::Wearable wearable_;
-    media::FileDescriptor root_;
-    media::FileDescriptor music_;
-    media::FileDescriptor own_;
+    base::FileDescriptor root_;
+    base::FileDescriptor music_;
+    base::FileDescriptor own_;
 };
 
 } // namespace quorl::syncd

@@ -1,6 +1,6 @@
 #include "quorl-syncd/transfer/DeviceNames.h"
 
-#include "services/base/Text.h"
+#include "services/base/Utf8.h"
 
 #include <unicode/unistr.h>
 
@@ -27,7 +27,7 @@ std::string folded(std::string_view name) {
     icu::UnicodeString::fromUTF8({name.data(), static_cast<std::int32_t>(name.size())})
         .foldCase()
         .toUTF8String(result);
-    return media::composed(result);
+    return base::composed(result);
 }
 
 bool isAllowed(char byte) {
@@ -82,7 +82,7 @@ std::string withSuffix(std::string_view name, std::string_view suffix) {
 } // namespace
 
 std::string deviceName(std::string_view name) {
-    auto result = media::composed(media::validUtf8(name));
+    auto result = base::composed(base::validUtf8(name));
     std::ranges::replace_if(result, std::not_fn(isAllowed), replacement);
     if (isDevice(result) || result.starts_with('.')) {
         result.insert(result.begin(), replacement);

@@ -2,7 +2,7 @@
 
 #include "quorl-syncd/transfer/ContentHash.h"
 #include "quorl-syncd/transfer/RateLimit.h"
-#include "services/base/Text.h"
+#include "services/base/Utf8.h"
 
 #include <fcntl.h>
 #include <linux/fs.h>
@@ -64,7 +64,7 @@ void setModified(int file, std::int64_t modified) {
     static_cast<void>(futimens(file, times));
 }
 
-std::string inQuotes(const std::string& path) { return "“" + media::printable(path) + "”"; }
+std::string inQuotes(const std::string& path) { return "“" + base::printable(path) + "”"; }
 
 } // namespace
 

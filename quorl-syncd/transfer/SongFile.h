@@ -76,7 +76,7 @@ class SongFile {
 
     std::string path_;
     FileState expected_;
-    media::FileDescriptor file_;
+    base::FileDescriptor file_;
 };
 
 /// Throws `std::system_error`.

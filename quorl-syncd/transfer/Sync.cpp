@@ -310,7 +310,7 @@ void Sync::copySong(Device& device, Song& song) {
 void Sync::settle(Device& device) {
     const auto begun = std::chrono::steady_clock::now();
     for (const auto& [song, unfinished, file] : copied_) {
-        wearable::syncToDevice(file.get());
+        base::syncToDevice(file.get());
         device.finish(unfinished, song->name);
     }
     if (!copied_.empty()) {

@@ -64,7 +64,7 @@ class Sync {
     struct Copied {
         Song* song;
         std::string unfinished;
-        media::FileDescriptor file;
+        base::FileDescriptor file;
     };
 
     void perform(Device& device);

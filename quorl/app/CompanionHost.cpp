@@ -1,6 +1,6 @@
 #include "quorl/app/CompanionHost.h"
 
-#include "services/base/Text.h"
+#include "services/base/Utf8.h"
 
 namespace quorl {
 
@@ -42,7 +42,7 @@ void CompanionHost::noticeProblems(const media::Snapshot& snapshot) {
     notices_.set(Notices::Topic::MusicFolder,
                  snapshot.rootFound
                      ? std::string()
-                     : "There is no music folder at " + media::printable(snapshot.root.string()) +
+                     : "There is no music folder at " + base::printable(snapshot.root.string()) +
                            ". Create it, or start quorl with --music and another folder.");
     notices_.set(Notices::Topic::Watching, snapshot.unwatchedNotice());
 }

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "quorl/app/CommandLine.h"
 #include "quorl/adapters/Library.h"
 #include "quorl/adapters/PreferencesStore.h"
 #include "quorl/adapters/SyncEngine.h"
 #include "quorl/adapters/Wearable.h"
+#include "quorl/app/CommandLine.h"
 #include "runtime/host/Host.h"
 #include "runtime/host/Screen.h"
 

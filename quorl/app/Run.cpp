@@ -8,10 +8,10 @@
 #include <QCursor>
 #include <QLocale>
 
-#include "quorl/window/MainWindow.h"
 #include "quorl/reports/Screenshot.h"
 #include "quorl/terminal/TextScreen.h"
 #include "quorl/terminal/TextSession.h"
+#include "quorl/window/MainWindow.h"
 #include "runtime/plugins/StringTable.h"
 
 namespace quorl {

@@ -3,10 +3,10 @@
 #include <iostream>
 #include <numeric>
 
-#include "runtime/services/SizeText.h"
 #include "runtime/plugins/StringTable.h"
+#include "runtime/services/SizeText.h"
+#include "services/base/Utf8.h"
 #include "services/media/MusicFolder.h"
-#include "services/base/Text.h"
 
 namespace quorl {
 
@@ -40,17 +40,17 @@ std::string_view kindOf(const media::Playlist& playlist) {
 
 std::string describe(const media::Playlist& playlist, const media::Snapshot& snapshot,
                      const std::string& language) {
-    std::string line = media::printable(playlist.name) + ": " +
+    std::string line = base::printable(playlist.name) + ": " +
                        countOf(playlist.songs.size(), "song") + ", " +
                        sizeText(static_cast<double>(bytesOf(playlist, snapshot)), language) + ", " +
-                       media::printable(playlist.path);
+                       base::printable(playlist.path);
     const auto kind = kindOf(playlist);
     return kind.empty() ? line : line + " (" + std::string(kind) + ")";
 }
 
 void printPlaylists(const media::Snapshot& snapshot) {
     const std::string language = environmentLanguages().front();
-    std::cout << media::printable(snapshot.root.string()) << ": "
+    std::cout << base::printable(snapshot.root.string()) << ": "
               << countOf(snapshot.playlists.size(), "playlist") << ", "
               << countOf(snapshot.songs.size(), "song") << " listed\n";
     for (const auto& playlist : snapshot.playlists) {
@@ -71,7 +71,7 @@ ExitCode printLibrary(const Options& options) {
     const auto snapshot = media::scan(options.music);
     if (!snapshot->rootFound) {
         std::cerr << "quorl: There is no music folder at "
-                  << media::printable(options.music.string())
+                  << base::printable(options.music.string())
                   << ". Create it, or name another one with --music.\n";
         return ExitCode::NoMusicFolder;
     }

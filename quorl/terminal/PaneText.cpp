@@ -5,7 +5,7 @@
 #include <QString>
 
 #include "quorl/content/SwitchCell.h"
-#include "services/base/Text.h"
+#include "services/base/Utf8.h"
 
 namespace quorl {
 
@@ -13,9 +13,7 @@ namespace {
 
 constexpr const char* rowIndent = "      ";
 
-std::string textOfLabel(const UILabel& label) {
-    return media::printable(label.text().value_or(""));
-}
+std::string textOfLabel(const UILabel& label) { return base::printable(label.text().value_or("")); }
 
 std::string textOfRow(NSInteger row, const UITableViewCell& cell) {
     const auto number = std::to_string(row + 1);
@@ -36,7 +34,7 @@ std::string textOfSection(const PaneContent& content, const PaneContent::Section
                           NSInteger firstRow, int width) {
     std::string text;
     if (section.title && !section.title->empty()) {
-        text += media::printable(*section.title) + '\n';
+        text += base::printable(*section.title) + '\n';
     }
     for (NSInteger row = firstRow; row < firstRow + section.rowCount; ++row) {
         if (const auto cell = content.cell(row)) {
@@ -44,7 +42,7 @@ std::string textOfSection(const PaneContent& content, const PaneContent::Section
         }
     }
     if (section.footer && !section.footer->empty()) {
-        text += wrapped(media::printable(*section.footer), width, rowIndent);
+        text += wrapped(base::printable(*section.footer), width, rowIndent);
     }
     return text;
 }
@@ -85,7 +83,7 @@ std::string wrapped(const std::string& text, int width, const std::string& inden
 }
 
 std::string textOf(const PaneContent& content, int width) {
-    std::string text = media::printable(content.pane().title().value_or("")) + '\n';
+    std::string text = base::printable(content.pane().title().value_or("")) + '\n';
     NSInteger row = 0;
     for (const auto& section : content.sections()) {
         const auto part = textOfSection(content, section, row, width);

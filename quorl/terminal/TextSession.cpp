@@ -10,7 +10,7 @@
 #include <unistd.h>
 
 #include "quorl/terminal/PaneText.h"
-#include "services/base/Text.h"
+#include "services/base/Utf8.h"
 
 namespace quorl {
 
@@ -37,7 +37,7 @@ std::string textOfProblem(const std::string& problem, int width) {
     std::istringstream lines(problem);
     std::string text;
     for (std::string line; std::getline(lines, line);) {
-        text += line.empty() ? "\n" : wrapped(media::printable(line), width, "");
+        text += line.empty() ? "\n" : wrapped(base::printable(line), width, "");
     }
     return text;
 }
@@ -78,7 +78,7 @@ void TextSession::takeNextLine() {
     }
     const auto end = unread_.find('\n');
     if (end != std::string::npos) {
-        const std::string command(media::trimmed(unread_.substr(0, end)));
+        const std::string command(base::trimmed(unread_.substr(0, end)));
         unread_.erase(0, end + 1);
         nextLine_.start(0);
         take(command);

@@ -6,8 +6,8 @@
 #include <QAbstractScrollArea>
 #include <QVariantAnimation>
 
-#include "quorl/window/PaneColors.h"
 #include "quorl/content/PaneContent.h"
+#include "quorl/window/PaneColors.h"
 #include "quorl/window/RowTexts.h"
 #include "quorl/window/RowsLayout.h"
 #include "quorl/window/WindowScreen.h"

@@ -5,8 +5,8 @@
 #include <cstdlib>
 
 #include "runtime/objects/NotificationCenter.h"
-#include "runtime/services/SizeText.h"
 #include "runtime/plugins/StringTable.h"
+#include "runtime/services/SizeText.h"
 
 namespace quorl {
 

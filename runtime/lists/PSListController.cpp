@@ -2,8 +2,8 @@
 
 #include "platform/HostApp.h"
 #include "runtime/host/Host.h"
-#include "runtime/lists/PSListView.h"
 #include "runtime/host/Screen.h"
+#include "runtime/lists/PSListView.h"
 
 namespace {
 

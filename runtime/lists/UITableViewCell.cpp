@@ -1,6 +1,6 @@
 #include "runtime/host/Host.h"
-#include "runtime/lists/Label.h"
 #include "runtime/host/Screen.h"
+#include "runtime/lists/Label.h"
 
 UITableViewCell::UITableViewCell() = default;
 

@@ -9,10 +9,8 @@
 #include <cstdio>
 #include <system_error>
 
-namespace quorl::wearable {
+namespace quorl::base {
 namespace {
-
-using media::FileDescriptor;
 
 [[noreturn]] void fail(const std::string& what) {
     throw std::system_error{errno, std::generic_category(), what};
@@ -96,4 +94,4 @@ std::string readFile(int directory, const std::string& name) {
     }
 }
 
-} // namespace quorl::wearable
+} // namespace quorl::base

@@ -9,14 +9,14 @@
 ///
 /// Directories are given as open descriptors, so that what is mounted or linked elsewhere in the
 /// meantime makes no difference. Every failure throws `std::system_error`.
-namespace quorl::wearable {
+namespace quorl::base {
 
 /// Opens the directory `name` in the directory `parent`, or makes it. Never follows a symbolic
 /// link out of the wearable.
-[[nodiscard]] media::FileDescriptor openDirectory(int parent, const char* name);
+[[nodiscard]] FileDescriptor openDirectory(int parent, const char* name);
 
 /// Opens the directory at the top of a wearable.
-[[nodiscard]] media::FileDescriptor openRoot(const char* path);
+[[nodiscard]] FileDescriptor openRoot(const char* path);
 
 /// Writes what the system still holds back for the open file or directory. A file system that
 /// cannot do so for directories is no failure.
@@ -28,4 +28,4 @@ void replaceFile(int directory, const std::string& name, std::string_view text);
 /// The contents of the file; empty where there is none.
 [[nodiscard]] std::string readFile(int directory, const std::string& name);
 
-} // namespace quorl::wearable
+} // namespace quorl::base

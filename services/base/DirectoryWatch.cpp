@@ -2,7 +2,7 @@
 
 #include "services/base/InotifyEvents.h"
 
-namespace quorl::media {
+namespace quorl::base {
 
 namespace {
 
@@ -39,4 +39,4 @@ DirectoryWatch::Changes DirectoryWatch::take() {
     return changes;
 }
 
-} // namespace quorl::media
+} // namespace quorl::base

@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-namespace quorl::media {
+namespace quorl::base {
 
 /// Notices changes in the entries of directories, through inotify. For one thread at a time.
 class DirectoryWatch {
@@ -40,4 +40,4 @@ class DirectoryWatch {
     FileDescriptor inotify_;
 };
 
-} // namespace quorl::media
+} // namespace quorl::base

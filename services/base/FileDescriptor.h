@@ -4,7 +4,7 @@
 
 #include <utility>
 
-namespace quorl::media {
+namespace quorl::base {
 
 /// Owns an open file descriptor, or none (-1), and closes it.
 class FileDescriptor {
@@ -37,4 +37,4 @@ class FileDescriptor {
     int descriptor_ = -1;
 };
 
-} // namespace quorl::media
+} // namespace quorl::base

@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <ctime>
 
-namespace quorl::media {
+namespace quorl::base {
 
 /// What `stat` tells of a file. The function and the structure share their name.
 using FileStatus = struct stat;
@@ -19,4 +19,4 @@ using FileStatus = struct stat;
     return seconds * 1'000'000'000 + time.tv_nsec;
 }
 
-} // namespace quorl::media
+} // namespace quorl::base

@@ -9,7 +9,7 @@
 #include <cstring>
 #include <string_view>
 
-namespace quorl::media {
+namespace quorl::base {
 
 /// Calls `use(event, name)` with each inotify event that is ready on `descriptor`, which does not
 /// block. `name` is empty for an event of the watched directory itself and valid during the call.
@@ -36,4 +36,4 @@ void forEachInotifyEvent(int descriptor, Use use) {
     }
 }
 
-} // namespace quorl::media
+} // namespace quorl::base

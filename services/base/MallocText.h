@@ -3,7 +3,7 @@
 #include <cstdlib>
 #include <memory>
 
-namespace quorl::media {
+namespace quorl::base {
 
 struct FreeWithMalloc {
     void operator()(char* text) const { std::free(text); }
@@ -12,4 +12,4 @@ struct FreeWithMalloc {
 /// A C string that the C library allocated, such as the result of `realpath`.
 using MallocText = std::unique_ptr<char, FreeWithMalloc>;
 
-} // namespace quorl::media
+} // namespace quorl::base

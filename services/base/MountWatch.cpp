@@ -1,7 +1,7 @@
 #include "services/base/MountWatch.h"
 
 #include "services/base/FileStatus.h"
-#include "services/base/Text.h"
+#include "services/base/Paths.h"
 
 #include <fcntl.h>
 #include <sys/stat.h>
@@ -14,7 +14,7 @@
 #include <system_error>
 #include <utility>
 
-namespace quorl::media {
+namespace quorl::base {
 
 namespace {
 
@@ -81,4 +81,4 @@ std::string MountWatch::describe() const {
     return description.str();
 }
 
-} // namespace quorl::media
+} // namespace quorl::base

@@ -5,7 +5,7 @@
 #include <filesystem>
 #include <string>
 
-namespace quorl::media {
+namespace quorl::base {
 
 /// Notices when a file system is mounted or unmounted at a directory, below it, or on the way to
 /// it, which inotify does not tell. For one thread at a time.
@@ -29,4 +29,4 @@ class MountWatch {
     std::string known_;
 };
 
-} // namespace quorl::media
+} // namespace quorl::base

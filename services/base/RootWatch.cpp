@@ -4,7 +4,7 @@
 
 #include <utility>
 
-namespace quorl::media {
+namespace quorl::base {
 
 namespace {
 
@@ -47,4 +47,4 @@ void RootWatch::watchTheWay() {
     }
 }
 
-} // namespace quorl::media
+} // namespace quorl::base

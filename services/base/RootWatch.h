@@ -6,7 +6,7 @@
 #include <string>
 #include <unordered_map>
 
-namespace quorl::media {
+namespace quorl::base {
 
 /// Notices when the directory at a path may have become another one: made, deleted, renamed or
 /// replaced, or one on the way to it. For one thread at a time.
@@ -30,4 +30,4 @@ class RootWatch {
     std::unordered_map<int, std::string> nextNames_;
 };
 
-} // namespace quorl::media
+} // namespace quorl::base

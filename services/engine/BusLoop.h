@@ -63,7 +63,7 @@ class BusLoop {
     void callDue();
 
     const std::unique_ptr<sdbus::IConnection> bus_;
-    const media::FileDescriptor wake_;
+    const base::FileDescriptor wake_;
     std::map<int, Watched> watched_;
     std::multimap<Clock::time_point, Task> timers_;
 

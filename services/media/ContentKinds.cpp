@@ -55,9 +55,9 @@ Guess guess(const char* name, const unsigned char* bytes, std::size_t size) {
 
 std::optional<Kind> kindByFirstBytes(int directory, const char* name) {
     // Not blocking, for what was a file a moment ago may be a pipe by now.
-    const FileDescriptor file(
+    const base::FileDescriptor file(
         openat(directory, name, O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
-    FileStatus status{};
+    base::FileStatus status{};
     if (!file || fstat(file.get(), &status) != 0 || !S_ISREG(status.st_mode)) {
         return std::nullopt;
     }

@@ -3,7 +3,8 @@
 #include "services/base/FileDescriptor.h"
 #include "services/base/FileStatus.h"
 #include "services/base/MallocText.h"
-#include "services/base/Text.h"
+#include "services/base/Paths.h"
+#include "services/base/Utf8.h"
 
 #include <dirent.h>
 #include <fcntl.h>
@@ -29,15 +30,15 @@ struct CloseDirectory {
 
 using DirectoryStream = std::unique_ptr<DIR, CloseDirectory>;
 
-PlaylistFile::State stateOf(const FileStatus& status) {
-    return {status.st_ino, static_cast<std::uint64_t>(status.st_size), nanoseconds(status.st_mtim),
-            nanoseconds(status.st_ctim)};
+PlaylistFile::State stateOf(const base::FileStatus& status) {
+    return {status.st_ino, static_cast<std::uint64_t>(status.st_size),
+            base::nanoseconds(status.st_mtim), base::nanoseconds(status.st_ctim)};
 }
 
 bool isSettled(const PlaylistFile::State& state) {
     timespec now{};
     clock_gettime(CLOCK_REALTIME, &now);
-    return std::max(state.modified, state.changed) < nanoseconds(now) - settlingTime;
+    return std::max(state.modified, state.changed) < base::nanoseconds(now) - settlingTime;
 }
 
 /// Everything in `file` up to one byte more than a playlist may have; null: it cannot be read.
@@ -61,7 +62,7 @@ std::optional<std::string> readBytes(int file, std::size_t expected) {
     return bytes;
 }
 
-std::variant<PlaylistContent, Reason> readPlaylist(int file, const FileStatus& status,
+std::variant<PlaylistContent, Reason> readPlaylist(int file, const base::FileStatus& status,
                                                    Format format) {
     if (!S_ISREG(status.st_mode)) {
         return Reason::NotRegularFile;
@@ -123,7 +124,7 @@ class DirectoryReader {
     /// that.
     bool readEntries() {
         constexpr int flags = O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC;
-        FileDescriptor opened(open(path_.c_str(), flags));
+        base::FileDescriptor opened(open(path_.c_str(), flags));
         if (!opened) {
             return errno == ENOENT || errno == ENOTDIR || errno == ELOOP;
         }
@@ -172,7 +173,7 @@ class DirectoryReader {
             return entry.d_type;
         }
 
-        FileStatus status{};
+        base::FileStatus status{};
         if (fstatat(descriptor_, entry.d_name, &status, AT_SYMLINK_NOFOLLOW) != 0) {
             return DT_UNKNOWN;
         }
@@ -207,13 +208,13 @@ class DirectoryReader {
 
     /// Why what the link leads to cannot stand in the folder; null: it can.
     [[nodiscard]] std::optional<Reason> obstacleBehind(const char* name) const {
-        const MallocText target(realpath((path_ + '/' + name).c_str(), nullptr));
+        const base::MallocText target(realpath((path_ + '/' + name).c_str(), nullptr));
 
-        FileStatus status{};
+        base::FileStatus status{};
         if (!target || stat(target.get(), &status) != 0) {
             return errno == EACCES ? Reason::Unreachable : Reason::Missing;
         }
-        if (!isWithin(target.get(), root_)) {
+        if (!base::isWithin(target.get(), root_)) {
             return Reason::OutsideFolder;
         }
         return S_ISREG(status.st_mode) ? std::nullopt : std::optional(Reason::NotRegularFile);
@@ -225,7 +226,7 @@ class DirectoryReader {
 
     void addPlaylist(const char* name, Format format) {
 
-        FileStatus status{};
+        base::FileStatus status{};
         if (PlaylistFile* const previous = previousPlaylist(name);
             previous != nullptr && previous->settled &&
             fstatat(descriptor_, name, &status, 0) == 0 && stateOf(status) == previous->state) {
@@ -234,7 +235,7 @@ class DirectoryReader {
             return;
         }
         // Not blocking, for what was a file a moment ago may be a pipe by now.
-        const FileDescriptor file(
+        const base::FileDescriptor file(
             openat(descriptor_, name, O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
         if (!file || fstat(file.get(), &status) != 0) {
             addFailedPlaylist(name, Reason::PlaylistUnreadable);
@@ -302,7 +303,7 @@ class DirectoryReader {
 };
 
 void examine(int directory, const char* name, SongFile& song) {
-    FileStatus status{};
+    base::FileStatus status{};
     song.examined = true;
     song.obstacle.reset();
     if (fstatat(directory, name, &status, 0) != 0) {
@@ -311,7 +312,7 @@ void examine(int directory, const char* name, SongFile& song) {
         song.obstacle = Reason::NotRegularFile;
     } else {
         song.size = static_cast<std::uint64_t>(status.st_size);
-        song.modified = nanoseconds(status.st_mtim);
+        song.modified = base::nanoseconds(status.st_mtim);
     }
 }
 
@@ -352,7 +353,8 @@ void examineListedSongs(Directory& directory, const std::string& path) {
     if (song == directory.songs.end()) {
         return;
     }
-    const FileDescriptor opened(open(path.c_str(), O_PATH | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
+    const base::FileDescriptor opened(
+        open(path.c_str(), O_PATH | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
     for (; song != directory.songs.end();
          song = std::find_if(++song, directory.songs.end(), isWanted)) {
         examine(opened.get(), std::string(directory.songNames[song->name]).c_str(), *song);

@@ -1,8 +1,8 @@
 #pragma once
 
 #include "services/media/ContentKinds.h"
-#include "services/media/playlists/PlaylistContent.h"
 #include "services/media/Snapshot.h"
+#include "services/media/playlists/PlaylistContent.h"
 #include "services/media/playlists/TextList.h"
 
 #include <sys/types.h>

@@ -1,9 +1,10 @@
 #include "services/media/EntryResolver.h"
 
-#include "services/media/playlists/EntryReadings.h"
 #include "services/base/FileStatus.h"
 #include "services/base/MallocText.h"
-#include "services/base/Text.h"
+#include "services/base/Paths.h"
+#include "services/base/Utf8.h"
+#include "services/media/playlists/EntryReadings.h"
 
 #include <sys/stat.h>
 
@@ -71,10 +72,10 @@ Resolved EntryResolver::resolve(Directory& directory, std::string_view entry, Fo
 std::optional<FoundSong> EntryResolver::locateInAnyNormalisation(Directory& directory,
                                                                  const std::string& path) const {
     auto found = locate(directory, path);
-    if (!found && !isAscii(path)) {
-        found = locate(directory, composed(path));
+    if (!found && !base::isAscii(path)) {
+        found = locate(directory, base::composed(path));
         if (!found) {
-            found = locate(directory, decomposed(path));
+            found = locate(directory, base::decomposed(path));
         }
     }
     return found;
@@ -98,7 +99,7 @@ std::optional<FoundSong> EntryResolver::locate(Directory& directory, std::string
 Resolved EntryResolver::examine(const Directory& directory, const std::string& path) const {
     const std::string absolute =
         path.starts_with('/') ? path : tree_.absolute(directory.pathOf(path));
-    FileStatus status{};
+    base::FileStatus status{};
     if (stat(absolute.c_str(), &status) == 0) {
         return examineExisting(absolute, S_ISREG(status.st_mode));
     }
@@ -110,12 +111,12 @@ Resolved EntryResolver::examine(const Directory& directory, const std::string& p
 }
 
 Resolved EntryResolver::examineExisting(const std::string& path, bool regular) const {
-    const MallocText canonical(realpath(path.c_str(), nullptr));
+    const base::MallocText canonical(realpath(path.c_str(), nullptr));
     if (!canonical) {
         return Reason::Missing;
     }
     const std::string_view target = canonical.get();
-    if (!isWithin(target, tree_.canonicalRoot())) {
+    if (!base::isWithin(target, tree_.canonicalRoot())) {
         return Reason::OutsideFolder;
     }
     if (!regular) {
@@ -130,7 +131,7 @@ Resolved EntryResolver::examineExisting(const std::string& path, bool regular) c
 std::optional<std::string_view> EntryResolver::relativeToRoot(std::string_view path) const {
     for (const std::string_view root :
          {std::string_view(tree_.canonicalRoot()), std::string_view(givenRoot_)}) {
-        if (isWithin(path, root)) {
+        if (base::isWithin(path, root)) {
             return path.substr(std::min(root.size() + 1, path.size()));
         }
     }

@@ -32,7 +32,7 @@ bool mayHaveChanged(const Directory& directory) {
 
 } // namespace
 
-FolderTree::FolderTree(std::filesystem::path root, DirectoryWatch* watch)
+FolderTree::FolderTree(std::filesystem::path root, base::DirectoryWatch* watch)
     : root_(std::move(root)), watch_(watch) {}
 
 void FolderTree::reset() {
@@ -50,7 +50,7 @@ void FolderTree::markAll() {
     dirty_ = true;
 }
 
-void FolderTree::mark(const DirectoryWatch::Changes& changes) {
+void FolderTree::mark(const base::DirectoryWatch::Changes& changes) {
     if (changes.lost) {
         markAll();
     }

@@ -1,8 +1,8 @@
 #pragma once
 
+#include "services/base/DirectoryWatch.h"
 #include "services/media/ContentKinds.h"
 #include "services/media/Directory.h"
-#include "services/base/DirectoryWatch.h"
 
 #include <cstddef>
 #include <filesystem>
@@ -21,7 +21,7 @@ class FolderTree {
   public:
     /// `root` is absolute. `watch` is told of every directory and outlives the tree; null: nobody
     /// watches. Reads nothing yet.
-    FolderTree(std::filesystem::path root, DirectoryWatch* watch);
+    FolderTree(std::filesystem::path root, base::DirectoryWatch* watch);
 
     /// Forgets everything: the folder, or a part of it, may be another one by now.
     void reset();
@@ -30,7 +30,7 @@ class FolderTree {
     void markAll();
 
     /// Has the directories read again that `changes` names.
-    void mark(const DirectoryWatch::Changes& changes);
+    void mark(const base::DirectoryWatch::Changes& changes);
 
     /// Something was marked, or nothing was read yet.
     [[nodiscard]] bool isDirty() const { return dirty_; }
@@ -64,7 +64,7 @@ class FolderTree {
     void stopWatchingAll(Directory& top);
 
     const std::filesystem::path root_;
-    DirectoryWatch* const watch_;
+    base::DirectoryWatch* const watch_;
     std::string canonicalRoot_;
     std::unique_ptr<Directory> top_;
     std::unordered_map<int, Directory*> watched_;

@@ -2,9 +2,9 @@
 
 #include "services/base/DirectoryWatch.h"
 #include "services/base/FileDescriptor.h"
-#include "services/media/FolderTree.h"
 #include "services/base/MountWatch.h"
 #include "services/base/RootWatch.h"
+#include "services/media/FolderTree.h"
 #include "services/media/SnapshotBuilder.h"
 
 #include <malloc.h>
@@ -44,8 +44,8 @@ std::filesystem::path absoluteRoot(const std::filesystem::path& root) {
 /// process.
 void giveBackMemory() { malloc_trim(0); }
 
-FileDescriptor makeWakeUp() {
-    FileDescriptor descriptor(eventfd(0, EFD_NONBLOCK | EFD_CLOEXEC));
+base::FileDescriptor makeWakeUp() {
+    base::FileDescriptor descriptor(eventfd(0, EFD_NONBLOCK | EFD_CLOEXEC));
     if (!descriptor) {
         throw std::system_error(errno, std::generic_category(),
                                 "The music folder cannot be watched");
@@ -179,13 +179,13 @@ class MusicFolder::Worker {
     void wakeUp() { eventfd_write(wakeUp_.get(), 1); }
 
     const Changed changed_;
-    const FileDescriptor wakeUp_ = makeWakeUp();
+    const base::FileDescriptor wakeUp_ = makeWakeUp();
 
     // The folder's own thread only. It also makes those that look at the folder when they are made,
     // for a drive that does not answer may keep them waiting.
-    std::optional<RootWatch> rootWatch_;
-    std::optional<MountWatch> mountWatch_;
-    DirectoryWatch directoryWatch_;
+    std::optional<base::RootWatch> rootWatch_;
+    std::optional<base::MountWatch> mountWatch_;
+    base::DirectoryWatch directoryWatch_;
     FolderTree tree_;
 
     mutable std::mutex mutex_;

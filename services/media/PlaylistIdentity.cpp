@@ -1,6 +1,6 @@
 #include "services/media/PlaylistIdentity.h"
 
-#include "services/base/Text.h"
+#include "services/base/Utf8.h"
 
 #include <glib.h>
 
@@ -11,7 +11,7 @@
 namespace quorl::media {
 
 std::uint64_t playlistId(std::string_view path, bool folder) {
-    std::string hashed = composed(path);
+    std::string hashed = base::composed(path);
     if (folder) {
         hashed += '/';
     }

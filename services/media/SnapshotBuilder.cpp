@@ -1,9 +1,9 @@
 #include "services/media/SnapshotBuilder.h"
 
+#include "services/base/Utf8.h"
 #include "services/media/Collation.h"
 #include "services/media/EntryResolver.h"
 #include "services/media/PlaylistIdentity.h"
-#include "services/base/Text.h"
 
 #include <algorithm>
 #include <unordered_map>
@@ -32,7 +32,7 @@ struct Draft {
 
 std::string fileNameWithoutExtension(std::string_view fileName) {
     const std::size_t dot = fileName.rfind('.');
-    return validUtf8(dot == 0 ? fileName : fileName.substr(0, dot));
+    return base::validUtf8(dot == 0 ? fileName : fileName.substr(0, dot));
 }
 
 class SnapshotBuilder {
@@ -92,7 +92,7 @@ class SnapshotBuilder {
         }
         if (any && directory.parent != nullptr) {
             Playlist folder;
-            folder.name = validUtf8(directory.name);
+            folder.name = base::validUtf8(directory.name);
             folder.path = directory.path();
             folder.folder = true;
             drafts_.push_back({std::move(folder), &directory, nullptr, Format::M3u, {}});

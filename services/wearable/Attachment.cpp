@@ -16,7 +16,7 @@ constexpr auto fileName = "state.json";
 
 Attachment loadAttachment(int root) {
     try {
-        const auto text = readFile(root, std::string{ownDirectory} + "/" + fileName);
+        const auto text = base::readFile(root, std::string{ownDirectory} + "/" + fileName);
         const auto value = nlohmann::json::parse(text);
         return {value.at("connected").get<bool>(), value.at("onCharger").get<bool>()};
     } catch (const nlohmann::json::exception&) {
@@ -29,7 +29,7 @@ Attachment loadAttachment(int root) {
 void saveAttachment(int root, const Attachment& attachment) {
     const nlohmann::json value{{"connected", attachment.connected},
                                {"onCharger", attachment.onCharger}};
-    replaceFile(openDirectory(root, ownDirectory).get(), fileName, value.dump() + "\n");
+    base::replaceFile(base::openDirectory(root, ownDirectory).get(), fileName, value.dump() + "\n");
 }
 
 } // namespace quorl::wearable

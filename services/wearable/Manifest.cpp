@@ -148,11 +148,11 @@ Manifest parseManifest(std::string_view text) {
 }
 
 Manifest loadManifest(int root) {
-    return parseManifest(readFile(root, std::string{ownDirectory} + "/" + fileName));
+    return parseManifest(base::readFile(root, std::string{ownDirectory} + "/" + fileName));
 }
 
 void saveManifest(int root, const Manifest& manifest) {
-    replaceFile(openDirectory(root, ownDirectory).get(), fileName, toText(manifest));
+    base::replaceFile(base::openDirectory(root, ownDirectory).get(), fileName, toText(manifest));
 }
 
 } // namespace quorl::wearable

@@ -13,7 +13,7 @@
 namespace quorl::wearable {
 namespace {
 
-using media::FileDescriptor;
+using base::FileDescriptor;
 
 struct Space {
     std::uint64_t total = 0;
@@ -67,7 +67,7 @@ FileDescriptor openWearable(const Wearable& wearable) {
     if (wearable.isMountPoint && !isMountPoint(wearable.root)) {
         throw std::system_error{ENODEV, std::generic_category()};
     }
-    return openRoot(wearable.root.c_str());
+    return base::openRoot(wearable.root.c_str());
 }
 
 } // namespace

@@ -3,8 +3,8 @@
 #include "tests/engine/EngineFixture.h"
 #include "tests/engine/SlowDevice.h"
 
-#include "services/engine/Names.h"
 #include "services/base/AtomicFile.h"
+#include "services/engine/Names.h"
 
 #include <sdbus-c++/sdbus-c++.h>
 
@@ -75,8 +75,7 @@ TEST_F(Engine, SaysThatEverythingWasSentOnlyWhenItIsThereAndBeforeTheSessionEnds
         const bool isSent = keys.contains(lastFullySentAssetSyncPlaylistPersistentID.key) ||
                             keys.contains(lastFullySentAssetSyncPlaylistVersion.key);
         if (isSent && !std::exchange(isTold, true)) {
-            const auto manifest =
-                wearable::loadManifest(wearable::openRoot(wearable_.c_str()).get());
+            const auto manifest = wearable::loadManifest(base::openRoot(wearable_.c_str()).get());
             wrong.set_value(manifest.sent ? syncd::testing::whatIsWrongWith(wearable_)
                                           : "the list is not complete");
         }
@@ -340,8 +339,8 @@ TEST_F(Engine, SaysThatThereIsNotEnoughSpaceAndTellsTheSizes) {
 TEST_F(Engine, TriesAgainByItselfWhatDidNotWork) {
     listLargeSongs();
     std::filesystem::create_directories(wearable_);
-    auto others = wearable::openDirectory(wearable::openRoot(wearable_.c_str()).get(),
-                                          wearable::ownDirectory);
+    auto others =
+        base::openDirectory(base::openRoot(wearable_.c_str()).get(), wearable::ownDirectory);
     ASSERT_EQ(flock(others.get(), LOCK_EX), 0);
     start({"--retry-after", "1"});
     choose();

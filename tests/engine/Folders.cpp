@@ -1,7 +1,7 @@
 #include "tests/engine/Folders.h"
 
-#include "services/media/MusicFolder.h"
 #include "services/base/AtomicFile.h"
+#include "services/media/MusicFolder.h"
 
 #include <fcntl.h>
 
@@ -47,7 +47,7 @@ void Music::list(const std::vector<std::string>& songs, const std::string& title
 }
 
 wearable::Manifest Player::manifest() const {
-    return wearable::loadManifest(wearable::openRoot(path().c_str()).get());
+    return wearable::loadManifest(base::openRoot(path().c_str()).get());
 }
 
 Wish wishFor(const Music& music, const Player& player, std::uint64_t limitType, std::uint64_t limit,
@@ -67,11 +67,11 @@ Outcome sync(const Wish& wish, const Sync::Told& told, std::stop_token stop) {
 }
 
 std::string whatIsWrongWith(const std::filesystem::path& wearable) {
-    const auto root = wearable::openRoot(wearable.c_str());
+    const auto root = base::openRoot(wearable.c_str());
     const auto manifest = wearable::loadManifest(root.get());
     const auto music = wearable / wearable::musicDirectory;
     for (const auto& song : manifest.songs) {
-        const media::FileDescriptor file{open((music / song.name).c_str(), O_RDONLY | O_CLOEXEC)};
+        const base::FileDescriptor file{open((music / song.name).c_str(), O_RDONLY | O_CLOEXEC)};
         if (!file) {
             return song.name + " is not there";
         }

@@ -25,8 +25,8 @@ class LoginManager {
         if (pipe2(ends, O_CLOEXEC) != 0) {
             throw std::runtime_error{"pipe"};
         }
-        reading_ = media::FileDescriptor{ends[0]};
-        writing_ = media::FileDescriptor{ends[1]};
+        reading_ = base::FileDescriptor{ends[0]};
+        writing_ = base::FileDescriptor{ends[1]};
         object_->registerMethod("Inhibit")
             .onInterface("org.freedesktop.login1.Manager")
             .implementedAs([this](const std::string& what, const std::string&, const std::string&,
@@ -46,7 +46,7 @@ class LoginManager {
 
     /// Waits until nobody holds the lock any more.
     void awaitRelease() {
-        writing_ = media::FileDescriptor{};
+        writing_ = base::FileDescriptor{};
         char byte = 0;
         while (read(reading_.get(), &byte, 1) > 0) {
         }
@@ -56,8 +56,8 @@ class LoginManager {
     SecondBus bus_;
     std::unique_ptr<sdbus::IConnection> connection_;
     std::unique_ptr<sdbus::IObject> object_;
-    media::FileDescriptor reading_;
-    media::FileDescriptor writing_;
+    base::FileDescriptor reading_;
+    base::FileDescriptor writing_;
     std::promise<std::string> asked_;
 };
 

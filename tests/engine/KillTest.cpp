@@ -70,7 +70,7 @@ TEST_F(KilledEngine, LeavesNothingHalfAndNothingOfOthersTouchedAndCompletesInThe
         recorder_.next(Kind::EngineDidVanish);
 
         ASSERT_EQ(whatIsWrongWith(wearable_), "") << "at kill " << kill;
-        const auto root = wearable::openRoot(wearable_.c_str());
+        const auto root = base::openRoot(wearable_.c_str());
         incomplete += wearable::loadManifest(root.get()).strays.empty() ? 0 : 1;
         const auto there = onWearable();
         for (const auto& [name, text] : foreign) {

@@ -25,8 +25,8 @@ Process::Process(const std::vector<std::string>& command,
     if (pipe2(ends, O_CLOEXEC) != 0) {
         throw std::runtime_error{"pipe"};
     }
-    output_ = media::FileDescriptor{ends[0]};
-    const media::FileDescriptor input{ends[1]};
+    output_ = base::FileDescriptor{ends[0]};
+    const base::FileDescriptor input{ends[1]};
     std::vector<char*> arguments;
     for (const auto& argument : command) {
         arguments.push_back(const_cast<char*>(argument.c_str()));

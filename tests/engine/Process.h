@@ -36,7 +36,7 @@ class Process {
   private:
     pid_t id_ = -1;
     /// Both its output and its errors.
-    media::FileDescriptor output_;
+    base::FileDescriptor output_;
 };
 
 /// One more message bus, in the session's directory.

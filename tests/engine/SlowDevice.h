@@ -38,8 +38,8 @@ class SlowDevice {
 
     wearable::testing::TemporaryDirectory folder_;
     bool isMounted_ = false;
-    media::FileDescriptor watch_;
-    media::FileDescriptor end_;
+    base::FileDescriptor watch_;
+    base::FileDescriptor end_;
 
     std::mutex mutex_;
     std::condition_variable changed_;

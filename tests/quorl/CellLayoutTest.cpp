@@ -4,8 +4,8 @@
 
 #include <QImage>
 
-#include "quorl/window/CellPainter.h"
 #include "quorl/app/CompanionHost.h"
+#include "quorl/window/CellPainter.h"
 #include "quorl/window/WindowScreen.h"
 
 namespace quorl::tests {

@@ -1,6 +1,6 @@
 #include "services/media/playlists/LeftOut.h"
 
-#include "services/base/Text.h"
+#include "services/base/Utf8.h"
 
 #include <algorithm>
 #include <array>
@@ -52,9 +52,10 @@ std::string_view sentence(Reason reason) {
 }
 
 std::string describe(const LeftOut& leftOut) {
-    std::string line = leftOut.playlist.empty() ? "The music folder" : printable(leftOut.playlist);
+    std::string line =
+        leftOut.playlist.empty() ? "The music folder" : base::printable(leftOut.playlist);
     if (!leftOut.entry.empty()) {
-        line += ": " + printable(leftOut.entry);
+        line += ": " + base::printable(leftOut.entry);
     }
     return line + ": " + std::string(sentence(leftOut.reason));
 }

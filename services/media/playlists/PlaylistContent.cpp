@@ -1,6 +1,6 @@
 #include "services/media/playlists/PlaylistContent.h"
 
-#include "services/base/Text.h"
+#include "services/base/Utf8.h"
 
 #include <glib.h>
 #include <pugixml.hpp>
@@ -33,7 +33,7 @@ bool equalsIgnoringCase(std::string_view left, std::string_view right) {
 }
 
 Generated generatedValue(std::string_view value) {
-    return trimmed(value) == "mix" ? Generated::Mix : Generated::Playlist;
+    return base::trimmed(value) == "mix" ? Generated::Mix : Generated::Playlist;
 }
 
 /// Takes the marker from the text of a comment, the comment character left out.
@@ -50,7 +50,7 @@ void addEntry(std::string_view entry, PlaylistContent& content) {
     if (content.entries.size() == maximumEntries) {
         content.truncated = true;
     } else {
-        content.entries.add(toUtf8(entry));
+        content.entries.add(base::toUtf8(entry));
     }
 }
 
@@ -63,7 +63,7 @@ void forEachLine(std::string_view bytes, Use use) {
     }
     while (!bytes.empty()) {
         const std::size_t end = std::min(bytes.find_first_of("\r\n"), bytes.size());
-        const std::string_view line = trimmed(bytes.substr(0, end));
+        const std::string_view line = base::trimmed(bytes.substr(0, end));
         if (!line.empty()) {
             use(line);
         }
@@ -76,7 +76,7 @@ PlaylistContent parseM3u(std::string_view bytes) {
     PlaylistContent content;
     forEachLine(bytes, [&](std::string_view line) {
         if (line.starts_with(nameDirective)) {
-            content.name = toUtf8(trimmed(line.substr(nameDirective.size())));
+            content.name = base::toUtf8(base::trimmed(line.substr(nameDirective.size())));
         } else if (line.front() == '#') {
             readMarker(line.substr(1), content);
         } else {
@@ -106,8 +106,8 @@ PlaylistContent parsePls(std::string_view bytes) {
         if (line.front() == '#' || line.front() == ';') {
             readMarker(line.substr(1), content);
         } else if (equals != std::string_view::npos) {
-            if (const auto number = fileNumber(trimmed(line.substr(0, equals)))) {
-                files.emplace_back(*number, trimmed(line.substr(equals + 1)));
+            if (const auto number = fileNumber(base::trimmed(line.substr(0, equals)))) {
+                files.emplace_back(*number, base::trimmed(line.substr(equals + 1)));
             }
         }
     });
@@ -125,7 +125,9 @@ bool isElement(const pugi::xml_node& node, std::string_view name) {
     return ownName == name;
 }
 
-std::string_view textOf(const pugi::xml_node& element) { return trimmed(element.text().get()); }
+std::string_view textOf(const pugi::xml_node& element) {
+    return base::trimmed(element.text().get());
+}
 
 /// The address of a track: its first location, or the first that is on this machine, for a track
 /// may list several places where the same song is found.
@@ -166,7 +168,7 @@ std::optional<PlaylistContent> parseXspf(std::string_view bytes) {
     PlaylistContent content;
     for (const pugi::xml_node& child : playlist) {
         if (isElement(child, "title")) {
-            content.name = toUtf8(textOf(child));
+            content.name = base::toUtf8(textOf(child));
         } else if (isElement(child, "meta") &&
                    child.attribute("rel").value() == std::string_view("urn:quorl:generated")) {
             content.generated = generatedValue(textOf(child));

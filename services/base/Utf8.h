@@ -3,7 +3,7 @@
 #include <string>
 #include <string_view>
 
-namespace quorl::media {
+namespace quorl::base {
 
 /// `text` without ASCII white space at both ends.
 [[nodiscard]] std::string_view trimmed(std::string_view text);
@@ -26,7 +26,4 @@ namespace quorl::media {
 
 [[nodiscard]] bool isAscii(std::string_view text);
 
-/// Whether `path` is `root` or below it, by its text alone. Both absolute; `root` is empty for "/".
-[[nodiscard]] bool isWithin(std::string_view path, std::string_view root);
-
-} // namespace quorl::media
+} // namespace quorl::base

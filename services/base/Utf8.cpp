@@ -1,4 +1,4 @@
-#include "services/base/Text.h"
+#include "services/base/Utf8.h"
 
 #include <glib.h>
 
@@ -6,7 +6,7 @@
 #include <array>
 #include <memory>
 
-namespace quorl::media {
+namespace quorl::base {
 
 namespace {
 
@@ -103,8 +103,4 @@ bool isAscii(std::string_view text) {
                                [](char byte) { return static_cast<unsigned char>(byte) < 0x80; });
 }
 
-bool isWithin(std::string_view path, std::string_view root) {
-    return path.starts_with(root) && (path.size() == root.size() || path[root.size()] == '/');
-}
-
-} // namespace quorl::media
+} // namespace quorl::base
