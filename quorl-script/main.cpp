@@ -4,10 +4,9 @@
 #include <iostream>
 #include <system_error>
 
+#include <CLI/CLI.hpp>
 #include <fcntl.h>
 #include <unistd.h>
-
-#include <CLI/CLI.hpp>
 
 #include "quorl-script/Interpreter.h"
 #include "quorl-script/LineReader.h"

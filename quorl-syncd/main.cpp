@@ -1,19 +1,18 @@
 // quorl-syncd: brings the chosen playlist to the wearable.
 
+#include <csignal>
+#include <iostream>
+#include <memory>
+
+#include <CLI/CLI.hpp>
+#include <poll.h>
+#include <sys/signalfd.h>
+
 #include "quorl-syncd/bus/BusObjects.h"
 #include "quorl-syncd/engine/Engine.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Names.h"
 #include "services/preferences/SharedPreferences.h"
-
-#include <CLI/CLI.hpp>
-
-#include <poll.h>
-#include <sys/signalfd.h>
-
-#include <csignal>
-#include <iostream>
-#include <memory>
 
 namespace {
 

@@ -1,5 +1,4 @@
 #include "sync/LMSyncDefaults+Extras.h"
-
 #include "sync/_LMSyncDefaultsAssociatedObject.h"
 
 namespace {

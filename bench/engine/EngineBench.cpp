@@ -5,12 +5,6 @@
 //
 // Everything is made in DIRECTORY, which must not exist yet, or in a temporary one, and deleted.
 
-#include "quorl-syncd/transfer/RateLimit.h"
-#include "quorl-syncd/transfer/Sync.h"
-#include "services/media/MusicFolder.h"
-
-#include <unistd.h>
-
 #include <algorithm>
 #include <chrono>
 #include <cstdio>
@@ -21,6 +15,12 @@
 #include <stdexcept>
 #include <string>
 #include <vector>
+
+#include <unistd.h>
+
+#include "quorl-syncd/transfer/RateLimit.h"
+#include "quorl-syncd/transfer/Sync.h"
+#include "services/media/MusicFolder.h"
 
 namespace {
 

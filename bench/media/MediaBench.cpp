@@ -6,10 +6,6 @@
 //
 // The library is made in DIRECTORY, which must not exist yet, or in a temporary one, and deleted.
 
-#include "services/media/MusicFolder.h"
-
-#include <unistd.h>
-
 #include <algorithm>
 #include <array>
 #include <chrono>
@@ -21,6 +17,10 @@
 #include <future>
 #include <stdexcept>
 #include <string>
+
+#include <unistd.h>
+
+#include "services/media/MusicFolder.h"
 
 namespace {
 

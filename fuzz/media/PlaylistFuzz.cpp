@@ -3,13 +3,6 @@
 //
 //     quorl-media-fuzz -max_total_time=60 CORPUS fuzz/media/seeds
 
-#include "services/base/Utf8.h"
-#include "services/media/playlists/EntryReadings.h"
-#include "services/media/playlists/LeftOut.h"
-#include "services/media/playlists/PlaylistContent.h"
-
-#include <glib.h>
-
 #include <algorithm>
 #include <bit>
 #include <cstddef>
@@ -17,6 +10,13 @@
 #include <cstdlib>
 #include <string>
 #include <string_view>
+
+#include <glib.h>
+
+#include "services/base/Utf8.h"
+#include "services/media/playlists/EntryReadings.h"
+#include "services/media/playlists/LeftOut.h"
+#include "services/media/playlists/PlaylistContent.h"
 
 namespace {
 

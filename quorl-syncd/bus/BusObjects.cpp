@@ -1,12 +1,12 @@
 #include "quorl-syncd/bus/BusObjects.h"
 
-#include "quorl-syncd/engine/Engine.h"
-#include "services/engine/Names.h"
+#include <exception>
 
 #include <Engine-adaptor.h>
 #include <Wearable-adaptor.h>
 
-#include <exception>
+#include "quorl-syncd/engine/Engine.h"
+#include "services/engine/Names.h"
 
 namespace quorl::syncd {
 namespace {

@@ -1,8 +1,8 @@
 #pragma once
 
-#include <sdbus-c++/sdbus-c++.h>
-
 #include <memory>
+
+#include <sdbus-c++/sdbus-c++.h>
 
 namespace quorl::syncd {
 

@@ -1,11 +1,11 @@
 #include "quorl-syncd/bus/SessionObject.h"
 
-#include "services/engine/Names.h"
+#include <algorithm>
 
 #include <Session-adaptor.h>
 #include <Task-adaptor.h>
 
-#include <algorithm>
+#include "services/engine/Names.h"
 
 namespace quorl::syncd {
 namespace {

@@ -1,13 +1,13 @@
 #pragma once
 
-#include "quorl-syncd/transfer/Sync.h"
-
-#include <sdbus-c++/sdbus-c++.h>
-
 #include <chrono>
 #include <functional>
 #include <memory>
 #include <string>
+
+#include <sdbus-c++/sdbus-c++.h>
+
+#include "quorl-syncd/transfer/Sync.h"
 
 namespace quorl::syncd {
 

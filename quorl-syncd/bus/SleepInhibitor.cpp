@@ -1,9 +1,9 @@
 #include "quorl-syncd/bus/SleepInhibitor.h"
 
-#include "services/wearable/Wearable.h"
-
 #include <chrono>
 #include <string>
+
+#include "services/wearable/Wearable.h"
 
 namespace quorl::syncd {
 namespace {

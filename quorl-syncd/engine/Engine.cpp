@@ -1,15 +1,15 @@
 #include "quorl-syncd/engine/Engine.h"
 
-#include "quorl-syncd/bus/SessionObject.h"
-#include "quorl-syncd/bus/SleepInhibitor.h"
-#include "services/base/AtomicFile.h"
+#include <iostream>
+#include <system_error>
+#include <thread>
 
 #include <glib.h>
 #include <poll.h>
 
-#include <iostream>
-#include <system_error>
-#include <thread>
+#include "quorl-syncd/bus/SessionObject.h"
+#include "quorl-syncd/bus/SleepInhibitor.h"
+#include "services/base/AtomicFile.h"
 
 namespace quorl::syncd {
 namespace {

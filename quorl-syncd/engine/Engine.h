@@ -1,5 +1,11 @@
 #pragma once
 
+#include <chrono>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+
 #include "quorl-syncd/engine/LastResults.h"
 #include "quorl-syncd/engine/RetryDelay.h"
 #include "quorl-syncd/transfer/RateLimit.h"
@@ -13,12 +19,6 @@
 #include "services/preferences/SharedPreferences.h"
 #include "services/wearable/Attachment.h"
 #include "services/wearable/Reporter.h"
-
-#include <chrono>
-#include <functional>
-#include <memory>
-#include <optional>
-#include <string>
 
 namespace quorl::syncd {
 

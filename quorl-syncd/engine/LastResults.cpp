@@ -1,10 +1,10 @@
 #include "quorl-syncd/engine/LastResults.h"
 
-#include "services/base/AtomicFile.h"
+#include <system_error>
 
 #include <nlohmann/json.hpp>
 
-#include <system_error>
+#include "services/base/AtomicFile.h"
 
 namespace quorl::syncd {
 namespace {

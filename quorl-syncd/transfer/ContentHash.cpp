@@ -1,9 +1,9 @@
 #include "quorl-syncd/transfer/ContentHash.h"
 
-#include <xxhash.h>
-
 #include <array>
 #include <new>
+
+#include <xxhash.h>
 
 namespace quorl::syncd {
 

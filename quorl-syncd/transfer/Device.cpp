@@ -1,20 +1,20 @@
 #include "quorl-syncd/transfer/Device.h"
 
-#include "quorl-syncd/transfer/SongFile.h"
-#include "services/base/AtomicFile.h"
-#include "services/wearable/Report.h"
-
-#include <dirent.h>
-#include <fcntl.h>
-#include <sys/file.h>
-#include <sys/stat.h>
-
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
 #include <memory>
 #include <optional>
 #include <system_error>
+
+#include <dirent.h>
+#include <fcntl.h>
+#include <sys/file.h>
+#include <sys/stat.h>
+
+#include "quorl-syncd/transfer/SongFile.h"
+#include "services/base/AtomicFile.h"
+#include "services/wearable/Report.h"
 
 namespace quorl::syncd {
 namespace {

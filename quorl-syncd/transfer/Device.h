@@ -1,13 +1,13 @@
 #pragma once
 
-#include "services/base/FileDescriptor.h"
-#include "services/wearable/Manifest.h"
-#include "services/wearable/Wearable.h"
-
 #include <cstdint>
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "services/base/FileDescriptor.h"
+#include "services/wearable/Manifest.h"
+#include "services/wearable/Wearable.h"
 
 namespace quorl::syncd {
 

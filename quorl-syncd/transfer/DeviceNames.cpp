@@ -1,12 +1,12 @@
 #include "quorl-syncd/transfer/DeviceNames.h"
 
-#include "services/base/Utf8.h"
-
-#include <unicode/unistr.h>
-
 #include <algorithm>
 #include <array>
 #include <functional>
+
+#include <unicode/unistr.h>
+
+#include "services/base/Utf8.h"
 
 namespace quorl::syncd {
 namespace {

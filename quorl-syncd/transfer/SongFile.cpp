@@ -1,20 +1,20 @@
 #include "quorl-syncd/transfer/SongFile.h"
 
-#include "quorl-syncd/transfer/ContentHash.h"
-#include "quorl-syncd/transfer/RateLimit.h"
-#include "services/base/Utf8.h"
-
-#include <fcntl.h>
-#include <linux/fs.h>
-#include <sys/ioctl.h>
-#include <unistd.h>
-
 #include <algorithm>
 #include <cerrno>
 #include <cstring>
 #include <memory>
 #include <system_error>
 #include <vector>
+
+#include <fcntl.h>
+#include <linux/fs.h>
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/RateLimit.h"
+#include "services/base/Utf8.h"
 
 namespace quorl::syncd {
 namespace {

@@ -1,9 +1,5 @@
 #pragma once
 
-#include "services/base/FileDescriptor.h"
-
-#include <sys/stat.h>
-
 #include <cstddef>
 #include <cstdint>
 #include <filesystem>
@@ -12,6 +8,10 @@
 #include <stdexcept>
 #include <stop_token>
 #include <string>
+
+#include <sys/stat.h>
+
+#include "services/base/FileDescriptor.h"
 
 /// Reading and copying files in pieces.
 namespace quorl::syncd {

@@ -1,16 +1,16 @@
 #include "quorl-syncd/transfer/Sync.h"
 
-#include "quorl-syncd/transfer/ContentHash.h"
-#include "quorl-syncd/transfer/DeviceNames.h"
-#include "quorl-syncd/transfer/RateLimit.h"
-#include "services/base/AtomicFile.h"
-
 #include <algorithm>
 #include <cerrno>
 #include <iterator>
 #include <system_error>
 #include <unordered_map>
 #include <unordered_set>
+
+#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/DeviceNames.h"
+#include "quorl-syncd/transfer/RateLimit.h"
+#include "services/base/AtomicFile.h"
 
 namespace quorl::syncd {
 namespace {

@@ -1,14 +1,14 @@
 #pragma once
 
-#include "quorl-syncd/transfer/Device.h"
-#include "quorl-syncd/transfer/SongFile.h"
-#include "quorl-syncd/transfer/Wish.h"
-
 #include <chrono>
 #include <functional>
 #include <stop_token>
 #include <string>
 #include <vector>
+
+#include "quorl-syncd/transfer/Device.h"
+#include "quorl-syncd/transfer/SongFile.h"
+#include "quorl-syncd/transfer/Wish.h"
 
 namespace quorl::syncd {
 

@@ -1,9 +1,9 @@
 #include "quorl-syncd/transfer/Wish.h"
 
-#include "services/preferences/Preference.h"
-
 #include <cstdint>
 #include <limits>
+
+#include "services/preferences/Preference.h"
 
 namespace quorl::syncd {
 namespace {

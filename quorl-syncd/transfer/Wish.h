@@ -1,11 +1,11 @@
 #pragma once
 
+#include <memory>
+#include <vector>
+
 #include "services/media/Snapshot.h"
 #include "services/wearable/Manifest.h"
 #include "services/wearable/Wearable.h"
-
-#include <memory>
-#include <vector>
 
 namespace quorl::syncd {
 

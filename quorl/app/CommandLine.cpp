@@ -1,12 +1,12 @@
 #include "quorl/app/CommandLine.h"
 
+#include <QStandardPaths>
 #include <charconv>
 #include <iostream>
 #include <map>
 #include <optional>
 
 #include <CLI/CLI.hpp>
-#include <QStandardPaths>
 
 namespace quorl {
 

@@ -1,10 +1,9 @@
 #pragma once
 
+#include <QObject>
 #include <map>
 #include <string>
 #include <vector>
-
-#include <QObject>
 
 namespace quorl {
 

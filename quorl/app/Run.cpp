@@ -1,12 +1,11 @@
 #include "quorl/app/Run.h"
 
-#include <array>
-#include <iostream>
-#include <optional>
-
 #include <QApplication>
 #include <QCursor>
 #include <QLocale>
+#include <array>
+#include <iostream>
+#include <optional>
 
 #include "quorl/reports/Screenshot.h"
 #include "quorl/terminal/TextScreen.h"

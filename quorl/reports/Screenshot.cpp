@@ -1,12 +1,11 @@
 #include "quorl/reports/Screenshot.h"
 
-#include <iostream>
-
 #include <QCoreApplication>
 #include <QImageWriter>
 #include <QPixmap>
 #include <QPointer>
 #include <QTimer>
+#include <iostream>
 
 namespace quorl {
 

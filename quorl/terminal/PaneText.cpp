@@ -1,8 +1,7 @@
 #include "quorl/terminal/PaneText.h"
 
-#include <sstream>
-
 #include <QString>
+#include <sstream>
 
 #include "quorl/content/SwitchCell.h"
 #include "services/base/Utf8.h"

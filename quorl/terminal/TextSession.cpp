@@ -1,11 +1,11 @@
 #include "quorl/terminal/TextSession.h"
 
+#include <QCoreApplication>
 #include <array>
 #include <charconv>
 #include <iostream>
 #include <sstream>
 
-#include <QCoreApplication>
 #include <sys/ioctl.h>
 #include <unistd.h>
 

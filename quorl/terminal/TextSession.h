@@ -1,10 +1,9 @@
 #pragma once
 
-#include <optional>
-#include <string>
-
 #include <QSocketNotifier>
 #include <QTimer>
+#include <optional>
+#include <string>
 
 #include "quorl/app/Companion.h"
 #include "quorl/content/PaneContent.h"

@@ -1,9 +1,8 @@
 #pragma once
 
-#include <vector>
-
 #include <QAccessible>
 #include <QString>
+#include <vector>
 
 #include "platform/UserInterface.h"
 

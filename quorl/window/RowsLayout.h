@@ -1,11 +1,10 @@
 #pragma once
 
+#include <QRectF>
+#include <QString>
 #include <functional>
 #include <optional>
 #include <vector>
-
-#include <QRectF>
-#include <QString>
 
 #include "quorl/content/PaneContent.h"
 

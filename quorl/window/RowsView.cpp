@@ -1,7 +1,5 @@
 #include "quorl/window/RowsView.h"
 
-#include <cmath>
-
 #include <QAccessible>
 #include <QApplication>
 #include <QKeyEvent>
@@ -10,6 +8,7 @@
 #include <QScrollBar>
 #include <QScroller>
 #include <QStyle>
+#include <cmath>
 
 #include "quorl/window/CellPainter.h"
 #include "quorl/window/RowsAccessible.h"

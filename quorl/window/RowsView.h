@@ -1,10 +1,9 @@
 #pragma once
 
-#include <map>
-#include <memory>
-
 #include <QAbstractScrollArea>
 #include <QVariantAnimation>
+#include <map>
+#include <memory>
 
 #include "quorl/content/PaneContent.h"
 #include "quorl/window/PaneColors.h"

@@ -1,10 +1,9 @@
 #include "quorl/window/WindowScreen.h"
 
-#include <cmath>
-
 #include <QFontInfo>
 #include <QFontMetricsF>
 #include <QGuiApplication>
+#include <cmath>
 
 namespace quorl {
 

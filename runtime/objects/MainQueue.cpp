@@ -2,9 +2,8 @@
 
 #include <cstdint>
 
-#include <unistd.h>
-
 #include <dispatch/dispatch.h>
+#include <unistd.h>
 
 // libdispatch exports these two for event loops and declares them in no installed header.
 extern "C" {

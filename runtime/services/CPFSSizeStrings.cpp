@@ -1,11 +1,10 @@
-#include "platform/SizeFormatter.h"
-
 #include <array>
 #include <cmath>
 
 #include <unicode/measunit.h>
 #include <unicode/numberformatter.h>
 
+#include "platform/SizeFormatter.h"
 #include "runtime/host/Host.h"
 #include "runtime/services/SizeText.h"
 

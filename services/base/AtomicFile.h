@@ -1,9 +1,9 @@
 #pragma once
 
-#include "services/base/FileDescriptor.h"
-
 #include <string>
 #include <string_view>
+
+#include "services/base/FileDescriptor.h"
 
 /// Small files that are either the old ones or the new ones, whenever the power goes.
 ///

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "services/base/FileDescriptor.h"
-
 #include <optional>
 #include <string>
 #include <vector>
+
+#include "services/base/FileDescriptor.h"
 
 namespace quorl::base {
 

@@ -1,10 +1,10 @@
 #pragma once
 
-#include <sys/stat.h>
-
 #include <algorithm>
 #include <cstdint>
 #include <ctime>
+
+#include <sys/stat.h>
 
 namespace quorl::base {
 

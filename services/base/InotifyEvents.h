@@ -1,13 +1,13 @@
 #pragma once
 
-#include <sys/inotify.h>
-#include <unistd.h>
-
 #include <array>
 #include <cerrno>
 #include <cstddef>
 #include <cstring>
 #include <string_view>
+
+#include <sys/inotify.h>
+#include <unistd.h>
 
 namespace quorl::base {
 

@@ -1,18 +1,18 @@
 #include "services/base/MountWatch.h"
 
-#include "services/base/FileStatus.h"
-#include "services/base/Paths.h"
-
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
-
 #include <array>
 #include <cstddef>
 #include <sstream>
 #include <string_view>
 #include <system_error>
 #include <utility>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "services/base/FileStatus.h"
+#include "services/base/Paths.h"
 
 namespace quorl::base {
 

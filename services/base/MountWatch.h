@@ -1,9 +1,9 @@
 #pragma once
 
-#include "services/base/FileDescriptor.h"
-
 #include <filesystem>
 #include <string>
+
+#include "services/base/FileDescriptor.h"
 
 namespace quorl::base {
 

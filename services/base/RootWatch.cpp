@@ -1,8 +1,8 @@
 #include "services/base/RootWatch.h"
 
-#include "services/base/InotifyEvents.h"
-
 #include <utility>
+
+#include "services/base/InotifyEvents.h"
 
 namespace quorl::base {
 

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "services/base/FileDescriptor.h"
-
 #include <filesystem>
 #include <string>
 #include <unordered_map>
+
+#include "services/base/FileDescriptor.h"
 
 namespace quorl::base {
 

@@ -1,10 +1,10 @@
 #include "services/base/Utf8.h"
 
-#include <glib.h>
-
 #include <algorithm>
 #include <array>
 #include <memory>
+
+#include <glib.h>
 
 namespace quorl::base {
 

@@ -1,12 +1,12 @@
 #include "services/engine/BusLoop.h"
 
-#include <poll.h>
-#include <sys/eventfd.h>
-
 #include <algorithm>
 #include <cerrno>
 #include <system_error>
 #include <utility>
+
+#include <poll.h>
+#include <sys/eventfd.h>
 
 namespace quorl::engine {
 

@@ -1,9 +1,5 @@
 #pragma once
 
-#include "services/base/FileDescriptor.h"
-
-#include <sdbus-c++/sdbus-c++.h>
-
 #include <chrono>
 #include <functional>
 #include <map>
@@ -11,6 +7,10 @@
 #include <mutex>
 #include <string>
 #include <vector>
+
+#include <sdbus-c++/sdbus-c++.h>
+
+#include "services/base/FileDescriptor.h"
 
 namespace quorl::engine {
 

@@ -1,10 +1,10 @@
 #include "services/engine/Client.h"
 
-#include "services/engine/BusLoop.h"
-
 #include <algorithm>
 #include <thread>
 #include <utility>
+
+#include "services/engine/BusLoop.h"
 
 namespace quorl::engine {
 namespace {

@@ -1,11 +1,11 @@
 #pragma once
 
-#include "services/engine/Model.h"
-#include "services/engine/Names.h"
-
 #include <functional>
 #include <memory>
 #include <string>
+
+#include "services/engine/Model.h"
+#include "services/engine/Names.h"
 
 namespace quorl::engine {
 

@@ -1,11 +1,11 @@
 #pragma once
 
-#include <sdbus-c++/sdbus-c++.h>
-
 #include <cstdint>
 #include <map>
 #include <string>
 #include <vector>
+
+#include <sdbus-c++/sdbus-c++.h>
 
 /// What a sync engine tells about itself, as plain values.
 namespace quorl::engine {

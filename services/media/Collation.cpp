@@ -1,10 +1,10 @@
 #include "services/media/Collation.h"
 
+#include <cstdint>
+
 #include <glib.h>
 #include <unicode/locid.h>
 #include <unicode/stringpiece.h>
-
-#include <cstdint>
 
 namespace quorl::media {
 

@@ -1,9 +1,9 @@
 #pragma once
 
-#include <unicode/coll.h>
-
 #include <memory>
 #include <string_view>
+
+#include <unicode/coll.h>
 
 namespace quorl::media {
 

@@ -1,17 +1,16 @@
 #include "services/media/ContentKinds.h"
 
-#include "services/base/FileDescriptor.h"
-#include "services/base/FileStatus.h"
-
-#include <gio/gio.h>
-
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
-
 #include <algorithm>
 #include <array>
 #include <memory>
+
+#include <fcntl.h>
+#include <gio/gio.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "services/base/FileDescriptor.h"
+#include "services/base/FileStatus.h"
 
 namespace quorl::media {
 

@@ -1,11 +1,11 @@
 #pragma once
 
-#include "services/media/Snapshot.h"
-
 #include <map>
 #include <optional>
 #include <string>
 #include <string_view>
+
+#include "services/media/Snapshot.h"
 
 namespace quorl::media {
 

@@ -1,21 +1,21 @@
 #include "services/media/Directory.h"
 
-#include "services/base/FileDescriptor.h"
-#include "services/base/FileStatus.h"
-#include "services/base/MallocText.h"
-#include "services/base/Paths.h"
-#include "services/base/Utf8.h"
-
-#include <dirent.h>
-#include <fcntl.h>
-#include <sys/stat.h>
-
 #include <algorithm>
 #include <cerrno>
 #include <cstdlib>
 #include <ctime>
 #include <iterator>
 #include <utility>
+
+#include <dirent.h>
+#include <fcntl.h>
+#include <sys/stat.h>
+
+#include "services/base/FileDescriptor.h"
+#include "services/base/FileStatus.h"
+#include "services/base/MallocText.h"
+#include "services/base/Paths.h"
+#include "services/base/Utf8.h"
 
 namespace quorl::media {
 

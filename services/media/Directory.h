@@ -1,12 +1,5 @@
 #pragma once
 
-#include "services/media/ContentKinds.h"
-#include "services/media/Snapshot.h"
-#include "services/media/playlists/PlaylistContent.h"
-#include "services/media/playlists/TextList.h"
-
-#include <sys/types.h>
-
 #include <cstdint>
 #include <limits>
 #include <memory>
@@ -15,6 +8,13 @@
 #include <string_view>
 #include <variant>
 #include <vector>
+
+#include <sys/types.h>
+
+#include "services/media/ContentKinds.h"
+#include "services/media/Snapshot.h"
+#include "services/media/playlists/PlaylistContent.h"
+#include "services/media/playlists/TextList.h"
 
 namespace quorl::media {
 

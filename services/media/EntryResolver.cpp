@@ -1,17 +1,17 @@
 #include "services/media/EntryResolver.h"
 
+#include <algorithm>
+#include <cerrno>
+#include <cstdlib>
+#include <filesystem>
+
+#include <sys/stat.h>
+
 #include "services/base/FileStatus.h"
 #include "services/base/MallocText.h"
 #include "services/base/Paths.h"
 #include "services/base/Utf8.h"
 #include "services/media/playlists/EntryReadings.h"
-
-#include <sys/stat.h>
-
-#include <algorithm>
-#include <cerrno>
-#include <cstdlib>
-#include <filesystem>
 
 namespace quorl::media {
 

@@ -1,13 +1,13 @@
 #pragma once
 
-#include "services/media/FolderTree.h"
-#include "services/media/playlists/LeftOut.h"
-#include "services/media/playlists/PlaylistContent.h"
-
 #include <optional>
 #include <string>
 #include <string_view>
 #include <variant>
+
+#include "services/media/FolderTree.h"
+#include "services/media/playlists/LeftOut.h"
+#include "services/media/playlists/PlaylistContent.h"
 
 namespace quorl::media {
 

@@ -1,9 +1,5 @@
 #pragma once
 
-#include "services/base/DirectoryWatch.h"
-#include "services/media/ContentKinds.h"
-#include "services/media/Directory.h"
-
 #include <cstddef>
 #include <filesystem>
 #include <memory>
@@ -11,6 +7,10 @@
 #include <string>
 #include <unordered_map>
 #include <vector>
+
+#include "services/base/DirectoryWatch.h"
+#include "services/media/ContentKinds.h"
+#include "services/media/Directory.h"
 
 namespace quorl::media {
 

@@ -1,16 +1,5 @@
 #include "services/media/MusicFolder.h"
 
-#include "services/base/DirectoryWatch.h"
-#include "services/base/FileDescriptor.h"
-#include "services/base/MountWatch.h"
-#include "services/base/RootWatch.h"
-#include "services/media/FolderTree.h"
-#include "services/media/SnapshotBuilder.h"
-
-#include <malloc.h>
-#include <poll.h>
-#include <sys/eventfd.h>
-
 #include <array>
 #include <cerrno>
 #include <chrono>
@@ -21,6 +10,17 @@
 #include <thread>
 #include <utility>
 #include <vector>
+
+#include <malloc.h>
+#include <poll.h>
+#include <sys/eventfd.h>
+
+#include "services/base/DirectoryWatch.h"
+#include "services/base/FileDescriptor.h"
+#include "services/base/MountWatch.h"
+#include "services/base/RootWatch.h"
+#include "services/media/FolderTree.h"
+#include "services/media/SnapshotBuilder.h"
 
 namespace quorl::media {
 

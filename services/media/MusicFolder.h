@@ -1,10 +1,10 @@
 #pragma once
 
-#include "services/media/Snapshot.h"
-
 #include <filesystem>
 #include <functional>
 #include <memory>
+
+#include "services/media/Snapshot.h"
 
 namespace quorl::media {
 

@@ -1,12 +1,12 @@
 #include "services/media/PlaylistIdentity.h"
 
-#include "services/base/Utf8.h"
-
-#include <glib.h>
-
 #include <array>
 #include <bit>
 #include <string>
+
+#include <glib.h>
+
+#include "services/base/Utf8.h"
 
 namespace quorl::media {
 

@@ -1,9 +1,9 @@
 #pragma once
 
-#include "services/media/Snapshot.h"
-
 #include <cstdint>
 #include <string_view>
+
+#include "services/media/Snapshot.h"
 
 namespace quorl::media {
 

@@ -1,15 +1,15 @@
 #pragma once
 
-#include "services/media/playlists/Generated.h"
-#include "services/media/playlists/LeftOut.h"
-#include "services/media/playlists/TextList.h"
-
 #include <cstddef>
 #include <cstdint>
 #include <filesystem>
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "services/media/playlists/Generated.h"
+#include "services/media/playlists/LeftOut.h"
+#include "services/media/playlists/TextList.h"
 
 namespace quorl::media {
 

@@ -1,15 +1,15 @@
 #include "services/media/SnapshotBuilder.h"
 
-#include "services/base/Utf8.h"
-#include "services/media/Collation.h"
-#include "services/media/EntryResolver.h"
-#include "services/media/PlaylistIdentity.h"
-
 #include <algorithm>
 #include <unordered_map>
 #include <unordered_set>
 #include <utility>
 #include <variant>
+
+#include "services/base/Utf8.h"
+#include "services/media/Collation.h"
+#include "services/media/EntryResolver.h"
+#include "services/media/PlaylistIdentity.h"
 
 namespace quorl::media {
 

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "services/media/FolderTree.h"
-#include "services/media/Snapshot.h"
-
 #include <memory>
 #include <stop_token>
+
+#include "services/media/FolderTree.h"
+#include "services/media/Snapshot.h"
 
 namespace quorl::media {
 

@@ -2,12 +2,12 @@
 #define G_SETTINGS_ENABLE_BACKEND
 #include "services/preferences/Backend.h"
 
-#include "services/preferences/Preference.h"
+#include <string_view>
+#include <utility>
 
 #include <gio/gsettingsbackend.h>
 
-#include <string_view>
-#include <utility>
+#include "services/preferences/Preference.h"
 
 namespace quorl::preferences {
 namespace {

@@ -1,8 +1,8 @@
 #pragma once
 
-#include <gio/gio.h>
-
 #include <memory>
+
+#include <gio/gio.h>
 
 namespace quorl::preferences {
 

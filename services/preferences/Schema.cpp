@@ -1,11 +1,11 @@
 #include "services/preferences/Schema.h"
 
-#include "services/preferences/Preference.h"
-#include "services/preferences/Variant.h"
-
 #include <filesystem>
 #include <system_error>
 #include <vector>
+
+#include "services/preferences/Preference.h"
+#include "services/preferences/Variant.h"
 
 namespace quorl::preferences {
 namespace {

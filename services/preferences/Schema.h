@@ -1,8 +1,8 @@
 #pragma once
 
-#include "services/preferences/Pointers.h"
-
 #include <string>
+
+#include "services/preferences/Pointers.h"
 
 namespace quorl::preferences {
 

@@ -1,9 +1,5 @@
 #include "services/preferences/SharedPreferences.h"
 
-#include "services/preferences/Backend.h"
-#include "services/preferences/Schema.h"
-#include "services/preferences/Variant.h"
-
 #include <deque>
 #include <map>
 #include <mutex>
@@ -11,6 +7,10 @@
 #include <stop_token>
 #include <thread>
 #include <utility>
+
+#include "services/preferences/Backend.h"
+#include "services/preferences/Schema.h"
+#include "services/preferences/Variant.h"
 
 namespace quorl::preferences {
 namespace {

@@ -1,13 +1,13 @@
 #pragma once
 
-#include "services/preferences/Preference.h"
-
 #include <functional>
 #include <memory>
 #include <set>
 #include <string>
 #include <string_view>
 #include <type_traits>
+
+#include "services/preferences/Preference.h"
 
 namespace quorl::preferences {
 

@@ -1,9 +1,9 @@
 #pragma once
 
-#include "services/preferences/Pointers.h"
-
 #include <cstdint>
 #include <optional>
+
+#include "services/preferences/Pointers.h"
 
 namespace quorl::preferences {
 

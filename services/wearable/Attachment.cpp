@@ -1,11 +1,11 @@
 #include "services/wearable/Attachment.h"
 
-#include "services/base/AtomicFile.h"
-#include "services/wearable/Wearable.h"
+#include <system_error>
 
 #include <nlohmann/json.hpp>
 
-#include <system_error>
+#include "services/base/AtomicFile.h"
+#include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
 namespace {

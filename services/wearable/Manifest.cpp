@@ -1,12 +1,12 @@
 #include "services/wearable/Manifest.h"
 
-#include "services/base/AtomicFile.h"
-#include "services/wearable/Wearable.h"
+#include <algorithm>
+#include <charconv>
 
 #include <nlohmann/json.hpp>
 
-#include <algorithm>
-#include <charconv>
+#include "services/base/AtomicFile.h"
+#include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
 namespace {

@@ -1,14 +1,14 @@
 #include "services/wearable/Report.h"
 
-#include "services/base/AtomicFile.h"
+#include <algorithm>
+#include <cerrno>
+#include <system_error>
 
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <sys/statvfs.h>
 
-#include <algorithm>
-#include <cerrno>
-#include <system_error>
+#include "services/base/AtomicFile.h"
 
 namespace quorl::wearable {
 namespace {

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "services/wearable/Manifest.h"
-#include "services/wearable/Wearable.h"
-
 #include <cstdint>
 #include <optional>
+
+#include "services/wearable/Manifest.h"
+#include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
 

@@ -1,12 +1,12 @@
 #pragma once
 
-#include "services/wearable/Report.h"
-
 #include <chrono>
 #include <functional>
 #include <memory>
 #include <string>
 #include <variant>
+
+#include "services/wearable/Report.h"
 
 namespace quorl::wearable {
 

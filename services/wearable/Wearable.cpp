@@ -1,10 +1,10 @@
 #include "services/wearable/Wearable.h"
 
-#include <fcntl.h>
-#include <sys/stat.h>
-
 #include <cstdlib>
 #include <string_view>
+
+#include <fcntl.h>
+#include <sys/stat.h>
 
 namespace quorl::wearable {
 namespace {

@@ -1,13 +1,13 @@
 // Proves the libdispatch that was found: a host with its own event loop can drain the main queue.
 
+#include <array>
+#include <cstdint>
+#include <thread>
+
 #include <dispatch/dispatch.h>
 #include <gtest/gtest.h>
 #include <poll.h>
 #include <unistd.h>
-
-#include <array>
-#include <cstdint>
-#include <thread>
 
 // Exported for hosts with an event loop of their own, but declared in no installed header.
 extern "C" {

@@ -1,10 +1,10 @@
 // The connection of an app to the engine.
 
-#include "tests/engine/EngineFixture.h"
+#include <csignal>
 
 #include <sdbus-c++/sdbus-c++.h>
 
-#include <csignal>
+#include "tests/engine/EngineFixture.h"
 
 namespace {
 

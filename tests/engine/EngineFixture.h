@@ -1,12 +1,12 @@
 #pragma once
 
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
 #include "services/preferences/SharedPreferences.h"
 #include "tests/engine/Folders.h"
 #include "tests/engine/Process.h"
 #include "tests/engine/Recorder.h"
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 namespace quorl::syncd::testing {
 

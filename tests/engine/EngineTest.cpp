@@ -1,18 +1,16 @@
 // The engine as the app meets it: over the session bus.
 
-#include "tests/engine/EngineFixture.h"
-#include "tests/engine/SlowDevice.h"
-
-#include "services/base/AtomicFile.h"
-#include "services/engine/Names.h"
+#include <algorithm>
+#include <csignal>
 
 #include <sdbus-c++/sdbus-c++.h>
-
 #include <sys/file.h>
 #include <sys/mount.h>
 
-#include <algorithm>
-#include <csignal>
+#include "services/base/AtomicFile.h"
+#include "services/engine/Names.h"
+#include "tests/engine/EngineFixture.h"
+#include "tests/engine/SlowDevice.h"
 
 namespace {
 

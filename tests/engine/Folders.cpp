@@ -1,12 +1,12 @@
 #include "tests/engine/Folders.h"
 
-#include "services/base/AtomicFile.h"
-#include "services/media/MusicFolder.h"
+#include <algorithm>
+#include <sstream>
 
 #include <fcntl.h>
 
-#include <algorithm>
-#include <sstream>
+#include "services/base/AtomicFile.h"
+#include "services/media/MusicFolder.h"
 
 namespace quorl::syncd::testing {
 

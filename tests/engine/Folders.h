@@ -1,13 +1,13 @@
 #pragma once
 
+#include <map>
+#include <string>
+#include <vector>
+
 #include "quorl-syncd/transfer/RateLimit.h"
 #include "quorl-syncd/transfer/Sync.h"
 #include "services/preferences/Preference.h"
 #include "tests/wearable/TemporaryDirectory.h"
-
-#include <map>
-#include <string>
-#include <vector>
 
 /// A music folder and a wearable, both real directories.
 namespace quorl::syncd::testing {

@@ -1,13 +1,12 @@
 // The machine stays awake while the engine copies, and may sleep afterwards.
 
-#include "tests/engine/EngineFixture.h"
-
-#include <sdbus-c++/sdbus-c++.h>
+#include <csignal>
 
 #include <fcntl.h>
+#include <sdbus-c++/sdbus-c++.h>
 #include <unistd.h>
 
-#include <csignal>
+#include "tests/engine/EngineFixture.h"
 
 namespace {
 

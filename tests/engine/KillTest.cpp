@@ -1,12 +1,12 @@
 // The engine is killed again and again while it works.
 
-#include "services/base/AtomicFile.h"
-#include "tests/engine/EngineFixture.h"
-
 #include <chrono>
 #include <csignal>
 #include <random>
 #include <thread>
+
+#include "services/base/AtomicFile.h"
+#include "tests/engine/EngineFixture.h"
 
 namespace {
 

@@ -1,10 +1,11 @@
 // What the engine remembers of its syncs, and when it tries again.
 
 #include "quorl-syncd/engine/LastResults.h"
-#include "quorl-syncd/engine/RetryDelay.h"
-#include "tests/wearable/TemporaryDirectory.h"
 
 #include <gtest/gtest.h>
+
+#include "quorl-syncd/engine/RetryDelay.h"
+#include "tests/wearable/TemporaryDirectory.h"
 
 namespace {
 

@@ -1,9 +1,9 @@
 // Which songs of the playlist are sent.
 
-#include "tests/engine/Folders.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+
+#include "tests/engine/Folders.h"
 
 namespace {
 

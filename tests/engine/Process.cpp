@@ -1,12 +1,12 @@
 #include "tests/engine/Process.h"
 
-#include <fcntl.h>
-#include <sys/wait.h>
-#include <unistd.h>
-
 #include <csignal>
 #include <cstdlib>
 #include <stdexcept>
+
+#include <fcntl.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
 namespace quorl::syncd::testing {
 namespace {

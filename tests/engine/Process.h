@@ -1,12 +1,12 @@
 #pragma once
 
-#include "services/base/FileDescriptor.h"
-
-#include <sys/types.h>
-
 #include <map>
 #include <string>
 #include <vector>
+
+#include <sys/types.h>
+
+#include "services/base/FileDescriptor.h"
 
 namespace quorl::syncd::testing {
 

@@ -1,13 +1,13 @@
 #pragma once
 
-#include "services/engine/Client.h"
-
 #include <condition_variable>
 #include <functional>
 #include <future>
 #include <mutex>
 #include <string>
 #include <vector>
+
+#include "services/engine/Client.h"
 
 namespace quorl::syncd::testing {
 

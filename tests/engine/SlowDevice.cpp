@@ -1,13 +1,13 @@
 #include "tests/engine/SlowDevice.h"
 
+#include <array>
+
 #include <fcntl.h>
 #include <poll.h>
 #include <sys/eventfd.h>
 #include <sys/fanotify.h>
 #include <sys/mount.h>
 #include <unistd.h>
-
-#include <array>
 
 namespace quorl::syncd::testing {
 

@@ -1,11 +1,11 @@
 #pragma once
 
-#include "services/base/FileDescriptor.h"
-#include "tests/wearable/TemporaryDirectory.h"
-
 #include <condition_variable>
 #include <mutex>
 #include <thread>
+
+#include "services/base/FileDescriptor.h"
+#include "tests/wearable/TemporaryDirectory.h"
 
 namespace quorl::syncd::testing {
 

@@ -1,11 +1,10 @@
 // What is on the wearable after a sync.
 
-#include "tests/engine/Folders.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
 #include <sys/stat.h>
+
+#include "tests/engine/Folders.h"
 
 namespace {
 

@@ -1,11 +1,10 @@
 // What can go wrong in the middle of a sync.
 
-#include "tests/engine/Folders.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
 #include <sys/mount.h>
+
+#include "tests/engine/Folders.h"
 
 namespace {
 

@@ -1,10 +1,10 @@
-#include "services/media/MusicFolder.h"
-#include "tests/media/TemporaryFolder.h"
+#include <cstdint>
+#include <string>
 
 #include <gtest/gtest.h>
 
-#include <cstdint>
-#include <string>
+#include "services/media/MusicFolder.h"
+#include "tests/media/TemporaryFolder.h"
 
 namespace quorl::media::test {
 

@@ -1,15 +1,15 @@
 #include "services/media/playlists/LeftOut.h"
-#include "services/media/MusicFolder.h"
-#include "services/media/playlists/PlaylistContent.h"
-#include "tests/media/TemporaryFolder.h"
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <sys/stat.h>
 
 #include <filesystem>
 #include <string>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include "services/media/MusicFolder.h"
+#include "services/media/playlists/PlaylistContent.h"
+#include "tests/media/TemporaryFolder.h"
 
 namespace quorl::media::test {
 

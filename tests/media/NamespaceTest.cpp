@@ -1,18 +1,17 @@
 // These tests mount file systems and lower limits of the system. They run in namespaces of their
 // own, which CMakeLists.txt sees to, so that nothing outside notices.
 
-#include "tests/media/TemporaryFolder.h"
-#include "tests/media/WatchedFolder.h"
-
-#include <gtest/gtest.h>
-
-#include <sys/mount.h>
-
 #include <cerrno>
 #include <fstream>
 #include <stdexcept>
 #include <string>
 #include <system_error>
+
+#include <gtest/gtest.h>
+#include <sys/mount.h>
+
+#include "tests/media/TemporaryFolder.h"
+#include "tests/media/WatchedFolder.h"
 
 namespace quorl::media::test {
 

@@ -1,16 +1,15 @@
-#include "services/media/MusicFolder.h"
-#include "tests/media/TemporaryFolder.h"
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
-#include <sys/stat.h>
-
 #include <cstdlib>
 #include <filesystem>
 #include <optional>
 #include <ostream>
 #include <string>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include "services/media/MusicFolder.h"
+#include "tests/media/TemporaryFolder.h"
 
 namespace quorl::media::test {
 

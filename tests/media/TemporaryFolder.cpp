@@ -1,10 +1,5 @@
 #include "tests/media/TemporaryFolder.h"
 
-#include <fcntl.h>
-#include <sys/fsuid.h>
-#include <sys/stat.h>
-#include <unistd.h>
-
 #include <cerrno>
 #include <cstdlib>
 #include <ctime>
@@ -12,6 +7,11 @@
 #include <stdexcept>
 #include <system_error>
 #include <thread>
+
+#include <fcntl.h>
+#include <sys/fsuid.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 namespace quorl::media::test {
 

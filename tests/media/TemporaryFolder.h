@@ -1,7 +1,5 @@
 #pragma once
 
-#include "services/media/Snapshot.h"
-
 #include <cstdint>
 #include <filesystem>
 #include <functional>
@@ -9,6 +7,8 @@
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "services/media/Snapshot.h"
 
 namespace quorl::media::test {
 

@@ -1,10 +1,3 @@
-#include "services/media/MusicFolder.h"
-#include "tests/media/TemporaryFolder.h"
-#include "tests/media/WatchedFolder.h"
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
 #include <atomic>
 #include <chrono>
 #include <fstream>
@@ -13,6 +6,13 @@
 #include <string>
 #include <thread>
 #include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "services/media/MusicFolder.h"
+#include "tests/media/TemporaryFolder.h"
+#include "tests/media/WatchedFolder.h"
 
 namespace quorl::media::test {
 

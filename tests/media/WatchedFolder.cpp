@@ -1,11 +1,11 @@
 #include "tests/media/WatchedFolder.h"
 
-#include "tests/media/TemporaryFolder.h"
-
 #include <algorithm>
 #include <chrono>
 #include <stdexcept>
 #include <utility>
+
+#include "tests/media/TemporaryFolder.h"
 
 namespace quorl::media::test {
 

@@ -1,13 +1,13 @@
 #pragma once
 
-#include "services/media/MusicFolder.h"
-
 #include <condition_variable>
 #include <cstddef>
 #include <filesystem>
 #include <functional>
 #include <memory>
 #include <mutex>
+
+#include "services/media/MusicFolder.h"
 
 namespace quorl::media::test {
 

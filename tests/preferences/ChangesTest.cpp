@@ -1,11 +1,11 @@
 // What a program is told of changes that others make.
 
-#include "tests/preferences/Session.h"
+#include <future>
+#include <mutex>
 
 #include <gtest/gtest.h>
 
-#include <future>
-#include <mutex>
+#include "tests/preferences/Session.h"
 
 namespace {
 

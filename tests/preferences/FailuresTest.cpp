@@ -1,13 +1,13 @@
 // What becomes of the shared preferences when something they need is missing or goes away.
 
-#include "tests/preferences/Session.h"
+#include <fstream>
+#include <future>
+#include <thread>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <fstream>
-#include <future>
-#include <thread>
+#include "tests/preferences/Session.h"
 
 namespace {
 

@@ -10,13 +10,13 @@
 // It begins with "ready", "limited: " and why, or "failed: " and why. In between it says "told "
 // and the keys whenever it is told of changes.
 
-#include "services/preferences/SharedPreferences.h"
-#include "tests/preferences/Text.h"
-
 #include <iostream>
 #include <mutex>
 #include <sstream>
 #include <thread>
+
+#include "services/preferences/SharedPreferences.h"
+#include "tests/preferences/Text.h"
 
 namespace {
 

@@ -1,11 +1,11 @@
 // Several programs that use the shared preferences at the same time, or end in the middle.
 
-#include "tests/preferences/Session.h"
-#include "tests/preferences/Text.h"
+#include <array>
 
 #include <gtest/gtest.h>
 
-#include <array>
+#include "tests/preferences/Session.h"
+#include "tests/preferences/Text.h"
 
 namespace {
 

@@ -1,10 +1,5 @@
 #pragma once
 
-#include "services/preferences/Pointers.h"
-#include "services/preferences/SharedPreferences.h"
-
-#include <gtest/gtest.h>
-
 #include <condition_variable>
 #include <deque>
 #include <filesystem>
@@ -12,6 +7,11 @@
 #include <mutex>
 #include <string>
 #include <vector>
+
+#include <gtest/gtest.h>
+
+#include "services/preferences/Pointers.h"
+#include "services/preferences/SharedPreferences.h"
 
 /// What the tests of the preferences need of the login session that tests/session-run gives them.
 namespace quorl::preferences::testing {

@@ -1,15 +1,15 @@
 // What one program sees of the shared preferences.
 
+#include <array>
+#include <limits>
+#include <thread>
+
+#include <gtest/gtest.h>
+
 #include "services/preferences/Schema.h"
 #include "services/preferences/Variant.h"
 #include "tests/preferences/Session.h"
 #include "tests/preferences/Text.h"
-
-#include <gtest/gtest.h>
-
-#include <array>
-#include <limits>
-#include <thread>
 
 namespace {
 

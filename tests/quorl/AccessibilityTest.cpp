@@ -1,6 +1,6 @@
-#include <gmock/gmock.h>
-
 #include <QAccessible>
+
+#include <gmock/gmock.h>
 
 #include "tests/quorl/Window.h"
 

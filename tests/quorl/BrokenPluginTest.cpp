@@ -1,8 +1,7 @@
+#include <QImage>
 #include <fstream>
 
 #include <gmock/gmock.h>
-
-#include <QImage>
 
 #include "tests/quorl/Music.h"
 #include "tests/quorl/Program.h"

@@ -1,8 +1,7 @@
+#include <QImage>
 #include <cmath>
 
 #include <gmock/gmock.h>
-
-#include <QImage>
 
 #include "quorl/app/CompanionHost.h"
 #include "quorl/window/CellPainter.h"

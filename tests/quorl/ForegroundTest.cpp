@@ -1,4 +1,5 @@
 #include <QCoreApplication>
+
 #include <gmock/gmock.h>
 
 #include "tests/quorl/Window.h"

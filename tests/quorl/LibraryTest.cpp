@@ -1,8 +1,8 @@
 #include "quorl/adapters/Library.h"
 
-#include <gmock/gmock.h>
-
 #include <QTest>
+
+#include <gmock/gmock.h>
 
 #include "quorl/app/MainQueueNotifier.h"
 #include "tests/quorl/Music.h"

@@ -1,7 +1,7 @@
-#include <gmock/gmock.h>
-
 #include <QScrollBar>
 #include <QTest>
+
+#include <gmock/gmock.h>
 
 #include "quorl/app/CompanionHost.h"
 #include "quorl/window/RowsView.h"

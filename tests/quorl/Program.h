@@ -1,11 +1,10 @@
 #pragma once
 
+#include <QProcess>
 #include <map>
 #include <optional>
 #include <string>
 #include <vector>
-
-#include <QProcess>
 
 namespace quorl::tests {
 

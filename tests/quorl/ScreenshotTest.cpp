@@ -1,6 +1,6 @@
-#include <gmock/gmock.h>
-
 #include <QImage>
+
+#include <gmock/gmock.h>
 
 #include "tests/quorl/Music.h"
 #include "tests/quorl/Program.h"

@@ -1,8 +1,7 @@
 #include "tests/quorl/Window.h"
 
-#include <stdexcept>
-
 #include <QTest>
+#include <stdexcept>
 
 namespace quorl::tests {
 

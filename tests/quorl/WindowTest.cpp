@@ -1,10 +1,10 @@
 #include "tests/quorl/Window.h"
 
-#include <gmock/gmock.h>
-
 #include <QScrollBar>
 #include <QTest>
 #include <QToolButton>
+
+#include <gmock/gmock.h>
 
 #include "tests/quorl/Program.h"
 

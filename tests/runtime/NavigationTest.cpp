@@ -1,7 +1,6 @@
-#include "runtime/lists/NavigationController.h"
-
 #include <gmock/gmock.h>
 
+#include "runtime/lists/NavigationController.h"
 #include "runtime/lists/PSListView.h"
 #include "tests/support/TestHost.h"
 

@@ -1,8 +1,7 @@
-#include "settings/LMQuorlLimitChooser.h"
-
 #include <gmock/gmock.h>
 
 #include "platform/SizeFormatter.h"
+#include "settings/LMQuorlLimitChooser.h"
 #include "tests/settings/TablePane.h"
 
 namespace {

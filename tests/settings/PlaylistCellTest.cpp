@@ -1,7 +1,6 @@
-#include "settings/LMQuorlPlaylistCell.h"
-
 #include <gmock/gmock.h>
 
+#include "settings/LMQuorlPlaylistCell.h"
 #include "tests/support/TestHost.h"
 
 namespace {

@@ -1,10 +1,9 @@
-#include "settings/LMQuorlPlaylistChooser.h"
-
 #include <limits>
 
 #include <gmock/gmock.h>
 
 #include "settings/LMQuorlPlaylistCell.h"
+#include "settings/LMQuorlPlaylistChooser.h"
 #include "sync/LMQuorlSyncManager.h"
 #include "tests/settings/TablePane.h"
 

@@ -1,5 +1,3 @@
-#include "sync/LMQuorlSyncManager.h"
-
 #include <array>
 #include <limits>
 #include <thread>
@@ -7,6 +5,7 @@
 #include <gmock/gmock.h>
 
 #include "platform/UserInterface.h"
+#include "sync/LMQuorlSyncManager.h"
 #include "tests/support/MainQueueRun.h"
 #include "tests/support/TestHost.h"
 

@@ -1,7 +1,6 @@
-#include "sync/LMSyncDefaults+Extras.h"
-
 #include <gmock/gmock.h>
 
+#include "sync/LMSyncDefaults+Extras.h"
 #include "tests/support/MainQueueRun.h"
 #include "tests/support/TestHost.h"
 

@@ -1,14 +1,15 @@
 // The list of our files on a wearable, which others may have had in their hands.
 
 #include "services/wearable/Manifest.h"
-#include "services/base/AtomicFile.h"
-#include "services/wearable/Attachment.h"
-#include "tests/wearable/TemporaryDirectory.h"
+
+#include <limits>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <limits>
+#include "services/base/AtomicFile.h"
+#include "services/wearable/Attachment.h"
+#include "tests/wearable/TemporaryDirectory.h"
 
 namespace {
 

@@ -1,14 +1,14 @@
 // How much room a wearable says it has.
 
 #include "services/wearable/Report.h"
-#include "services/base/AtomicFile.h"
-#include "tests/wearable/TemporaryDirectory.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
 #include <sys/mount.h>
 #include <sys/statvfs.h>
+
+#include "services/base/AtomicFile.h"
+#include "tests/wearable/TemporaryDirectory.h"
 
 namespace {
 

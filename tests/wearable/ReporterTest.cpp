@@ -1,10 +1,6 @@
 // Questions to a wearable that may be slow, hang or go away.
 
 #include "services/wearable/Reporter.h"
-#include "tests/wearable/TemporaryDirectory.h"
-
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <atomic>
 #include <future>
@@ -12,6 +8,11 @@
 #include <semaphore>
 #include <thread>
 #include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "tests/wearable/TemporaryDirectory.h"
 
 namespace {
 

@@ -1,9 +1,9 @@
 #include "services/media/playlists/EntryReadings.h"
 
-#include <glib.h>
-
 #include <algorithm>
 #include <optional>
+
+#include <glib.h>
 
 namespace quorl::media {
 

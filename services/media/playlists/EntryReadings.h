@@ -1,12 +1,12 @@
 #pragma once
 
-#include "services/media/playlists/LeftOut.h"
-#include "services/media/playlists/PlaylistContent.h"
-
 #include <string>
 #include <string_view>
 #include <variant>
 #include <vector>
+
+#include "services/media/playlists/LeftOut.h"
+#include "services/media/playlists/PlaylistContent.h"
 
 namespace quorl::media {
 

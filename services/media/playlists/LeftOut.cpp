@@ -1,9 +1,9 @@
 #include "services/media/playlists/LeftOut.h"
 
-#include "services/base/Utf8.h"
-
 #include <algorithm>
 #include <array>
+
+#include "services/base/Utf8.h"
 
 namespace quorl::media {
 

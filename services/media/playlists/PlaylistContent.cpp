@@ -1,15 +1,15 @@
 #include "services/media/playlists/PlaylistContent.h"
 
-#include "services/base/Utf8.h"
-
-#include <glib.h>
-#include <pugixml.hpp>
-
 #include <algorithm>
 #include <array>
 #include <charconv>
 #include <utility>
 #include <vector>
+
+#include <glib.h>
+#include <pugixml.hpp>
+
+#include "services/base/Utf8.h"
 
 namespace quorl::media {
 

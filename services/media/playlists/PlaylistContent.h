@@ -1,13 +1,13 @@
 #pragma once
 
-#include "services/media/playlists/Generated.h"
-#include "services/media/playlists/TextList.h"
-
 #include <cstddef>
 #include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
+
+#include "services/media/playlists/Generated.h"
+#include "services/media/playlists/TextList.h"
 
 namespace quorl::media {
 
