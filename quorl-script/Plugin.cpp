@@ -14,6 +14,7 @@ namespace {
 // What the plug-in's functions are called in its shared object, and their types. A method is a
 // function of the object that it is sent to.
 namespace symbols {
+
 constexpr const char* sharedManager = "_ZN18LMQuorlSyncManager13sharedManagerEv";
 constexpr const char* syncStage = "_ZNK18LMQuorlSyncManager9syncStageEv";
 constexpr const char* progress = "_ZNK18LMQuorlSyncManager8progressEv";

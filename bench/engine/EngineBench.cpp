@@ -52,7 +52,7 @@ void run(const std::string& command) {
     }
 }
 
-template <typename Act>
+template <class Act>
 double secondsOf(Act act) {
     const auto begun = std::chrono::steady_clock::now();
     act();

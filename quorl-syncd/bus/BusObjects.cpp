@@ -9,10 +9,11 @@
 #include "services/engine/Names.h"
 
 namespace quorl::syncd {
+
 namespace {
 
 /// The names of the properties whose values differ. `fields` pairs names with member pointers.
-template <typename Status, typename... Field>
+template <class Status, class... Field>
 std::vector<std::string> changes(const Status& before, const Status& now,
                                  const std::pair<const char*, Field>&... fields) {
     std::vector<std::string> names;
@@ -26,7 +27,7 @@ std::vector<std::string> changes(const Status& before, const Status& now,
 }
 
 /// Has the caller on the bus told what went wrong, in words.
-template <typename Act>
+template <class Act>
 void answering(const char* errorName, Act act) {
     try {
         act();

@@ -8,6 +8,7 @@
 #include "services/engine/Names.h"
 
 namespace quorl::syncd {
+
 namespace {
 
 using Clock = std::chrono::steady_clock;
@@ -28,7 +29,7 @@ double fractionOf(const CopyProgress& progress) {
 }
 
 /// Tells that an object leaves the bus, which may be gone itself.
-template <typename Tell>
+template <class Tell>
 void leave(Tell tell) {
     try {
         tell();

@@ -6,6 +6,7 @@
 #include "services/wearable/Wearable.h"
 
 namespace quorl::syncd {
+
 namespace {
 
 constexpr auto loginManager = "org.freedesktop.login1";

@@ -12,6 +12,7 @@
 #include "services/base/AtomicFile.h"
 
 namespace quorl::syncd {
+
 namespace {
 
 using Clock = engine::BusLoop::Clock;

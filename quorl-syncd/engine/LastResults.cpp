@@ -7,6 +7,7 @@
 #include "services/base/AtomicFile.h"
 
 namespace quorl::syncd {
+
 namespace {
 
 using Json = nlohmann::json;

@@ -17,6 +17,7 @@
 #include "services/wearable/Report.h"
 
 namespace quorl::syncd {
+
 namespace {
 
 using base::FileDescriptor;

@@ -9,6 +9,7 @@
 #include "services/base/Utf8.h"
 
 namespace quorl::syncd {
+
 namespace {
 
 constexpr std::size_t longestName = 255;

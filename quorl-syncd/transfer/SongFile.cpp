@@ -17,6 +17,7 @@
 #include "services/base/Utf8.h"
 
 namespace quorl::syncd {
+
 namespace {
 
 constexpr std::size_t pieceSize = 1 << 20;

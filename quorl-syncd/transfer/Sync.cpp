@@ -13,6 +13,7 @@
 #include "services/base/AtomicFile.h"
 
 namespace quorl::syncd {
+
 namespace {
 
 using wearable::Entry;
@@ -41,7 +42,7 @@ Index indexOf(const std::vector<Entry>& entries) {
 }
 
 /// Whether `use` takes one of the entries with this source.
-template <typename Use>
+template <class Use>
 bool anyOf(const Index& index, const std::string& source, Use use) {
     const auto [begin, end] = index.equal_range(source);
     return std::any_of(begin, end, [&](const auto& found) { return use(found.second); });

@@ -6,6 +6,7 @@
 #include "services/preferences/Preference.h"
 
 namespace quorl::syncd {
+
 namespace {
 
 constexpr std::uint64_t unlimited = std::numeric_limits<std::uint64_t>::max();

@@ -10,6 +10,7 @@
 #include <unistd.h>
 
 namespace quorl::base {
+
 namespace {
 
 [[noreturn]] void fail(const std::string& what) {

@@ -13,7 +13,7 @@ namespace quorl::base {
 
 /// Calls `use(event, name)` with each inotify event that is ready on `descriptor`, which does not
 /// block. `name` is empty for an event of the watched directory itself and valid during the call.
-template <typename Use>
+template <class Use>
 void forEachInotifyEvent(int descriptor, Use use) {
     std::array<char, 65536>
         buffer; // NOLINT(cppcoreguidelines-pro-type-member-init): read() fills it

@@ -7,6 +7,7 @@
 #include "services/engine/BusLoop.h"
 
 namespace quorl::engine {
+
 namespace {
 
 constexpr auto managerInterface = "org.freedesktop.DBus.ObjectManager";
@@ -26,7 +27,7 @@ std::unique_ptr<sdbus::IConnection> connectToSession(std::string& problem) {
 }
 
 /// A handler of messages that passes over those which are not as they should be.
-template <typename Handler>
+template <class Handler>
 sdbus::message_handler tolerant(Handler handler) {
     return [handler](sdbus::Message& message) {
         try {
@@ -37,7 +38,7 @@ sdbus::message_handler tolerant(Handler handler) {
     };
 }
 
-template <typename Item>
+template <class Item>
 Item* find(std::vector<Item>& items, const std::string& path) {
     const auto found = std::ranges::find(items, path, &Item::path);
     return found == items.end() ? nullptr : &*found;
@@ -97,7 +98,7 @@ class Client::Connection {
     static void add(State& state, const std::string& path, const Interfaces& interfaces);
     static std::pair<Session*, Task*> findTask(State& state, const std::string& path);
 
-    template <typename Change>
+    template <class Change>
     auto change(Change change) {
         const std::scoped_lock lock{mutex_};
         return change(state_);

@@ -1,9 +1,10 @@
 #include "services/engine/Model.h"
 
 namespace quorl::engine {
+
 namespace {
 
-template <typename T>
+template <class T>
 void take(const Properties& properties, const char* name, T& value) {
     const auto found = properties.find(name);
     if (found != properties.end() && found->second.containsValueOfType<T>()) {

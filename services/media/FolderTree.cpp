@@ -11,7 +11,7 @@ namespace {
 
 /// Calls `use` with `top` and each directory below it, a directory before those in it. `use` may
 /// change the children of the directory that it is given.
-template <typename Use>
+template <class Use>
 void forEachDirectory(Directory& top, Use use) {
     std::vector<Directory*> waiting{&top};
     while (!waiting.empty()) {

@@ -10,6 +10,7 @@
 #include "services/preferences/Preference.h"
 
 namespace quorl::preferences {
+
 namespace {
 
 /// GSettings does not say whether its backend shares anything; the name of the type does.

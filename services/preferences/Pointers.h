@@ -12,7 +12,7 @@ struct FreedWith {
     void operator()(auto* pointer) const { Free(pointer); }
 };
 
-template <typename T>
+template <class T>
 using ObjectPointer = std::unique_ptr<T, FreedWith<g_object_unref>>;
 
 using BackendPointer = ObjectPointer<GSettingsBackend>;

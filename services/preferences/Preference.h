@@ -11,7 +11,7 @@ namespace quorl::preferences {
 ///
 /// T is `bool`, `std::uint64_t` or `std::optional<std::uint64_t>`; the last is `nothing` in the
 /// store where it holds no value.
-template <typename T>
+template <class T>
 struct Preference {
     /// The name in the store, which is also what `gsettings` calls it.
     const char* key;
@@ -63,13 +63,14 @@ inline constexpr auto allPreferences = std::tuple{assetSyncEnabled,
                                                   lastFullySentAssetSyncPlaylistVersion};
 
 /// Calls `visit` with each preference, in the order of the table.
-template <typename Visitor>
+template <class Visitor>
 constexpr void forEachPreference(Visitor&& visit) {
     std::apply([&visit](const auto&... preference) { (visit(preference), ...); }, allPreferences);
 }
 
 /// The values of `assetSyncLimitType` that have a meaning. Stored, so the numbers stay as they are.
 namespace LimitType {
+
 inline constexpr std::uint64_t Megabytes = 0; ///< of 1,048,576 bytes each
 inline constexpr std::uint64_t Songs = 1;
 } // namespace LimitType

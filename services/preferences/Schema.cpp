@@ -8,6 +8,7 @@
 #include "services/preferences/Variant.h"
 
 namespace quorl::preferences {
+
 namespace {
 
 constexpr auto schemaID = "org.quorl.Velora.AssetSync";
@@ -56,7 +57,7 @@ bool hasValue(GSettingsSchema& schema, const char* key, const char* type) {
 /// The keys that the schema lacks, or has with another type, separated by commas.
 std::string misfits(GSettingsSchema& schema) {
     std::string text;
-    forEachPreference([&]<typename T>(const Preference<T>& preference) {
+    forEachPreference([&]<class T>(const Preference<T>& preference) {
         if (!hasValue(schema, preference.key, Stored<T>::type)) {
             text += (text.empty() ? "" : ", ") + std::string{preference.key};
         }

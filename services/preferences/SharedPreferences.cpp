@@ -13,6 +13,7 @@
 #include "services/preferences/Variant.h"
 
 namespace quorl::preferences {
+
 namespace {
 
 /// What was last known of a value; tells a change from elsewhere from the echo of an own write.
@@ -246,12 +247,12 @@ SharedPreferences::Opened SharedPreferences::open(Changed changed) {
     return {std::move(preferences), store.problem()};
 }
 
-template <typename T>
+template <class T>
 T SharedPreferences::get(const Preference<T>& preference) const {
     return Stored<T>::unwrap(*store_->read(preference.key));
 }
 
-template <typename T>
+template <class T>
 WriteResult SharedPreferences::set(const Preference<T>& preference,
                                    const std::type_identity_t<T>& value) {
     return store_->write(preference.key, Stored<T>::wrap(value));

@@ -75,7 +75,7 @@ class SharedPreferences {
 
     /// The value of this moment, also where the change to it has not been told yet. Takes about a
     /// microsecond, never waits for another process, and also works without a session bus.
-    template <typename T>
+    template <class T>
     [[nodiscard]] T get(const Preference<T>& preference) const;
 
     /// Writes the value and waits until the store has it: when this returns, other processes read
@@ -84,7 +84,7 @@ class SharedPreferences {
     ///
     /// Takes some milliseconds, in which the store writes its file; up to a minute, and then fails,
     /// where its service hangs.
-    template <typename T>
+    template <class T>
     WriteResult set(const Preference<T>& preference, const std::type_identity_t<T>& value);
 
   private:

@@ -9,7 +9,7 @@ namespace quorl::preferences {
 
 /// How a value of type T looks in the store: `type` is the GVariant type, `wrap` and `unwrap` go
 /// there and back. `unwrap` wants a value of that very type.
-template <typename T>
+template <class T>
 struct Stored;
 
 template <>

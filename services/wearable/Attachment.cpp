@@ -8,6 +8,7 @@
 #include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
+
 namespace {
 
 constexpr auto fileName = "state.json";

@@ -9,6 +9,7 @@
 #include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
+
 namespace {
 
 using nlohmann::json;

@@ -11,6 +11,7 @@
 #include "services/base/AtomicFile.h"
 
 namespace quorl::wearable {
+
 namespace {
 
 using base::FileDescriptor;

@@ -7,6 +7,7 @@
 #include <thread>
 
 namespace quorl::wearable {
+
 namespace {
 
 using Clock = std::chrono::steady_clock;

@@ -7,6 +7,7 @@
 #include <sys/stat.h>
 
 namespace quorl::wearable {
+
 namespace {
 
 std::filesystem::path dataDirectory() {

@@ -27,13 +27,13 @@ class EngineTest : public ::testing::Test {
 
     void limitTo(std::uint64_t amount, std::uint64_t type);
 
-    template <typename T>
+    template <class T>
     void set(const preferences::Preference<T>& preference, std::type_identity_t<T> value) {
         const auto result = preferences_->set(preference, value);
         ASSERT_EQ(result.problem, "");
     }
 
-    template <typename T>
+    template <class T>
     [[nodiscard]] T get(const preferences::Preference<T>& preference) const {
         return preferences_->get(preference);
     }

@@ -9,6 +9,7 @@
 #include <unistd.h>
 
 namespace quorl::syncd::testing {
+
 namespace {
 
 std::string newAddress() {

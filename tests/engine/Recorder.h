@@ -63,7 +63,7 @@ class Recorder : private engine::Listener {
     [[nodiscard]] std::size_t count(Event::Kind kind);
 
     /// Calls a method of the client and waits for its reply.
-    template <typename Method, typename... Argument>
+    template <class Method, class... Argument>
     std::string ask(Method method, const Argument&... arguments) {
         std::promise<std::string> reply;
         std::invoke(method, *client_, arguments...,

@@ -42,7 +42,7 @@ std::string outcome(const WriteResult& result) {
 }
 
 /// Calls the action with the preference of that name.
-template <typename Action>
+template <class Action>
 void withPreference(const std::string& key, Action&& action) {
     forEachPreference([&](const auto& preference) {
         if (key == preference.key) {
@@ -81,7 +81,7 @@ class Peer {
     }
 
     void set(const std::string& key, const std::string& text) {
-        withPreference(key, [&]<typename T>(const Preference<T>& preference) {
+        withPreference(key, [&]<class T>(const Preference<T>& preference) {
             T value;
             readText(text, value);
             speaker_.say(outcome(preferences_.set(preference, value)));
@@ -89,7 +89,7 @@ class Peer {
     }
 
     void count(const std::string& key, std::uint64_t first) {
-        withPreference(key, [&]<typename T>(const Preference<T>& preference) {
+        withPreference(key, [&]<class T>(const Preference<T>& preference) {
             if constexpr (!std::is_same_v<T, bool>) {
                 for (auto number = first;; ++number) {
                     const auto result = preferences_.set(preference, number);

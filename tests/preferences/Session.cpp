@@ -4,6 +4,7 @@
 #include <stdexcept>
 
 namespace quorl::preferences::testing {
+
 namespace {
 
 /// How the peer begins a line about what it was told.

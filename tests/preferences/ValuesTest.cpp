@@ -33,7 +33,7 @@ TEST_F(Values, AreDeclaredInTheSchemaAsInTheTable) {
     ASSERT_TRUE(schema) << problem;
 
     std::size_t count = 0;
-    forEachPreference([&, &found = *schema]<typename T>(const Preference<T>& preference) {
+    forEachPreference([&, &found = *schema]<class T>(const Preference<T>& preference) {
         ++count;
         const KeyPointer key{g_settings_schema_get_key(&found, preference.key)};
         const VariantPointer byDefault{g_settings_schema_key_get_default_value(key.get())};
@@ -50,14 +50,14 @@ TEST_F(Values, AreDeclaredInTheSchemaAsInTheTable) {
 
 TEST_F(Values, ComeBackAsTheyWereWritten) {
     const auto preferences = openShared();
-    const auto comesBack = [&]<typename T>(const Preference<T>& preference, T value) {
+    const auto comesBack = [&]<class T>(const Preference<T>& preference, T value) {
         const auto result = preferences->set(preference, value);
         EXPECT_EQ(result.problem, "") << preference.key;
         EXPECT_TRUE(result.changed) << preference.key << " " << textOf(value);
         EXPECT_EQ(preferences->get(preference), value) << preference.key;
     };
 
-    forEachPreference([&]<typename T>(const Preference<T>& preference) {
+    forEachPreference([&]<class T>(const Preference<T>& preference) {
         if constexpr (std::is_same_v<T, bool>) {
             comesBack(preference, true);
             comesBack(preference, false);
@@ -74,7 +74,7 @@ TEST_F(Values, ComeBackAsTheyWereWritten) {
 
 TEST_F(Values, AreReadAndWrittenWithGsettings) {
     const auto preferences = openShared();
-    forEachPreference([&]<typename T>(const Preference<T>& preference) {
+    forEachPreference([&]<class T>(const Preference<T>& preference) {
         if constexpr (std::is_same_v<T, bool>) {
             gsettings("set", {preference.key, "true"});
             EXPECT_TRUE(preferences->get(preference));

@@ -55,7 +55,7 @@ void addEntry(std::string_view entry, PlaylistContent& content) {
 }
 
 /// Calls `use` with each line that has something in it, without the white space around it.
-template <typename Use>
+template <class Use>
 void forEachLine(std::string_view bytes, Use use) {
     constexpr std::string_view byteOrderMark = "\uFEFF";
     if (bytes.starts_with(byteOrderMark)) {
