@@ -6,7 +6,6 @@
 /// Main thread only.
 
 class PSSpecifier;
-class PSListView;
 
 /// A row's getter: a method of the row's target that is given the row and gives its value text
 /// back, null for no text.
@@ -143,9 +142,6 @@ struct PSListAppearance {
 /// A pane that is a list of rows.
 class PSListController : public UIViewController, public PSController {
   public:
-    PSListController();
-    ~PSListController() override;
-
     /// False where no host is there to show the list.
     [[nodiscard]] bool init() override;
 
@@ -164,8 +160,9 @@ class PSListController : public UIViewController, public PSController {
 
     void viewDidAppear(bool animated) override;
 
-    /// What a person sees of the list; it lives as long as the controller.
-    [[nodiscard]] PSListView& listView() const { return *_listView; }
+    /// What a person sees of the list, which is the runtime's own; it lives as long as the
+    /// controller.
+    [[nodiscard]] NSObject& listView() const { return *_listView; }
 
     [[nodiscard]] PSController* parentController() const override;
     void setParentController(PSController* controller) override;
@@ -198,7 +195,7 @@ class PSListController : public UIViewController, public PSController {
   private:
     void show(const std::shared_ptr<PSController>& controller, std::optional<bool> animate);
 
-    std::shared_ptr<PSListView> _listView;
+    std::shared_ptr<NSObject> _listView;
     PSController* _parentController = nullptr;
     PSRootController* _rootController = nullptr;
     std::shared_ptr<PSSpecifier> _specifier;

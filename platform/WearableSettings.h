@@ -3,14 +3,9 @@
 #include "platform/Dispatch.h"
 #include "platform/Foundation.h"
 
-class LSSClient;
-
 /// A client of the wearable's settings service. Main thread; replies come on the queue given.
 class LSSManager : public NSObject {
   public:
-    LSSManager();
-    ~LSSManager() override;
-
     /// What a usage question is answered with: figures, or null and an error.
     using UsageHandler =
         std::function<void(const NSDictionary<NSNumber>& usage, std::shared_ptr<NSError> error)>;
@@ -24,7 +19,7 @@ class LSSManager : public NSObject {
     void getUsage(UsageHandler handler);
 
   private:
-    std::unique_ptr<LSSClient> _client;
+    std::shared_ptr<NSObject> _connection; ///< the runtime's own
     dispatch_queue_t _queue = nullptr;
 };
 

@@ -66,7 +66,7 @@ NSArray<DVSession> ScriptedHost::sessions(const std::string& type) {
     return sessions_.ofType(type);
 }
 
-std::unique_ptr<LSSClient> ScriptedHost::connectToWearable(dispatch_queue_t queue) {
+std::shared_ptr<WearableConnection> ScriptedHost::connectToWearable(dispatch_queue_t queue) {
     return wearable_.connect(queue);
 }
 

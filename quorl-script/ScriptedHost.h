@@ -50,10 +50,11 @@ class ScriptedHost final : public Host {
 
     [[nodiscard]] LMSyncDefaults& syncDefaults() override { return *syncDefaults_; }
 
-    [[nodiscard]] MediaLibrary& mediaLibrary() override { return *library_; }
+    [[nodiscard]] AnnouncingLibrary& mediaLibrary() override { return *library_; }
 
     [[nodiscard]] NSArray<DVSession> sessions(const std::string& type) override;
-    [[nodiscard]] std::unique_ptr<LSSClient> connectToWearable(dispatch_queue_t queue) override;
+    [[nodiscard]] std::shared_ptr<WearableConnection>
+    connectToWearable(dispatch_queue_t queue) override;
 
     [[nodiscard]] ScriptedScreen& screen() override { return screen_; }
 

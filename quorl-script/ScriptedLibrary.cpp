@@ -66,7 +66,7 @@ Json valueOf(const MPMediaPropertyPredicate& predicate) {
     return value->boolValue();
 }
 
-Json descriptionOf(const MediaLibrary::Predicates& predicates) {
+Json descriptionOf(const AnnouncingLibrary::Predicates& predicates) {
     Json list = Json::array();
     for (const auto& predicate : predicates) {
         list.push_back(Json::array({predicate->property(), valueOf(*predicate),
@@ -139,12 +139,12 @@ NSArray<MPMediaPlaylist> ScriptedLibrary::playlistsMatching(const Predicates& pr
 
 void ScriptedLibrary::beginGeneratingLibraryChangeNotifications() {
     trace_->record("MPMediaLibrary", "beginGeneratingLibraryChangeNotifications");
-    MediaLibrary::beginGeneratingLibraryChangeNotifications();
+    AnnouncingLibrary::beginGeneratingLibraryChangeNotifications();
 }
 
 void ScriptedLibrary::endGeneratingLibraryChangeNotifications() {
     trace_->record("MPMediaLibrary", "endGeneratingLibraryChangeNotifications");
-    MediaLibrary::endGeneratingLibraryChangeNotifications();
+    AnnouncingLibrary::endGeneratingLibraryChangeNotifications();
 }
 
 } // namespace quorl

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "quorl-script/Trace.h"
-#include "runtime/services/MediaLibrary.h"
+#include "runtime/services/AnnouncingLibrary.h"
 
 namespace quorl {
 
@@ -20,7 +20,7 @@ struct PlaylistDescription {
 class ScriptedPlaylist;
 
 /// The media library of a script. Main thread.
-class ScriptedLibrary final : public MediaLibrary {
+class ScriptedLibrary final : public AnnouncingLibrary {
   public:
     explicit ScriptedLibrary(std::shared_ptr<Trace> trace) : trace_(std::move(trace)) {}
 

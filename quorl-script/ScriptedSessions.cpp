@@ -25,12 +25,12 @@ std::shared_ptr<ScriptedTask> ScriptedSession::task(const std::string& id) const
 
 void ScriptedSession::addObserver(const std::shared_ptr<DVSessionObserver>& observer) {
     trace_->record("DVSession", "addObserver:", id_);
-    Session::addObserver(observer);
+    ObservedSession::addObserver(observer);
 }
 
 void ScriptedSession::removeObserver(const std::shared_ptr<DVSessionObserver>& observer) {
     trace_->record("DVSession", "removeObserver:", id_);
-    Session::removeObserver(observer);
+    ObservedSession::removeObserver(observer);
 }
 
 NSArray<DVSessionTask> ScriptedSession::sessionTasks() const {

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "quorl-script/Trace.h"
-#include "runtime/services/Session.h"
+#include "runtime/services/ObservedSession.h"
 
 namespace quorl {
 
@@ -43,7 +43,7 @@ class ScriptedTask final : public DVSessionTask {
     TaskDescription description_;
 };
 
-class ScriptedSession final : public Session {
+class ScriptedSession final : public ObservedSession {
   public:
     ScriptedSession(std::string id, std::shared_ptr<Trace> trace)
         : id_(std::move(id)), trace_(std::move(trace)) {}

@@ -6,7 +6,7 @@ namespace quorl {
 
 namespace {
 
-class Connection final : public LSSClient {
+class Connection final : public WearableConnection {
   public:
     explicit Connection(ScriptedWearable& wearable) : wearable_(wearable) {}
 
@@ -39,10 +39,10 @@ void tell(const LSSManager::UsageHandler& reply, const std::optional<UsageFigure
 
 } // namespace
 
-std::unique_ptr<LSSClient> ScriptedWearable::connect(dispatch_queue_t queue) {
+std::shared_ptr<WearableConnection> ScriptedWearable::connect(dispatch_queue_t queue) {
     const bool isMain = queue == dispatch_get_main_queue();
     trace_->record("LSSManager", "initWithQueue:", isMain ? "main" : "other");
-    return std::make_unique<Connection>(*this);
+    return std::make_shared<Connection>(*this);
 }
 
 void ScriptedWearable::setAnswer(const UsageAnswer& answer) {

@@ -4,7 +4,7 @@
 
 #include "quorl-script/Trace.h"
 #include "quorl-script/virtual-time/VirtualTime.h"
-#include "runtime/services/LSSClient.h"
+#include "runtime/services/WearableConnection.h"
 
 namespace quorl {
 
@@ -27,7 +27,7 @@ class ScriptedWearable {
     explicit ScriptedWearable(std::shared_ptr<Trace> trace) : trace_(std::move(trace)) {}
 
     /// A connection for a client whose replies run on `queue`. The wearable outlives it.
-    [[nodiscard]] std::unique_ptr<LSSClient> connect(dispatch_queue_t queue);
+    [[nodiscard]] std::shared_ptr<WearableConnection> connect(dispatch_queue_t queue);
 
     /// From now on; held requests are answered now, in the order of asking.
     void setAnswer(const UsageAnswer& answer);

@@ -1,14 +1,14 @@
 #include "quorl-script/Snapshot.h"
 
 #include "quorl-script/Naming.h"
-#include "runtime/lists/PSListView.h"
+#include "runtime/lists/ListView.h"
 #include "runtime/lists/TableView.h"
 
 namespace quorl {
 
 namespace {
 
-Json specifierOf(const PSListView::Row& row) {
+Json specifierOf(const ListView::Row& row) {
     const PSSpecifier& specifier = *row.specifier;
     Json entry;
     entry["cell"] = static_cast<NSInteger>(specifier.cellType());
@@ -25,7 +25,7 @@ Json specifierOf(const PSListView::Row& row) {
 
 Json specifiersOf(const PSListController& list) {
     Json specifiers = Json::array();
-    for (const auto& row : list.listView().rows()) {
+    for (const auto& row : ListView::of(list).rows()) {
         specifiers.push_back(specifierOf(row));
     }
     return specifiers;

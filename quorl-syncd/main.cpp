@@ -35,7 +35,7 @@ base::FileDescriptor blockSignals() {
     return base::FileDescriptor{signalfd(-1, &signals, SFD_CLOEXEC)};
 }
 
-int serve(const syncd::Options& options) {
+int serve(const syncd::EngineSettings& options) {
     const auto signals = blockSignals();
     engine::BusLoop loop{sdbus::createSessionBusConnection()};
     loop.watch(signals.get(), POLLIN, [&] { loop.stop(); });
@@ -81,7 +81,7 @@ int serve(const syncd::Options& options) {
 } // namespace
 
 int main(int argc, char** argv) {
-    syncd::Options options;
+    syncd::EngineSettings options;
     CLI::App program{"Brings the chosen playlist to the Velora, and tells on the session bus how "
                      "far it is."};
     program.set_version_flag("--version", "quorl-syncd " QUORL_VERSION);

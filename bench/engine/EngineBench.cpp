@@ -70,11 +70,11 @@ double secondsOfSync(const std::filesystem::path& music, const std::filesystem::
     std::filesystem::create_directories(target);
     const auto library = media::scan(music);
     const auto& playlist = library->playlists.front();
-    const syncd::Wish wish{
+    const syncd::Order order{
         library, {playlist.id, playlist.revision, noLimit, 0}, wearable::Wearable::mounted(target)};
     syncd::RateLimit rate;
     return secondsOf([&] {
-        const auto outcome = syncd::Sync{wish, rate, {}, [](const syncd::CopyProgress&) {}}.run();
+        const auto outcome = syncd::Sync{order, rate, {}, [](const syncd::CopyProgress&) {}}.run();
         if (outcome.kind != syncd::Outcome::Kind::Sent) {
             throw std::runtime_error{outcome.message};
         }

@@ -86,16 +86,16 @@ void compareTimes(const std::filesystem::path& root) {
     constexpr std::size_t rounds = 11;
     std::array<Milliseconds, rounds> find{};
     std::array<Milliseconds, rounds> scan{};
-    std::shared_ptr<const quorl::media::Snapshot> snapshot;
+    std::shared_ptr<const quorl::media::Inventory> inventory;
     runFind(root);
     for (std::size_t round = 0; round < rounds; ++round) {
         find[round] = timeOf([&] { runFind(root); });
-        scan[round] = timeOf([&] { snapshot = quorl::media::scan(root); });
+        scan[round] = timeOf([&] { inventory = quorl::media::scan(root); });
     }
     std::ranges::sort(find);
     std::ranges::sort(scan);
     std::printf("found:  %zu songs, %zu playlists and folders, %zu left out\n",
-                snapshot->songs.size(), snapshot->playlists.size(), snapshot->leftOut.size());
+                inventory->songs.size(), inventory->playlists.size(), inventory->leftOut.size());
     std::printf("find:   %.1f ms\n", find[rounds / 2].count());
     std::printf("scan:   %.1f ms, %.2f times find\n", scan[rounds / 2].count(),
                 scan[rounds / 2] / find[rounds / 2]);

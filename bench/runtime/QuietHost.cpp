@@ -29,7 +29,7 @@ NSArray<DVSession> QuietHost::sessions(const std::string& /*type*/) {
     return std::make_shared<const std::vector<std::shared_ptr<DVSession>>>();
 }
 
-std::unique_ptr<LSSClient> QuietHost::connectToWearable(dispatch_queue_t /*queue*/) {
+std::shared_ptr<WearableConnection> QuietHost::connectToWearable(dispatch_queue_t /*queue*/) {
     return wearable_.connect();
 }
 

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "runtime/host/Host.h"
-#include "runtime/services/MediaLibrary.h"
+#include "runtime/services/AnnouncingLibrary.h"
 #include "tests/support/TestPreferences.h"
 #include "tests/support/TestScreen.h"
 #include "tests/support/TestWearable.h"
@@ -49,7 +49,7 @@ class Playlist final : public Entity<MPMediaPlaylist> {
 };
 
 /// A library of `count` playlists with ids from 1 on.
-class Library final : public MediaLibrary {
+class Library final : public AnnouncingLibrary {
   public:
     explicit Library(std::uint64_t count);
 
@@ -80,7 +80,8 @@ class QuietHost final : public Host {
     [[nodiscard]] Library& mediaLibrary() override { return *library_; }
 
     [[nodiscard]] NSArray<DVSession> sessions(const std::string& type) override;
-    [[nodiscard]] std::unique_ptr<LSSClient> connectToWearable(dispatch_queue_t queue) override;
+    [[nodiscard]] std::shared_ptr<WearableConnection>
+    connectToWearable(dispatch_queue_t queue) override;
 
     [[nodiscard]] Screen& screen() override { return screen_; }
 

@@ -46,7 +46,7 @@ std::uint64_t microsecondsNow() {
 
 /// A sync under way: its thread, and what the bus is told of it.
 struct Engine::Run {
-    Wish wish;
+    Order order;
     bool ignoresCharger;
     std::string whyStopped;
     std::unique_ptr<SessionObject> session;
@@ -54,7 +54,7 @@ struct Engine::Run {
 };
 
 Engine::Engine(engine::BusLoop& loop, preferences::SharedPreferences& preferences,
-               const Options& options, Changed changed)
+               const EngineSettings& options, Changed changed)
     : loop_{loop},
       preferences_{preferences},
       embeddedCapacity_{options.embeddedCapacity},
@@ -90,7 +90,7 @@ void Engine::startNow() {
     if (run_) {
         return;
     }
-    if (!wish(true)) {
+    if (!currentOrder(true)) {
         throw NotReady{obstacle_};
     }
     isStartRequested_ = true;
@@ -99,7 +99,7 @@ void Engine::startNow() {
 
 void Engine::cancel() {
     if (run_) {
-        givenUp_ = run_->wish.selection;
+        givenUp_ = run_->order.selection;
         stop("The sync was cancelled.");
     }
 }
@@ -111,7 +111,7 @@ void Engine::setMusicFolder(const std::string& path) {
     library_.reset();
     const auto folder = status_.musicFolder;
     folder_ = std::make_unique<media::MusicFolder>(
-        folder, [this, folder](std::shared_ptr<const media::Snapshot> library) {
+        folder, [this, folder](std::shared_ptr<const media::Inventory> library) {
             loop_.post([this, folder, library = std::move(library)] {
                 if (folder == status_.musicFolder) {
                     library_ = library;
@@ -132,13 +132,13 @@ void Engine::setWearableDirectory(const std::string& path) {
     unwatchWearable();
     wearable_ = wearableAt(path, embeddedCapacity_);
     ++wearables_;
-    report_.reset();
+    usage_.reset();
     givenUp_.reset();
     wearableProblem_ = "Looking for the wearable…";
     attachment_ = {};
     tellLastResult();
     rate_.set(wearable_.isEmbedded() ? status_.rateLimit : 0);
-    reporter_ = std::make_unique<wearable::Reporter>(wearable_);
+    usageReader_ = std::make_unique<wearable::UsageReader>(wearable_);
     if (wearable_.isEmbedded()) {
         std::filesystem::create_directories(wearable_.root);
         attachment_ = wearable::loadAttachment(base::openRoot(wearable_.root.c_str()).get());
@@ -164,23 +164,23 @@ void Engine::attach(const wearable::Attachment& attachment) {
 }
 
 void Engine::refreshWearable() {
-    reporter_->ask([this, number = wearables_](const wearable::Reporter::Answer& answer) {
+    usageReader_->ask([this, number = wearables_](const wearable::UsageReader::Answer& answer) {
         loop_.post([this, number, answer] {
             if (number == wearables_) {
-                takeReport(answer);
+                takeUsage(answer);
             }
         });
     });
 }
 
-void Engine::takeReport(const wearable::Reporter::Answer& answer) {
-    if (const auto* const report = std::get_if<wearable::Report>(&answer)) {
-        if (!report_) {
+void Engine::takeUsage(const wearable::UsageReader::Answer& answer) {
+    if (const auto* const usage = std::get_if<wearable::Usage>(&answer)) {
+        if (!usage_) {
             givenUp_.reset();
         }
-        report_ = *report;
+        usage_ = *usage;
     } else {
-        report_.reset();
+        usage_.reset();
         wearableProblem_ = std::get<std::string>(answer);
     }
     consider();
@@ -220,14 +220,14 @@ void Engine::unwatchWearable() {
 }
 
 /// What is to be on the wearable; nothing where something stands in the way.
-std::optional<Wish> Engine::wish(bool ignoresCharger) {
+std::optional<Order> Engine::currentOrder(bool ignoresCharger) {
     const auto id = preferences_.get(preferences::assetSyncPlaylistPersistentID);
     const auto* const playlist = library_ && id ? library_->playlist(*id) : nullptr;
     obstacle_ = !preferences_.get(preferences::assetSyncEnabled) ? "Music sync is switched off."
                 : !id                                            ? "No playlist is chosen."
                 : !library_                                      ? "Reading the music folder…"
                 : playlist == nullptr    ? "The chosen playlist is not in the music folder."
-                : !report_               ? wearableProblem_
+                : !usage_                ? wearableProblem_
                 : !attachment_.connected ? "The wearable is not connected."
                 : !attachment_.onCharger && !ignoresCharger ? "The wearable is not on its charger."
                                                             : "";
@@ -237,32 +237,32 @@ std::optional<Wish> Engine::wish(bool ignoresCharger) {
     const wearable::Selection selection{playlist->id, playlist->revision,
                                         preferences_.get(preferences::assetSyncLimitType),
                                         preferences_.get(preferences::assetSyncLimit).value_or(0)};
-    return Wish{library_, selection, wearable_};
+    return Order{library_, selection, wearable_};
 }
 
-bool Engine::isSent(const Wish& wish) const {
+bool Engine::isSent(const Order& order) const {
     using namespace preferences;
-    return report_->sent == wish.selection &&
+    return usage_->sent == order.selection &&
            preferences_.get(lastFullySentAssetSyncPlaylistPersistentID) ==
-               wish.selection.playlist &&
-           preferences_.get(lastFullySentAssetSyncPlaylistVersion) == wish.selection.revision;
+               order.selection.playlist &&
+           preferences_.get(lastFullySentAssetSyncPlaylistVersion) == order.selection.revision;
 }
 
-bool Engine::isDue(const Wish& wish) const {
+bool Engine::isDue(const Order& order) const {
     return isStartRequested_ ||
-           (Clock::now() >= settled_ && givenUp_ != wish.selection && !isSent(wish));
+           (Clock::now() >= settled_ && givenUp_ != order.selection && !isSent(order));
 }
 
 /// Begins or ends a sync, where what is wished for asks for it.
 void Engine::consider() {
-    const auto wanted = wish(run_ ? run_->ignoresCharger : isStartRequested_);
+    const auto wanted = currentOrder(run_ ? run_->ignoresCharger : isStartRequested_);
     if (run_ && !wanted) {
         stop(obstacle_);
     } else if (run_) {
         // Another revision of the playlist has its turn afterwards.
-        auto selection = run_->wish.selection;
+        auto selection = run_->order.selection;
         selection.revision = wanted->selection.revision;
-        if (selection != wanted->selection || run_->wish.wearable != wanted->wearable) {
+        if (selection != wanted->selection || run_->order.wearable != wanted->wearable) {
             stop("Something else was chosen.");
         }
     } else if (wanted && isDue(*wanted)) {
@@ -271,11 +271,11 @@ void Engine::consider() {
     publish();
 }
 
-void Engine::begin(Wish wish) {
+void Engine::begin(Order order) {
     givenUp_.reset();
-    run_ = std::make_unique<Run>(Run{wish, std::exchange(isStartRequested_, false), {}, {}, {}});
+    run_ = std::make_unique<Run>(Run{order, std::exchange(isStartRequested_, false), {}, {}, {}});
     run_->session = std::make_unique<SessionObject>(loop_.bus(), ++sessions_, [this] { cancel(); });
-    run_->thread = std::jthread{[this, wish = std::move(wish)](const std::stop_token& stop) {
+    run_->thread = std::jthread{[this, order = std::move(order)](const std::stop_token& stop) {
         const SleepInhibitor awake;
         CopyProgress last;
         Clock::time_point told;
@@ -288,7 +288,7 @@ void Engine::begin(Wish wish) {
             told = Clock::now();
             loop_.post([this, progress] { run_->session->copied(progress); });
         };
-        const auto outcome = Sync{wish, rate_, stop, tell}.run();
+        const auto outcome = Sync{order, rate_, stop, tell}.run();
         loop_.post([this, outcome] { finish(outcome); });
     }};
 }
@@ -302,16 +302,16 @@ void Engine::stop(const std::string& why) {
 
 void Engine::finish(const Outcome& outcome) {
     run_->thread.join();
-    const auto wish = run_->wish;
+    const auto order = run_->order;
     const bool isSent = outcome.kind == Outcome::Kind::Sent;
-    const auto problem = isSent ? remember(wish) : "";
+    const auto problem = isSent ? remember(order) : "";
     if (isSent && problem.empty()) {
         retry_.reset();
         conclude(true, outcome.message);
     } else if (outcome.kind == Outcome::Kind::Stopped) {
         conclude(false, run_->whyStopped);
     } else {
-        givenUp_ = wish.selection;
+        givenUp_ = order.selection;
         if (run_->whyStopped.empty() && (isSent || outcome.mayPass)) {
             tryAgainLater();
         }
@@ -329,7 +329,7 @@ void Engine::finish(const Outcome& outcome) {
 void Engine::conclude(bool success, const std::string& message) {
     const LastResult result{success, message, microsecondsNow()};
     try {
-        results_.remember(run_->wish.wearable.root, result);
+        results_.remember(run_->order.wearable.root, result);
     } catch (const std::system_error& error) {
         std::cerr << "quorl-syncd: What became of the sync is forgotten when the engine ends ("
                   << error.what() << ").\n";
@@ -356,17 +356,18 @@ void Engine::tryAgainLater() {
 }
 
 /// The last thing of all; gives back an empty text, or why it could not be done.
-std::string Engine::remember(const Wish& wish) {
+std::string Engine::remember(const Order& order) {
     using namespace preferences;
     const auto id =
-        preferences_.set(lastFullySentAssetSyncPlaylistPersistentID, wish.selection.playlist);
+        preferences_.set(lastFullySentAssetSyncPlaylistPersistentID, order.selection.playlist);
     if (!id.problem.empty()) {
         return id.problem;
     }
-    if (report_ && wish.wearable == wearable_) {
-        report_->sent = wish.selection;
+    if (usage_ && order.wearable == wearable_) {
+        usage_->sent = order.selection;
     }
-    return preferences_.set(lastFullySentAssetSyncPlaylistVersion, wish.selection.revision).problem;
+    return preferences_.set(lastFullySentAssetSyncPlaylistVersion, order.selection.revision)
+        .problem;
 }
 
 void Engine::publish() {
@@ -376,15 +377,15 @@ void Engine::publish() {
     if (!run_ && obstacle_.empty() && givenUp_) {
         status_.status = status_.lastMessage;
     }
-    const auto report = report_.value_or(wearable::Report{});
+    const auto usage = usage_.value_or(wearable::Usage{});
     wearableStatus_ = {wearable_.root,
                        wearable::wearableName,
                        wearable_.isEmbedded(),
-                       report_ && attachment_.connected,
-                       report_ && attachment_.onCharger,
-                       report.capacity,
-                       report.available,
-                       report.songs};
+                       usage_ && attachment_.connected,
+                       usage_ && attachment_.onCharger,
+                       usage.capacity,
+                       usage.available,
+                       usage.songs};
     changed_();
 }
 

@@ -8,9 +8,9 @@
 
 #include "quorl-syncd/engine/LastResults.h"
 #include "quorl-syncd/engine/RetryDelay.h"
+#include "quorl-syncd/transfer/Order.h"
 #include "quorl-syncd/transfer/RateLimit.h"
 #include "quorl-syncd/transfer/Sync.h"
-#include "quorl-syncd/transfer/Wish.h"
 #include "services/base/MountWatch.h"
 #include "services/base/RootWatch.h"
 #include "services/engine/BusLoop.h"
@@ -18,14 +18,14 @@
 #include "services/media/MusicFolder.h"
 #include "services/preferences/SharedPreferences.h"
 #include "services/wearable/Attachment.h"
-#include "services/wearable/Reporter.h"
+#include "services/wearable/UsageReader.h"
 
 namespace quorl::syncd {
 
 class SessionObject;
 
 /// What the engine is started with.
-struct Options {
+struct EngineSettings {
     /// Empty for the user's music folder.
     std::string musicFolder;
     /// Empty for the wearable that is embedded in this machine.
@@ -55,7 +55,7 @@ class Engine {
     /// @param preferences outlives the engine; its changes are to be told with
     /// `preferencesDidChange`.
     Engine(engine::BusLoop& loop, preferences::SharedPreferences& preferences,
-           const Options& options, Changed changed);
+           const EngineSettings& options, Changed changed);
 
     /// Ends a running sync in order, and waits for that.
     ~Engine();
@@ -89,19 +89,19 @@ class Engine {
     struct Run;
 
     void consider();
-    [[nodiscard]] std::optional<Wish> wish(bool ignoresCharger);
-    [[nodiscard]] bool isDue(const Wish& wish) const;
-    [[nodiscard]] bool isSent(const Wish& wish) const;
+    [[nodiscard]] std::optional<Order> currentOrder(bool ignoresCharger);
+    [[nodiscard]] bool isDue(const Order& order) const;
+    [[nodiscard]] bool isSent(const Order& order) const;
 
-    void begin(Wish wish);
+    void begin(Order order);
     void stop(const std::string& why);
     void finish(const Outcome& outcome);
-    [[nodiscard]] std::string remember(const Wish& wish);
+    [[nodiscard]] std::string remember(const Order& order);
     void conclude(bool success, const std::string& message);
     void tellLastResult();
     void tryAgainLater();
 
-    void takeReport(const wearable::Reporter::Answer& answer);
+    void takeUsage(const wearable::UsageReader::Answer& answer);
     void watchWearable();
     void mountsDidChange();
     void unwatchWearable();
@@ -117,12 +117,12 @@ class Engine {
     /// What stands in the way of a sync, in a sentence; empty where nothing does.
     std::string obstacle_;
 
-    std::shared_ptr<const media::Snapshot> library_;
+    std::shared_ptr<const media::Inventory> library_;
 
     wearable::Wearable wearable_;
     wearable::Attachment attachment_;
     /// Nothing while it is not there or was not looked at yet; then the sentence says why.
-    std::optional<wearable::Report> report_;
+    std::optional<wearable::Usage> usage_;
     std::string wearableProblem_;
     std::optional<base::RootWatch> rootWatch_;
     std::optional<base::MountWatch> mountWatch_;
@@ -141,7 +141,7 @@ class Engine {
 
     // The last members, for their threads call this object through the loop.
     std::unique_ptr<Run> run_;
-    std::unique_ptr<wearable::Reporter> reporter_;
+    std::unique_ptr<wearable::UsageReader> usageReader_;
     std::unique_ptr<media::MusicFolder> folder_;
 };
 

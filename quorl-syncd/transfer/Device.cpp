@@ -12,9 +12,9 @@
 #include <sys/file.h>
 #include <sys/stat.h>
 
-#include "quorl-syncd/transfer/SongFile.h"
+#include "quorl-syncd/transfer/SongSource.h"
 #include "services/base/AtomicFile.h"
-#include "services/wearable/Report.h"
+#include "services/wearable/Usage.h"
 
 namespace quorl::syncd {
 

@@ -88,13 +88,13 @@ std::string sentence(const std::error_code& error) {
 
 } // namespace
 
-Sync::Sync(Wish wish, RateLimit& rate, std::stop_token stop, Told told)
-    : wish_{std::move(wish)}, rate_{rate}, stop_{std::move(stop)}, told_{std::move(told)} {}
+Sync::Sync(Order order, RateLimit& rate, std::stop_token stop, Told told)
+    : order_{std::move(order)}, rate_{rate}, stop_{std::move(stop)}, told_{std::move(told)} {}
 
 Outcome Sync::run() {
     using Kind = Outcome::Kind;
     try {
-        Device device{wish_.wearable};
+        Device device{order_.wearable};
         try {
             perform(device);
             return outcome();
@@ -166,11 +166,11 @@ void Sync::findWhatIsThere(Device& device) {
     const auto songs = indexOf(manifest_.songs);
     const auto strays = indexOf(manifest_.strays);
     std::unordered_set<media::SongIndex> seen;
-    for (const auto index : songsWithinLimit(wish_)) {
+    for (const auto index : songsWithinLimit(order_)) {
         if (!seen.insert(index).second) {
             continue;
         }
-        const auto listed = wish_.library->songs[index];
+        const auto listed = order_.library->songs[index];
         Song song{"", listed.path(), listed.size, listed.modified, ""};
         try {
             const bool isThere =
@@ -194,7 +194,7 @@ bool Sync::adopt(Song& song, const Entry& there) {
         return false;
     }
     if (there.modified != song.modified) {
-        const SongFile file{wish_.library->root, song.source, {song.size, song.modified}};
+        const SongSource file{order_.library->root, song.source, {song.size, song.modified}};
         if (file.hash(stop_) != there.hash) {
             return false;
         }
@@ -209,7 +209,7 @@ bool Sync::adoptStray(const Device& device, Song& song, const Entry& stray) {
     if (stray.size != song.size || stray.modified != song.modified) {
         return false;
     }
-    const SongFile file{wish_.library->root, song.source, {song.size, song.modified}};
+    const SongSource file{order_.library->root, song.source, {song.size, song.modified}};
     const auto hash = file.hash(stop_);
     if (hashOf(device.openMusic(stray.name).get(), stop_) != hash) {
         return false;
@@ -239,7 +239,7 @@ void Sync::chooseNames(const Device& device) {
             manifest_.strays.push_back(song);
         }
     }
-    const auto& title = wish_.playlist().name;
+    const auto& title = order_.playlist().name;
     if (manifest_.playlist && manifest_.playlist->source == title) {
         playlist_ = *manifest_.playlist;
     } else {
@@ -287,7 +287,7 @@ void Sync::copySongs(Device& device) {
 
 void Sync::copySong(Device& device, Song& song) {
     const auto unfinished = std::to_string(copied_.size());
-    const SongFile source{wish_.library->root, song.source, {song.size, song.modified}};
+    const SongSource source{order_.library->root, song.source, {song.size, song.modified}};
     auto destination = device.createUnfinished(unfinished);
     const auto before = progress_.bytes;
     const auto moved = [this, &song, before](std::uint64_t bytes) {
@@ -342,12 +342,12 @@ std::string Sync::playlistText() const {
     for (const auto& song : songs_) {
         names.emplace(song.source, song.name);
     }
-    auto title = wish_.playlist().name;
+    auto title = order_.playlist().name;
     std::ranges::replace_if(
         title, [](unsigned char byte) { return byte < ' '; }, ' ');
     std::string text = "#EXTM3U\n#PLAYLIST:" + title + "\n";
-    for (const auto index : songsWithinLimit(wish_)) {
-        const auto name = names.find(wish_.library->songs[index].path());
+    for (const auto index : songsWithinLimit(order_)) {
+        const auto name = names.find(order_.library->songs[index].path());
         if (name != names.end()) {
             // What begins with # would be a comment.
             text.append(name->second.starts_with('#') ? "./" : "").append(name->second) += '\n';
@@ -401,7 +401,7 @@ void Sync::removeOldSongs(Device& device) {
         removeStrays(device);
         device.syncMusic();
     }
-    manifest_.sent = wish_.selection;
+    manifest_.sent = order_.selection;
     remember(device);
 }
 

@@ -7,8 +7,8 @@
 #include <vector>
 
 #include "quorl-syncd/transfer/Device.h"
-#include "quorl-syncd/transfer/SongFile.h"
-#include "quorl-syncd/transfer/Wish.h"
+#include "quorl-syncd/transfer/Order.h"
+#include "quorl-syncd/transfer/SongSource.h"
 
 namespace quorl::syncd {
 
@@ -33,7 +33,7 @@ struct Outcome {
     Kind kind = Kind::Failed;
     /// For the user, in a sentence or several.
     std::string message;
-    /// The music folder is no longer as the wish has it.
+    /// The music folder is no longer as the order has it.
     bool isLibraryStale = false;
     /// What was in the way may go away by itself.
     bool mayPass = false;
@@ -51,7 +51,7 @@ class Sync {
     using Told = std::function<void(const CopyProgress&)>;
 
     /// `rate` outlives the sync.
-    Sync(Wish wish, RateLimit& rate, std::stop_token stop, Told told);
+    Sync(Order order, RateLimit& rate, std::stop_token stop, Told told);
 
     /// Does all of it, on the calling thread; once. Never throws.
     [[nodiscard]] Outcome run();
@@ -89,7 +89,7 @@ class Sync {
 
     [[nodiscard]] Outcome outcome() const;
 
-    Wish wish_;
+    Order order_;
     RateLimit& rate_;
     std::stop_token stop_;
     Told told_;

@@ -4,26 +4,26 @@
 
 namespace quorl {
 
-EngineTask::EngineTask(const engine::Task& task)
+EngineTask::EngineTask(const engine::TaskState& task)
     : groupingKey_(task.groupingKey),
       isRunning_(task.isRunning),
       total_(static_cast<NSUInteger>(task.totalItemCount)),
       completed_(static_cast<NSUInteger>(task.completedItemCount)),
       progress_(task.progress) {}
 
-void EngineTask::update(const engine::Task& task) {
+void EngineTask::update(const engine::TaskState& task) {
     isRunning_ = task.isRunning;
     total_ = static_cast<NSUInteger>(task.totalItemCount);
     completed_ = static_cast<NSUInteger>(task.completedItemCount);
     progress_ = task.progress;
 }
 
-EngineSession::EngineSession(const engine::Session& session)
+EngineSession::EngineSession(const engine::SessionState& session)
     : type_(session.typeIdentifier), isFinished_(session.isFinished) {
     update(session);
 }
 
-std::shared_ptr<EngineTask> EngineSession::update(const engine::Task& task) {
+std::shared_ptr<EngineTask> EngineSession::update(const engine::TaskState& task) {
     const std::lock_guard lock(mutex_);
     const auto known = std::find_if(tasks_.begin(), tasks_.end(), [&task](const auto& entry) {
         return entry.first == task.path;
@@ -35,8 +35,8 @@ std::shared_ptr<EngineTask> EngineSession::update(const engine::Task& task) {
     return tasks_.emplace_back(task.path, std::make_shared<EngineTask>(task)).second;
 }
 
-void EngineSession::update(const engine::Session& session) {
-    for (const engine::Task& task : session.tasks) {
+void EngineSession::update(const engine::SessionState& session) {
+    for (const engine::TaskState& task : session.tasks) {
         update(task);
     }
     isFinished_ = session.isFinished;

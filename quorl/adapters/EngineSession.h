@@ -4,7 +4,7 @@
 #include <map>
 #include <mutex>
 
-#include "runtime/services/Session.h"
+#include "runtime/services/ObservedSession.h"
 #include "services/engine/Model.h"
 
 namespace quorl {
@@ -12,9 +12,9 @@ namespace quorl {
 /// A task of the sync engine, with the figures that the engine gave last. Any thread.
 class EngineTask final : public DVSessionTask {
   public:
-    explicit EngineTask(const engine::Task& task);
+    explicit EngineTask(const engine::TaskState& task);
 
-    void update(const engine::Task& task);
+    void update(const engine::TaskState& task);
 
     [[nodiscard]] bool isRunning() const override { return isRunning_; }
 
@@ -36,16 +36,16 @@ class EngineTask final : public DVSessionTask {
 
 /// A session of the sync engine. Its tasks keep their identity from one figure to the next. Any
 /// thread.
-class EngineSession final : public Session {
+class EngineSession final : public ObservedSession {
   public:
-    explicit EngineSession(const engine::Session& session);
+    explicit EngineSession(const engine::SessionState& session);
 
     /// The object that stands for `task`, with its figures taken over; made where there is none
     /// yet.
-    std::shared_ptr<EngineTask> update(const engine::Task& task);
+    std::shared_ptr<EngineTask> update(const engine::TaskState& task);
 
     /// Takes over everything that the engine tells of the session.
-    void update(const engine::Session& session);
+    void update(const engine::SessionState& session);
 
     [[nodiscard]] const std::string& type() const { return type_; }
 

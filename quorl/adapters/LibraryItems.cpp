@@ -28,16 +28,16 @@ class LibraryItem final : public MPMediaItem {
 
 /// Whoever holds one of the items holds all of them.
 struct Items : std::enable_shared_from_this<Items> {
-    Items(std::shared_ptr<const media::Snapshot> from, std::size_t count)
-        : snapshot(std::move(from)), items(count) {}
+    Items(std::shared_ptr<const media::Inventory> from, std::size_t count)
+        : inventory(std::move(from)), items(count) {}
 
-    std::shared_ptr<const media::Snapshot> snapshot;
+    std::shared_ptr<const media::Inventory> inventory;
     std::vector<LibraryItem> items;
 };
 
 std::uint64_t LibraryItem::persistentID() const {
     media::Fingerprint fingerprint;
-    fingerprint.add(items_->snapshot->songs[song_].path());
+    fingerprint.add(items_->inventory->songs[song_].path());
     return fingerprint.value();
 }
 
@@ -50,14 +50,14 @@ std::shared_ptr<NSObject> LibraryItem::valueForProperty(MPMediaProperty property
 
 } // namespace
 
-NSArray<MPMediaItem> makeItems(std::shared_ptr<const media::Snapshot> snapshot,
+NSArray<MPMediaItem> makeItems(std::shared_ptr<const media::Inventory> inventory,
                                const std::vector<media::SongIndex>& songs) {
-    const auto items = std::make_shared<Items>(std::move(snapshot), songs.size());
+    const auto items = std::make_shared<Items>(std::move(inventory), songs.size());
     std::vector<std::shared_ptr<MPMediaItem>> list;
     list.reserve(songs.size());
     for (std::size_t index = 0; index < songs.size(); ++index) {
         LibraryItem& item = items->items[index];
-        item.attach(*items, songs[index], items->snapshot->songs[songs[index]].size);
+        item.attach(*items, songs[index], items->inventory->songs[songs[index]].size);
         list.emplace_back(items, &item);
     }
     return std::make_shared<const std::vector<std::shared_ptr<MPMediaItem>>>(std::move(list));

@@ -12,9 +12,9 @@ NSNumber::Value truth(bool value) { return std::uint64_t{value ? 1U : 0U}; }
 
 } // namespace
 
-LibraryPlaylist::LibraryPlaylist(std::shared_ptr<const media::Snapshot> snapshot,
+LibraryPlaylist::LibraryPlaylist(std::shared_ptr<const media::Inventory> inventory,
                                  const media::Playlist& playlist)
-    : snapshot_(std::move(snapshot)),
+    : inventory_(std::move(inventory)),
       playlist_(&playlist),
       identifier_(playlist.id),
       revision_(playlist.revision),
@@ -28,11 +28,11 @@ bool LibraryPlaylist::isSame(const media::Playlist& playlist) const {
            playlist.generated == playlist_->generated;
 }
 
-void LibraryPlaylist::moveTo(std::shared_ptr<const media::Snapshot> snapshot,
+void LibraryPlaylist::moveTo(std::shared_ptr<const media::Inventory> inventory,
                              const media::Playlist& playlist) {
-    snapshot_ = std::move(snapshot);
+    inventory_ = std::move(inventory);
     playlist_ = &playlist;
-    items_ = nullptr; // they keep the snapshot before alive
+    items_ = nullptr; // they keep the inventory before alive
 }
 
 std::uint64_t LibraryPlaylist::persistentID() const { return playlist_->id; }
@@ -56,7 +56,7 @@ std::optional<std::string> LibraryPlaylist::name() const { return playlist_->nam
 
 NSArray<MPMediaItem> LibraryPlaylist::items() const {
     if (!items_) {
-        items_ = makeItems(snapshot_, playlist_->songs);
+        items_ = makeItems(inventory_, playlist_->songs);
     }
     return items_;
 }

@@ -1,22 +1,22 @@
 #pragma once
 
 #include "platform/MediaLibrary.h"
-#include "services/media/Snapshot.h"
+#include "services/media/Inventory.h"
 
 namespace quorl {
 
-/// A playlist, or a folder of playlists, of a snapshot of the music folder. Main thread.
+/// A playlist, or a folder of playlists, of an inventory of the music folder. Main thread.
 class LibraryPlaylist final : public MPMediaPlaylist {
   public:
-    /// `playlist` is one of `snapshot`, which is kept alive.
-    LibraryPlaylist(std::shared_ptr<const media::Snapshot> snapshot,
+    /// `playlist` is one of `inventory`, which is kept alive.
+    LibraryPlaylist(std::shared_ptr<const media::Inventory> inventory,
                     const media::Playlist& playlist);
 
-    /// Whether `playlist`, of any snapshot, says what this one says.
+    /// Whether `playlist`, of any inventory, says what this one says.
     [[nodiscard]] bool isSame(const media::Playlist& playlist) const;
 
-    /// Takes the place of `isSame` playlist in another snapshot, and lets go of the one before.
-    void moveTo(std::shared_ptr<const media::Snapshot> snapshot, const media::Playlist& playlist);
+    /// Takes the place of `isSame` playlist in another inventory, and lets go of the one before.
+    void moveTo(std::shared_ptr<const media::Inventory> inventory, const media::Playlist& playlist);
 
     [[nodiscard]] std::uint64_t persistentID() const override;
 
@@ -29,8 +29,8 @@ class LibraryPlaylist final : public MPMediaPlaylist {
     [[nodiscard]] NSArray<MPMediaItem> items() const override;
 
   private:
-    std::shared_ptr<const media::Snapshot> snapshot_;
-    const media::Playlist* playlist_; ///< in `snapshot_`
+    std::shared_ptr<const media::Inventory> inventory_;
+    const media::Playlist* playlist_; ///< in `inventory_`
     mutable NSArray<MPMediaItem> items_;
 
     // Handed out; a number never changes.

@@ -30,7 +30,7 @@ void Companion::makeFrontPage() {
         problem_ = problem->text;
         return;
     }
-    frontPage_ = FrontPage::over(host_->syncEngine(), std::get<Class>(loaded), "Music",
+    frontPage_ = FrontPage::over(host_->engineLink(), std::get<Class>(loaded), "Music",
                                  options_.wearable.empty());
     navigation_->setRootPane(frontPage_);
     (void)frontPage_->specifiers(); // builds the rows before the page is shown

@@ -18,7 +18,7 @@ CompanionHost::CompanionHost(const Options& options, Screen& screen, Notices& no
       notices_(notices),
       store_(notices),
       syncDefaults_(std::make_shared<SyncDefaults>(store_)),
-      library_(std::make_shared<Library>()),
+      library_(std::make_shared<MusicLibrary>()),
       wearable_(wearableOf(options)),
       engine_({options.music, options.wearable},
               [this](const std::string& problem) { engineDidChange(problem); }) {}
@@ -32,30 +32,30 @@ void CompanionHost::engineDidChange(const std::string& problem) {
 }
 
 void CompanionHost::openLibrary(const std::filesystem::path& music, std::function<void()> taken) {
-    library_->open(music, [this, taken = std::move(taken)](const media::Snapshot& snapshot) {
-        noticeProblems(snapshot);
+    library_->open(music, [this, taken = std::move(taken)](const media::Inventory& inventory) {
+        noticeProblems(inventory);
         taken();
     });
 }
 
-void CompanionHost::noticeProblems(const media::Snapshot& snapshot) {
+void CompanionHost::noticeProblems(const media::Inventory& inventory) {
     notices_.set(Notices::Topic::MusicFolder,
-                 snapshot.rootFound
+                 inventory.rootFound
                      ? std::string()
-                     : "There is no music folder at " + base::printable(snapshot.root.string()) +
+                     : "There is no music folder at " + base::printable(inventory.root.string()) +
                            ". Create it, or start quorl with --music and another folder.");
-    notices_.set(Notices::Topic::Watching, snapshot.unwatchedNotice());
+    notices_.set(Notices::Topic::Watching, inventory.unwatchedNotice());
 }
 
 LMSyncDefaults& CompanionHost::syncDefaults() { return *syncDefaults_; }
 
-MediaLibrary& CompanionHost::mediaLibrary() { return *library_; }
+AnnouncingLibrary& CompanionHost::mediaLibrary() { return *library_; }
 
 NSArray<DVSession> CompanionHost::sessions(const std::string& type) {
     return engine_.sessions(type);
 }
 
-std::unique_ptr<LSSClient> CompanionHost::connectToWearable(dispatch_queue_t /*queue*/) {
+std::shared_ptr<WearableConnection> CompanionHost::connectToWearable(dispatch_queue_t /*queue*/) {
     return wearable_.connect();
 }
 

@@ -1,9 +1,9 @@
 #pragma once
 
-#include "quorl/adapters/Library.h"
+#include "quorl/adapters/EngineLink.h"
+#include "quorl/adapters/MusicLibrary.h"
 #include "quorl/adapters/PreferencesStore.h"
-#include "quorl/adapters/SyncEngine.h"
-#include "quorl/adapters/Wearable.h"
+#include "quorl/adapters/WearableUsage.h"
 #include "quorl/app/CommandLine.h"
 #include "runtime/host/Host.h"
 #include "runtime/host/Screen.h"
@@ -16,7 +16,7 @@ class CompanionHost final : public Host {
     /// `screen` and `notices` outlive the host.
     CompanionHost(const Options& options, Screen& screen, Notices& notices);
 
-    [[nodiscard]] SyncEngine& syncEngine() { return engine_; }
+    [[nodiscard]] EngineLink& engineLink() { return engine_; }
 
     /// `changed` is called after the engine, its sessions or the wearable have changed; empty for
     /// nobody.
@@ -32,24 +32,25 @@ class CompanionHost final : public Host {
     }
 
     [[nodiscard]] LMSyncDefaults& syncDefaults() override;
-    [[nodiscard]] MediaLibrary& mediaLibrary() override;
+    [[nodiscard]] AnnouncingLibrary& mediaLibrary() override;
     [[nodiscard]] NSArray<DVSession> sessions(const std::string& type) override;
-    [[nodiscard]] std::unique_ptr<LSSClient> connectToWearable(dispatch_queue_t queue) override;
+    [[nodiscard]] std::shared_ptr<WearableConnection>
+    connectToWearable(dispatch_queue_t queue) override;
     [[nodiscard]] Screen& screen() override;
 
   private:
-    void noticeProblems(const media::Snapshot& snapshot);
+    void noticeProblems(const media::Inventory& inventory);
     void engineDidChange(const std::string& problem);
 
     Screen& screen_;
     Notices& notices_;
     PreferencesStore store_;
     std::shared_ptr<SyncDefaults> syncDefaults_;
-    std::shared_ptr<Library> library_;
-    Wearable wearable_;
+    std::shared_ptr<MusicLibrary> library_;
+    WearableUsage wearable_;
     std::function<void()> engineChanged_;
     bool isEngineHeardOf_ = false; ///< or of there being none
-    SyncEngine engine_;
+    EngineLink engine_;
 };
 
 } // namespace quorl

@@ -44,7 +44,7 @@ std::string statusText(const engine::State& state) {
 
 } // namespace
 
-std::shared_ptr<FrontPage> FrontPage::over(SyncEngine& engine, const Class& pane,
+std::shared_ptr<FrontPage> FrontPage::over(EngineLink& engine, const Class& pane,
                                            const std::string& paneName, bool isEmbedded) {
     auto page = ::create<FrontPage>();
     if (!page) {

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "platform/PreferencesList.h"
-#include "quorl/adapters/SyncEngine.h"
+#include "quorl/adapters/EngineLink.h"
 
 namespace quorl {
 
@@ -13,7 +13,7 @@ class FrontPage final : public PSListController {
     /// A page over `engine`, which outlives it. `pane` is what the app's one row opens, under that
     /// name; the charger of an embedded wearable is a switch, that of a device is only told.
     [[nodiscard]] static std::shared_ptr<FrontPage>
-    over(SyncEngine& engine, const Class& pane, const std::string& paneName, bool isEmbedded);
+    over(EngineLink& engine, const Class& pane, const std::string& paneName, bool isEmbedded);
 
     /// The row that opens the pane.
     [[nodiscard]] const std::shared_ptr<PSSpecifier>& paneRow() const { return paneRow_; }
@@ -35,7 +35,7 @@ class FrontPage final : public PSListController {
     void setOnCharger(const std::shared_ptr<NSObject>& value,
                       const std::shared_ptr<PSSpecifier>& row);
 
-    SyncEngine* engine_ = nullptr;
+    EngineLink* engine_ = nullptr;
     bool isEmbedded_ = true;
     std::shared_ptr<PSSpecifier> wearableGroup_;
     std::vector<std::shared_ptr<PSSpecifier>> rows_;

@@ -3,13 +3,13 @@
 #include <limits>
 
 #include "quorl/content/SwitchCell.h"
-#include "runtime/lists/PSListView.h"
+#include "runtime/lists/ListView.h"
 
 namespace quorl {
 
 namespace {
 
-std::shared_ptr<UITableViewCell> switchOf(const PSListView::Row& row) {
+std::shared_ptr<UITableViewCell> switchOf(const ListView::Row& row) {
     auto cell = ::create<SwitchCell>(&UITableViewCell::initWithStyle_reuseIdentifier,
                                      UITableViewCellStyle::Value1, std::string());
     cell->textLabel().setText(row.specifier->name());
@@ -19,7 +19,7 @@ std::shared_ptr<UITableViewCell> switchOf(const PSListView::Row& row) {
     return cell;
 }
 
-std::shared_ptr<UITableViewCell> makeCell(const PSListView::Row& row, UITableViewCellStyle style) {
+std::shared_ptr<UITableViewCell> makeCell(const ListView::Row& row, UITableViewCellStyle style) {
     auto cell = ::create<UITableViewCell>(&UITableViewCell::initWithStyle_reuseIdentifier, style,
                                           std::string());
     cell->textLabel().setText(row.specifier->name());
@@ -39,7 +39,7 @@ bool isShortened(const UILabel& label) {
 }
 
 /// The value is beside the title where there is room for both, else below it.
-std::shared_ptr<UITableViewCell> cellOf(const PSListView::Row& row) {
+std::shared_ptr<UITableViewCell> cellOf(const ListView::Row& row) {
     if (row.specifier->cellType() == PSCellType::Switch) {
         return switchOf(row);
     }
@@ -58,7 +58,7 @@ void ListContent::draw(NSInteger /*firstRow*/, NSInteger /*rowsOnScreen*/) {
         return;
     }
     quorl::draw(*pane_);
-    for (const auto& row : list->listView().rows()) {
+    for (const auto& row : ListView::of(*list).rows()) {
         if (row.specifier->cellType() == PSCellType::Group) {
             sections_.push_back({row.specifier->name(), row.footer, 0});
             continue;

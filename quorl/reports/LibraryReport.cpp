@@ -16,10 +16,10 @@ std::string countOf(std::size_t count, const std::string& singular) {
     return std::to_string(count) + " " + singular + (count == 1 ? "" : "s");
 }
 
-std::uint64_t bytesOf(const media::Playlist& playlist, const media::Snapshot& snapshot) {
+std::uint64_t bytesOf(const media::Playlist& playlist, const media::Inventory& inventory) {
     return std::accumulate(playlist.songs.begin(), playlist.songs.end(), std::uint64_t{0},
-                           [&snapshot](std::uint64_t sum, media::SongIndex song) {
-                               return sum + snapshot.songs[song].size;
+                           [&inventory](std::uint64_t sum, media::SongIndex song) {
+                               return sum + inventory.songs[song].size;
                            });
 }
 
@@ -38,29 +38,29 @@ std::string_view kindOf(const media::Playlist& playlist) {
     return {};
 }
 
-std::string describe(const media::Playlist& playlist, const media::Snapshot& snapshot,
+std::string describe(const media::Playlist& playlist, const media::Inventory& inventory,
                      const std::string& language) {
     std::string line = base::printable(playlist.name) + ": " +
                        countOf(playlist.songs.size(), "song") + ", " +
-                       sizeText(static_cast<double>(bytesOf(playlist, snapshot)), language) + ", " +
-                       base::printable(playlist.path);
+                       sizeText(static_cast<double>(bytesOf(playlist, inventory)), language) +
+                       ", " + base::printable(playlist.path);
     const auto kind = kindOf(playlist);
     return kind.empty() ? line : line + " (" + std::string(kind) + ")";
 }
 
-void printPlaylists(const media::Snapshot& snapshot) {
+void printPlaylists(const media::Inventory& inventory) {
     const std::string language = environmentLanguages().front();
-    std::cout << base::printable(snapshot.root.string()) << ": "
-              << countOf(snapshot.playlists.size(), "playlist") << ", "
-              << countOf(snapshot.songs.size(), "song") << " listed\n";
-    for (const auto& playlist : snapshot.playlists) {
-        std::cout << "  " << describe(playlist, snapshot, language) << '\n';
+    std::cout << base::printable(inventory.root.string()) << ": "
+              << countOf(inventory.playlists.size(), "playlist") << ", "
+              << countOf(inventory.songs.size(), "song") << " listed\n";
+    for (const auto& playlist : inventory.playlists) {
+        std::cout << "  " << describe(playlist, inventory, language) << '\n';
     }
 }
 
-void printLeftOut(const media::Snapshot& snapshot) {
-    std::cout << "\nLeft out: " << snapshot.leftOut.size() << '\n';
-    for (const auto& leftOut : snapshot.leftOut) {
+void printLeftOut(const media::Inventory& inventory) {
+    std::cout << "\nLeft out: " << inventory.leftOut.size() << '\n';
+    for (const auto& leftOut : inventory.leftOut) {
         std::cout << "  " << media::describe(leftOut) << '\n';
     }
 }
@@ -68,16 +68,16 @@ void printLeftOut(const media::Snapshot& snapshot) {
 } // namespace
 
 ExitCode printLibrary(const Options& options) {
-    const auto snapshot = media::scan(options.music);
-    if (!snapshot->rootFound) {
+    const auto inventory = media::scan(options.music);
+    if (!inventory->rootFound) {
         std::cerr << "quorl: There is no music folder at "
                   << base::printable(options.music.string())
                   << ". Create it, or name another one with --music.\n";
         return ExitCode::NoMusicFolder;
     }
-    printPlaylists(*snapshot);
-    if (!snapshot->leftOut.empty()) {
-        printLeftOut(*snapshot);
+    printPlaylists(*inventory);
+    if (!inventory->leftOut.empty()) {
+        printLeftOut(*inventory);
     }
     std::cout.flush();
     if (!std::cout) {

@@ -49,7 +49,7 @@ struct Choice {
     const char* state = "off";
 };
 
-Choice choiceOf(const preferences::SharedPreferences& preferences, const media::Snapshot& library,
+Choice choiceOf(const preferences::SharedPreferences& preferences, const media::Inventory& library,
                 bool isRunning) {
     using namespace preferences;
     const auto id = preferences.get(assetSyncPlaylistPersistentID);
@@ -69,8 +69,8 @@ Choice choiceOf(const preferences::SharedPreferences& preferences, const media::
 std::optional<double> progressOf(const engine::State& state) {
     double sum = 0;
     int count = 0;
-    for (const engine::Session& session : state.sessions) {
-        for (const engine::Task& task : session.tasks) {
+    for (const engine::SessionState& session : state.sessions) {
+        for (const engine::TaskState& task : session.tasks) {
             if (!session.isFinished && task.groupingKey == engine::assetGroupingKey) {
                 sum += task.progress;
                 ++count;
@@ -82,7 +82,7 @@ std::optional<double> progressOf(const engine::State& state) {
 
 bool isRunning(const engine::State& state) {
     return std::any_of(state.sessions.begin(), state.sessions.end(),
-                       [](const engine::Session& session) { return !session.isFinished; });
+                       [](const engine::SessionState& session) { return !session.isFinished; });
 }
 
 Json jsonOf(const engine::State& state, const Choice& choice) {

@@ -8,9 +8,10 @@
 
 namespace quorl {
 
-class MediaLibrary;
+class AnnouncingLibrary;
 class Screen;
 class StringTable;
+class WearableConnection;
 
 /// What a host supplies to the runtime: the services of the device and what surrounds the process.
 /// One per process, installed before the first pane is made. Main thread only.
@@ -33,13 +34,14 @@ class Host {
 
     /// The services. They live as long as the host.
     [[nodiscard]] virtual LMSyncDefaults& syncDefaults() = 0;
-    [[nodiscard]] virtual MediaLibrary& mediaLibrary() = 0;
+    [[nodiscard]] virtual AnnouncingLibrary& mediaLibrary() = 0;
 
     /// The sessions of a type that exist now, never null.
     [[nodiscard]] virtual NSArray<DVSession> sessions(const std::string& type) = 0;
 
     /// A connection to the wearable for a client whose replies run on `queue`; never null.
-    [[nodiscard]] virtual std::unique_ptr<LSSClient> connectToWearable(dispatch_queue_t queue) = 0;
+    [[nodiscard]] virtual std::shared_ptr<WearableConnection>
+    connectToWearable(dispatch_queue_t queue) = 0;
 
     /// The toolkit's half of the host.
     [[nodiscard]] virtual Screen& screen() = 0;

@@ -1,6 +1,6 @@
 #include "runtime/lists/NavigationController.h"
 
-#include "runtime/lists/PSListView.h"
+#include "runtime/lists/ListView.h"
 #include "runtime/lists/TableView.h"
 
 namespace quorl {
@@ -88,7 +88,7 @@ bool NavigationController::openURL(const std::string& url) {
 
 void draw(UIViewController& pane) {
     if (auto* list = dynamic_cast<PSListController*>(&pane)) {
-        list->listView().draw();
+        ListView::of(*list).draw();
     } else if (auto* table = dynamic_cast<UITableViewController*>(&pane)) {
         TableView::of(*table).draw();
     }

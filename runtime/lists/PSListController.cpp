@@ -3,7 +3,9 @@
 #include "platform/HostApp.h"
 #include "runtime/host/Host.h"
 #include "runtime/host/Screen.h"
-#include "runtime/lists/PSListView.h"
+#include "runtime/lists/ListView.h"
+
+using quorl::ListView;
 
 namespace {
 
@@ -11,12 +13,8 @@ quorl::Screen& screen() { return quorl::Host::required().screen(); }
 
 } // namespace
 
-PSListController::PSListController() = default;
-
-PSListController::~PSListController() = default;
-
 bool PSListController::init() {
-    _listView = std::make_shared<PSListView>(*this);
+    _listView = std::make_shared<ListView>(*this);
     return UIViewController::init() && quorl::Host::current() != nullptr;
 }
 
@@ -28,18 +26,18 @@ void PSListController::reloadSpecifier(const std::shared_ptr<PSSpecifier>& speci
     screen().listWillReloadSpecifier(*this, specifier.get());
     const auto rows = elements<PSSpecifier>(_specifiers);
     if (specifier && std::find(rows.begin(), rows.end(), specifier) != rows.end()) {
-        _listView->update(specifier);
+        ListView::of(*this).update(specifier);
     }
 }
 
 void PSListController::reload() {
     screen().listWillReload(*this);
-    _listView->markForDrawing();
+    ListView::of(*this).markForDrawing();
 }
 
 void PSListController::viewDidAppear(bool animated) {
     UIViewController::viewDidAppear(animated);
-    _listView->setShown();
+    ListView::of(*this).setShown();
 }
 
 PSController* PSListController::parentController() const { return _parentController; }

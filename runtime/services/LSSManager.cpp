@@ -1,18 +1,14 @@
 #include "runtime/host/Host.h"
-#include "runtime/services/LSSClient.h"
+#include "runtime/services/WearableConnection.h"
 
 const std::string_view kLSSUsageAvailableStorageKey = "kLSSUsageAvailableStorageKey";
 const std::string_view kLSSUsageSongsKey = "kLSSUsageSongsKey";
-
-LSSManager::LSSManager() = default;
-
-LSSManager::~LSSManager() = default;
 
 bool LSSManager::initWithQueue(dispatch_queue_t queue) {
     if (!NSObject::init() || !quorl::Host::current()) {
         return false;
     }
-    _client = quorl::Host::current()->connectToWearable(queue);
+    _connection = quorl::Host::current()->connectToWearable(queue);
     _queue = queue;
     return true;
 }
@@ -20,11 +16,11 @@ bool LSSManager::initWithQueue(dispatch_queue_t queue) {
 void LSSManager::getUsage(UsageHandler handler) {
     // The handler goes to the queue with the reply, so that what it captures is let go of there.
     auto shared = std::make_shared<UsageHandler>(std::move(handler));
-    _client->requestUsage(
-        [queue = _queue, shared = std::move(shared)](const NSDictionary<NSNumber>& usage,
-                                                     std::shared_ptr<NSError> error) mutable {
-            dispatch_async(queue, [usage, error = std::move(error), shared = std::move(shared)] {
-                (*shared)(usage, error);
+    static_cast<quorl::WearableConnection&>(*_connection)
+        .requestUsage(
+            [queue = _queue, shared = std::move(shared)](const NSDictionary<NSNumber>& usage,
+                                                         std::shared_ptr<NSError> error) mutable {
+                dispatch_async(queue, [usage, error = std::move(error),
+                                       shared = std::move(shared)] { (*shared)(usage, error); });
             });
-        });
 }

@@ -23,7 +23,7 @@ BusLoop::BusLoop(std::unique_ptr<sdbus::IConnection> bus)
     });
 }
 
-void BusLoop::post(Task task) {
+void BusLoop::post(Work task) {
     {
         const std::scoped_lock lock{mutex_};
         posted_.push_back(std::move(task));
@@ -31,13 +31,13 @@ void BusLoop::post(Task task) {
     static_cast<void>(eventfd_write(wake_.get(), 1));
 }
 
-void BusLoop::watch(int descriptor, short events, Task ready) {
+void BusLoop::watch(int descriptor, short events, Work ready) {
     watched_.insert_or_assign(descriptor, Watched{events, std::move(ready)});
 }
 
 void BusLoop::unwatch(int descriptor) { watched_.erase(descriptor); }
 
-void BusLoop::callAt(Clock::time_point time, Task task) { timers_.emplace(time, std::move(task)); }
+void BusLoop::callAt(Clock::time_point time, Work task) { timers_.emplace(time, std::move(task)); }
 
 void BusLoop::stop() {
     post([this] { stopped_ = true; });
@@ -106,7 +106,7 @@ void BusLoop::callReady(int descriptor) {
 }
 
 void BusLoop::callPosted() {
-    std::vector<Task> tasks;
+    std::vector<Work> tasks;
     {
         const std::scoped_lock lock{mutex_};
         tasks.swap(posted_);

@@ -18,7 +18,7 @@ namespace quorl::engine {
 /// threads hand over. All of them are served on the thread that is in `run`, one at a time.
 class BusLoop {
   public:
-    using Task = std::function<void()>;
+    using Work = std::function<void()>;
     using Clock = std::chrono::steady_clock;
 
     /// @param bus nobody else runs a loop on it. Null: the loop serves everything else.
@@ -32,15 +32,15 @@ class BusLoop {
 
     /// Has `task` called by `run`, after those that were handed over before. Any thread; never
     /// waits. What was not called when the loop ended is destroyed with it.
-    void post(Task task);
+    void post(Work task);
 
     /// Has `ready` called while the descriptor shows one of these events of poll(2). `ready` may
     /// call `unwatch`.
-    void watch(int descriptor, short events, Task ready);
+    void watch(int descriptor, short events, Work ready);
     void unwatch(int descriptor);
 
     /// Has `task` called once, no sooner than at this time.
-    void callAt(Clock::time_point time, Task task);
+    void callAt(Clock::time_point time, Work task);
 
     /// Serves everything until `stop` is called or the bus is gone. Gives back an empty text, or
     /// says why the bus is gone; a further call then serves everything else.
@@ -52,7 +52,7 @@ class BusLoop {
   private:
     struct Watched {
         short events;
-        Task ready;
+        Work ready;
     };
 
     void serveBus();
@@ -65,10 +65,10 @@ class BusLoop {
     const std::unique_ptr<sdbus::IConnection> bus_;
     const base::FileDescriptor wake_;
     std::map<int, Watched> watched_;
-    std::multimap<Clock::time_point, Task> timers_;
+    std::multimap<Clock::time_point, Work> timers_;
 
     std::mutex mutex_;
-    std::vector<Task> posted_;
+    std::vector<Work> posted_;
     bool stopped_ = false;
     bool isBusThere_;
 };

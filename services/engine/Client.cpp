@@ -96,7 +96,7 @@ class Client::Connection {
 
     /// Adds what the object is to `state`; true where it was a session or a task.
     static void add(State& state, const std::string& path, const Interfaces& interfaces);
-    static std::pair<Session*, Task*> findTask(State& state, const std::string& path);
+    static std::pair<SessionState*, TaskState*> findTask(State& state, const std::string& path);
 
     template <class Change>
     auto change(Change change) {
@@ -271,7 +271,7 @@ void Client::Connection::onAdded(const std::string& path, const Interfaces& inte
     const auto session = change([&](State& state) {
         add(state, path, interfaces);
         const auto* const added = find(state.sessions, path);
-        return added == nullptr ? Session{} : *added;
+        return added == nullptr ? SessionState{} : *added;
     });
     if (!session.path.empty()) {
         listener_.sessionWillBegin(session);
@@ -280,13 +280,13 @@ void Client::Connection::onAdded(const std::string& path, const Interfaces& inte
 
 void Client::Connection::onRemoved(const std::string& path) {
     const auto session = change([&](State& state) {
-        Session removed;
+        SessionState removed;
         if (const auto* const found = find(state.sessions, path)) {
             removed = *found;
         }
-        std::erase_if(state.sessions, [&](const Session& each) { return each.path == path; });
+        std::erase_if(state.sessions, [&](const SessionState& each) { return each.path == path; });
         for (auto& each : state.sessions) {
-            std::erase_if(each.tasks, [&](const Task& task) { return task.path == path; });
+            std::erase_if(each.tasks, [&](const TaskState& task) { return task.path == path; });
         }
         return removed;
     });
@@ -298,8 +298,8 @@ void Client::Connection::onRemoved(const std::string& path) {
 void Client::Connection::onChanged(const std::string& path, const std::string& interface,
                                    const Properties& properties) {
     if (interface == taskInterface) {
-        Session session;
-        Task task;
+        SessionState session;
+        TaskState task;
         const bool isUpdate = change([&](State& state) {
             const auto [ofTask, changed] = findTask(state, path);
             if (changed == nullptr) {
@@ -333,7 +333,8 @@ void Client::Connection::onChanged(const std::string& path, const std::string& i
     }
 }
 
-std::pair<Session*, Task*> Client::Connection::findTask(State& state, const std::string& path) {
+std::pair<SessionState*, TaskState*> Client::Connection::findTask(State& state,
+                                                                  const std::string& path) {
     for (auto& session : state.sessions) {
         if (auto* const task = find(session.tasks, path)) {
             return {&session, task};

@@ -27,23 +27,23 @@ class Listener {
     /// The session bus is gone, and nothing comes any more. `problem` says what to do.
     virtual void busDidVanish(const std::string& /*problem*/) {}
 
-    virtual void sessionWillBegin(const Session& /*session*/) {}
+    virtual void sessionWillBegin(const SessionState& /*session*/) {}
 
-    virtual void taskWillBegin(const Session& /*session*/, const Task& /*task*/) {}
+    virtual void taskWillBegin(const SessionState& /*session*/, const TaskState& /*task*/) {}
 
-    virtual void taskDidBegin(const Session& /*session*/, const Task& /*task*/) {}
+    virtual void taskDidBegin(const SessionState& /*session*/, const TaskState& /*task*/) {}
 
-    virtual void taskDidUpdate(const Session& /*session*/, const Task& /*task*/) {}
+    virtual void taskDidUpdate(const SessionState& /*session*/, const TaskState& /*task*/) {}
 
     /// `message` is a sentence for the user.
-    virtual void taskDidFinish(const Session& /*session*/, const Task& /*task*/, bool /*success*/,
-                               const std::string& /*message*/) {}
+    virtual void taskDidFinish(const SessionState& /*session*/, const TaskState& /*task*/,
+                               bool /*success*/, const std::string& /*message*/) {}
 
-    virtual void sessionDidFinish(const Session& /*session*/, bool /*success*/,
+    virtual void sessionDidFinish(const SessionState& /*session*/, bool /*success*/,
                                   const std::string& /*message*/) {}
 
     /// The session is no longer in `state`.
-    virtual void sessionDidVanish(const Session& /*session*/) {}
+    virtual void sessionDidVanish(const SessionState& /*session*/) {}
 
     /// The engine's own status or that of the wearable is another one.
     virtual void statusDidChange() {}

@@ -14,7 +14,7 @@ void take(const Properties& properties, const char* name, T& value) {
 
 } // namespace
 
-void update(Task& task, const Properties& properties) {
+void update(TaskState& task, const Properties& properties) {
     take(properties, "GroupingKey", task.groupingKey);
     take(properties, "Running", task.isRunning);
     take(properties, "TotalItemCount", task.totalItemCount);
@@ -22,7 +22,7 @@ void update(Task& task, const Properties& properties) {
     take(properties, "Progress", task.progress);
 }
 
-void update(Session& session, const Properties& properties) {
+void update(SessionState& session, const Properties& properties) {
     take(properties, "TypeIdentifier", session.typeIdentifier);
     take(properties, "Finished", session.isFinished);
 }

@@ -11,7 +11,7 @@
 namespace quorl::engine {
 
 /// A piece of a session's work.
-struct Task {
+struct TaskState {
     /// Tells it from all others for as long as the engine runs.
     std::string path;
     std::string groupingKey;
@@ -22,19 +22,19 @@ struct Task {
     /// From 0 to 1.
     double progress = 0.0;
 
-    bool operator==(const Task&) const = default;
+    bool operator==(const TaskState&) const = default;
 };
 
 /// One run of the engine.
-struct Session {
+struct SessionState {
     /// Tells it from all others for as long as the engine runs.
     std::string path;
     std::string typeIdentifier;
     bool isFinished = false;
     /// In the order in which they were announced.
-    std::vector<Task> tasks;
+    std::vector<TaskState> tasks;
 
-    bool operator==(const Session&) const = default;
+    bool operator==(const SessionState&) const = default;
 };
 
 /// The wearable that the engine syncs to. Byte counts are as last looked at.
@@ -74,7 +74,7 @@ struct State {
     EngineStatus engine;
     WearableStatus wearable;
     /// In the order in which they began.
-    std::vector<Session> sessions;
+    std::vector<SessionState> sessions;
 
     bool operator==(const State&) const = default;
 };
@@ -83,8 +83,8 @@ using Properties = std::map<std::string, sdbus::Variant>;
 
 /// Take over those of the properties that are known and of the right type; the others are left as
 /// they are, so that other engines may have more.
-void update(Task& task, const Properties& properties);
-void update(Session& session, const Properties& properties);
+void update(TaskState& task, const Properties& properties);
+void update(SessionState& session, const Properties& properties);
 void update(WearableStatus& wearable, const Properties& properties);
 void update(EngineStatus& engine, const Properties& properties);
 

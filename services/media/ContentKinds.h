@@ -5,7 +5,7 @@
 #include <string>
 #include <string_view>
 
-#include "services/media/Snapshot.h"
+#include "services/media/Inventory.h"
 
 namespace quorl::media {
 

@@ -12,7 +12,7 @@
 #include <sys/types.h>
 
 #include "services/media/ContentKinds.h"
-#include "services/media/Snapshot.h"
+#include "services/media/Inventory.h"
 #include "services/media/playlists/PlaylistContent.h"
 #include "services/media/playlists/TextList.h"
 
@@ -21,14 +21,14 @@ namespace quorl::media {
 /// A file that may be listed as a song. Its size and time are asked for only once a playlist lists
 /// it.
 struct SongFile {
-    static constexpr SongIndex notInSnapshot = std::numeric_limits<SongIndex>::max();
+    static constexpr SongIndex notListed = std::numeric_limits<SongIndex>::max();
 
     std::uint64_t size = 0;
     std::int64_t modified = 0;
     /// Index in `Directory::songNames`.
     std::uint32_t name = 0;
-    /// Where it is in the snapshot that is being built.
-    SongIndex song = notInSnapshot;
+    /// Where it is in the inventory that is being built.
+    SongIndex song = notListed;
     Kind kind = Kind::Audio;
     /// A playlist lists it.
     bool listed = false;

@@ -20,7 +20,7 @@
 #include "services/base/MountWatch.h"
 #include "services/base/RootWatch.h"
 #include "services/media/FolderTree.h"
-#include "services/media/SnapshotBuilder.h"
+#include "services/media/InventoryBuilder.h"
 
 namespace quorl::media {
 
@@ -29,7 +29,7 @@ namespace {
 using Clock = std::chrono::steady_clock;
 
 // A program that copies an album makes hundreds of changes within moments of each other. Building
-// the snapshot costs some milliseconds however small the change, so it waits until the folder has
+// the inventory costs some milliseconds however small the change, so it waits until the folder has
 // been quiet for a moment; a copy that never rests is shown in steps all the same.
 constexpr std::chrono::milliseconds quietTime{50};
 constexpr std::chrono::milliseconds longestWait{500};
@@ -39,7 +39,7 @@ std::filesystem::path absoluteRoot(const std::filesystem::path& root) {
     return path.has_filename() ? path : path.parent_path();
 }
 
-/// While a snapshot is built, the one before is still there. What that leaves free amounts to a
+/// While an inventory is built, the one before is still there. What that leaves free amounts to a
 /// third of all that a large folder needs, and the allocator would keep it for the rest of the
 /// process.
 void giveBackMemory() { malloc_trim(0); }
@@ -55,11 +55,11 @@ base::FileDescriptor makeWakeUp() {
 
 } // namespace
 
-std::shared_ptr<const Snapshot> scan(const std::filesystem::path& root) {
+std::shared_ptr<const Inventory> scan(const std::filesystem::path& root) {
     FolderTree tree(absoluteRoot(root), nullptr);
     const std::stop_token never;
     static_cast<void>(tree.refresh(never));
-    return buildSnapshot(tree, never);
+    return buildInventory(tree, never);
 }
 
 class MusicFolder::Worker {
@@ -69,7 +69,7 @@ class MusicFolder::Worker {
           tree_(root, &directoryWatch_),
           thread_([this](const std::stop_token& stop) { run(stop); }) {}
 
-    std::shared_ptr<const Snapshot> snapshot() const {
+    std::shared_ptr<const Inventory> inventory() const {
         const std::lock_guard lock(mutex_);
         return snapshot_;
     }
@@ -114,7 +114,7 @@ class MusicFolder::Worker {
         if (!tree_.refresh(stop)) {
             return false;
         }
-        auto next = buildSnapshot(tree_, stop);
+        auto next = buildInventory(tree_, stop);
         if (!next) {
             return false;
         }
@@ -190,7 +190,7 @@ class MusicFolder::Worker {
 
     mutable std::mutex mutex_;
     /// Written by the folder's own thread only.
-    std::shared_ptr<const Snapshot> snapshot_;
+    std::shared_ptr<const Inventory> snapshot_;
     Rescans rescans_;
 
     /// Last, so that everything is there while it runs.
@@ -202,7 +202,7 @@ MusicFolder::MusicFolder(const std::filesystem::path& root, Changed changed)
 
 MusicFolder::~MusicFolder() = default;
 
-std::shared_ptr<const Snapshot> MusicFolder::snapshot() const { return worker_->snapshot(); }
+std::shared_ptr<const Inventory> MusicFolder::inventory() const { return worker_->inventory(); }
 
 void MusicFolder::rescan(std::function<void()> done) { worker_->rescan(std::move(done)); }
 

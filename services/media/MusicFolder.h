@@ -4,13 +4,13 @@
 #include <functional>
 #include <memory>
 
-#include "services/media/Snapshot.h"
+#include "services/media/Inventory.h"
 
 namespace quorl::media {
 
 /// Reads the music folder at `root` once, on the calling thread. Never null; a folder that is not
-/// there gives an empty snapshot with `rootFound` false.
-[[nodiscard]] std::shared_ptr<const Snapshot> scan(const std::filesystem::path& root);
+/// there gives an empty inventory with `rootFound` false.
+[[nodiscard]] std::shared_ptr<const Inventory> scan(const std::filesystem::path& root);
 
 /// A music folder that is watched from construction to destruction, on a thread of its own.
 ///
@@ -18,9 +18,9 @@ namespace quorl::media {
 /// again.
 class MusicFolder {
   public:
-    /// Is given each snapshot that differs from the one before, and the first. Called on the
+    /// Is given each inventory that differs from the one before, and the first. Called on the
     /// folder's own thread, one call at a time. Must not throw, nor destroy the folder.
-    using Changed = std::function<void(std::shared_ptr<const Snapshot>)>;
+    using Changed = std::function<void(std::shared_ptr<const Inventory>)>;
 
     /// Begins to read and watch `root`, which is taken as absolute, or relative to the working
     /// directory of this moment. Throws `std::system_error` where the process may open no more
@@ -33,11 +33,12 @@ class MusicFolder {
     MusicFolder(const MusicFolder&) = delete;
     MusicFolder& operator=(const MusicFolder&) = delete;
 
-    /// The last snapshot; null: the first is not ready yet. Any thread.
-    [[nodiscard]] std::shared_ptr<const Snapshot> snapshot() const;
+    /// The last inventory; null: the first is not ready yet. Any thread.
+    [[nodiscard]] std::shared_ptr<const Inventory> inventory() const;
 
     /// Has everything read again, for changes that no watch tells: those made by other machines on
-    /// a network drive, and those in `Snapshot::unwatchedDirectories`. Returns at once; any thread.
+    /// a network drive, and those in `Inventory::unwatchedDirectories`. Returns at once; any
+    /// thread.
     ///
     /// `done`, where given, is called on the folder's own thread once that has been read, after
     /// `Changed` if it made a difference. It is never called when the folder is destroyed before.

@@ -3,7 +3,7 @@
 #include <cstdint>
 #include <string_view>
 
-#include "services/media/Snapshot.h"
+#include "services/media/Inventory.h"
 
 namespace quorl::media {
 

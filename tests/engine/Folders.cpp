@@ -50,8 +50,8 @@ wearable::Manifest Player::manifest() const {
     return wearable::loadManifest(base::openRoot(path().c_str()).get());
 }
 
-Wish wishFor(const Music& music, const Player& player, std::uint64_t limitType, std::uint64_t limit,
-             const std::string& title) {
+Order wishFor(const Music& music, const Player& player, std::uint64_t limitType,
+              std::uint64_t limit, const std::string& title) {
     auto library = media::scan(music.path());
     const auto playlist = std::ranges::find(library->playlists, title, &media::Playlist::name);
     if (playlist == library->playlists.end()) {
@@ -61,9 +61,9 @@ Wish wishFor(const Music& music, const Player& player, std::uint64_t limitType, 
     return {std::move(library), selection, player.wearable()};
 }
 
-Outcome sync(const Wish& wish, const Sync::Told& told, std::stop_token stop) {
+Outcome sync(const Order& order, const Sync::Told& told, std::stop_token stop) {
     RateLimit rate;
-    return Sync{wish, rate, std::move(stop), told ? told : [](const CopyProgress&) {}}.run();
+    return Sync{order, rate, std::move(stop), told ? told : [](const CopyProgress&) {}}.run();
 }
 
 std::string whatIsWrongWith(const std::filesystem::path& wearable) {

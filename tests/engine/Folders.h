@@ -65,12 +65,12 @@ class Player {
 inline constexpr std::uint64_t noLimit = 99;
 
 /// The playlist "List" of the folder as it is now.
-[[nodiscard]] Wish wishFor(const Music& music, const Player& player,
-                           std::uint64_t limitType = noLimit, std::uint64_t limit = 0,
-                           const std::string& title = "List");
+[[nodiscard]] Order wishFor(const Music& music, const Player& player,
+                            std::uint64_t limitType = noLimit, std::uint64_t limit = 0,
+                            const std::string& title = "List");
 
 /// A whole sync; `told` sees each step.
-[[nodiscard]] Outcome sync(const Wish& wish, const Sync::Told& told = {},
+[[nodiscard]] Outcome sync(const Order& order, const Sync::Told& told = {},
                            std::stop_token stop = {});
 
 /// What is to hold on a wearable at every moment: the list of our files can be read, and each song

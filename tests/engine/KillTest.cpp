@@ -86,8 +86,8 @@ TEST_F(KilledEngine, LeavesNothingHalfAndNothingOfOthersTouchedAndCompletesInThe
     start();
     EXPECT_TRUE(sessionEnd().success);
 
-    const auto wish = wishFor(music_, Player{});
-    EXPECT_EQ(onWearable().size(), foreign.size() + wish.playlist().songs.size() + 1)
+    const auto order = wishFor(music_, Player{});
+    EXPECT_EQ(onWearable().size(), foreign.size() + order.playlist().songs.size() + 1)
         << "nothing is left behind";
     EXPECT_EQ(whatIsWrongWith(wearable_), "");
 }

@@ -28,10 +28,10 @@ class Limit : public ::testing::Test {
     }
 
     [[nodiscard]] std::vector<std::string> sent(std::uint64_t type, std::uint64_t amount) const {
-        const auto wish = wishFor(music_, player_, type, amount);
+        const auto order = wishFor(music_, player_, type, amount);
         std::vector<std::string> names;
-        for (const auto song : songsWithinLimit(wish)) {
-            names.push_back(wish.library->songs[song].path());
+        for (const auto song : songsWithinLimit(order)) {
+            names.push_back(order.library->songs[song].path());
         }
         return names;
     }

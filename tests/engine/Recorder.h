@@ -28,8 +28,8 @@ struct Event {
     };
 
     Kind kind;
-    engine::Session session = {};
-    engine::Task task = {};
+    engine::SessionState session = {};
+    engine::TaskState task = {};
     bool success = false;
     std::string message = {};
 };
@@ -86,33 +86,35 @@ class Recorder : private engine::Listener {
         note({Kind::BusDidVanish, {}, {}, false, problem});
     }
 
-    void sessionWillBegin(const engine::Session& session) override {
+    void sessionWillBegin(const engine::SessionState& session) override {
         note({Kind::SessionWillBegin, session});
     }
 
-    void taskWillBegin(const engine::Session& session, const engine::Task& task) override {
+    void taskWillBegin(const engine::SessionState& session,
+                       const engine::TaskState& task) override {
         note({Kind::TaskWillBegin, session, task});
     }
 
-    void taskDidBegin(const engine::Session& session, const engine::Task& task) override {
+    void taskDidBegin(const engine::SessionState& session, const engine::TaskState& task) override {
         note({Kind::TaskDidBegin, session, task});
     }
 
-    void taskDidUpdate(const engine::Session& session, const engine::Task& task) override {
+    void taskDidUpdate(const engine::SessionState& session,
+                       const engine::TaskState& task) override {
         note({Kind::TaskDidUpdate, session, task});
     }
 
-    void taskDidFinish(const engine::Session& session, const engine::Task& task, bool success,
-                       const std::string& message) override {
+    void taskDidFinish(const engine::SessionState& session, const engine::TaskState& task,
+                       bool success, const std::string& message) override {
         note({Kind::TaskDidFinish, session, task, success, message});
     }
 
-    void sessionDidFinish(const engine::Session& session, bool success,
+    void sessionDidFinish(const engine::SessionState& session, bool success,
                           const std::string& message) override {
         note({Kind::SessionDidFinish, session, {}, success, message});
     }
 
-    void sessionDidVanish(const engine::Session& session) override {
+    void sessionDidVanish(const engine::SessionState& session) override {
         note({Kind::SessionDidVanish, session});
     }
 

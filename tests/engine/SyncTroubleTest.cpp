@@ -82,7 +82,7 @@ TEST_F(Trouble, ASongThatGrowsWithoutEndDoesNotFillTheWearable) {
 
 TEST_F(Trouble, AnOldCopyStaysWhereTheSongCannotBeReadNow) {
     ASSERT_EQ(sync(wishFor(music_, player_)).kind, Kind::Sent);
-    const auto wish = wishFor(music_, player_);
+    const auto order = wishFor(music_, player_);
     music_.write("second.mp3", "changed");
     const auto newWish = wishFor(music_, player_);
     music_.remove("second.mp3");
@@ -130,9 +130,9 @@ TEST_F(Trouble, NoFileOfAnUnfinishedSyncStaysBehind) {
 }
 
 TEST_F(Trouble, ACopyThatWasLeftBehindByAKilledSyncIsUsedAndARuinedOneIsNot) {
-    const auto wish = wishFor(music_, player_);
+    const auto order = wishFor(music_, player_);
     const auto song = [&](std::size_t at) {
-        return wish.library->songs[wish.playlist().songs[at]];
+        return order.library->songs[order.playlist().songs[at]];
     };
     player_.write("Music/second.mp3", "second");
     player_.write("Music/third.mp3", "ruins");
@@ -146,7 +146,7 @@ TEST_F(Trouble, ACopyThatWasLeftBehindByAKilledSyncIsUsedAndARuinedOneIsNot) {
     player_.write(".quorl/manifest.json", toText(manifest));
     std::uint64_t copied = 0;
 
-    EXPECT_EQ(sync(wish, [&](const auto& step) { copied = step.songs; }).kind, Kind::Sent);
+    EXPECT_EQ(sync(order, [&](const auto& step) { copied = step.songs; }).kind, Kind::Sent);
 
     EXPECT_EQ(copied, 2);
     EXPECT_EQ(player_.music().at("third.mp3"), "third");
@@ -154,13 +154,13 @@ TEST_F(Trouble, ACopyThatWasLeftBehindByAKilledSyncIsUsedAndARuinedOneIsNot) {
 }
 
 TEST_F(Trouble, AFileOfSomebodyElseThatTookTheNameOfAnUnfinishedCopyIsKept) {
-    const auto wish = wishFor(music_, player_);
+    const auto order = wishFor(music_, player_);
     quorl::wearable::Manifest manifest;
     manifest.strays = {{"second.mp3", "second.mp3", 6, 1, ""}};
     player_.write(".quorl/manifest.json", toText(manifest));
     player_.write("Music/second.mp3", "not ours");
 
-    EXPECT_EQ(sync(wish).kind, Kind::Sent);
+    EXPECT_EQ(sync(order).kind, Kind::Sent);
 
     EXPECT_EQ(player_.music().at("second.mp3"), "not ours");
     EXPECT_EQ(player_.music().at("second (2).mp3"), "second");

@@ -66,11 +66,11 @@ TEST(IdentityTest, APlaylistIsFoundByItsIdAndAnUnknownIdFindsNone) {
     folder.write("a.m3u", "");
     folder.write("b.m3u", "");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    ASSERT_NE(snapshot->playlist(playlistAt(*snapshot, "b.m3u").id), nullptr);
-    EXPECT_EQ(snapshot->playlist(playlistAt(*snapshot, "b.m3u").id)->path, "b.m3u");
-    EXPECT_EQ(snapshot->playlist(1), nullptr);
+    ASSERT_NE(inventory->playlist(playlistAt(*inventory, "b.m3u").id), nullptr);
+    EXPECT_EQ(inventory->playlist(playlistAt(*inventory, "b.m3u").id)->path, "b.m3u");
+    EXPECT_EQ(inventory->playlist(1), nullptr);
 }
 
 class RevisionTest : public testing::Test {

@@ -22,9 +22,9 @@ using testing::IsEmpty;
 constexpr std::string_view track = "<track><location>one.mp3</location></track>";
 
 /// The one thing that is left out, which says why.
-LeftOut onlyOneOf(const Snapshot& snapshot) {
-    EXPECT_EQ(snapshot.leftOut.size(), 1U);
-    return snapshot.leftOut.at(0);
+LeftOut onlyOneOf(const Inventory& inventory) {
+    EXPECT_EQ(inventory.leftOut.size(), 1U);
+    return inventory.leftOut.at(0);
 }
 
 } // namespace
@@ -34,10 +34,10 @@ TEST(LeftOutTest, ARecordTellsPlaylistEntryAndReasonAndTheOtherEntriesStay) {
     folder.writeSongs({"one.mp3", "two.mp3"});
     folder.write("lists/List.m3u", "../one.mp3\n..\\gone%20away.mp3\n../two.mp3\n");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(songsOf(*snapshot, "lists/List.m3u"), ElementsAre("one.mp3", "two.mp3"));
-    EXPECT_EQ(onlyOneOf(*snapshot),
+    EXPECT_THAT(songsOf(*inventory, "lists/List.m3u"), ElementsAre("one.mp3", "two.mp3"));
+    EXPECT_EQ(onlyOneOf(*inventory),
               (LeftOut{"lists/List.m3u", "..\\gone%20away.mp3", Reason::Missing}));
 }
 
@@ -46,11 +46,11 @@ TEST(LeftOutTest, RecordsAreInTheOrderOfPathsAndEntries) {
     folder.write("b.m3u", "#PLAYLIST:A\nz\ny\n");
     folder.write("a.m3u", "#PLAYLIST:B\nx\n");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(snapshot->leftOut, ElementsAre(LeftOut{"a.m3u", "x", Reason::Missing},
-                                               LeftOut{"b.m3u", "z", Reason::Missing},
-                                               LeftOut{"b.m3u", "y", Reason::Missing}));
+    EXPECT_THAT(inventory->leftOut, ElementsAre(LeftOut{"a.m3u", "x", Reason::Missing},
+                                                LeftOut{"b.m3u", "z", Reason::Missing},
+                                                LeftOut{"b.m3u", "y", Reason::Missing}));
 }
 
 TEST(LeftOutTest, AnEntryThatIsNotUtf8IsRecordedInUtf8) {
@@ -68,12 +68,12 @@ TEST(LeftOutTest, AddressesOnOtherMachines) {
     folder.write("b.xspf", "<playlist><trackList><track><location>https://a.example/1.mp3"
                            "</location></track></trackList></playlist>");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(reasonsFor(*snapshot, "a.m3u"),
+    EXPECT_THAT(reasonsFor(*inventory, "a.m3u"),
                 ElementsAre(Reason::RemoteAddress, Reason::RemoteAddress, Reason::RemoteAddress,
                             Reason::RemoteAddress));
-    EXPECT_THAT(reasonsFor(*snapshot, "b.xspf"), ElementsAre(Reason::RemoteAddress));
+    EXPECT_THAT(reasonsFor(*inventory, "b.xspf"), ElementsAre(Reason::RemoteAddress));
 }
 
 TEST(LeftOutTest, AbsolutePathsOfOtherSystems) {
@@ -84,11 +84,11 @@ TEST(LeftOutTest, AbsolutePathsOfOtherSystems) {
     folder.write("b.xspf", "<playlist><trackList><track><location>C%3A%5Cone.mp3</location>"
                            "</track></trackList></playlist>");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(reasonsFor(*snapshot, "a.m3u"), testing::Each(Reason::OtherSystem));
-    EXPECT_EQ(reasonsFor(*snapshot, "a.m3u").size(), 7U);
-    EXPECT_THAT(reasonsFor(*snapshot, "b.xspf"), ElementsAre(Reason::OtherSystem));
+    EXPECT_THAT(reasonsFor(*inventory, "a.m3u"), testing::Each(Reason::OtherSystem));
+    EXPECT_EQ(reasonsFor(*inventory, "a.m3u").size(), 7U);
+    EXPECT_THAT(reasonsFor(*inventory, "b.xspf"), ElementsAre(Reason::OtherSystem));
 }
 
 TEST(LeftOutTest, FilesOutsideTheFolderWhetherTheyExistOrNot) {
@@ -101,12 +101,12 @@ TEST(LeftOutTest, FilesOutsideTheFolderWhetherTheyExistOrNot) {
                      "../outside.mp3\n..\\outside.mp3\nlink.mp3\nlinked/one.mp3\n../gone.mp3\n"
                      "/gone/away.mp3\n../MusicOther/one.mp3\n");
 
-    const auto snapshot = scan(folder / "Music");
+    const auto inventory = scan(folder / "Music");
 
-    EXPECT_THAT(reasonsFor(*snapshot, "List.m3u"), testing::Each(Reason::OutsideFolder));
-    EXPECT_EQ(reasonsFor(*snapshot, "List.m3u").size(), 8U);
-    EXPECT_EQ(snapshot->songs.size(), 0U);
-    EXPECT_FALSE(snapshot->hasAudio);
+    EXPECT_THAT(reasonsFor(*inventory, "List.m3u"), testing::Each(Reason::OutsideFolder));
+    EXPECT_EQ(reasonsFor(*inventory, "List.m3u").size(), 8U);
+    EXPECT_EQ(inventory->songs.size(), 0U);
+    EXPECT_FALSE(inventory->hasAudio);
 }
 
 TEST(LeftOutTest, FilesThatAreMissing) {
@@ -119,10 +119,10 @@ TEST(LeftOutTest, FilesThatAreMissing) {
                                  (folder / "gone.mp3").string() + "\n" + std::string(5000, 'x') +
                                  "\n" + std::string("zero\0.mp3", 9) + "\n");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(reasonsFor(*snapshot, "List.m3u"), testing::Each(Reason::Missing));
-    EXPECT_EQ(reasonsFor(*snapshot, "List.m3u").size(), 8U);
+    EXPECT_THAT(reasonsFor(*inventory, "List.m3u"), testing::Each(Reason::Missing));
+    EXPECT_EQ(reasonsFor(*inventory, "List.m3u").size(), 8U);
 }
 
 TEST(LeftOutTest, FilesThatAreMissingBehindALinkToTheFolder) {
@@ -143,9 +143,9 @@ TEST(LeftOutTest, FilesInADirectoryThatMayNotBeEntered) {
     folder.setPermissions("locked", std::filesystem::perms::none);
     const WithoutPrivileges ordinary;
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(snapshot->leftOut,
+    EXPECT_THAT(inventory->leftOut,
                 ElementsAre(LeftOut{"List.m3u", "locked/one.mp3", Reason::Unreachable},
                             LeftOut{"locked", "", Reason::DirectoryUnreadable}));
 }
@@ -155,10 +155,10 @@ TEST(LeftOutTest, AFolderThatMayNotBeReadIsNamedItself) {
     folder.setPermissions("", std::filesystem::perms::owner_exec);
     const WithoutPrivileges ordinary;
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_TRUE(snapshot->rootFound);
-    EXPECT_EQ(onlyOneOf(*snapshot), (LeftOut{"", "", Reason::DirectoryUnreadable}));
+    EXPECT_TRUE(inventory->rootFound);
+    EXPECT_EQ(onlyOneOf(*inventory), (LeftOut{"", "", Reason::DirectoryUnreadable}));
 }
 
 TEST(LeftOutTest, HiddenFiles) {
@@ -201,10 +201,11 @@ TEST(LeftOutTest, TracksWithoutAddress) {
                            "<track><location> </location></track></trackList></playlist>");
     folder.write("b.pls", "[playlist]\nFile1=\n");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(reasonsFor(*snapshot, "a.xspf"), ElementsAre(Reason::NoAddress, Reason::NoAddress));
-    EXPECT_THAT(reasonsFor(*snapshot, "b.pls"), ElementsAre(Reason::NoAddress));
+    EXPECT_THAT(reasonsFor(*inventory, "a.xspf"),
+                ElementsAre(Reason::NoAddress, Reason::NoAddress));
+    EXPECT_THAT(reasonsFor(*inventory, "b.pls"), ElementsAre(Reason::NoAddress));
 }
 
 // Whole playlists.
@@ -215,10 +216,10 @@ TEST(LeftOutTest, APlaylistThatMayNotBeRead) {
     folder.setPermissions("List.m3u", std::filesystem::perms::none);
     const WithoutPrivileges ordinary;
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(snapshot->playlists, IsEmpty());
-    EXPECT_EQ(onlyOneOf(*snapshot), (LeftOut{"List.m3u", "", Reason::PlaylistUnreadable}));
+    EXPECT_THAT(inventory->playlists, IsEmpty());
+    EXPECT_EQ(onlyOneOf(*inventory), (LeftOut{"List.m3u", "", Reason::PlaylistUnreadable}));
 }
 
 TEST(LeftOutTest, APlaylistOfMoreThan64MiBButNotOneOfExactlyThat) {
@@ -228,10 +229,10 @@ TEST(LeftOutTest, APlaylistOfMoreThan64MiBButNotOneOfExactlyThat) {
     std::filesystem::resize_file(folder / "large.m3u", maximumPlaylistBytes + 1);
     std::filesystem::resize_file(folder / "largest.m3u", maximumPlaylistBytes);
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(namesOf(*snapshot), ElementsAre("largest"));
-    EXPECT_THAT(reasonsFor(*snapshot, "large.m3u"), ElementsAre(Reason::PlaylistTooLarge));
+    EXPECT_THAT(namesOf(*inventory), ElementsAre("largest"));
+    EXPECT_THAT(reasonsFor(*inventory, "large.m3u"), ElementsAre(Reason::PlaylistTooLarge));
 }
 
 TEST(LeftOutTest, BrokenXml) {
@@ -240,12 +241,12 @@ TEST(LeftOutTest, BrokenXml) {
     folder.write("empty.xspf", "");
     folder.write("html.xspf", "<html><body/></html>");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(snapshot->playlists, IsEmpty());
-    EXPECT_THAT(snapshot->leftOut, ElementsAre(LeftOut{"cut off.xspf", "", Reason::PlaylistBroken},
-                                               LeftOut{"empty.xspf", "", Reason::PlaylistBroken},
-                                               LeftOut{"html.xspf", "", Reason::PlaylistBroken}));
+    EXPECT_THAT(inventory->playlists, IsEmpty());
+    EXPECT_THAT(inventory->leftOut, ElementsAre(LeftOut{"cut off.xspf", "", Reason::PlaylistBroken},
+                                                LeftOut{"empty.xspf", "", Reason::PlaylistBroken},
+                                                LeftOut{"html.xspf", "", Reason::PlaylistBroken}));
 }
 
 TEST(LeftOutTest, APlaylistThatIsAPipeIsNotWaitedFor) {
@@ -253,11 +254,11 @@ TEST(LeftOutTest, APlaylistThatIsAPipeIsNotWaitedFor) {
     ASSERT_EQ(mkfifo((folder / "pipe.m3u").c_str(), 0644), 0);
     folder.link("link.pls", "pipe.m3u");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(snapshot->playlists, IsEmpty());
-    EXPECT_THAT(snapshot->leftOut, ElementsAre(LeftOut{"link.pls", "", Reason::NotRegularFile},
-                                               LeftOut{"pipe.m3u", "", Reason::NotRegularFile}));
+    EXPECT_THAT(inventory->playlists, IsEmpty());
+    EXPECT_THAT(inventory->leftOut, ElementsAre(LeftOut{"link.pls", "", Reason::NotRegularFile},
+                                                LeftOut{"pipe.m3u", "", Reason::NotRegularFile}));
 }
 
 TEST(LeftOutTest, APlaylistThatIsALinkOutOfTheFolderOrToNowhere) {
@@ -266,11 +267,11 @@ TEST(LeftOutTest, APlaylistThatIsALinkOutOfTheFolderOrToNowhere) {
     folder.link("Music/out.m3u", "../secret.m3u");
     folder.link("Music/nowhere.m3u", "gone.m3u");
 
-    const auto snapshot = scan(folder / "Music");
+    const auto inventory = scan(folder / "Music");
 
-    EXPECT_THAT(snapshot->playlists, IsEmpty());
-    EXPECT_THAT(snapshot->leftOut, ElementsAre(LeftOut{"nowhere.m3u", "", Reason::Missing},
-                                               LeftOut{"out.m3u", "", Reason::OutsideFolder}));
+    EXPECT_THAT(inventory->playlists, IsEmpty());
+    EXPECT_THAT(inventory->leftOut, ElementsAre(LeftOut{"nowhere.m3u", "", Reason::Missing},
+                                                LeftOut{"out.m3u", "", Reason::OutsideFolder}));
 }
 
 TEST(LeftOutTest, EntriesAfterTheFirstMillion) {
@@ -283,11 +284,11 @@ TEST(LeftOutTest, EntriesAfterTheFirstMillion) {
     folder.write("full.m3u", bytes);
     folder.write("over.m3u", bytes + "a.mp3\n");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_EQ(playlistAt(*snapshot, "full.m3u").songs.size(), maximumEntries);
-    EXPECT_EQ(playlistAt(*snapshot, "over.m3u").songs.size(), maximumEntries);
-    EXPECT_EQ(onlyOneOf(*snapshot), (LeftOut{"over.m3u", "", Reason::TooManyEntries}));
+    EXPECT_EQ(playlistAt(*inventory, "full.m3u").songs.size(), maximumEntries);
+    EXPECT_EQ(playlistAt(*inventory, "over.m3u").songs.size(), maximumEntries);
+    EXPECT_EQ(onlyOneOf(*inventory), (LeftOut{"over.m3u", "", Reason::TooManyEntries}));
 }
 
 TEST(LeftOutTest, OfTwoPlaylistsWhosePathsDifferInStoredAccentsOnlyOneIsThere) {
@@ -295,10 +296,10 @@ TEST(LeftOutTest, OfTwoPlaylistsWhosePathsDifferInStoredAccentsOnlyOneIsThere) {
     folder.write("Caf\u00E9.m3u", "");
     folder.write("Cafe\u0301.m3u", "");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_EQ(snapshot->playlists.size(), 1U);
-    EXPECT_EQ(onlyOneOf(*snapshot).reason, Reason::SameAsAnother);
+    EXPECT_EQ(inventory->playlists.size(), 1U);
+    EXPECT_EQ(onlyOneOf(*inventory).reason, Reason::SameAsAnother);
 }
 
 // Words.

@@ -74,7 +74,7 @@ TEST(MountTest, ADiskThatIsMountedAtTheFolderIsReadAndWatchedAndCanBeUnmounted) 
     watched.waitForSongs("Inside.m3u", 0);
 
     const Mount disk(folder / "Music");
-    watched.waitFor([](const Snapshot& each) { return each.playlists.empty(); });
+    watched.waitFor([](const Inventory& each) { return each.playlists.empty(); });
 
     folder.writeSongs({"Music/one.mp3"});
     folder.write("Music/Disk.m3u", "one.mp3\n");
@@ -97,7 +97,7 @@ TEST(MountTest, ADiskThatIsMountedOnTheWayToTheFolderIsNoticed) {
     folder.makeDirectory("disk with space");
     folder.link("Music", "disk with space/Music");
     WatchedFolder watched(folder / "Music");
-    watched.waitFor([](const Snapshot& each) { return !each.rootFound; });
+    watched.waitFor([](const Inventory& each) { return !each.rootFound; });
 
     folder.makeDirectory("prepared");
     const Mount disk(folder / "prepared");
@@ -108,7 +108,7 @@ TEST(MountTest, ADiskThatIsMountedOnTheWayToTheFolderIsNoticed) {
     watched.waitForSongs("List.m3u", 0);
 
     EXPECT_EQ(umount(place.c_str()), 0);
-    watched.waitFor([](const Snapshot& each) { return !each.rootFound; });
+    watched.waitFor([](const Inventory& each) { return !each.rootFound; });
 }
 
 TEST(MountTest, ADiskThatIsMountedInTheFolderIsPartOfIt) {
@@ -125,7 +125,7 @@ TEST(MountTest, ADiskThatIsMountedInTheFolderIsPartOfIt) {
     watched.waitForSongs("my disk/List.m3u", 0);
 
     EXPECT_EQ(umount(place.c_str()), 0);
-    watched.waitFor([](const Snapshot& each) { return each.playlists.empty(); });
+    watched.waitFor([](const Inventory& each) { return each.playlists.empty(); });
 }
 
 TEST(LimitTest, DirectoriesThatCannotBeWatchedAreCountedAndReadByARescan) {
@@ -138,7 +138,7 @@ TEST(LimitTest, DirectoriesThatCannotBeWatchedAreCountedAndReadByARescan) {
     limit.set(10);
 
     WatchedFolder watched(folder.path());
-    const auto first = watched.waitFor([](const Snapshot&) { return true; });
+    const auto first = watched.waitFor([](const Inventory&) { return true; });
     EXPECT_GE(first->unwatchedDirectories, 13U);
     EXPECT_NE(
         first->unwatchedNotice().find(std::to_string(first->unwatchedDirectories) + " directories"),
@@ -152,7 +152,7 @@ TEST(LimitTest, DirectoriesThatCannotBeWatchedAreCountedAndReadByARescan) {
     limit.set(1000);
     watched.rescan();
     const auto all =
-        watched.waitFor([](const Snapshot& each) { return each.unwatchedDirectories == 0; });
+        watched.waitFor([](const Inventory& each) { return each.unwatchedDirectories == 0; });
     EXPECT_EQ(all->unwatchedNotice(), "");
 
     folder.write("z/last/Other.m3u", "");

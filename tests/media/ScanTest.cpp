@@ -62,24 +62,24 @@ std::string xspfTracks(const std::string& tracks) {
 TEST(ScanTest, AnEmptyFolderIsAnEmptyLibrary) {
     const TemporaryFolder folder;
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_TRUE(snapshot->rootFound);
-    EXPECT_EQ(snapshot->root, folder.path());
-    EXPECT_THAT(snapshot->playlists, IsEmpty());
-    EXPECT_THAT(snapshot->leftOut, IsEmpty());
-    EXPECT_EQ(snapshot->songs.size(), 0U);
-    EXPECT_FALSE(snapshot->hasAudio);
-    EXPECT_FALSE(snapshot->hasMusicVideo);
+    EXPECT_TRUE(inventory->rootFound);
+    EXPECT_EQ(inventory->root, folder.path());
+    EXPECT_THAT(inventory->playlists, IsEmpty());
+    EXPECT_THAT(inventory->leftOut, IsEmpty());
+    EXPECT_EQ(inventory->songs.size(), 0U);
+    EXPECT_FALSE(inventory->hasAudio);
+    EXPECT_FALSE(inventory->hasMusicVideo);
 }
 
 TEST(ScanTest, AMissingFolderIsAnEmptyLibraryThatSaysSo) {
     const TemporaryFolder folder;
 
-    const auto snapshot = scan(folder / "Music");
+    const auto inventory = scan(folder / "Music");
 
-    EXPECT_FALSE(snapshot->rootFound);
-    EXPECT_THAT(snapshot->playlists, IsEmpty());
+    EXPECT_FALSE(inventory->rootFound);
+    EXPECT_THAT(inventory->playlists, IsEmpty());
 }
 
 TEST(ScanTest, AFileInPlaceOfTheFolderIsAnEmptyLibraryThatSaysSo) {
@@ -95,10 +95,10 @@ TEST(ScanTest, AFolderGivenRelativeToTheWorkingDirectoryAndWithASlashAtItsEndIsF
     folder.write("List.m3u", (folder / "one.mp3").string());
     const auto relative = std::filesystem::relative(folder.path()).string() + "/";
 
-    const auto snapshot = scan(relative);
+    const auto inventory = scan(relative);
 
-    EXPECT_EQ(snapshot->root, folder.path());
-    EXPECT_THAT(songsOf(*snapshot, "List.m3u"), ElementsAre("one.mp3"));
+    EXPECT_EQ(inventory->root, folder.path());
+    EXPECT_THAT(songsOf(*inventory, "List.m3u"), ElementsAre("one.mp3"));
 }
 
 TEST(ScanTest, PlaylistsOfEveryFormatListTheirSongsInOrder) {
@@ -111,12 +111,12 @@ TEST(ScanTest, PlaylistsOfEveryFormatListTheirSongsInOrder) {
     folder.write("d.xspf", xspfTracks("<track><location>two.ogg</location></track>"
                                       "<track><location>one.mp3</location></track>"));
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
     for (const char* const playlist : {"a.m3u", "b.M3U8", "c.pls", "d.xspf"}) {
-        EXPECT_THAT(songsOf(*snapshot, playlist), ElementsAre("two.ogg", "one.mp3")) << playlist;
+        EXPECT_THAT(songsOf(*inventory, playlist), ElementsAre("two.ogg", "one.mp3")) << playlist;
     }
-    EXPECT_THAT(snapshot->leftOut, IsEmpty());
+    EXPECT_THAT(inventory->leftOut, IsEmpty());
 }
 
 TEST(ScanTest, PlaylistsAtAnyDepthListSongsRelativeToThemselves) {
@@ -135,10 +135,10 @@ TEST(ScanTest, ASongThatIsListedTwiceIsThereTwice) {
     folder.writeSongs({"one.mp3", "two.mp3"});
     folder.write("List.m3u", "one.mp3\ntwo.mp3\none.mp3\n");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(songsOf(*snapshot, "List.m3u"), ElementsAre("one.mp3", "two.mp3", "one.mp3"));
-    EXPECT_EQ(snapshot->songs.size(), 2U);
+    EXPECT_THAT(songsOf(*inventory, "List.m3u"), ElementsAre("one.mp3", "two.mp3", "one.mp3"));
+    EXPECT_EQ(inventory->songs.size(), 2U);
 }
 
 TEST(ScanTest, SongsKnowTheirDirectoryNameSizeTimeAndKind) {
@@ -147,10 +147,10 @@ TEST(ScanTest, SongsKnowTheirDirectoryNameSizeTimeAndKind) {
     folder.setModified("Album/one.mp3", 1'600'000'000'123'456'789);
     folder.write("List.m3u", "Album/one.mp3");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    ASSERT_EQ(snapshot->songs.size(), 1U);
-    const Song song = snapshot->songs[0];
+    ASSERT_EQ(inventory->songs.size(), 1U);
+    const Song song = inventory->songs[0];
     EXPECT_EQ(song.directory, "Album");
     EXPECT_EQ(song.name, "one.mp3");
     EXPECT_EQ(song.path(), "Album/one.mp3");
@@ -179,10 +179,10 @@ TEST(ScanTest, PlaylistsInUtf8AreReadWithAndWithoutByteOrderMark) {
     folder.write("marked.xspf",
                  "\uFEFF" + xspfTracks("<track><location>Füße.mp3</location></track>"));
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
     for (const char* const playlist : {"plain.m3u", "marked.m3u", "marked.pls", "marked.xspf"}) {
-        EXPECT_THAT(songsOf(*snapshot, playlist), ElementsAre("Füße.mp3")) << playlist;
+        EXPECT_THAT(songsOf(*inventory, playlist), ElementsAre("Füße.mp3")) << playlist;
     }
 }
 
@@ -198,13 +198,13 @@ TEST(ScanTest, TextThatIsNotUtf8IsTakenAsLatin1) {
                            "e</title><trackList><track><location>F\xFC\xDF"
                            "e.mp3</location></track></trackList></playlist>");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
     for (const char* const playlist : {"a.m3u", "b.pls", "c.xspf"}) {
-        EXPECT_THAT(songsOf(*snapshot, playlist), ElementsAre("Füße.mp3")) << playlist;
+        EXPECT_THAT(songsOf(*inventory, playlist), ElementsAre("Füße.mp3")) << playlist;
     }
-    EXPECT_EQ(playlistAt(*snapshot, "a.m3u").name, "Füße");
-    EXPECT_EQ(playlistAt(*snapshot, "c.xspf").name, "Füße");
+    EXPECT_EQ(playlistAt(*inventory, "a.m3u").name, "Füße");
+    EXPECT_EQ(playlistAt(*inventory, "c.xspf").name, "Füße");
 }
 
 TEST(ScanTest, QuotationMarksThatWindowsWritesInLatin1AreUnderstood) {
@@ -243,12 +243,12 @@ TEST(ScanTest, LinesMayEndInAnyWayAndCommentsAndBlankLinesAreNoEntries) {
     folder.write("windows.pls", "[playlist]\r\nFile1=one.mp3\r\n; File3=three.mp3\r\n"
                                 "# File4=three.mp3\r\n File2 = two.mp3 \r\n");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
     for (const char* const playlist : {"windows.m3u", "classic.m3u", "blanks.m3u", "windows.pls"}) {
-        EXPECT_THAT(songsOf(*snapshot, playlist), ElementsAre("one.mp3", "two.mp3")) << playlist;
+        EXPECT_THAT(songsOf(*inventory, playlist), ElementsAre("one.mp3", "two.mp3")) << playlist;
     }
-    EXPECT_THAT(snapshot->leftOut, IsEmpty());
+    EXPECT_THAT(inventory->leftOut, IsEmpty());
 }
 
 TEST(ScanTest, EntriesOfAPlsFileAreInTheOrderOfTheirNumbers) {
@@ -270,11 +270,11 @@ TEST(ScanTest, BackslashesAreSeparatorsWhereNoFileHasThemInItsName) {
     folder.write("lists/b.m3u", "..\\Album\\one.mp3\n");
     folder.write("c.xspf", xspfTracks("<track><location>Album\\one.mp3</location></track>"));
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(songsOf(*snapshot, "a.m3u"), ElementsAre("Album/one.mp3", "back\\slash.mp3"));
-    EXPECT_THAT(songsOf(*snapshot, "lists/b.m3u"), ElementsAre("Album/one.mp3"));
-    EXPECT_THAT(songsOf(*snapshot, "c.xspf"), ElementsAre("Album/one.mp3"));
+    EXPECT_THAT(songsOf(*inventory, "a.m3u"), ElementsAre("Album/one.mp3", "back\\slash.mp3"));
+    EXPECT_THAT(songsOf(*inventory, "lists/b.m3u"), ElementsAre("Album/one.mp3"));
+    EXPECT_THAT(songsOf(*inventory, "c.xspf"), ElementsAre("Album/one.mp3"));
 }
 
 TEST(ScanTest, PercentEncodedEntriesAreDecodedWhereNoFileHasTheCodesInItsName) {
@@ -285,11 +285,11 @@ TEST(ScanTest, PercentEncodedEntriesAreDecodedWhereNoFileHasTheCodesInItsName) {
                                       "<track><location>My Album/one.mp3</location></track>"
                                       "<track><location>100%2525%20pure.mp3</location></track>"));
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(songsOf(*snapshot, "a.m3u"),
+    EXPECT_THAT(songsOf(*inventory, "a.m3u"),
                 ElementsAre("My Album/one.mp3", "100%25 pure.mp3", "50% off.mp3"));
-    EXPECT_THAT(songsOf(*snapshot, "b.xspf"),
+    EXPECT_THAT(songsOf(*inventory, "b.xspf"),
                 ElementsAre("My Album/one.mp3", "My Album/one.mp3", "100%25 pure.mp3"));
 }
 
@@ -354,10 +354,10 @@ TEST(ScanTest, XspfWithANamespacePrefixIsUnderstood) {
         <x:trackList><x:track><x:location><![CDATA[R&B.mp3]]></x:location></x:track>
         <x:track><x:location>R&amp;B.mp3</x:location></x:track></x:trackList></x:playlist>)");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(songsOf(*snapshot, "List.xspf"), ElementsAre("R&B.mp3", "R&B.mp3"));
-    EXPECT_EQ(playlistAt(*snapshot, "List.xspf").name, "Prefix");
+    EXPECT_THAT(songsOf(*inventory, "List.xspf"), ElementsAre("R&B.mp3", "R&B.mp3"));
+    EXPECT_EQ(playlistAt(*inventory, "List.xspf").name, "Prefix");
 }
 
 // Names, order and folders.
@@ -370,13 +370,13 @@ TEST(ScanTest, APlaylistHasTheNameThatItGivesItselfElseThatOfItsFile) {
     folder.write("d.m3u", "#PLAYLIST:\n");
     folder.write("broken \xFF name.m3u", "");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_EQ(playlistAt(*snapshot, "a.m3u").name, "Road Trip");
-    EXPECT_EQ(playlistAt(*snapshot, "b.xspf").name, "Quiet Evening");
-    EXPECT_EQ(playlistAt(*snapshot, "lists/Long Run.v2.pls").name, "Long Run.v2");
-    EXPECT_EQ(playlistAt(*snapshot, "d.m3u").name, "d");
-    EXPECT_EQ(playlistAt(*snapshot, "broken \xFF name.m3u").name, "broken \uFFFD name");
+    EXPECT_EQ(playlistAt(*inventory, "a.m3u").name, "Road Trip");
+    EXPECT_EQ(playlistAt(*inventory, "b.xspf").name, "Quiet Evening");
+    EXPECT_EQ(playlistAt(*inventory, "lists/Long Run.v2.pls").name, "Long Run.v2");
+    EXPECT_EQ(playlistAt(*inventory, "d.m3u").name, "d");
+    EXPECT_EQ(playlistAt(*inventory, "broken \xFF name.m3u").name, "broken \uFFFD name");
 }
 
 TEST(ScanTest, ANameTooLongToBeOneIsIgnored) {
@@ -409,10 +409,10 @@ TEST(ScanTest, PlaylistsOfTheSameNameAreInTheOrderOfTheirPaths) {
         folder.write(file, "#PLAYLIST:Same\n");
     }
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
     std::vector<std::string> paths;
-    for (const Playlist& playlist : snapshot->playlists) {
+    for (const Playlist& playlist : inventory->playlists) {
         paths.push_back(playlist.path);
     }
     EXPECT_THAT(paths, ElementsAre("b", "a.m3u", "b/x.m3u", "c.m3u"));
@@ -426,16 +426,16 @@ TEST(ScanTest, ADirectoryThatHoldsPlaylistsIsAFolderWithTheirSongsInTheirOrder) 
     folder.write("Workout/Inner/Deep.m3u", "../../two.mp3\n");
     folder.write("Top.m3u", "one.mp3\n");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(namesOf(*snapshot), ElementsAre("Abc", "Deep", "Inner", "Top", "Workout", "Xyz"));
-    const Playlist& workout = playlistAt(*snapshot, "Workout");
+    EXPECT_THAT(namesOf(*inventory), ElementsAre("Abc", "Deep", "Inner", "Top", "Workout", "Xyz"));
+    const Playlist& workout = playlistAt(*inventory, "Workout");
     EXPECT_TRUE(workout.folder);
     EXPECT_EQ(workout.generated, Generated::No);
-    EXPECT_THAT(songsOf(*snapshot, "Workout"),
+    EXPECT_THAT(songsOf(*inventory, "Workout"),
                 ElementsAre("three.mp3", "one.mp3", "one.mp3", "two.mp3"));
-    EXPECT_TRUE(playlistAt(*snapshot, "Workout/Inner").folder);
-    EXPECT_FALSE(playlistAt(*snapshot, "Top.m3u").folder);
+    EXPECT_TRUE(playlistAt(*inventory, "Workout/Inner").folder);
+    EXPECT_FALSE(playlistAt(*inventory, "Top.m3u").folder);
 }
 
 TEST(ScanTest, ADirectoryOfDirectoriesOrOfBrokenPlaylistsIsNoFolder) {
@@ -495,14 +495,14 @@ TEST(ScanTest, SongsAreToldByTheirContentType) {
     folder.writeSongs({"a.mp3", "b.FLAC", "c.opus", "d.m4a", "e.ogg", "f.mp4", "g.mkv", "h.webm"});
     folder.write("List.m3u", "a.mp3\nb.FLAC\nc.opus\nd.m4a\ne.ogg\nf.mp4\ng.mkv\nh.webm\n");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    ASSERT_EQ(snapshot->songs.size(), 8U);
+    ASSERT_EQ(inventory->songs.size(), 8U);
     for (SongIndex song = 0; song < 5; ++song) {
-        EXPECT_EQ(snapshot->songs[song].kind, Kind::Audio) << snapshot->songs[song].name;
+        EXPECT_EQ(inventory->songs[song].kind, Kind::Audio) << inventory->songs[song].name;
     }
     for (SongIndex song = 5; song < 8; ++song) {
-        EXPECT_EQ(snapshot->songs[song].kind, Kind::MusicVideo) << snapshot->songs[song].name;
+        EXPECT_EQ(inventory->songs[song].kind, Kind::MusicVideo) << inventory->songs[song].name;
     }
 }
 
@@ -514,10 +514,10 @@ TEST(ScanTest, FirstBytesTellWhereTheNameDoesNot) {
     folder.write("named.txt", "fLaC" + std::string(100, '\0'));
     folder.write("List.m3u", "song\nArtist. Song no. 5\nnotes\nnamed.txt\n");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(songsOf(*snapshot, "List.m3u"), ElementsAre("song", "Artist. Song no. 5"));
-    EXPECT_TRUE(snapshot->hasAudio);
+    EXPECT_THAT(songsOf(*inventory, "List.m3u"), ElementsAre("song", "Artist. Song no. 5"));
+    EXPECT_TRUE(inventory->hasAudio);
 }
 
 TEST(ScanTest, AudioAndVideoAreNoticedAlsoInNoPlaylist) {
@@ -540,10 +540,10 @@ TEST(ScanTest, PlaylistsAndTextsAreNoAudio) {
     }
     folder.write("e.xspf", xspf(""));
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_FALSE(snapshot->hasAudio);
-    EXPECT_FALSE(snapshot->hasMusicVideo);
+    EXPECT_FALSE(inventory->hasAudio);
+    EXPECT_FALSE(inventory->hasMusicVideo);
 }
 
 TEST(ScanTest, HiddenFilesAndDirectoriesAreSkipped) {
@@ -552,11 +552,11 @@ TEST(ScanTest, HiddenFilesAndDirectoriesAreSkipped) {
     folder.write(".hidden.m3u", "");
     folder.write(".trash/List.m3u", "one.mp3");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(snapshot->playlists, IsEmpty());
-    EXPECT_THAT(snapshot->leftOut, IsEmpty());
-    EXPECT_FALSE(snapshot->hasAudio);
+    EXPECT_THAT(inventory->playlists, IsEmpty());
+    EXPECT_THAT(inventory->leftOut, IsEmpty());
+    EXPECT_FALSE(inventory->hasAudio);
 }
 
 TEST(ScanTest, LinkedDirectoriesAreNotWalked) {
@@ -577,11 +577,11 @@ TEST(ScanTest, LinksToFilesInTheFolderAreSongsAndPlaylists) {
     folder.link("linked.m3u", folder / "lists/real.m3u");
     folder.link("again", "Album");
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(songsOf(*snapshot, "linked.m3u"),
+    EXPECT_THAT(songsOf(*inventory, "linked.m3u"),
                 ElementsAre("favourite.mp3", "Album/one.mp3", "Album/one.mp3"));
-    EXPECT_EQ(snapshot->songs[0].size, 77U);
+    EXPECT_EQ(inventory->songs[0].size, 77U);
 }
 
 TEST(ScanTest, FoldersDeeperThanAPathCanSayDoNoHarm) {
@@ -597,11 +597,11 @@ TEST(ScanTest, FoldersDeeperThanAPathCanSayDoNoHarm) {
     }
     std::filesystem::current_path(before);
 
-    const auto snapshot = scan(folder.path());
+    const auto inventory = scan(folder.path());
 
-    EXPECT_THAT(songsOf(*snapshot, "List.m3u"), ElementsAre("one.mp3"));
-    ASSERT_EQ(snapshot->leftOut.size(), 1U);
-    EXPECT_EQ(snapshot->leftOut[0].reason, Reason::DirectoryUnreadable);
+    EXPECT_THAT(songsOf(*inventory, "List.m3u"), ElementsAre("one.mp3"));
+    ASSERT_EQ(inventory->leftOut.size(), 1U);
+    EXPECT_EQ(inventory->leftOut[0].reason, Reason::DirectoryUnreadable);
 }
 
 } // namespace quorl::media::test

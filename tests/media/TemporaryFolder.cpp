@@ -112,8 +112,8 @@ void withPrivileges(const std::function<void()>& act) {
     }).join();
 }
 
-const Playlist& playlistAt(const Snapshot& snapshot, std::string_view path) {
-    for (const Playlist& playlist : snapshot.playlists) {
+const Playlist& playlistAt(const Inventory& inventory, std::string_view path) {
+    for (const Playlist& playlist : inventory.playlists) {
         if (playlist.path == path) {
             return playlist;
         }
@@ -121,25 +121,25 @@ const Playlist& playlistAt(const Snapshot& snapshot, std::string_view path) {
     throw std::runtime_error("There is no playlist " + std::string(path) + ".");
 }
 
-std::vector<std::string> songsOf(const Snapshot& snapshot, std::string_view path) {
+std::vector<std::string> songsOf(const Inventory& inventory, std::string_view path) {
     std::vector<std::string> songs;
-    for (const SongIndex song : playlistAt(snapshot, path).songs) {
-        songs.push_back(snapshot.songs[song].path());
+    for (const SongIndex song : playlistAt(inventory, path).songs) {
+        songs.push_back(inventory.songs[song].path());
     }
     return songs;
 }
 
-std::vector<std::string> namesOf(const Snapshot& snapshot) {
+std::vector<std::string> namesOf(const Inventory& inventory) {
     std::vector<std::string> names;
-    for (const Playlist& playlist : snapshot.playlists) {
+    for (const Playlist& playlist : inventory.playlists) {
         names.push_back(playlist.name);
     }
     return names;
 }
 
-std::vector<Reason> reasonsFor(const Snapshot& snapshot, std::string_view path) {
+std::vector<Reason> reasonsFor(const Inventory& inventory, std::string_view path) {
     std::vector<Reason> reasons;
-    for (const LeftOut& leftOut : snapshot.leftOut) {
+    for (const LeftOut& leftOut : inventory.leftOut) {
         if (leftOut.playlist == path) {
             reasons.push_back(leftOut.reason);
         }

@@ -8,7 +8,7 @@
 #include <string_view>
 #include <vector>
 
-#include "services/media/Snapshot.h"
+#include "services/media/Inventory.h"
 
 namespace quorl::media::test {
 
@@ -67,15 +67,15 @@ class WithoutPrivileges {
 void withPrivileges(const std::function<void()>& act);
 
 /// The playlist, or folder, of this path; throws where there is none.
-[[nodiscard]] const Playlist& playlistAt(const Snapshot& snapshot, std::string_view path);
+[[nodiscard]] const Playlist& playlistAt(const Inventory& inventory, std::string_view path);
 
 /// The paths of the songs in the playlist of this path.
-[[nodiscard]] std::vector<std::string> songsOf(const Snapshot& snapshot, std::string_view path);
+[[nodiscard]] std::vector<std::string> songsOf(const Inventory& inventory, std::string_view path);
 
 /// The names of all playlists, in order.
-[[nodiscard]] std::vector<std::string> namesOf(const Snapshot& snapshot);
+[[nodiscard]] std::vector<std::string> namesOf(const Inventory& inventory);
 
 /// The reasons for which entries of the playlist of this path are left out, in order.
-[[nodiscard]] std::vector<Reason> reasonsFor(const Snapshot& snapshot, std::string_view path);
+[[nodiscard]] std::vector<Reason> reasonsFor(const Inventory& inventory, std::string_view path);
 
 } // namespace quorl::media::test

@@ -28,18 +28,18 @@ std::size_t lengthOfEventQueue() {
 
 } // namespace
 
-TEST(WatchTest, TheFirstSnapshotIsToldAndThenThere) {
+TEST(WatchTest, TheFirstInventoryIsToldAndThenThere) {
     const TemporaryFolder folder;
     folder.writeSongs({"one.mp3"});
     folder.write("List.m3u", "one.mp3\n");
-    std::promise<std::shared_ptr<const Snapshot>> told;
+    std::promise<std::shared_ptr<const Inventory>> told;
 
     const MusicFolder music(folder.path(),
-                            [&](auto snapshot) { told.set_value(std::move(snapshot)); });
+                            [&](auto inventory) { told.set_value(std::move(inventory)); });
     const auto first = told.get_future().get();
 
     EXPECT_THAT(songsOf(*first, "List.m3u"), ElementsAre("one.mp3"));
-    EXPECT_EQ(music.snapshot(), first);
+    EXPECT_EQ(music.inventory(), first);
     EXPECT_EQ(*first, *scan(folder.path()));
 }
 
@@ -52,7 +52,7 @@ TEST(WatchTest, NobodyNeedsToListen) {
     music.rescan([&] { done.set_value(); });
     done.get_future().wait();
 
-    EXPECT_EQ(namesOf(*music.snapshot()), std::vector<std::string>{"List"});
+    EXPECT_EQ(namesOf(*music.inventory()), std::vector<std::string>{"List"});
 }
 
 // Songs.
@@ -64,10 +64,10 @@ TEST(WatchTest, AMissingSongThatIsAddedIsListed) {
 
     folder.writeSongs({"Album/one.mp3"}, 12);
 
-    const auto snapshot = watched.waitFor(
-        [](const Snapshot& each) { return each.songs.size() == 1 && each.songs[0].size == 12; });
-    EXPECT_TRUE(snapshot->hasAudio);
-    EXPECT_TRUE(snapshot->leftOut.empty());
+    const auto inventory = watched.waitFor(
+        [](const Inventory& each) { return each.songs.size() == 1 && each.songs[0].size == 12; });
+    EXPECT_TRUE(inventory->hasAudio);
+    EXPECT_TRUE(inventory->leftOut.empty());
 }
 
 TEST(WatchTest, ASongThatIsRemovedIsLeftOut) {
@@ -78,9 +78,9 @@ TEST(WatchTest, ASongThatIsRemovedIsLeftOut) {
 
     folder.remove("Album/one.mp3");
 
-    const auto snapshot = watched.waitForSongs("List.m3u", 0);
-    EXPECT_FALSE(snapshot->hasAudio);
-    EXPECT_THAT(snapshot->leftOut,
+    const auto inventory = watched.waitForSongs("List.m3u", 0);
+    EXPECT_FALSE(inventory->hasAudio);
+    EXPECT_THAT(inventory->leftOut,
                 ElementsAre(LeftOut{"List.m3u", "Album/one.mp3", Reason::Missing}));
 }
 
@@ -94,7 +94,7 @@ TEST(WatchTest, ASongThatGrowsHasItsNewSizeAndThePlaylistANewRevision) {
     folder.writeSongs({"Album/one.mp3"}, 20);
 
     const auto after =
-        watched.waitFor([](const Snapshot& each) { return each.songs[0].size == 20; });
+        watched.waitFor([](const Inventory& each) { return each.songs[0].size == 20; });
     EXPECT_NE(after->playlists[0].revision, before->playlists[0].revision);
     EXPECT_EQ(after->playlists[0].id, before->playlists[0].id);
 }
@@ -108,7 +108,7 @@ TEST(WatchTest, ASongThatGetsAnotherTimeHasIt) {
     folder.setModified("one.mp3", 1'600'000'000'000'000'001);
 
     watched.waitFor(
-        [](const Snapshot& each) { return each.songs[0].modified == 1'600'000'000'000'000'001; });
+        [](const Inventory& each) { return each.songs[0].modified == 1'600'000'000'000'000'001; });
 }
 
 TEST(WatchTest, ASongThatIsRenamedIsFoundUnderItsNewName) {
@@ -132,7 +132,7 @@ TEST(WatchTest, WhatALinkLeadsToIsLookedAtWithEveryChange) {
 
     folder.writeSongs({"Album/one.mp3"}, 20);
 
-    watched.waitFor([](const Snapshot& each) { return each.songs[0].size == 20; });
+    watched.waitFor([](const Inventory& each) { return each.songs[0].size == 20; });
 }
 
 // Playlists.
@@ -149,7 +149,7 @@ TEST(WatchTest, APlaylistThatIsAddedRenamedAndRemovedComesMovesAndGoes) {
     EXPECT_THAT(namesOf(*watched.waitForSongs("Renamed.m3u", 1)), ElementsAre("Renamed"));
 
     folder.remove("Renamed.m3u");
-    watched.waitFor([](const Snapshot& each) { return each.playlists.empty(); });
+    watched.waitFor([](const Inventory& each) { return each.playlists.empty(); });
 }
 
 TEST(WatchTest, APlaylistThatIsEditedInPlaceListsTheNewSongs) {
@@ -182,7 +182,7 @@ TEST(WatchTest, EditsInQuickSuccessionThatLeaveTheSizeAreAllSeen) {
 
     for (const char* const song : {"two.mp3", "one.mp3", "two.mp3", "one.mp3", "two.mp3"}) {
         folder.write("List.m3u", std::string(song) + "\n");
-        watched.waitFor([&](const Snapshot& each) {
+        watched.waitFor([&](const Inventory& each) {
             return each.songs.size() == 1 && each.songs[0].name == song;
         });
     }
@@ -203,7 +203,7 @@ TEST(WatchTest, APlaylistThatWasNotWrittenLatelyIsReadAgainAfterAnEdit) {
     folder.write("List.m3u", "two.mp3\n");
     folder.setModified("List.m3u", 1'600'000'000'000'000'000);
 
-    watched.waitFor([](const Snapshot& each) {
+    watched.waitFor([](const Inventory& each) {
         return songsOf(each, "List.m3u") == std::vector<std::string>{"two.mp3"};
     });
 }
@@ -215,7 +215,7 @@ TEST(WatchTest, APlaylistIsReadOnceItMayBe) {
     folder.setPermissions("List.m3u", std::filesystem::perms::none);
     const WithoutPrivileges ordinary;
     WatchedFolder watched(folder.path());
-    EXPECT_THAT(watched.waitFor([](const Snapshot&) { return true; })->leftOut,
+    EXPECT_THAT(watched.waitFor([](const Inventory&) { return true; })->leftOut,
                 ElementsAre(LeftOut{"List.m3u", "", Reason::PlaylistUnreadable}));
 
     withPrivileges([&] { folder.setPermissions("List.m3u", std::filesystem::perms(0644)); });
@@ -252,7 +252,7 @@ TEST(WatchTest, ADirectoryThatIsMovedInIsReadAndWatchedAndOneMovedOutIsForgotten
     watched.waitForSongs("inside/inner/List.m3u", 2);
 
     folder.rename("Music/inside", "outside");
-    watched.waitFor([](const Snapshot& each) { return each.playlists.empty(); });
+    watched.waitFor([](const Inventory& each) { return each.playlists.empty(); });
 
     const std::size_t calls = watched.calls();
     folder.write("outside/inner/List.m3u", "");
@@ -337,7 +337,7 @@ TEST(WatchTest, AFolderThatIsDeletedIsEmptyAndFoundAgainWhenItIsMade) {
     WatchedFolder watched(folder / "Music");
 
     folder.remove("Music");
-    const auto gone = watched.waitFor([](const Snapshot& each) { return !each.rootFound; });
+    const auto gone = watched.waitFor([](const Inventory& each) { return !each.rootFound; });
     EXPECT_TRUE(gone->playlists.empty());
     EXPECT_EQ(gone->songs.size(), 0U);
     EXPECT_FALSE(gone->hasAudio);
@@ -353,7 +353,7 @@ TEST(WatchTest, AFolderThatIsDeletedIsEmptyAndFoundAgainWhenItIsMade) {
 TEST(WatchTest, AFolderIsFoundWhenItAndTheDirectoriesAboveItAreMadeLater) {
     const TemporaryFolder folder;
     WatchedFolder watched(folder / "home/user/Music");
-    EXPECT_FALSE(watched.waitFor([](const Snapshot&) { return true; })->rootFound);
+    EXPECT_FALSE(watched.waitFor([](const Inventory&) { return true; })->rootFound);
 
     folder.makeDirectory("home");
     folder.writeSongs({"home/user/Music/one.mp3"});
@@ -369,13 +369,13 @@ TEST(WatchTest, AFolderThatIsMovedAwayWithADirectoryAboveItIsEmptyUntilItIsBack)
     WatchedFolder watched(folder / "home/user/Music");
 
     folder.rename("home", "away");
-    watched.waitFor([](const Snapshot& each) { return !each.rootFound; });
+    watched.waitFor([](const Inventory& each) { return !each.rootFound; });
 
     folder.rename("away", "home");
     watched.waitForSongs("List.m3u", 1);
 
     folder.rename("home/user", "home/other");
-    watched.waitFor([](const Snapshot& each) { return !each.rootFound; });
+    watched.waitFor([](const Inventory& each) { return !each.rootFound; });
 }
 
 TEST(WatchTest, AFolderThatIsReplacedByAnotherIsReadAndWatched) {
@@ -391,7 +391,7 @@ TEST(WatchTest, AFolderThatIsReplacedByAnotherIsReadAndWatched) {
     folder.rename("other", "Music");
     watched.release();
     watched.waitFor(
-        [](const Snapshot& each) { return namesOf(each) == std::vector<std::string>{"New"}; });
+        [](const Inventory& each) { return namesOf(each) == std::vector<std::string>{"New"}; });
 
     folder.write("Music/Newer.m3u", "");
     watched.waitForSongs("Newer.m3u", 0);
@@ -510,7 +510,7 @@ TEST(WatchTest, AFolderCanBeDestroyedAtAnyMomentOfItsFirstScan) {
             const MusicFolder music(folder.path(),
                                     [&](const auto&) { lateCalls += destroyed ? 1 : 0; });
             for (int turn = 0; turn < moment * 100; ++turn) {
-                static_cast<void>(music.snapshot());
+                static_cast<void>(music.inventory());
             }
         }
         destroyed = true;

@@ -18,20 +18,20 @@ constexpr std::chrono::seconds patience{60};
 
 WatchedFolder::WatchedFolder(const std::filesystem::path& root)
     : folder_(root,
-              [this](std::shared_ptr<const Snapshot> snapshot) { take(std::move(snapshot)); }) {
-    waitFor([](const Snapshot&) { return true; });
+              [this](std::shared_ptr<const Inventory> inventory) { take(std::move(inventory)); }) {
+    waitFor([](const Inventory&) { return true; });
 }
 
-std::shared_ptr<const Snapshot> WatchedFolder::waitFor(const Predicate& predicate) {
+std::shared_ptr<const Inventory> WatchedFolder::waitFor(const Predicate& predicate) {
     std::unique_lock lock(mutex_);
     waitUntil(lock, [&] { return last_ && predicate(*last_); });
     return last_;
 }
 
-std::shared_ptr<const Snapshot> WatchedFolder::waitForSongs(std::string_view playlist,
-                                                            std::size_t count) {
-    return waitFor([&](const Snapshot& snapshot) {
-        return std::ranges::any_of(snapshot.playlists, [&](const Playlist& candidate) {
+std::shared_ptr<const Inventory> WatchedFolder::waitForSongs(std::string_view playlist,
+                                                             std::size_t count) {
+    return waitFor([&](const Inventory& inventory) {
+        return std::ranges::any_of(inventory.playlists, [&](const Playlist& candidate) {
             return candidate.path == playlist && candidate.songs.size() == count;
         });
     });
@@ -69,9 +69,9 @@ void WatchedFolder::release() {
     changed_.notify_all();
 }
 
-void WatchedFolder::take(std::shared_ptr<const Snapshot> snapshot) {
+void WatchedFolder::take(std::shared_ptr<const Inventory> inventory) {
     std::unique_lock lock(mutex_);
-    last_ = std::move(snapshot);
+    last_ = std::move(inventory);
     ++calls_;
     held_ = hold_;
     changed_.notify_all();

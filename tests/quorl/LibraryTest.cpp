@@ -1,9 +1,8 @@
-#include "quorl/adapters/Library.h"
-
 #include <QTest>
 
 #include <gmock/gmock.h>
 
+#include "quorl/adapters/MusicLibrary.h"
 #include "quorl/app/MainQueueNotifier.h"
 #include "tests/quorl/Music.h"
 
@@ -16,7 +15,7 @@ using testing::ElementsAre;
 class TheLibrary : public testing::Test {
   protected:
     TheLibrary() {
-        library_->open(music_.path(), [this](const media::Snapshot& /*snapshot*/) { ++taken_; });
+        library_->open(music_.path(), [this](const media::Inventory& /*inventory*/) { ++taken_; });
         waitFor([this] { return taken_ > 0; });
     }
 
@@ -43,7 +42,7 @@ class TheLibrary : public testing::Test {
     Music music_;
     MainQueueNotifier mainQueue_;
     int taken_ = 0;
-    std::shared_ptr<Library> library_ = ::create<Library>();
+    std::shared_ptr<MusicLibrary> library_ = ::create<MusicLibrary>();
 };
 
 std::uint64_t number(const MPMediaEntity& entity, MPMediaProperty property) {

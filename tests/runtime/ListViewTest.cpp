@@ -1,10 +1,12 @@
+#include "runtime/lists/ListView.h"
+
 #include <gmock/gmock.h>
 
-#include "runtime/lists/PSListView.h"
 #include "tests/support/TestHost.h"
 
 namespace {
 
+using quorl::ListView;
 using quorl::tests::TestHost;
 using testing::ElementsAre;
 using testing::IsEmpty;
@@ -50,12 +52,12 @@ class Lists : public testing::Test {
         draw();
     }
 
-    void draw() { list_->listView().draw(); }
+    void draw() { ListView::of(*list_).draw(); }
 
     /// The values on the screen, from top to bottom.
     [[nodiscard]] std::vector<std::string> values() const {
         std::vector<std::string> texts;
-        for (const auto& shown : list_->listView().rows()) {
+        for (const auto& shown : ListView::of(*list_).rows()) {
             texts.push_back(shown.value.value_or("null"));
         }
         return texts;
@@ -71,7 +73,7 @@ TEST_F(Lists, AreNotDrawnBeforeTheyWereShown) {
     list_->viewWillAppear(false);
     draw();
 
-    EXPECT_THAT(list_->listView().rows(), IsEmpty());
+    EXPECT_THAT(ListView::of(*list_).rows(), IsEmpty());
     EXPECT_EQ(list_->asked, 0);
 }
 
@@ -80,9 +82,9 @@ TEST_F(Lists, ShowEachRowWithItsValueAndFooter) {
     show();
 
     ASSERT_THAT(values(), ElementsAre("null", "value 1"));
-    EXPECT_EQ(list_->listView().rows()[0].footer, "below");
-    EXPECT_EQ(list_->listView().rows()[1].footer, std::nullopt);
-    EXPECT_EQ(list_->listView().rows()[1].specifier, list_->row);
+    EXPECT_EQ(ListView::of(*list_).rows()[0].footer, "below");
+    EXPECT_EQ(ListView::of(*list_).rows()[1].footer, std::nullopt);
+    EXPECT_EQ(ListView::of(*list_).rows()[1].specifier, list_->row);
     EXPECT_EQ(list_->askedFor, list_->row);
 }
 
@@ -102,11 +104,11 @@ TEST_F(Lists, ShowANewFooterOnlyOnceTheyAreReloadedAndDrawn) {
 
     list_->group->setProperty_forKey("new", PSFooterTextGroupKey);
     draw();
-    EXPECT_EQ(list_->listView().rows()[0].footer, std::nullopt);
+    EXPECT_EQ(ListView::of(*list_).rows()[0].footer, std::nullopt);
 
     list_->reload();
     draw();
-    EXPECT_EQ(list_->listView().rows()[0].footer, "new");
+    EXPECT_EQ(ListView::of(*list_).rows()[0].footer, "new");
 }
 
 TEST_F(Lists, TakeTheValueOfAReloadedRowAtOnce) {
@@ -123,7 +125,7 @@ TEST_F(Lists, AskForTheValueOfAReloadedRowAlsoWhileTheyAreHidden) {
     list_->reloadSpecifier(list_->row);
 
     EXPECT_EQ(list_->asked, 1);
-    EXPECT_THAT(list_->listView().rows(), IsEmpty());
+    EXPECT_THAT(ListView::of(*list_).rows(), IsEmpty());
 }
 
 TEST_F(Lists, AreDrawnWhileAnotherPaneCoversThem) {

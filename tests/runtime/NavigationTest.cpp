@@ -1,7 +1,7 @@
 #include <gmock/gmock.h>
 
+#include "runtime/lists/ListView.h"
 #include "runtime/lists/NavigationController.h"
-#include "runtime/lists/PSListView.h"
 #include "tests/support/TestHost.h"
 
 namespace {

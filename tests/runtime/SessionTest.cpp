@@ -1,11 +1,10 @@
-#include "runtime/services/Session.h"
-
 #include <atomic>
 #include <latch>
 #include <thread>
 
 #include <gmock/gmock.h>
 
+#include "runtime/services/ObservedSession.h"
 #include "tests/support/TestSessions.h"
 
 namespace {
@@ -119,7 +118,7 @@ TEST_F(Sessions, TellFromManyThreadsWhileObserversComeAndGo) {
     const auto task = session_->addAssetTask({});
     const auto constant = std::make_shared<Counter>();
     std::latch start(threads + 1);
-    session_->quorl::Session::addObserver(constant);
+    session_->quorl::ObservedSession::addObserver(constant);
 
     {
         std::vector<std::jthread> tellers;
@@ -136,8 +135,8 @@ TEST_F(Sessions, TellFromManyThreadsWhileObserversComeAndGo) {
         start.arrive_and_wait();
         for (int visit = 0; visit < updates; ++visit) {
             const auto visitor = std::make_shared<Counter>();
-            session_->quorl::Session::addObserver(visitor);
-            session_->quorl::Session::removeObserver(visitor);
+            session_->quorl::ObservedSession::addObserver(visitor);
+            session_->quorl::ObservedSession::removeObserver(visitor);
         }
     }
 

@@ -2,18 +2,18 @@
 
 #include <algorithm>
 
-#include "runtime/lists/PSListView.h"
+#include "runtime/lists/ListView.h"
 #include "sync/LMQuorlSyncManager.h"
 
 namespace quorl::tests {
 
 namespace {
 
-PSListView::Row rowOf(const NavigationController& navigation, const std::string& title) {
+ListView::Row rowOf(const NavigationController& navigation, const std::string& title) {
     auto& list = dynamic_cast<PSListController&>(*navigation.top());
     draw(list);
-    const auto& rows = list.listView().rows();
-    const auto found = std::find_if(rows.begin(), rows.end(), [&title](const PSListView::Row& row) {
+    const auto& rows = ListView::of(list).rows();
+    const auto found = std::find_if(rows.begin(), rows.end(), [&title](const ListView::Row& row) {
         return row.specifier->name() == title;
     });
     if (found == rows.end()) {

@@ -2,7 +2,7 @@
 
 #include <gmock/gmock.h>
 
-#include "runtime/lists/PSListView.h"
+#include "runtime/lists/ListView.h"
 #include "settings/LMQuorlLimitChooser.h"
 #include "settings/LMQuorlPlaylistChooser.h"
 #include "settings/LMSyncLimitType.h"

@@ -60,7 +60,7 @@ NSArray<DVSession> TestHost::sessions(const std::string& type) {
     return std::make_shared<const std::vector<std::shared_ptr<DVSession>>>(sessions_);
 }
 
-std::unique_ptr<LSSClient> TestHost::connectToWearable(dispatch_queue_t /*queue*/) {
+std::shared_ptr<WearableConnection> TestHost::connectToWearable(dispatch_queue_t /*queue*/) {
     return wearable.connect();
 }
 

@@ -71,7 +71,8 @@ class TestHost final : public Host {
     [[nodiscard]] TestLibrary& mediaLibrary() override { return *library_; }
 
     [[nodiscard]] NSArray<DVSession> sessions(const std::string& type) override;
-    [[nodiscard]] std::unique_ptr<LSSClient> connectToWearable(dispatch_queue_t queue) override;
+    [[nodiscard]] std::shared_ptr<WearableConnection>
+    connectToWearable(dispatch_queue_t queue) override;
 
     [[nodiscard]] TestScreen& screen() override { return screen_; }
 

@@ -50,12 +50,12 @@ bool TestLibrary::hasMediaOfType(NSUInteger mask) const {
 
 void TestLibrary::beginGeneratingLibraryChangeNotifications() {
     journal_.note("library begin");
-    MediaLibrary::beginGeneratingLibraryChangeNotifications();
+    AnnouncingLibrary::beginGeneratingLibraryChangeNotifications();
 }
 
 void TestLibrary::endGeneratingLibraryChangeNotifications() {
     journal_.note("library end");
-    MediaLibrary::endGeneratingLibraryChangeNotifications();
+    AnnouncingLibrary::endGeneratingLibraryChangeNotifications();
 }
 
 NSArray<MPMediaPlaylist> TestLibrary::playlistsMatching(const Predicates& predicates) const {

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "runtime/services/MediaLibrary.h"
+#include "runtime/services/AnnouncingLibrary.h"
 #include "tests/support/Journal.h"
 
 namespace quorl::tests {
@@ -59,7 +59,7 @@ class TestPlaylist final : public TestEntity<MPMediaPlaylist> {
 
 /// A library in memory, with a line for each call: "library hasMediaOfType MASK", "library begin",
 /// "library end", and "query NAME=VALUE ..." with the predicates in their order.
-class TestLibrary final : public MediaLibrary {
+class TestLibrary final : public AnnouncingLibrary {
   public:
     explicit TestLibrary(Journal& journal) : journal_(journal) {}
 

@@ -20,12 +20,12 @@ std::shared_ptr<TestTask> TestSession::addOtherTask(TestTask::Figures figures) {
 
 void TestSession::addObserver(const std::shared_ptr<DVSessionObserver>& observer) {
     journal_.note("session " + name_ + " add");
-    Session::addObserver(observer);
+    ObservedSession::addObserver(observer);
 }
 
 void TestSession::removeObserver(const std::shared_ptr<DVSessionObserver>& observer) {
     journal_.note("session " + name_ + " remove");
-    Session::removeObserver(observer);
+    ObservedSession::removeObserver(observer);
 }
 
 NSArray<DVSessionTask> TestSession::sessionTasks() const {

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "runtime/services/Session.h"
+#include "runtime/services/ObservedSession.h"
 #include "tests/support/Journal.h"
 
 namespace quorl::tests {
@@ -37,7 +37,7 @@ class TestTask final : public DVSessionTask {
 
 /// A session whose tasks and callbacks the test sets off, with a line "session NAME add" or
 /// "session NAME remove" for each observer that comes and goes.
-class TestSession final : public Session {
+class TestSession final : public ObservedSession {
   public:
     TestSession(std::string name, Journal& journal) : name_(std::move(name)), journal_(journal) {}
 

@@ -2,7 +2,7 @@
 
 namespace quorl::tests {
 
-class TestWearable::Connection final : public LSSClient {
+class TestWearable::Connection final : public WearableConnection {
   public:
     explicit Connection(TestWearable& wearable) : wearable_(wearable) {}
 
@@ -15,9 +15,9 @@ class TestWearable::Connection final : public LSSClient {
     TestWearable& wearable_;
 };
 
-std::unique_ptr<LSSClient> TestWearable::connect() {
+std::shared_ptr<WearableConnection> TestWearable::connect() {
     journal_.note("wearable connect");
-    return std::make_unique<Connection>(*this);
+    return std::make_shared<Connection>(*this);
 }
 
 LSSManager::UsageHandler TestWearable::takeQuestion() {

@@ -2,7 +2,7 @@
 
 #include <deque>
 
-#include "runtime/services/LSSClient.h"
+#include "runtime/services/WearableConnection.h"
 #include "tests/support/Journal.h"
 
 namespace quorl::tests {
@@ -15,7 +15,7 @@ class TestWearable {
 
     explicit TestWearable(Journal& journal) : journal_(journal) {}
 
-    [[nodiscard]] std::unique_ptr<LSSClient> connect();
+    [[nodiscard]] std::shared_ptr<WearableConnection> connect();
 
     /// The questions that have no reply yet.
     [[nodiscard]] std::size_t openQuestions() const { return questions_.size(); }

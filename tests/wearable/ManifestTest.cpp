@@ -27,7 +27,7 @@ Manifest everything() {
 
 TEST(Manifest, GivesBackWhatWasWritten) {
     const TemporaryDirectory device;
-    const auto root = openRoot(device.path().c_str());
+    const auto root = quorl::base::openRoot(device.path().c_str());
 
     saveManifest(root.get(), everything());
 
@@ -37,7 +37,7 @@ TEST(Manifest, GivesBackWhatWasWritten) {
 TEST(Manifest, IsEmptyOnAWearableThatWasNeverSynced) {
     const TemporaryDirectory device;
 
-    EXPECT_EQ(loadManifest(openRoot(device.path().c_str()).get()), Manifest{});
+    EXPECT_EQ(loadManifest(quorl::base::openRoot(device.path().c_str()).get()), Manifest{});
 }
 
 class HostileManifest : public ::testing::TestWithParam<std::string> {};
@@ -69,7 +69,7 @@ TEST(Manifest, IsNotWrittenThroughALinkThatLeadsOffTheWearable) {
     const TemporaryDirectory elsewhere;
     std::filesystem::create_directory_symlink(elsewhere.path(), device.path() / ".quorl");
 
-    EXPECT_THROW(saveManifest(openRoot(device.path().c_str()).get(), everything()),
+    EXPECT_THROW(saveManifest(quorl::base::openRoot(device.path().c_str()).get(), everything()),
                  std::system_error);
 
     EXPECT_TRUE(std::filesystem::is_empty(elsewhere.path()));
@@ -77,7 +77,7 @@ TEST(Manifest, IsNotWrittenThroughALinkThatLeadsOffTheWearable) {
 
 TEST(Attachment, IsConnectedAndOnTheChargerUntilTheUserSaysOtherwise) {
     const TemporaryDirectory device;
-    const auto root = openRoot(device.path().c_str());
+    const auto root = quorl::base::openRoot(device.path().c_str());
     EXPECT_EQ(loadAttachment(root.get()), (Attachment{true, true}));
 
     saveAttachment(root.get(), {true, false});

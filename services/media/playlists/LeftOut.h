@@ -6,7 +6,7 @@
 
 namespace quorl::media {
 
-/// Why something that a music folder names or holds is in no playlist of its snapshot.
+/// Why something that a music folder names or holds is in no playlist of its inventory.
 enum class Reason : std::uint8_t {
     NoAddress,           ///< An entry that names no file at all, such as a track with a title only.
     RemoteAddress,       ///< `http://…` and the like, and a `file:` address of another machine.

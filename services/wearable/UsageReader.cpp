@@ -1,4 +1,4 @@
-#include "services/wearable/Reporter.h"
+#include "services/wearable/UsageReader.h"
 
 #include <condition_variable>
 #include <cstdint>
@@ -14,17 +14,17 @@ using Clock = std::chrono::steady_clock;
 
 struct Question {
     std::uint64_t number;
-    Reporter::Reply reply;
+    UsageReader::Reply reply;
     Clock::time_point deadline;
     bool isLookedAt = false;
 };
 
 struct Answered {
-    Reporter::Reply reply;
-    Reporter::Answer answer;
+    UsageReader::Reply reply;
+    UsageReader::Answer answer;
 };
 
-Reporter::Answer answerOf(const Reporter::Look& look) {
+UsageReader::Answer answerOf(const UsageReader::Look& look) {
     try {
         return look();
     } catch (const std::exception& error) {
@@ -34,11 +34,11 @@ Reporter::Answer answerOf(const Reporter::Look& look) {
 
 } // namespace
 
-/// Shared by the reporter and the threads that look, the last of which may outlive it. Only the
+/// Shared by the reader and the threads that look, the last of which may outlive it. Only the
 /// clerk, a thread that never touches the device, calls replies.
-class Reporter::Desk : public std::enable_shared_from_this<Desk> {
+class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
   public:
-    Desk(Look look, std::chrono::milliseconds patience)
+    Questions(Look look, std::chrono::milliseconds patience)
         : look_{std::move(look)}, patience_{patience} {}
 
     void open() {
@@ -113,9 +113,10 @@ class Reporter::Desk : public std::enable_shared_from_this<Desk> {
             if (!question.isLookedAt) {
                 question.isLookedAt = true;
                 ++lookers_;
-                // The thread keeps the desk, and with it `look_`, for as long as the device hangs.
-                std::thread{[desk = shared_from_this(), number = question.number] {
-                    desk->lookFor(number);
+                // The thread keeps the questions, and with it `look_`, for as long as the device
+                // hangs.
+                std::thread{[questions = shared_from_this(), number = question.number] {
+                    questions->lookFor(number);
                 }}.detach();
             }
         }
@@ -149,15 +150,16 @@ class Reporter::Desk : public std::enable_shared_from_this<Desk> {
     bool closed_ = false;
 };
 
-Reporter::Reporter(const Wearable& wearable) : Reporter{[wearable] { return report(wearable); }} {}
+UsageReader::UsageReader(const Wearable& wearable)
+    : UsageReader{[wearable] { return readUsage(wearable); }} {}
 
-Reporter::Reporter(Look look, std::chrono::milliseconds patience)
-    : desk_{std::make_shared<Desk>(std::move(look), patience)} {
-    desk_->open();
+UsageReader::UsageReader(Look look, std::chrono::milliseconds patience)
+    : questions_{std::make_shared<Questions>(std::move(look), patience)} {
+    questions_->open();
 }
 
-Reporter::~Reporter() { desk_->close(); }
+UsageReader::~UsageReader() { questions_->close(); }
 
-void Reporter::ask(Reply reply) { desk_->ask(std::move(reply)); }
+void UsageReader::ask(Reply reply) { questions_->ask(std::move(reply)); }
 
 } // namespace quorl::wearable

@@ -1,4 +1,4 @@
-#include "services/media/SnapshotBuilder.h"
+#include "services/media/InventoryBuilder.h"
 
 #include <algorithm>
 #include <unordered_map>
@@ -18,7 +18,7 @@ namespace {
 /// A longer name is none, but somebody's attempt to choke whoever shows it.
 constexpr std::size_t longestName = 4096;
 
-/// A playlist on its way into the snapshot.
+/// A playlist on its way into the inventory.
 struct Draft {
     Playlist playlist;
     /// Where the file lies; for a folder, the folder itself.
@@ -35,11 +35,11 @@ std::string fileNameWithoutExtension(std::string_view fileName) {
     return base::validUtf8(dot == 0 ? fileName : fileName.substr(0, dot));
 }
 
-class SnapshotBuilder {
+class InventoryBuilder {
   public:
-    SnapshotBuilder(FolderTree& tree, const std::stop_token& stop) : tree_(tree), stop_(stop) {}
+    InventoryBuilder(FolderTree& tree, const std::stop_token& stop) : tree_(tree), stop_(stop) {}
 
-    std::shared_ptr<const Snapshot> build() {
+    std::shared_ptr<const Inventory> build() {
         snapshot_->root = tree_.root();
         snapshot_->rootFound = tree_.top() != nullptr;
         snapshot_->unwatchedDirectories = tree_.unwatchedDirectories();
@@ -63,7 +63,7 @@ class SnapshotBuilder {
                 leaveOut(directory->path(), {}, Reason::DirectoryUnreadable);
             }
             for (SongFile& song : directory->songs) {
-                song.song = SongFile::notInSnapshot;
+                song.song = SongFile::notListed;
                 song.listed = false;
                 (song.kind == Kind::Audio ? snapshot_->hasAudio : snapshot_->hasMusicVideo) = true;
             }
@@ -170,7 +170,7 @@ class SnapshotBuilder {
             return std::nullopt;
         }
         SongFile& file = *found->file;
-        if (file.song == SongFile::notInSnapshot) {
+        if (file.song == SongFile::notListed) {
             const std::string_view name = found->directory->songNames[file.name];
             file.song = snapshot_->songs.add(indexOf(*found->directory),
                                              {{}, name, file.size, file.modified, file.kind});
@@ -230,17 +230,17 @@ class SnapshotBuilder {
 
     FolderTree& tree_;
     const std::stop_token& stop_;
-    std::shared_ptr<Snapshot> snapshot_ = std::make_shared<Snapshot>();
+    std::shared_ptr<Inventory> snapshot_ = std::make_shared<Inventory>();
     std::vector<Draft> drafts_;
     std::unordered_map<const Directory*, std::uint32_t> directories_;
-    /// Of the songs of the snapshot, in their order.
+    /// Of the songs of the inventory, in their order.
     std::vector<std::uint64_t> fingerprints_;
 };
 
 } // namespace
 
-std::shared_ptr<const Snapshot> buildSnapshot(FolderTree& tree, const std::stop_token& stop) {
-    return SnapshotBuilder(tree, stop).build();
+std::shared_ptr<const Inventory> buildInventory(FolderTree& tree, const std::stop_token& stop) {
+    return InventoryBuilder(tree, stop).build();
 }
 
 } // namespace quorl::media

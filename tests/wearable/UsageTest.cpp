@@ -1,6 +1,6 @@
 // How much room a wearable says it has.
 
-#include "services/wearable/Report.h"
+#include "services/wearable/Usage.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -15,12 +15,12 @@ namespace {
 using namespace quorl::wearable;
 using quorl::wearable::testing::TemporaryDirectory;
 
-TEST(Report, OfTheEmbeddedWearableCountsWhatIsUsedAgainstItsCapacity) {
+TEST(Usage, OfTheEmbeddedWearableCountsWhatIsUsedAgainstItsCapacity) {
     const TemporaryDirectory device;
     device.write("Music/Somebody else's.mp3", std::string(300, 'x'));
     const Wearable wearable{device.path(), 1000, false};
 
-    const auto answer = report(wearable);
+    const auto answer = readUsage(wearable);
 
     EXPECT_EQ(answer.capacity, 1000);
     EXPECT_EQ(answer.available, 700);
@@ -28,71 +28,71 @@ TEST(Report, OfTheEmbeddedWearableCountsWhatIsUsedAgainstItsCapacity) {
     EXPECT_FALSE(answer.sent);
 }
 
-TEST(Report, HasNothingAvailableWhenMoreIsUsedThanTheCapacity) {
+TEST(Usage, HasNothingAvailableWhenMoreIsUsedThanTheCapacity) {
     const TemporaryDirectory device;
     device.write("big", std::string(2000, 'x'));
 
-    EXPECT_EQ(report({device.path(), 1000, false}).available, 0);
+    EXPECT_EQ(readUsage({device.path(), 1000, false}).available, 0);
 }
 
-TEST(Report, NeverPromisesMoreThanTheFileSystemHas) {
+TEST(Usage, NeverPromisesMoreThanTheFileSystemHas) {
     const TemporaryDirectory device;
 
     struct statvfs status {};
 
     ASSERT_EQ(statvfs(device.path().c_str(), &status), 0);
 
-    const auto answer = report({device.path(), std::uint64_t{1} << 62, false});
+    const auto answer = readUsage({device.path(), std::uint64_t{1} << 62, false});
 
     EXPECT_LE(answer.available, status.f_blocks * status.f_frsize);
 }
 
-TEST(Report, CountsTheSongsThatWeHavePutThereAndThatAreStillThere) {
+TEST(Usage, CountsTheSongsThatWeHavePutThereAndThatAreStillThere) {
     const TemporaryDirectory device;
     device.write("Music/there.mp3", std::string(100, 'x'));
     device.write("Music/foreign.mp3", std::string(50, 'x'));
-    saveManifest(openRoot(device.path().c_str()).get(),
+    saveManifest(quorl::base::openRoot(device.path().c_str()).get(),
                  {.songs = {{"there.mp3", "a", 100, 0, ""}, {"gone.mp3", "b", 200, 0, ""}},
                   .playlist = {},
                   .strays = {},
                   .sent = Selection{1, 2, 3, 4}});
 
-    const auto answer = report(Wearable::mounted(device.path()));
+    const auto answer = readUsage(Wearable::mounted(device.path()));
 
     EXPECT_EQ(answer.songs, 100);
     EXPECT_EQ(answer.sent, (Selection{1, 2, 3, 4}));
 }
 
-TEST(Report, OfAWearableThatIsGoneIsAnErrorInWords) {
+TEST(Usage, OfAWearableThatIsGoneIsAnErrorInWords) {
     const TemporaryDirectory parent;
 
     try {
-        static_cast<void>(report(Wearable::mounted(parent.path() / "gone")));
+        static_cast<void>(readUsage(Wearable::mounted(parent.path() / "gone")));
         FAIL();
     } catch (const std::runtime_error& error) {
         EXPECT_THAT(error.what(), ::testing::HasSubstr("cannot be reached"));
     }
 }
 
-TEST(Report, OfTheEmbeddedWearableMakesItOnFirstUse) {
+TEST(Usage, OfTheEmbeddedWearableMakesItOnFirstUse) {
     const TemporaryDirectory parent;
     const Wearable wearable{parent.path() / "not/yet", 10, false};
 
-    EXPECT_EQ(report(wearable).available, 10);
+    EXPECT_EQ(readUsage(wearable).available, 10);
 }
 
-TEST(Report, OfAMountedDeviceIsThatOfItsOwnFileSystemAndNotOfTheDirectoryBeneath) {
+TEST(Usage, OfAMountedDeviceIsThatOfItsOwnFileSystemAndNotOfTheDirectoryBeneath) {
     const TemporaryDirectory device;
     if (mount("tmpfs", device.path().c_str(), "tmpfs", 0, "size=1m") != 0) {
         GTEST_SKIP() << "only root may mount";
     }
     const auto wearable = Wearable::mounted(device.path());
 
-    EXPECT_EQ(report(wearable).capacity, 1 << 20);
-    EXPECT_LE(report(wearable).available, 1 << 20);
+    EXPECT_EQ(readUsage(wearable).capacity, 1 << 20);
+    EXPECT_LE(readUsage(wearable).available, 1 << 20);
 
     ASSERT_EQ(umount(device.path().c_str()), 0);
-    EXPECT_THROW(static_cast<void>(report(wearable)), std::runtime_error);
+    EXPECT_THROW(static_cast<void>(readUsage(wearable)), std::runtime_error);
 }
 
 TEST(Wearable, EmbeddedInThisMachineIsInTheUsersDataDirectory) {

@@ -9,7 +9,7 @@
 namespace quorl::wearable {
 
 /// How a wearable stood at one moment. Byte counts all.
-struct Report {
+struct Usage {
     /// What it holds at most.
     std::uint64_t capacity = 0;
     /// What an ordinary user may still write to it.
@@ -19,15 +19,15 @@ struct Report {
     /// What was last sent to it in full; nothing where that is not known.
     std::optional<Selection> sent;
 
-    bool operator==(const Report&) const = default;
+    bool operator==(const Usage&) const = default;
 };
 
-/// Looks at the wearable. Takes as long as the device takes; see Reporter for callers that cannot
-/// wait. The one that is embedded is made where it does not exist.
+/// Looks at the wearable. Takes as long as the device takes; see UsageReader for callers that
+/// cannot wait. The one that is embedded is made where it does not exist.
 ///
 /// Throws `std::runtime_error` with a sentence for the user when the wearable is not there or
 /// cannot be read.
-[[nodiscard]] Report report(const Wearable& wearable);
+[[nodiscard]] Usage readUsage(const Wearable& wearable);
 
 /// What may still be written to the wearable whose top directory is open as `root`, in bytes.
 /// Throws `std::system_error`.

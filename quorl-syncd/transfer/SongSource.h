@@ -48,11 +48,11 @@ class SongProblem : public std::runtime_error {
 };
 
 /// A song of the music folder, open for reading.
-class SongFile {
+class SongSource {
   public:
     /// Opens the song at `path` in the music folder `root`. Throws `SongProblem` where it is gone,
     /// cannot be read, or is not in the state that is expected.
-    SongFile(const std::filesystem::path& root, const std::string& path, FileState expected);
+    SongSource(const std::filesystem::path& root, const std::string& path, FileState expected);
 
     /// Throws `SongProblem`, and `Stopped` soon after `stop` was requested.
     [[nodiscard]] std::string hash(const std::stop_token& stop) const;

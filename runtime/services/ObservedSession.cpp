@@ -1,4 +1,4 @@
-#include "runtime/services/Session.h"
+#include "runtime/services/ObservedSession.h"
 
 #include <algorithm>
 
@@ -8,7 +8,7 @@ const std::string DVDeviceSyncSessionAssetTaskGroupingKey =
 
 namespace quorl {
 
-void Session::addObserver(const std::shared_ptr<DVSessionObserver>& observer) {
+void ObservedSession::addObserver(const std::shared_ptr<DVSessionObserver>& observer) {
     const std::lock_guard lock(mutex_);
     const bool isAttached =
         std::any_of(observers_.begin(), observers_.end(),
@@ -18,14 +18,14 @@ void Session::addObserver(const std::shared_ptr<DVSessionObserver>& observer) {
     }
 }
 
-void Session::removeObserver(const std::shared_ptr<DVSessionObserver>& observer) {
+void ObservedSession::removeObserver(const std::shared_ptr<DVSessionObserver>& observer) {
     const std::lock_guard lock(mutex_);
     std::erase_if(observers_, [&observer](const std::weak_ptr<DVSessionObserver>& attached) {
         return attached.expired() || attached.lock() == observer;
     });
 }
 
-void Session::tellObservers(const std::function<void(DVSessionObserver&)>& call) const {
+void ObservedSession::tellObservers(const std::function<void(DVSessionObserver&)>& call) const {
     std::vector<std::weak_ptr<DVSessionObserver>> attached;
     {
         const std::lock_guard lock(mutex_);

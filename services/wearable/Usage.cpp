@@ -1,4 +1,4 @@
-#include "services/wearable/Report.h"
+#include "services/wearable/Usage.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -82,7 +82,7 @@ std::uint64_t availableBytes(const Wearable& wearable, int root) {
     return std::min(space, *wearable.capacity - used);
 }
 
-Report report(const Wearable& wearable) {
+Usage readUsage(const Wearable& wearable) {
     try {
         const auto root = openWearable(wearable);
         const auto manifest = loadManifest(root.get());

@@ -1,4 +1,4 @@
-#include "runtime/services/MediaLibrary.h"
+#include "runtime/services/AnnouncingLibrary.h"
 
 #include <algorithm>
 
@@ -15,22 +15,22 @@ const MPMediaProperty MPMediaItemPropertyFileSize = "MPMediaItemPropertyFileSize
 
 namespace quorl {
 
-void MediaLibrary::beginGeneratingLibraryChangeNotifications() { ++wanted_; }
+void AnnouncingLibrary::beginGeneratingLibraryChangeNotifications() { ++wanted_; }
 
-void MediaLibrary::endGeneratingLibraryChangeNotifications() {
+void AnnouncingLibrary::endGeneratingLibraryChangeNotifications() {
     if (wanted_ > 0) {
         --wanted_;
     }
 }
 
-void MediaLibrary::contentsDidChange() {
+void AnnouncingLibrary::contentsDidChange() {
     if (wanted_ > 0) {
         NSNotificationCenter::defaultCenter().postNotificationName_object(
             MPMediaLibraryDidChangeNotification, this);
     }
 }
 
-bool fulfils(const MPMediaEntity& entity, const MediaLibrary::Predicates& predicates) {
+bool fulfils(const MPMediaEntity& entity, const AnnouncingLibrary::Predicates& predicates) {
     return std::all_of(predicates.begin(), predicates.end(), [&entity](const auto& predicate) {
         const auto value = entity.valueForProperty(predicate->property());
         return value != nullptr && value->isEqual(predicate->value().get());

@@ -1,4 +1,4 @@
-#include "quorl/adapters/SyncEngine.h"
+#include "quorl/adapters/EngineLink.h"
 
 #include <algorithm>
 
@@ -8,10 +8,10 @@ namespace quorl {
 
 /// What the client's thread and the main thread have in common. Held weakly by what is on its way
 /// from the one to the other.
-struct SyncEngine::Shared {
+struct EngineLink::Shared {
     explicit Shared(Changed callback) : changed(std::move(callback)) {}
 
-    [[nodiscard]] std::shared_ptr<EngineSession> session(const engine::Session& session);
+    [[nodiscard]] std::shared_ptr<EngineSession> session(const engine::SessionState& session);
 
     const Changed changed; ///< main thread only
     std::mutex mutex;
@@ -41,7 +41,7 @@ void announce(const std::shared_ptr<Shared>& shared, bool setChanged, std::strin
 } // namespace
 
 /// The object that stands for a session, with its figures taken over; made where there is none yet.
-std::shared_ptr<EngineSession> SyncEngine::Shared::session(const engine::Session& session) {
+std::shared_ptr<EngineSession> EngineLink::Shared::session(const engine::SessionState& session) {
     const std::lock_guard lock(mutex);
     const auto known =
         std::find_if(sessions.begin(), sessions.end(),
@@ -53,12 +53,12 @@ std::shared_ptr<EngineSession> SyncEngine::Shared::session(const engine::Session
     return sessions.emplace_back(session.path, std::make_shared<EngineSession>(session)).second;
 }
 
-SyncEngine::SyncEngine(Places places, Changed changed)
+EngineLink::EngineLink(Places places, Changed changed)
     : places_(std::move(places)),
       shared_(std::make_shared<Shared>(std::move(changed))),
       client_(*this) {}
 
-NSArray<DVSession> SyncEngine::sessions(const std::string& type) const {
+NSArray<DVSession> EngineLink::sessions(const std::string& type) const {
     auto sessions = std::make_shared<std::vector<std::shared_ptr<DVSession>>>();
     const std::lock_guard lock(shared_->mutex);
     for (const auto& [path, session] : shared_->sessions) {
@@ -69,7 +69,7 @@ NSArray<DVSession> SyncEngine::sessions(const std::string& type) const {
     return sessions;
 }
 
-void SyncEngine::tellPlaces() {
+void EngineLink::tellPlaces() {
     const auto state = client_.state();
     if (!state.isThere) {
         return;
@@ -86,7 +86,7 @@ void SyncEngine::tellPlaces() {
     }
 }
 
-void SyncEngine::engineDidAppear(const engine::State& state) {
+void EngineLink::engineDidAppear(const engine::State& state) {
     replaceSessions(state.sessions);
     dispatch_async(dispatch_get_main_queue(), [this, reference = std::weak_ptr(shared_)] {
         if (!reference.expired()) {
@@ -95,38 +95,38 @@ void SyncEngine::engineDidAppear(const engine::State& state) {
     });
 }
 
-void SyncEngine::engineDidVanish(const std::string& /*reason*/) { replaceSessions({}); }
+void EngineLink::engineDidVanish(const std::string& /*reason*/) { replaceSessions({}); }
 
-void SyncEngine::busDidVanish(const std::string& problem) {
+void EngineLink::busDidVanish(const std::string& problem) {
     replaceSessions({});
     announce(shared_, false, problem);
 }
 
-void SyncEngine::sessionWillBegin(const engine::Session& session) {
+void EngineLink::sessionWillBegin(const engine::SessionState& session) {
     const auto object = shared_->session(session);
     object->tellObservers(
         [&object](DVSessionObserver& observer) { observer.sessionWillBegin(*object); });
     announce(shared_, true);
 }
 
-void SyncEngine::taskWillBegin(const engine::Session& session, const engine::Task& task) {
+void EngineLink::taskWillBegin(const engine::SessionState& session, const engine::TaskState& task) {
     tellTask(session, task, &DVSessionObserver::session_willBeginSessionTask);
 }
 
-void SyncEngine::taskDidBegin(const engine::Session& session, const engine::Task& task) {
+void EngineLink::taskDidBegin(const engine::SessionState& session, const engine::TaskState& task) {
     tellTask(session, task, &DVSessionObserver::session_didBeginSessionTask);
 }
 
-void SyncEngine::taskDidUpdate(const engine::Session& session, const engine::Task& task) {
+void EngineLink::taskDidUpdate(const engine::SessionState& session, const engine::TaskState& task) {
     tellTask(session, task, &DVSessionObserver::session_didUpdateSessionTask);
 }
 
-void SyncEngine::taskDidFinish(const engine::Session& session, const engine::Task& task,
+void EngineLink::taskDidFinish(const engine::SessionState& session, const engine::TaskState& task,
                                bool /*success*/, const std::string& /*message*/) {
     tellTask(session, task, &DVSessionObserver::session_didFinishSessionTask);
 }
 
-void SyncEngine::sessionDidFinish(const engine::Session& session, bool /*success*/,
+void EngineLink::sessionDidFinish(const engine::SessionState& session, bool /*success*/,
                                   const std::string& /*message*/) {
     const auto object = shared_->session(session);
     object->tellObservers(
@@ -134,7 +134,7 @@ void SyncEngine::sessionDidFinish(const engine::Session& session, bool /*success
     announce(shared_, false);
 }
 
-void SyncEngine::sessionDidVanish(const engine::Session& session) {
+void EngineLink::sessionDidVanish(const engine::SessionState& session) {
     {
         const std::lock_guard lock(shared_->mutex);
         std::erase_if(shared_->sessions,
@@ -143,9 +143,9 @@ void SyncEngine::sessionDidVanish(const engine::Session& session) {
     announce(shared_, true);
 }
 
-void SyncEngine::statusDidChange() { announce(shared_, false); }
+void EngineLink::statusDidChange() { announce(shared_, false); }
 
-void SyncEngine::tellTask(const engine::Session& session, const engine::Task& task,
+void EngineLink::tellTask(const engine::SessionState& session, const engine::TaskState& task,
                           TaskMessage message) {
     const auto object = shared_->session(session);
     const auto taskObject = object->update(task);
@@ -155,9 +155,9 @@ void SyncEngine::tellTask(const engine::Session& session, const engine::Task& ta
 }
 
 /// Sessions that stay keep their objects.
-void SyncEngine::replaceSessions(const std::vector<engine::Session>& sessions) {
+void EngineLink::replaceSessions(const std::vector<engine::SessionState>& sessions) {
     std::vector<std::pair<std::string, std::shared_ptr<EngineSession>>> current;
-    for (const engine::Session& session : sessions) {
+    for (const engine::SessionState& session : sessions) {
         current.emplace_back(session.path, shared_->session(session));
     }
     {

@@ -1,6 +1,6 @@
 // Questions to a wearable that may be slow, hang or go away.
 
-#include "services/wearable/Reporter.h"
+#include "services/wearable/UsageReader.h"
 
 #include <atomic>
 #include <future>
@@ -25,15 +25,15 @@ constexpr auto forever = std::chrono::hours{1};
 /// One question and its answer.
 class Asked {
   public:
-    explicit Asked(Reporter& reporter) {
-        reporter.ask([this](const Reporter::Answer& answer) {
+    explicit Asked(UsageReader& reader) {
+        reader.ask([this](const UsageReader::Answer& answer) {
             ++times_;
             thread_ = std::this_thread::get_id();
             answer_.set_value(answer);
         });
     }
 
-    Reporter::Answer answer() { return future_.get(); }
+    UsageReader::Answer answer() { return future_.get(); }
 
     [[nodiscard]] int times() const { return times_; }
 
@@ -42,8 +42,8 @@ class Asked {
   private:
     std::atomic<int> times_ = 0;
     std::thread::id thread_;
-    std::promise<Reporter::Answer> answer_;
-    std::future<Reporter::Answer> future_ = answer_.get_future();
+    std::promise<UsageReader::Answer> answer_;
+    std::future<UsageReader::Answer> future_ = answer_.get_future();
 };
 
 /// A device that does not answer until it is released. Owns itself, like a real one.
@@ -51,45 +51,45 @@ struct Hanging {
     std::counting_semaphore<> release{0};
     std::counting_semaphore<> entered{0};
 
-    Reporter::Look look(const std::shared_ptr<Hanging>& self) {
+    UsageReader::Look look(const std::shared_ptr<Hanging>& self) {
         return [self] {
             self->entered.release();
             self->release.acquire();
-            return Report{7, 6, 5, {}};
+            return Usage{7, 6, 5, {}};
         };
     }
 };
 
-TEST(Reporter, AnswersOnAThreadThatIsNotTheCallers) {
+TEST(UsageReader, AnswersOnAThreadThatIsNotTheCallers) {
     const TemporaryDirectory device;
-    Reporter reporter{Wearable{device.path(), 100, false}};
+    UsageReader reader{Wearable{device.path(), 100, false}};
 
-    Asked asked{reporter};
+    Asked asked{reader};
 
-    EXPECT_EQ(std::get<Report>(asked.answer()).available, 100);
+    EXPECT_EQ(std::get<Usage>(asked.answer()).available, 100);
     EXPECT_NE(asked.thread(), std::this_thread::get_id());
 }
 
-TEST(Reporter, AnswersWithASentenceWhenTheDeviceIsGone) {
+TEST(UsageReader, AnswersWithASentenceWhenTheDeviceIsGone) {
     const TemporaryDirectory device;
-    Reporter reporter{Wearable{device.path() / "gone", {}, false}};
+    UsageReader reader{Wearable{device.path() / "gone", {}, false}};
 
-    EXPECT_THAT(std::get<std::string>(Asked{reporter}.answer()),
+    EXPECT_THAT(std::get<std::string>(Asked{reader}.answer()),
                 ::testing::HasSubstr("cannot be reached"));
 }
 
-TEST(Reporter, AnswersWithASentenceWhenTheDeviceGoesInTheMiddleOfTheQuestion) {
+TEST(UsageReader, AnswersWithASentenceWhenTheDeviceGoesInTheMiddleOfTheQuestion) {
     std::latch opened{1};
     std::latch removed{1};
     auto device = std::make_unique<TemporaryDirectory>();
     const Wearable wearable{device->path(), {}, false};
-    Reporter reporter{[&, wearable] {
-                          opened.count_down();
-                          removed.wait();
-                          return report(wearable);
-                      },
-                      forever};
-    Asked asked{reporter};
+    UsageReader reader{[&, wearable] {
+                           opened.count_down();
+                           removed.wait();
+                           return readUsage(wearable);
+                       },
+                       forever};
+    Asked asked{reader};
     opened.wait();
 
     device.reset();
@@ -98,7 +98,7 @@ TEST(Reporter, AnswersWithASentenceWhenTheDeviceGoesInTheMiddleOfTheQuestion) {
     EXPECT_THAT(std::get<std::string>(asked.answer()), ::testing::HasSubstr("cannot be reached"));
 }
 
-TEST(Reporter, NeverAnswersWithAnEarlierLookAfterALaterOne) {
+TEST(UsageReader, NeverAnswersWithAnEarlierLookAfterALaterOne) {
     struct Device {
         std::atomic<int> looks = 0;
         std::latch isLookedAt{1};
@@ -106,31 +106,31 @@ TEST(Reporter, NeverAnswersWithAnEarlierLookAfterALaterOne) {
     };
 
     const auto device = std::make_shared<Device>();
-    Reporter reporter{[device] {
-                          if (device->looks++ > 0) {
-                              return Report{2, 2, 2, {}};
-                          }
-                          device->isLookedAt.count_down();
-                          device->release.acquire();
-                          return Report{1, 1, 1, {}};
-                      },
-                      forever};
-    Asked first{reporter};
+    UsageReader reader{[device] {
+                           if (device->looks++ > 0) {
+                               return Usage{2, 2, 2, {}};
+                           }
+                           device->isLookedAt.count_down();
+                           device->release.acquire();
+                           return Usage{1, 1, 1, {}};
+                       },
+                       forever};
+    Asked first{reader};
     device->isLookedAt.wait();
 
-    Asked second{reporter};
+    Asked second{reader};
 
-    EXPECT_EQ(std::get<Report>(second.answer()).capacity, 2);
-    EXPECT_EQ(std::get<Report>(first.answer()).capacity, 2);
+    EXPECT_EQ(std::get<Usage>(second.answer()).capacity, 2);
+    EXPECT_EQ(std::get<Usage>(first.answer()).capacity, 2);
     device->release.release();
 }
 
-TEST(Reporter, AnswersEveryQuestionInTimeThoughTheDeviceHangs) {
+TEST(UsageReader, AnswersEveryQuestionInTimeThoughTheDeviceHangs) {
     const auto device = std::make_shared<Hanging>();
-    Reporter reporter{device->look(device), 1ms};
+    UsageReader reader{device->look(device), 1ms};
     std::vector<std::unique_ptr<Asked>> many;
     for (int question = 0; question < 20; ++question) {
-        many.push_back(std::make_unique<Asked>(reporter));
+        many.push_back(std::make_unique<Asked>(reader));
     }
 
     for (const auto& asked : many) {
@@ -141,12 +141,12 @@ TEST(Reporter, AnswersEveryQuestionInTimeThoughTheDeviceHangs) {
     device->release.release(20);
 }
 
-TEST(Reporter, SendsAtMostFourThreadsToADeviceThatHangsAndAnswersOnceItIsBack) {
+TEST(UsageReader, SendsAtMostFourThreadsToADeviceThatHangsAndAnswersOnceItIsBack) {
     const auto device = std::make_shared<Hanging>();
-    Reporter reporter{device->look(device), forever};
+    UsageReader reader{device->look(device), forever};
     std::vector<std::unique_ptr<Asked>> many;
     for (int question = 0; question < 8; ++question) {
-        many.push_back(std::make_unique<Asked>(reporter));
+        many.push_back(std::make_unique<Asked>(reader));
     }
     for (int looker = 0; looker < 4; ++looker) {
         device->entered.acquire();
@@ -156,17 +156,17 @@ TEST(Reporter, SendsAtMostFourThreadsToADeviceThatHangsAndAnswersOnceItIsBack) {
     device->release.release(8);
 
     for (const auto& asked : many) {
-        EXPECT_EQ(std::get<Report>(asked->answer()).capacity, 7);
+        EXPECT_EQ(std::get<Usage>(asked->answer()).capacity, 7);
     }
 }
 
-TEST(Reporter, ThatIsDestroyedWhileTheDeviceHangsAnswersExactlyOnceAndDoesNotWait) {
+TEST(UsageReader, ThatIsDestroyedWhileTheDeviceHangsAnswersExactlyOnceAndDoesNotWait) {
     const auto device = std::make_shared<Hanging>();
-    auto reporter = std::make_unique<Reporter>(device->look(device), forever);
-    Asked asked{*reporter};
+    auto reader = std::make_unique<UsageReader>(device->look(device), forever);
+    Asked asked{*reader};
     device->entered.acquire();
 
-    reporter.reset();
+    reader.reset();
 
     EXPECT_TRUE(std::holds_alternative<std::string>(asked.answer()));
     device->release.release();

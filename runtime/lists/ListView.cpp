@@ -1,8 +1,10 @@
-#include "runtime/lists/PSListView.h"
+#include "runtime/lists/ListView.h"
 
 #include <algorithm>
 
-void PSListView::draw() {
+namespace quorl {
+
+void ListView::draw() {
     if (!shown_ || !marked_) {
         return;
     }
@@ -15,7 +17,7 @@ void PSListView::draw() {
     rows_ = std::move(rows);
 }
 
-void PSListView::update(const std::shared_ptr<PSSpecifier>& specifier) {
+void ListView::update(const std::shared_ptr<PSSpecifier>& specifier) {
     auto value = specifier->value();
     const auto row = std::find_if(rows_.begin(), rows_.end(), [&specifier](const Row& candidate) {
         return candidate.specifier == specifier;
@@ -24,3 +26,5 @@ void PSListView::update(const std::shared_ptr<PSSpecifier>& specifier) {
         row->value = std::move(value);
     }
 }
+
+} // namespace quorl

@@ -1,4 +1,4 @@
-#include "quorl-syncd/transfer/Wish.h"
+#include "quorl-syncd/transfer/Order.h"
 
 #include <cstdint>
 #include <limits>
@@ -14,16 +14,16 @@ constexpr unsigned megabyteShift = 20;
 
 } // namespace
 
-std::vector<media::SongIndex> songsWithinLimit(const Wish& wish) {
+std::vector<media::SongIndex> songsWithinLimit(const Order& order) {
     namespace LimitType = preferences::LimitType;
-    const auto [type, amount] = std::pair{wish.selection.limitType, wish.selection.limit};
+    const auto [type, amount] = std::pair{order.selection.limitType, order.selection.limit};
     const auto mostBytes = type == LimitType::Megabytes ? amount << megabyteShift : unlimited;
     const auto mostSongs = type == LimitType::Songs ? amount : unlimited;
 
     std::vector<media::SongIndex> songs;
     std::uint64_t bytes = 0;
-    for (const auto song : wish.playlist().songs) {
-        bytes += wish.library->songs[song].size;
+    for (const auto song : order.playlist().songs) {
+        bytes += order.library->songs[song].size;
         if (bytes > mostBytes || songs.size() == mostSongs) {
             break;
         }

@@ -8,7 +8,7 @@
 namespace quorl {
 
 /// A session's list of observers, for hosts to derive their sessions from. Any thread.
-class Session : public DVSession {
+class ObservedSession : public DVSession {
   public:
     void addObserver(const std::shared_ptr<DVSessionObserver>& observer) override;
     void removeObserver(const std::shared_ptr<DVSessionObserver>& observer) override;

@@ -2,8 +2,10 @@
 
 #include "platform/PreferencesList.h"
 
+namespace quorl {
+
 /// What a person sees of a list controller, as every host shows it. Main thread only.
-class PSListView : public NSObject {
+class ListView : public NSObject {
   public:
     struct Row {
         std::shared_ptr<PSSpecifier> specifier;
@@ -12,7 +14,12 @@ class PSListView : public NSObject {
     };
 
     /// `controller` owns the view and answers for its rows.
-    explicit PSListView(PSListController& controller) : controller_(controller) {}
+    explicit ListView(PSListController& controller) : controller_(controller) {}
+
+    /// The view of a controller.
+    [[nodiscard]] static ListView& of(const PSListController& controller) {
+        return static_cast<ListView&>(controller.listView());
+    }
 
     /// The rows as last drawn, from top to bottom.
     [[nodiscard]] const std::vector<Row>& rows() const { return rows_; }
@@ -35,3 +42,5 @@ class PSListView : public NSObject {
     bool shown_ = false;
     bool marked_ = true;
 };
+
+} // namespace quorl

@@ -1,4 +1,4 @@
-#include "quorl-syncd/transfer/SongFile.h"
+#include "quorl-syncd/transfer/SongSource.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -107,7 +107,8 @@ std::string hashOf(int file, const std::stop_token& stop) {
     }
 }
 
-SongFile::SongFile(const std::filesystem::path& root, const std::string& path, FileState expected)
+SongSource::SongSource(const std::filesystem::path& root, const std::string& path,
+                       FileState expected)
     : path_{path},
       expected_{expected},
       file_{open((root / path).c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC)} {
@@ -120,7 +121,7 @@ SongFile::SongFile(const std::filesystem::path& root, const std::string& path, F
     static_cast<void>(posix_fadvise(file_.get(), 0, 0, POSIX_FADV_SEQUENTIAL));
 }
 
-std::string SongFile::hash(const std::stop_token& stop) const {
+std::string SongSource::hash(const std::stop_token& stop) const {
     try {
         return hashOf(file_.get(), stop);
     } catch (const std::system_error& error) {
@@ -128,18 +129,18 @@ std::string SongFile::hash(const std::stop_token& stop) const {
     }
 }
 
-std::string SongFile::copyTo(int destination, RateLimit& rate,
-                             const std::function<void(std::uint64_t)>& moved,
-                             const std::stop_token& stop) const {
+std::string SongSource::copyTo(int destination, RateLimit& rate,
+                               const std::function<void(std::uint64_t)>& moved,
+                               const std::stop_token& stop) const {
     auto hash = copyPieces(destination, rate, moved, stop);
     requireUnchanged();
     setModified(destination, expected_.modified);
     return hash;
 }
 
-std::string SongFile::copyPieces(int destination, RateLimit& rate,
-                                 const std::function<void(std::uint64_t)>& moved,
-                                 const std::stop_token& stop) const {
+std::string SongSource::copyPieces(int destination, RateLimit& rate,
+                                   const std::function<void(std::uint64_t)>& moved,
+                                   const std::stop_token& stop) const {
     // Where both are on one file system that can share blocks, nothing has to be copied at all. The
     // contents are read for the hash in any case, so a copy within the kernel would be a second
     // one.
@@ -169,7 +170,7 @@ std::string SongFile::copyPieces(int destination, RateLimit& rate,
     }
 }
 
-std::span<std::byte> SongFile::readPiece(std::span<std::byte> buffer) const {
+std::span<std::byte> SongSource::readPiece(std::span<std::byte> buffer) const {
     try {
         return buffer.first(readSome(file_.get(), buffer));
     } catch (const std::system_error& error) {
@@ -177,7 +178,7 @@ std::span<std::byte> SongFile::readPiece(std::span<std::byte> buffer) const {
     }
 }
 
-void SongFile::requireUnchanged() const {
+void SongSource::requireUnchanged() const {
     struct stat status {};
 
     if (fstat(file_.get(), &status) != 0 || !S_ISREG(status.st_mode)) {

@@ -1,4 +1,4 @@
-#include "services/media/Snapshot.h"
+#include "services/media/Inventory.h"
 
 #include <algorithm>
 
@@ -29,12 +29,12 @@ void SongTable::shrink() {
     records_.shrink_to_fit();
 }
 
-const Playlist* Snapshot::playlist(std::uint64_t id) const {
+const Playlist* Inventory::playlist(std::uint64_t id) const {
     const auto found = std::ranges::find(playlists, id, &Playlist::id);
     return found == playlists.end() ? nullptr : &*found;
 }
 
-std::string Snapshot::unwatchedNotice() const {
+std::string Inventory::unwatchedNotice() const {
     if (unwatchedDirectories == 0) {
         return {};
     }

@@ -2,7 +2,7 @@
 
 #include <filesystem>
 
-#include "runtime/services/MediaLibrary.h"
+#include "runtime/services/AnnouncingLibrary.h"
 #include "services/media/MusicFolder.h"
 
 namespace quorl {
@@ -10,10 +10,10 @@ namespace quorl {
 class LibraryPlaylist;
 
 /// The music folder as the platform's media library. Made by `create`. Main thread.
-class Library final : public MediaLibrary {
+class MusicLibrary final : public AnnouncingLibrary {
   public:
-    /// Is called on the main thread with each snapshot that the library has taken.
-    using Taken = std::function<void(const media::Snapshot& snapshot)>;
+    /// Is called on the main thread with each inventory that the library has taken.
+    using Taken = std::function<void(const media::Inventory& inventory)>;
 
     /// Begins to read and watch the folder at `root`, on a thread of its own; to be called once.
     /// Throws `std::system_error` where the process may open no more files or start no more
@@ -21,17 +21,17 @@ class Library final : public MediaLibrary {
     void open(const std::filesystem::path& root, Taken taken);
 
     /// Whether the folder has been read for the first time. Until then the library is empty.
-    [[nodiscard]] bool isRead() const { return snapshot_ != nullptr; }
+    [[nodiscard]] bool isRead() const { return inventory_ != nullptr; }
 
     [[nodiscard]] bool hasMediaOfType(NSUInteger mask) const override;
     [[nodiscard]] NSArray<MPMediaPlaylist>
     playlistsMatching(const Predicates& predicates) const override;
 
   private:
-    void take(std::shared_ptr<const media::Snapshot> snapshot);
+    void take(std::shared_ptr<const media::Inventory> inventory);
 
-    std::shared_ptr<const media::Snapshot> snapshot_;
-    std::vector<std::shared_ptr<LibraryPlaylist>> playlists_; ///< in the order of the snapshot
+    std::shared_ptr<const media::Inventory> inventory_;
+    std::vector<std::shared_ptr<LibraryPlaylist>> playlists_; ///< in the order of the inventory
     Taken taken_;
     std::unique_ptr<media::MusicFolder> folder_; ///< last: its thread ends first
 };

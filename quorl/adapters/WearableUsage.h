@@ -2,19 +2,19 @@
 
 #include <memory>
 
-#include "runtime/services/LSSClient.h"
+#include "runtime/services/WearableConnection.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl {
 
 /// What is asked of the wearable, and answered without anybody waiting for a slow device. Main
 /// thread.
-class Wearable {
+class WearableUsage {
   public:
-    explicit Wearable(const wearable::Wearable& wearable);
+    explicit WearableUsage(const wearable::Wearable& wearable);
 
     /// A connection for one client, which may outlive this object.
-    [[nodiscard]] std::unique_ptr<LSSClient> connect() const;
+    [[nodiscard]] std::shared_ptr<WearableConnection> connect() const;
 
     /// Whether every question that was asked through a connection has been answered, and the answer
     /// has been taken on the main queue.

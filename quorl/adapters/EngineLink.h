@@ -11,7 +11,7 @@ namespace quorl {
 /// The sync engine as panes see it: its sessions, and what it tells about itself and the wearable.
 /// Main thread, except for the listener's part, which the engine's client calls on its own thread.
 /// Observers of sessions are told on that thread too.
-class SyncEngine final : public engine::Listener {
+class EngineLink final : public engine::Listener {
   public:
     /// Called on the main thread whenever `state` may have changed, and with a sentence for the
     /// user when the session bus is gone; that sentence is empty otherwise.
@@ -25,10 +25,10 @@ class SyncEngine final : public engine::Listener {
 
     /// Connects in the background and starts the engine where it does not run. Where there is
     /// nothing to connect to there are no sessions, which is no error.
-    SyncEngine(Places places, Changed changed);
+    EngineLink(Places places, Changed changed);
 
-    SyncEngine(const SyncEngine&) = delete;
-    SyncEngine& operator=(const SyncEngine&) = delete;
+    EngineLink(const EngineLink&) = delete;
+    EngineLink& operator=(const EngineLink&) = delete;
 
     /// The sessions of a type that exist now, never null.
     [[nodiscard]] NSArray<DVSession> sessions(const std::string& type) const;
@@ -42,15 +42,15 @@ class SyncEngine final : public engine::Listener {
     void engineDidAppear(const engine::State& state) override;
     void engineDidVanish(const std::string& reason) override;
     void busDidVanish(const std::string& problem) override;
-    void sessionWillBegin(const engine::Session& session) override;
-    void taskWillBegin(const engine::Session& session, const engine::Task& task) override;
-    void taskDidBegin(const engine::Session& session, const engine::Task& task) override;
-    void taskDidUpdate(const engine::Session& session, const engine::Task& task) override;
-    void taskDidFinish(const engine::Session& session, const engine::Task& task, bool success,
-                       const std::string& message) override;
-    void sessionDidFinish(const engine::Session& session, bool success,
+    void sessionWillBegin(const engine::SessionState& session) override;
+    void taskWillBegin(const engine::SessionState& session, const engine::TaskState& task) override;
+    void taskDidBegin(const engine::SessionState& session, const engine::TaskState& task) override;
+    void taskDidUpdate(const engine::SessionState& session, const engine::TaskState& task) override;
+    void taskDidFinish(const engine::SessionState& session, const engine::TaskState& task,
+                       bool success, const std::string& message) override;
+    void sessionDidFinish(const engine::SessionState& session, bool success,
                           const std::string& message) override;
-    void sessionDidVanish(const engine::Session& session) override;
+    void sessionDidVanish(const engine::SessionState& session) override;
     void statusDidChange() override;
 
   private:
@@ -58,8 +58,9 @@ class SyncEngine final : public engine::Listener {
     using TaskMessage = void (DVSessionObserver::*)(DVSession&, DVSessionTask&);
 
     void tellPlaces();
-    void tellTask(const engine::Session& session, const engine::Task& task, TaskMessage message);
-    void replaceSessions(const std::vector<engine::Session>& sessions);
+    void tellTask(const engine::SessionState& session, const engine::TaskState& task,
+                  TaskMessage message);
+    void replaceSessions(const std::vector<engine::SessionState>& sessions);
 
     const Places places_;
     std::shared_ptr<Shared> shared_;

@@ -15,7 +15,7 @@ namespace quorl::media {
 
 enum class Kind : std::uint8_t { Audio, MusicVideo };
 
-/// The place of a song in `Snapshot::songs`. Means nothing in another snapshot.
+/// The place of a song in `Inventory::songs`. Means nothing in another inventory.
 using SongIndex = std::uint32_t;
 
 /// A song, as views into the table that gave it.
@@ -71,7 +71,7 @@ class SongTable {
 struct Playlist {
     /// Never 0. The same on every machine and after every restart as long as the playlist keeps its
     /// path in the music folder, whatever happens to its contents and in whichever Unicode
-    /// normalisation the file system stores the path. No two playlists of a snapshot share one.
+    /// normalisation the file system stores the path. No two playlists of an inventory share one.
     std::uint64_t id = 0;
     /// Differs whenever the songs, their order, their sizes or their modification times differ, and
     /// only then. Comparable over restarts.
@@ -92,9 +92,9 @@ struct Playlist {
     bool operator==(const Playlist&) const = default;
 };
 
-/// What a music folder held at one moment. Handed out as `std::shared_ptr<const Snapshot>`: nobody
+/// What a music folder held at one moment. Handed out as `std::shared_ptr<const Inventory>`: nobody
 /// changes it, any thread may read it.
-struct Snapshot {
+struct Inventory {
     /// The music folder, absolute, as the caller gave it.
     std::filesystem::path root;
     /// False: there is no such directory, and everything below is empty.
@@ -110,7 +110,7 @@ struct Snapshot {
     bool hasAudio = false;
     bool hasMusicVideo = false;
     /// Directories whose changes go unnoticed until `MusicFolder::rescan`, because the system
-    /// watches no more directories. Always 0 for a snapshot that nobody keeps up to date.
+    /// watches no more directories. Always 0 for an inventory that nobody keeps up to date.
     std::size_t unwatchedDirectories = 0;
 
     /// The playlist of this id; null: there is none.
@@ -119,7 +119,7 @@ struct Snapshot {
     /// What to tell a person about `unwatchedDirectories`, in English; empty where there are none.
     [[nodiscard]] std::string unwatchedNotice() const;
 
-    bool operator==(const Snapshot&) const = default;
+    bool operator==(const Inventory&) const = default;
 };
 
 } // namespace quorl::media

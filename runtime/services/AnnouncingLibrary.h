@@ -6,7 +6,7 @@ namespace quorl {
 
 /// The library without its contents, which a host adds: who wants change notifications is counted
 /// and served here. Main thread only.
-class MediaLibrary : public MPMediaLibrary {
+class AnnouncingLibrary : public MPMediaLibrary {
   public:
     using Predicates = std::vector<std::shared_ptr<MPMediaPropertyPredicate>>;
 
@@ -26,6 +26,7 @@ class MediaLibrary : public MPMediaLibrary {
 };
 
 /// Whether an entity fulfils every predicate. A missing property fulfils none.
-[[nodiscard]] bool fulfils(const MPMediaEntity& entity, const MediaLibrary::Predicates& predicates);
+[[nodiscard]] bool fulfils(const MPMediaEntity& entity,
+                           const AnnouncingLibrary::Predicates& predicates);
 
 } // namespace quorl

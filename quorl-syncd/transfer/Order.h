@@ -3,16 +3,16 @@
 #include <memory>
 #include <vector>
 
-#include "services/media/Snapshot.h"
+#include "services/media/Inventory.h"
 #include "services/wearable/Manifest.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl::syncd {
 
 /// What is to be on which wearable.
-struct Wish {
+struct Order {
     /// Not null; has the playlist in the revision of the selection.
-    std::shared_ptr<const media::Snapshot> library;
+    std::shared_ptr<const media::Inventory> library;
     wearable::Selection selection;
     wearable::Wearable wearable;
 
@@ -23,6 +23,6 @@ struct Wish {
 
 /// The songs from the top of the playlist to the first one that does not fit, as the pane's footer
 /// counts them; later ones are not tried. A song that is listed twice counts twice.
-[[nodiscard]] std::vector<media::SongIndex> songsWithinLimit(const Wish& wish);
+[[nodiscard]] std::vector<media::SongIndex> songsWithinLimit(const Order& order);
 
 } // namespace quorl::syncd
