@@ -1,5 +1,8 @@
 #pragma once
 
+#include <compare>
+#include <type_traits>
+
 #include "platform/Foundation.h"
 
 /// The user-interface toolkit, as far as panes use it. Main thread only.
@@ -56,6 +59,19 @@ class UILabel : public NSObject {
 
     /// What the whole text needs, at the most `size`.
     [[nodiscard]] virtual CGSize sizeThatFits(const CGSize& size) const = 0;
+};
+
+/// The place of a row in a table.
+struct NSIndexPath {
+    NSInteger section = 0;
+    NSInteger row = 0;
+
+    [[nodiscard]] static constexpr NSIndexPath indexPathForRow_inSection(NSInteger row,
+                                                                         NSInteger section) {
+        return {section, row};
+    }
+
+    [[nodiscard]] auto operator<=>(const NSIndexPath&) const = default;
 };
 
 enum class UITableViewCellStyle : NSInteger {
