@@ -1,6 +1,6 @@
-#include <cmath>
+#include "platform/NSNumber.h"
 
-#include "platform/Foundation.h"
+#include <cmath>
 
 namespace {
 

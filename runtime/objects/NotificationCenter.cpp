@@ -2,22 +2,13 @@
 
 #include <algorithm>
 
-#include "platform/MediaLibrary.h"
-#include "platform/SyncPreferences.h"
-#include "platform/SyncSessions.h"
-#include "platform/UserInterface.h"
-
-const NSNotificationName UIApplicationDidEnterBackgroundNotification =
-    "UIApplicationDidEnterBackgroundNotification";
-const NSNotificationName UIApplicationWillEnterForegroundNotification =
-    "UIApplicationWillEnterForegroundNotification";
-const NSNotificationName LMSyncPreferencesDidChangeNotification =
-    "LMSyncPreferencesDidChangeNotification";
-const NSNotificationName DVSessionsDidChangeNotification = "DVSessionsDidChangeNotification";
-const NSNotificationName MPMediaLibraryDidChangeNotification =
-    "MPMediaLibraryDidChangeNotification";
-
 namespace quorl {
+
+NotificationCenter& NotificationCenter::processWide() {
+    static auto* const center =
+        new std::shared_ptr<NotificationCenter>(create<NotificationCenter>()); // never destroyed
+    return **center;
+}
 
 void NotificationCenter::addObserver_selector_name_object(NSObject* observer,
                                                           NSNotificationSelector selector,

@@ -11,6 +11,9 @@ namespace quorl {
 /// The runtime's notification centre.
 class NotificationCenter : public NSNotificationCenter {
   public:
+    /// The one that every process has, with or without a host. It lives as long as the process.
+    [[nodiscard]] static NotificationCenter& processWide();
+
     void addObserver_selector_name_object(NSObject* observer, NSNotificationSelector selector,
                                           NSNotificationName name, const NSObject* object) override;
     void removeObserver(const NSObject* observer) override;

@@ -2,10 +2,6 @@
 
 #include <algorithm>
 
-const std::string DVSessionTypeDeviceSync = "DVSessionTypeDeviceSync";
-const std::string DVDeviceSyncSessionAssetTaskGroupingKey =
-    "DVDeviceSyncSessionAssetTaskGroupingKey";
-
 namespace quorl {
 
 void ObservedSession::addObserver(const std::shared_ptr<DVSessionObserver>& observer) {

@@ -1,3 +1,7 @@
+#include "platform/NSBundle.h"
+
+#include <map>
+
 #include <dlfcn.h>
 
 #include "runtime/plugins/PluginBundle.h"

@@ -1,12 +1,10 @@
+#include "runtime/services/SizeText.h"
+
 #include <array>
 #include <cmath>
 
 #include <unicode/measunit.h>
 #include <unicode/numberformatter.h>
-
-#include "platform/SizeFormatter.h"
-#include "runtime/host/Host.h"
-#include "runtime/services/SizeText.h"
 
 namespace quorl {
 
@@ -54,5 +52,3 @@ std::string sizeText(double bytes, const std::string& language) {
 }
 
 } // namespace quorl
-
-std::string CPFSSizeStrings(float bytes) { return quorl::Host::required().sizeText(bytes); }

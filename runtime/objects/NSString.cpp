@@ -1,9 +1,10 @@
+#include "platform/NSString.h"
+
 #include <charconv>
 #include <string>
 
 #include <unicode/numberformatter.h>
 
-#include "platform/Foundation.h"
 #include "runtime/host/Host.h"
 
 namespace {

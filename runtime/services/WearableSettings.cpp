@@ -1,3 +1,5 @@
+#include "platform/WearableSettings.h"
+
 #include "runtime/host/Host.h"
 #include "runtime/services/WearableConnection.h"
 

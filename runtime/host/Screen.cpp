@@ -3,8 +3,6 @@
 #include <algorithm>
 #include <cmath>
 
-#include "runtime/host/Host.h"
-
 namespace quorl {
 
 namespace {
@@ -51,32 +49,4 @@ void Screen::layOutLabels(UITableViewCell& cell) {
     layOut(cell.textLabel(), cell.detailTextLabel(), titleSize, detailSize, right, row.height);
 }
 
-namespace {
-
-class MainScreen final : public UIScreen {
-  public:
-    [[nodiscard]] CGFloat scale() const override { return Host::required().screen().scale(); }
-};
-
-} // namespace
-
 } // namespace quorl
-
-UIScreen& UIScreen::mainScreen() {
-    static auto* const screen = new std::shared_ptr<UIScreen>(create<quorl::MainScreen>());
-    return **screen;
-}
-
-CGRect UIRectIntegralWithScale(const CGRect& rect, CGFloat scale) {
-    // What is a whole pixel but for the error of the calculation that led to it is one.
-    constexpr CGFloat tolerance = sizeof(CGFloat) == sizeof(double) ? 1e-6 : 1e-3F;
-    const auto before = [scale](CGFloat edge) {
-        return std::floor(edge * scale + tolerance) / scale;
-    };
-    const auto after = [scale](CGFloat edge) {
-        return std::ceil(edge * scale - tolerance) / scale;
-    };
-    const CGFloat x = before(rect.x);
-    const CGFloat y = before(rect.y);
-    return {x, y, after(rect.x + rect.width) - x, after(rect.y + rect.height) - y};
-}
