@@ -91,12 +91,14 @@ class PSStateRestoration {
   public:
     virtual ~PSStateRestoration() = default;
 
-    [[nodiscard]] virtual bool canBeShownFromSuspendedState() = 0;
+    /// Unless overridden: true.
+    [[nodiscard]] virtual bool canBeShownFromSuspendedState() { return true; }
 };
 
 /// A controller that the list framework can show. A class that adopts it also derives from
 /// `UIViewController`. Parent, root and specifier are set before the pane is shown; parent and root
-/// outlive the pane and are not owned by it.
+/// outlive the pane and are not owned by it. Every other method may be left out: it does nothing
+/// then, and gives null where it gives something.
 class PSController : public PSStateRestoration {
   public:
     [[nodiscard]] virtual PSController* parentController() const = 0;
@@ -109,29 +111,39 @@ class PSController : public PSStateRestoration {
     virtual void setSpecifier(std::shared_ptr<PSSpecifier> specifier) = 0;
 
     /// Shows another controller over this one.
-    virtual void showController(const std::shared_ptr<PSController>& controller) = 0;
-    virtual void showController_animate(const std::shared_ptr<PSController>& controller,
-                                        bool animate) = 0;
+    virtual void showController(const std::shared_ptr<PSController>& /*controller*/) {}
+
+    virtual void showController_animate(const std::shared_ptr<PSController>& /*controller*/,
+                                        bool /*animate*/) {}
 
     /// Opens what `url` names within the pane.
-    virtual void handleURL(const std::string& url) = 0;
+    virtual void handleURL(const std::string& /*url*/) {}
 
     [[nodiscard]] virtual std::shared_ptr<NSObject>
-    readPreferenceValue(const std::shared_ptr<PSSpecifier>& specifier) = 0;
-    virtual void setPreferenceValue_specifier(const std::shared_ptr<NSObject>& value,
-                                              const std::shared_ptr<PSSpecifier>& specifier) = 0;
+    readPreferenceValue(const std::shared_ptr<PSSpecifier>& /*specifier*/) {
+        return nullptr;
+    }
+
+    virtual void setPreferenceValue_specifier(const std::shared_ptr<NSObject>& /*value*/,
+                                              const std::shared_ptr<PSSpecifier>& /*specifier*/) {}
 
     /// What happens to the app and the device while the pane is there.
-    virtual void suspend() = 0;
-    virtual void didLock() = 0;
-    virtual void willUnlock() = 0;
-    virtual void didUnlock() = 0;
-    virtual void didWake() = 0;
-    virtual void willBecomeActive() = 0;
-    virtual void willResignActive() = 0;
+    virtual void suspend() {}
+
+    virtual void didLock() {}
+
+    virtual void willUnlock() {}
+
+    virtual void didUnlock() {}
+
+    virtual void didWake() {}
+
+    virtual void willBecomeActive() {}
+
+    virtual void willResignActive() {}
 
     /// The bar at the top of the screen is about to change its height by `height` points.
-    virtual void statusBarWillAnimateByHeight(double height) = 0;
+    virtual void statusBarWillAnimateByHeight(double /*height*/) {}
 };
 
 /// How lists look, as the host set it.
@@ -174,19 +186,6 @@ class PSListController : public UIViewController, public PSController {
     void showController_animate(const std::shared_ptr<PSController>& controller,
                                 bool animate) override;
     void handleURL(const std::string& url) override;
-    [[nodiscard]] std::shared_ptr<NSObject>
-    readPreferenceValue(const std::shared_ptr<PSSpecifier>& specifier) override;
-    void setPreferenceValue_specifier(const std::shared_ptr<NSObject>& value,
-                                      const std::shared_ptr<PSSpecifier>& specifier) override;
-    void suspend() override;
-    void didLock() override;
-    void willUnlock() override;
-    void didUnlock() override;
-    void didWake() override;
-    void willBecomeActive() override;
-    void willResignActive() override;
-    void statusBarWillAnimateByHeight(double height) override;
-    [[nodiscard]] bool canBeShownFromSuspendedState() override;
 
   protected:
     /// The cached rows; null until `specifiers` has built them.

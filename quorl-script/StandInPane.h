@@ -26,39 +26,6 @@ class StandInPane final : public UIViewController, public PSController {
         specifier_ = std::move(specifier);
     }
 
-    void showController(const std::shared_ptr<PSController>& /*controller*/) override {}
-
-    void showController_animate(const std::shared_ptr<PSController>& /*controller*/,
-                                bool /*animate*/) override {}
-
-    void handleURL(const std::string& /*url*/) override {}
-
-    [[nodiscard]] std::shared_ptr<NSObject>
-    readPreferenceValue(const std::shared_ptr<PSSpecifier>& /*specifier*/) override {
-        return nullptr;
-    }
-
-    void setPreferenceValue_specifier(const std::shared_ptr<NSObject>& /*value*/,
-                                      const std::shared_ptr<PSSpecifier>& /*specifier*/) override {}
-
-    void suspend() override {}
-
-    void didLock() override {}
-
-    void willUnlock() override {}
-
-    void didUnlock() override {}
-
-    void didWake() override {}
-
-    void willBecomeActive() override {}
-
-    void willResignActive() override {}
-
-    void statusBarWillAnimateByHeight(double /*height*/) override {}
-
-    [[nodiscard]] bool canBeShownFromSuspendedState() override { return true; }
-
   private:
     std::string className_;
     PSController* parentController_ = nullptr;

@@ -125,30 +125,3 @@ void PSListController::show(const std::shared_ptr<PSController>& controller,
 }
 
 void PSListController::handleURL(const std::string& url) { screen().listWillHandleURL(*this, url); }
-
-std::shared_ptr<NSObject>
-PSListController::readPreferenceValue(const std::shared_ptr<PSSpecifier>& /*specifier*/) {
-    return nullptr;
-}
-
-void PSListController::setPreferenceValue_specifier(
-    const std::shared_ptr<NSObject>& /*value*/, const std::shared_ptr<PSSpecifier>& /*specifier*/) {
-}
-
-void PSListController::suspend() {}
-
-void PSListController::didLock() {}
-
-void PSListController::willUnlock() {}
-
-void PSListController::didUnlock() {}
-
-void PSListController::didWake() {}
-
-void PSListController::willBecomeActive() {}
-
-void PSListController::willResignActive() {}
-
-void PSListController::statusBarWillAnimateByHeight(double /*height*/) {}
-
-bool PSListController::canBeShownFromSuspendedState() { return true; }
