@@ -5,6 +5,11 @@
 #include <memory>
 #include <utility>
 
+/// How an object holds what is associated with it.
+enum NSAssociationPolicy : std::uintptr_t {
+    OBJC_ASSOCIATION_RETAIN_NONATOMIC = 1, ///< owns it, not atomically
+};
+
 /// The base of every class of the platform and of its plug-ins.
 ///
 /// Objects are made by `create`, which keeps construction in two steps: the constructor cannot
@@ -29,7 +34,7 @@ class NSObject : public std::enable_shared_from_this<NSObject> {
     struct AssociatedObjects;
     friend std::shared_ptr<NSObject> objc_getAssociatedObject(const NSObject&, const void*);
     friend void objc_setAssociatedObject(NSObject&, const void*, std::shared_ptr<NSObject>,
-                                         std::uintptr_t);
+                                         NSAssociationPolicy);
 
     std::unique_ptr<AssociatedObjects> _associatedObjects;
 };
@@ -62,15 +67,11 @@ template <std::derived_from<NSObject> T>
     return strong(object);
 }
 
-/// The ownership policy of an associated object: owned, not atomic.
-inline constexpr std::uintptr_t OBJC_ASSOCIATION_RETAIN_NONATOMIC = 1;
-
 /// The object that is attached to `object` under `key`, or null.
 [[nodiscard]] std::shared_ptr<NSObject> objc_getAssociatedObject(const NSObject& object,
                                                                  const void* key);
 
 /// Attaches `value` to `object` under `key`, in place of what was there; null detaches. `object`
-/// owns `value` and lets go of it in its own destruction. `policy` is
-/// `OBJC_ASSOCIATION_RETAIN_NONATOMIC`.
+/// owns `value` and lets go of it in its own destruction.
 void objc_setAssociatedObject(NSObject& object, const void* key, std::shared_ptr<NSObject> value,
-                              std::uintptr_t policy);
+                              NSAssociationPolicy policy);

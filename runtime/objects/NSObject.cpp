@@ -24,7 +24,7 @@ std::shared_ptr<NSObject> objc_getAssociatedObject(const NSObject& object, const
 }
 
 void objc_setAssociatedObject(NSObject& object, const void* key, std::shared_ptr<NSObject> value,
-                              std::uintptr_t /*policy*/) {
+                              NSAssociationPolicy /*policy*/) {
     if (!object._associatedObjects) {
         object._associatedObjects = std::make_unique<NSObject::AssociatedObjects>();
     }
