@@ -140,13 +140,9 @@ CellLayout layoutOf(const ScriptedScreen& screen, const Field& command) {
 Json layout(Stage& stage, const Field& command) {
     ScriptedScreen& screen = stage.host.screen();
     const CellLayout layout = layoutOf(screen, command);
-
-    const auto cell = ::create<UITableViewCell>(&UITableViewCell::initWithStyle_reuseIdentifier,
-                                                UITableViewCellStyle::Value1, "PC");
-    watchLife(*cell, "LMQuorlPlaylistCell", stage.host.trace());
-    const auto labels = screen.tryLayout(*cell, layout, [&stage](UITableViewCell& laidOut) {
-        stage.plugin.layOutPlaylistCell(laidOut);
-    });
+    const auto cell = stage.plugin.newPlaylistCell();
+    watchLife(*cell, className(*cell), stage.host.trace());
+    const auto labels = screen.tryLayout(*cell, layout);
     Json set = Json::array();
     for (const UILabel* label : labels) {
         set.push_back(label == &cell->textLabel() ? "title" : "detail");

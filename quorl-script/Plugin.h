@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/Inspection.h"
 #include "platform/UserInterface.h"
 #include "quorl-script/Trace.h"
 #include "runtime/plugins/PluginBundle.h"
@@ -17,21 +18,19 @@ class Plugin {
     /// The class that its registration names.
     [[nodiscard]] const Class& rootClass() const { return rootClass_; }
 
-    /// The answers of the plug-in's sync status manager, and the id of the synced playlist. Throws
-    /// `CommandError` where the plug-in has no such objects.
+    /// What the plug-in's table of inspection answers, asked in the table's order. Throws
+    /// `CommandError` where the plug-in has no table.
     [[nodiscard]] Json status() const;
 
-    /// The plug-in's layout of a playlist cell, applied to `cell`. Throws `CommandError` where it
-    /// has none.
-    void layOutPlaylistCell(UITableViewCell& cell) const;
+    /// A new cell of the class that the plug-in shows its playlists in, never null. Throws
+    /// `CommandError` where the plug-in does not offer that class.
+    [[nodiscard]] std::shared_ptr<UITableViewCell> newPlaylistCell() const;
 
   private:
     Plugin(std::shared_ptr<PluginBundle> bundle, const Class& rootClass)
         : bundle_(std::move(bundle)), rootClass_(rootClass) {}
 
-    /// The function of the plug-in that the linker knows by `symbol`.
-    template <class Function>
-    [[nodiscard]] Function* function(const char* symbol) const;
+    [[noreturn]] void refuse(const std::string& wanted) const;
 
     std::shared_ptr<PluginBundle> bundle_;
     Class rootClass_;

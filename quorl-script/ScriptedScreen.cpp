@@ -12,11 +12,10 @@ Json pathOf(const NSIndexPath& path) { return Json::array({path.section, path.ro
 
 } // namespace
 
-std::vector<const UILabel*>
-ScriptedScreen::tryLayout(UITableViewCell& cell, const CellLayout& layout,
-                          const std::function<void(UITableViewCell&)>& layoutSubviews) {
+std::vector<const UILabel*> ScriptedScreen::tryLayout(UITableViewCell& cell,
+                                                      const CellLayout& layout) {
     layout_ = layout;
-    layoutSubviews(cell);
+    cell.layoutSubviews();
     layout_.reset();
     return std::exchange(labelsSet_, {});
 }

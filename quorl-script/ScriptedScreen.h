@@ -1,7 +1,5 @@
 #pragma once
 
-#include <functional>
-
 #include "quorl-script/Trace.h"
 #include "runtime/host/Screen.h"
 
@@ -33,11 +31,10 @@ class ScriptedScreen final : public Screen {
 
     void setLooks(Looks looks) { looks_ = std::move(looks); }
 
-    /// Calls `layoutSubviews`, which lays out `cell`, under the conditions of `layout`. Gives the
-    /// labels back whose frames were set after the standard layout, in order.
-    [[nodiscard]] std::vector<const UILabel*>
-    tryLayout(UITableViewCell& cell, const CellLayout& layout,
-              const std::function<void(UITableViewCell&)>& layoutSubviews);
+    /// Has `cell` lay itself out under the conditions of `layout`. Gives the labels back whose
+    /// frames were set after the standard layout, in order.
+    [[nodiscard]] std::vector<const UILabel*> tryLayout(UITableViewCell& cell,
+                                                        const CellLayout& layout);
 
     [[nodiscard]] CGFloat scale() const override;
 

@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <limits>
 
+QUORL_EXPORT_CLASS(LMQuorlPlaylistCell)
+
 namespace {
 
 constexpr CGFloat leftmostDetail = 80;

@@ -97,13 +97,17 @@ void PluginBundle::load() const {
 
 Class PluginBundle::rootClass() const {
     load();
-    const auto* root = static_cast<const Class*>(symbol("QuorlClass_" + registration_.rootClass));
+    const Class* root = exportedClass(registration_.rootClass);
     if (!root) {
         throw BundleError(directory_ / registration_.library,
                           "it does not offer the class \"" + registration_.rootClass +
                               "\" that its registration names; install the plug-in again");
     }
     return *root;
+}
+
+const Class* PluginBundle::exportedClass(const std::string& name) const {
+    return static_cast<const Class*>(symbol("QuorlClass_" + name));
 }
 
 void* PluginBundle::symbol(const std::string& name) const {

@@ -48,6 +48,10 @@ class PluginBundle : public NSBundle {
     /// object is missing, damaged, cannot be loaded, or does not offer that class.
     [[nodiscard]] Class rootClass() const;
 
+    /// A class that the shared object, which `rootClass` has loaded, exports under this name; null
+    /// where it exports none.
+    [[nodiscard]] const Class* exportedClass(const std::string& name) const;
+
     /// The address of a symbol of the shared object, which `rootClass` has loaded; null where it
     /// has none of that name.
     [[nodiscard]] void* symbol(const std::string& name) const;
