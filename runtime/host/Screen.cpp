@@ -15,13 +15,14 @@ CGRect centred(CGFloat x, CGFloat width, CGFloat height, CGFloat rowHeight) {
     return {x, (rowHeight - height) / 2, width, height};
 }
 
-/// The title on the left as wide as it wants to be, the detail right-aligned in what remains.
+/// The title on the left as wide as it wants to be, the detail right-aligned in what remains. The
+/// gap is free whatever the title wants: a cell that widens its detail takes from the title alone.
 void layOutSideBySide(UILabel& title, UILabel& detail, CGSize titleSize, CGSize detailSize,
                       CGFloat right, CGFloat rowHeight) {
-    const CGFloat width = std::max<CGFloat>(right - margin, 0);
+    const CGFloat taken = detailSize.width > 0 ? gap : 0;
+    const CGFloat width = std::max<CGFloat>(right - margin - taken, 0);
     titleSize.width = std::min(titleSize.width, width);
-    const CGFloat remaining = std::max<CGFloat>(width - titleSize.width - gap, 0);
-    detailSize.width = std::min(detailSize.width, remaining);
+    detailSize.width = std::min(detailSize.width, width - titleSize.width);
     title.setFrame(centred(margin, titleSize.width, titleSize.height, rowHeight));
     detail.setFrame(
         centred(right - detailSize.width, detailSize.width, detailSize.height, rowHeight));

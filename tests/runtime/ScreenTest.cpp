@@ -1,3 +1,4 @@
+#include <algorithm>
 #include <cmath>
 
 #include <gmock/gmock.h>
@@ -114,15 +115,29 @@ TEST_F(Screens, MakeRoomForACheckmark) {
     EXPECT_LT(row->detailTextLabel().frame().x, before);
 }
 
-TEST_F(Screens, GiveALongTitleTheWidthAndTheDetailWhatRemains) {
+TEST_F(Screens, GiveALongTitleTheWidthBesideAnEmptyDetail) {
     const auto row = cell(UITableViewCellStyle::Value1);
     row->textLabel().setText(std::string(100, 'x'));
-    row->detailTextLabel().setText("detail");
 
     row->layoutSubviews();
 
     EXPECT_EQ(row->textLabel().frame().width, 320 - 2 * 16);
-    EXPECT_EQ(row->detailTextLabel().frame().width, 0);
+}
+
+TEST_F(Screens, KeepAGapBetweenALongTitleAndItsDetail) {
+    for (const std::size_t length : {22U, 25U, 28U, 29U, 100U}) {
+        const auto row = cell(UITableViewCellStyle::Value1);
+        row->textLabel().setText(std::string(length, 'x'));
+        row->detailTextLabel().setText("detail");
+
+        row->layoutSubviews();
+
+        const CGRect title = row->textLabel().frame();
+        const CGRect detail = row->detailTextLabel().frame();
+        EXPECT_EQ(title.width, std::min(static_cast<CGFloat>(10 * length), CGFloat{280}));
+        EXPECT_EQ(detail.x, title.x + title.width + 8);
+        EXPECT_EQ(detail.x + detail.width, 320 - 16);
+    }
 }
 
 TEST_F(Screens, LayTheSubtitleOutBelowTheTitle) {
