@@ -1,7 +1,7 @@
 #include "platform/NSString.h"
 
 #include <charconv>
-#include <string>
+#include <optional>
 
 #include <unicode/numberformatter.h>
 
@@ -9,28 +9,35 @@
 
 namespace {
 
-/// A placeholder at the start of `text`: how long it is, and which argument it asks for. `argument`
-/// is null for `%%`, 0 for the next argument, else its number counted from 1.
+/// What asks for an argument.
 struct Placeholder {
-    std::size_t length;
-    std::optional<std::size_t> argument;
+    std::string_view written;          ///< as it stands in the format
+    std::optional<std::size_t> number; ///< of the argument, counted from 1; null for the next one
 };
 
-std::optional<Placeholder> placeholderAt(std::string_view text) {
-    if (text.starts_with("%%")) {
-        return Placeholder{2, std::nullopt};
-    }
+/// Takes the number of an argument, "2$", off the front of `text`; null where none is there.
+std::optional<std::size_t> takeNumber(std::string_view& text) {
     std::size_t number = 0;
-    std::string_view rest = text.substr(1);
-    const auto [end, error] = std::from_chars(rest.data(), rest.data() + rest.size(), number);
-    if (error == std::errc() && number > 0 && end != rest.data() + rest.size() && *end == '$') {
-        rest.remove_prefix(static_cast<std::size_t>(end - rest.data()) + 1);
-    } else {
-        number = 0;
+    const char* const end = text.data() + text.size();
+    const auto parsed = std::from_chars(text.data(), end, number);
+    if (parsed.ec != std::errc() || number == 0 || parsed.ptr == end || *parsed.ptr != '$') {
+        return std::nullopt;
     }
+    text.remove_prefix(static_cast<std::size_t>(parsed.ptr - text.data()) + 1);
+    return number;
+}
+
+/// The placeholder at the front of `text`; null where none is there.
+std::optional<Placeholder> placeholderAt(std::string_view text) {
+    if (!text.starts_with('%')) {
+        return std::nullopt;
+    }
+    std::string_view rest = text.substr(1);
+    const auto number = takeNumber(rest);
     for (const std::string_view conversion : {"tu", "@"}) {
         if (rest.starts_with(conversion)) {
-            return Placeholder{text.size() - rest.size() + conversion.size(), number};
+            rest.remove_prefix(conversion.size());
+            return Placeholder{text.substr(0, text.size() - rest.size()), number};
         }
     }
     return std::nullopt;
@@ -52,30 +59,40 @@ std::string argumentText(const NSFormatArgument& argument) {
     return count ? countText(*count) : std::get<std::string>(argument);
 }
 
+/// The arguments of a format, handed out one after the other or by number.
+class ArgumentList {
+  public:
+    explicit ArgumentList(const std::vector<NSFormatArgument>& arguments) : arguments_(arguments) {}
+
+    /// What stands in a placeholder's place: itself where there is no argument for it.
+    std::string textFor(const Placeholder& placeholder) {
+        const std::size_t index = placeholder.number ? *placeholder.number - 1 : next_++;
+        return index < arguments_.size() ? argumentText(arguments_[index])
+                                         : std::string(placeholder.written);
+    }
+
+  private:
+    const std::vector<NSFormatArgument>& arguments_;
+    std::size_t next_ = 0;
+};
+
 } // namespace
 
 std::string NSString::localizedStringWithFormat(std::string_view format,
                                                 const std::vector<NSFormatArgument>& arguments) {
+    ArgumentList list(arguments);
     std::string result;
-    std::size_t next = 0;
     while (!format.empty()) {
-        const std::size_t plain = std::min(format.find('%'), format.size());
-        result += format.substr(0, plain);
-        format.remove_prefix(plain);
-        if (format.empty()) {
-            break;
-        }
-        const auto placeholder = placeholderAt(format);
-        const std::size_t length = placeholder ? placeholder->length : 1;
-        if (placeholder && !placeholder->argument) {
+        if (format.starts_with("%%")) {
             result += '%';
+            format.remove_prefix(2);
+        } else if (const auto placeholder = placeholderAt(format)) {
+            result += list.textFor(*placeholder);
+            format.remove_prefix(placeholder->written.size());
         } else {
-            const auto wanted = placeholder ? placeholder->argument : std::nullopt;
-            const std::size_t index = !wanted ? arguments.size() : *wanted ? *wanted - 1 : next++;
-            result += index < arguments.size() ? argumentText(arguments[index])
-                                               : std::string(format.substr(0, length));
+            result += format.front();
+            format.remove_prefix(1);
         }
-        format.remove_prefix(length);
     }
     return result;
 }
