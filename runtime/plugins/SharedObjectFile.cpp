@@ -1,46 +1,34 @@
 #include "runtime/plugins/SharedObjectFile.h"
 
+#include <cstdio>
 #include <memory>
 
-#include <fcntl.h>
 #include <gelf.h>
-#include <unistd.h>
 
 namespace quorl {
 
 namespace {
 
-class FileDescriptor {
-  public:
-    explicit FileDescriptor(const std::filesystem::path& file)
-        : descriptor_(::open(file.c_str(), O_RDONLY | O_CLOEXEC)) {}
+using FileReference = std::unique_ptr<std::FILE, int (*)(std::FILE*)>;
+using ElfReference = std::unique_ptr<Elf, int (*)(Elf*)>;
 
-    FileDescriptor(const FileDescriptor&) = delete;
-    FileDescriptor& operator=(const FileDescriptor&) = delete;
+FileReference openFile(const std::filesystem::path& file) {
+    return {std::fopen(file.c_str(), "rbe"), &std::fclose};
+}
 
-    ~FileDescriptor() {
-        if (descriptor_ >= 0) {
-            ::close(descriptor_);
-        }
-    }
-
-    [[nodiscard]] int get() const { return descriptor_; }
-
-  private:
-    int descriptor_;
-};
-
-using ElfReference = std::unique_ptr<Elf, decltype(&elf_end)>;
-
-ElfReference readElf(const FileDescriptor& file) {
+/// `file` stays open as long as what is read of it.
+ElfReference readElf(std::FILE& file) {
     elf_version(EV_CURRENT);
-    return {elf_begin(file.get(), ELF_C_READ, nullptr), &elf_end};
+    return {elf_begin(fileno(&file), ELF_C_READ, nullptr), &elf_end};
 }
 
 /// Whether an object file is for the kind of machine that this process runs on.
 bool isForThisMachine(Elf* elf) {
-    const FileDescriptor program("/proc/self/exe");
-    const ElfReference own = readElf(program);
+    const FileReference program = openFile("/proc/self/exe");
+    if (!program) {
+        return false;
+    }
+    const ElfReference own = readElf(*program);
     GElf_Ehdr header{};
     GElf_Ehdr ownHeader{};
     return own && gelf_getehdr(own.get(), &ownHeader) && gelf_getehdr(elf, &header) &&
@@ -71,11 +59,11 @@ std::optional<std::string> problemOfSharedObject(const std::filesystem::path& fi
         return "this file is missing; install the plug-in again";
     }
     const auto size = std::filesystem::file_size(file, error);
-    const FileDescriptor descriptor(file);
-    if (error || descriptor.get() < 0) {
+    const FileReference opened = openFile(file);
+    if (error || !opened) {
         return "this file cannot be read; check its permissions";
     }
-    const ElfReference elf = readElf(descriptor);
+    const ElfReference elf = readElf(*opened);
     GElf_Ehdr header{};
     if (!elf || elf_kind(elf.get()) != ELF_K_ELF || gelf_getehdr(elf.get(), &header) == nullptr ||
         header.e_type != ET_DYN) {
