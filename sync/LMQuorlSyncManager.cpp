@@ -31,8 +31,12 @@ LMQuorlSyncStage stageOfPreferences() {
 
 const std::shared_ptr<LMQuorlSyncManager>& LMQuorlSyncManager::sharedManager() {
     static dispatch_once_t once;
-    static auto* const manager = new std::shared_ptr<LMQuorlSyncManager>; // never destroyed
-    dispatch_once(&once, [] { *manager = create<LMQuorlSyncManager>(); });
+    // Constant from the start, for an initialiser would bring a lock of its own beside `once`; what
+    // it comes to point to is never destroyed.
+    constinit static const std::shared_ptr<LMQuorlSyncManager>* manager = nullptr;
+    dispatch_once(&once, [] {
+        manager = new std::shared_ptr<LMQuorlSyncManager>(::create<LMQuorlSyncManager>());
+    });
     return *manager;
 }
 

@@ -20,8 +20,10 @@ struct LMQuorlSyncManagerAssetCounts {
     NSUInteger total;
 };
 
-/// Posted on the main queue, with the manager as object and once for each cause, whenever an answer
-/// of the manager may have changed.
+/// Posted on the main queue, with the manager as object: once when the manager is made, once for
+/// each change of the list of sessions or of the sync preferences, and once for each event of an
+/// observed session, except that a task has begun. Nothing else causes one: what a change of the
+/// media library does to the answers is not announced here.
 extern const NSNotificationName LMQuorlSyncStatusDidChangeNotification;
 
 /// How far music sync has got: answers computed at each request from the platform's sync sessions
@@ -29,7 +31,8 @@ extern const NSNotificationName LMQuorlSyncStatusDidChangeNotification;
 /// answers are for the main thread; session callbacks may come on any.
 class LMQuorlSyncManager : public NSObject, public DVSessionObserver {
   public:
-    /// The one manager. Any thread.
+    /// The one manager. The first call, which makes it, is for the main thread; later ones may come
+    /// on any.
     [[nodiscard]] static const std::shared_ptr<LMQuorlSyncManager>& sharedManager();
 
     [[nodiscard]] bool init() override;
