@@ -18,121 +18,84 @@ namespace {
 
 constexpr double usageLifetime = 480.0; // seconds
 
-/// What a placeholder of a sentence stands for.
-enum class Argument { Percent, Songs, Size, Remaining };
+/// How many songs a sentence speaks of, "many" being any number but one, and whether it says what
+/// is left on the wearable.
+enum class Songs { One, Many, Any };
+enum class Space { Known, Unknown };
+
+/// When a sentence is the one to say.
+struct Occasion {
+    LMQuorlSyncStage stage;
+    Songs songs;
+    Space space;
+};
 
 struct Sentence {
-    LMQuorlSyncStage stage;
-    std::optional<bool> isOneSong; ///< null for any number
-    bool isSpaceUnknown;
+    Occasion occasion;
     LocalizedText text;
-    std::array<std::optional<Argument>, 4> arguments;
 };
 
 constexpr LocalizedText noPlaylistText{
     "SYNC_SETTINGS_FOOTER_NO_PLAYLIST",
     "No songs synced to Velora. Pick a playlist to sync songs for local playback."};
 
-constexpr auto percent = Argument::Percent;
-constexpr auto songs = Argument::Songs;
-constexpr auto size = Argument::Size;
-constexpr auto remaining = Argument::Remaining;
-
+// What a sentence has placeholders for follows from its occasion: the percentage while syncing, the
+// number of songs where they are many, always their size, and what is left where that is known.
 constexpr std::array sentences{
-    Sentence{LMQuorlSyncStageIdle,
-             true,
-             true,
+    Sentence{{LMQuorlSyncStageIdle, Songs::One, Space::Unknown},
              {"SYNC_SETTINGS_FOOTER_SYNCED_1_SONG_UNKNOWN_SPACE_REMAINING",
-              "1 song synced to Velora, taking up %@."},
-             {size}},
-    Sentence{LMQuorlSyncStageIdle,
-             true,
-             false,
+              "1 song synced to Velora, taking up %@."}},
+    Sentence{{LMQuorlSyncStageIdle, Songs::One, Space::Known},
              {"SYNC_SETTINGS_FOOTER_SYNCED_1_SONG",
-              "1 song synced to Velora, taking up %@ with %@ remaining."},
-             {size, remaining}},
-    Sentence{LMQuorlSyncStageIdle,
-             false,
-             true,
+              "1 song synced to Velora, taking up %@ with %@ remaining."}},
+    Sentence{{LMQuorlSyncStageIdle, Songs::Many, Space::Unknown},
              {"SYNC_SETTINGS_FOOTER_SYNCED_N_SONGS_UNKNOWN_SPACE_REMAINING",
-              "%tu songs synced to Velora, taking up %@."},
-             {songs, size}},
-    Sentence{LMQuorlSyncStageIdle,
-             false,
-             false,
+              "%tu songs synced to Velora, taking up %@."}},
+    Sentence{{LMQuorlSyncStageIdle, Songs::Many, Space::Known},
              {"SYNC_SETTINGS_FOOTER_SYNCED_MB_N_SONGS",
-              "%tu songs synced to Velora, taking up %@ with %@ remaining."},
-             {songs, size, remaining}},
-    Sentence{LMQuorlSyncStagePending,
-             true,
-             true,
+              "%tu songs synced to Velora, taking up %@ with %@ remaining."}},
+    Sentence{{LMQuorlSyncStagePending, Songs::One, Space::Unknown},
              {"SYNC_SETTINGS_FOOTER_SYNC_PENDING_1_SONG_UNKNOWN_SPACE_REMAINING",
-              "Will sync 1 song to Velora, which will take up %@"},
-             {size}},
-    Sentence{LMQuorlSyncStagePending,
-             true,
-             false,
+              "Will sync 1 song to Velora, which will take up %@"}},
+    Sentence{{LMQuorlSyncStagePending, Songs::One, Space::Known},
              {"SYNC_SETTINGS_FOOTER_SYNC_PENDING_1_SONG",
-              "Will sync 1 song to Velora, which will take up %@ with %@ remaining."},
-             {size, remaining}},
-    Sentence{LMQuorlSyncStagePending,
-             false,
-             true,
+              "Will sync 1 song to Velora, which will take up %@ with %@ remaining."}},
+    Sentence{{LMQuorlSyncStagePending, Songs::Many, Space::Unknown},
              {"SYNC_SETTINGS_FOOTER_SYNC_PENDING_N_SONGS_UNKNOWN_SPACE_REMAINING",
-              "Will sync %tu songs to Velora, which will take up %@."},
-             {songs, size}},
-    Sentence{LMQuorlSyncStagePending,
-             false,
-             false,
+              "Will sync %tu songs to Velora, which will take up %@."}},
+    Sentence{{LMQuorlSyncStagePending, Songs::Many, Space::Known},
              {"SYNC_SETTINGS_FOOTER_SYNC_PENDING_N_SONGS",
-              "Will sync %tu songs to Velora, which will take up %@ with %@ remaining."},
-             {songs, size, remaining}},
-    Sentence{LMQuorlSyncStageIndeterminateSyncing,
-             std::nullopt,
-             true,
+              "Will sync %tu songs to Velora, which will take up %@ with %@ remaining."}},
+    Sentence{{LMQuorlSyncStageIndeterminateSyncing, Songs::Any, Space::Unknown},
              {"SYNC_SETTINGS_FOOTER_INDETERMINATE_SYNC_UNKNOWN_SPACE_REMAINING",
-              "Syncing music to Velora, which will take up %@."},
-             {size}},
-    Sentence{LMQuorlSyncStageIndeterminateSyncing,
-             std::nullopt,
-             false,
+              "Syncing music to Velora, which will take up %@."}},
+    Sentence{{LMQuorlSyncStageIndeterminateSyncing, Songs::Any, Space::Known},
              {"SYNC_SETTINGS_FOOTER_INDETERMINATE_SYNC",
-              "Syncing music to Velora, which will take up %@ with %@ remaining."},
-             {size, remaining}},
-    Sentence{LMQuorlSyncStageSyncing,
-             true,
-             true,
+              "Syncing music to Velora, which will take up %@ with %@ remaining."}},
+    Sentence{{LMQuorlSyncStageSyncing, Songs::One, Space::Unknown},
              {"SYNC_SETTINGS_FOOTER_SYNCING_1_SONG_UNKNOWN_SPACE_REMAINING",
-              "Currently %tu%% through syncing 1 song to Velora, which will take up %@."},
-             {percent, size}},
-    Sentence{LMQuorlSyncStageSyncing,
-             true,
-             false,
+              "Currently %tu%% through syncing 1 song to Velora, which will take up %@."}},
+    Sentence{{LMQuorlSyncStageSyncing, Songs::One, Space::Known},
              {"SYNC_SETTINGS_FOOTER_SYNCING_1_SONG",
               "Currently %tu%% through syncing 1 song to Velora, which will take up %@ with %@ "
-              "remaining."},
-             {percent, size, remaining}},
-    Sentence{LMQuorlSyncStageSyncing,
-             false,
-             true,
+              "remaining."}},
+    Sentence{{LMQuorlSyncStageSyncing, Songs::Many, Space::Unknown},
              {"SYNC_SETTINGS_FOOTER_SYNCING_N_SONGS_UNKNOWN_SPACE_REMAINING",
-              "Currently %tu%% through syncing %tu songs to Velora, which will take up %@."},
-             {percent, songs, size}},
-    Sentence{LMQuorlSyncStageSyncing,
-             false,
-             false,
+              "Currently %tu%% through syncing %tu songs to Velora, which will take up %@."}},
+    Sentence{{LMQuorlSyncStageSyncing, Songs::Many, Space::Known},
              {"SYNC_SETTINGS_FOOTER_SYNCING_N_SONGS",
               "Currently %tu%% through syncing %tu songs to Velora, which will take up %@ with %@ "
-              "remaining."},
-             {percent, songs, size, remaining}},
+              "remaining."}},
 };
 
 /// Null for a stage that has no sentence.
-const Sentence* sentenceFor(NSInteger stage, NSUInteger songCount, bool isSpaceUnknown) {
+const Sentence* sentenceFor(NSInteger stage, NSUInteger songCount, Space space) {
+    const Songs songs = songCount == 1 ? Songs::One : Songs::Many;
     const auto* found =
         std::find_if(sentences.begin(), sentences.end(), [=](const Sentence& sentence) {
-            return sentence.stage == stage && sentence.isSpaceUnknown == isSpaceUnknown &&
-                   sentence.isOneSong.value_or(songCount == 1) == (songCount == 1);
+            const auto& [itsStage, itsSongs, itsSpace] = sentence.occasion;
+            return itsStage == stage && itsSpace == space &&
+                   (itsSongs == songs || itsSongs == Songs::Any);
         });
     return found == sentences.end() ? nullptr : found;
 }
@@ -152,7 +115,8 @@ Limits limitsOf(NSUInteger type, NSUInteger amount) {
     return limits;
 }
 
-struct Selection {
+/// What of a playlist fits within the limits.
+struct Fit {
     NSUInteger songs = 0;
     std::uint64_t bytes = 0;
 };
@@ -165,23 +129,40 @@ std::uint64_t fileSize(const MPMediaItem& item) {
 
 /// The songs from the top of the playlist to the first one that does not fit; later ones are not
 /// tried.
-Selection songsWithin(const Limits& limits, const std::shared_ptr<MPMediaPlaylist>& playlist) {
-    Selection selection;
+Fit songsWithin(const Limits& limits, const std::shared_ptr<MPMediaPlaylist>& playlist) {
+    Fit fit;
     const auto items = playlist ? playlist->items() : nullptr;
     for (const auto& item : elements(items)) {
-        const std::uint64_t bytes = selection.bytes + fileSize(*item);
-        if (bytes > limits.bytes || selection.songs == limits.songs) {
+        const std::uint64_t bytes = fit.bytes + fileSize(*item);
+        if (bytes > limits.bytes || fit.songs == limits.songs) {
             break;
         }
-        selection.bytes = bytes;
-        ++selection.songs;
+        fit.bytes = bytes;
+        ++fit.songs;
     }
-    return selection;
+    return fit;
 }
 
 NSUInteger syncedPercent() {
     const float progress = LMQuorlSyncManager::sharedManager()->progress();
     return NSSaturatingTruncate<NSUInteger>(static_cast<double>(progress) * 100.0);
+}
+
+/// In the order of the placeholders. The progress is asked for only where it is spoken of.
+std::vector<NSFormatArgument> argumentsFor(const Occasion& occasion, NSUInteger songCount,
+                                           const std::string& size, const std::string& remaining) {
+    std::vector<NSFormatArgument> arguments;
+    if (occasion.stage == LMQuorlSyncStageSyncing) {
+        arguments.emplace_back(syncedPercent());
+    }
+    if (occasion.songs == Songs::Many) {
+        arguments.emplace_back(songCount);
+    }
+    arguments.emplace_back(size);
+    if (occasion.space == Space::Known) {
+        arguments.emplace_back(remaining);
+    }
+    return arguments;
 }
 
 double figure(const std::map<std::string, std::shared_ptr<NSNumber>, std::less<>>& usage,
@@ -234,14 +215,18 @@ void LMQuorlSettingsController::_updateLimitFooterTextWithAvailableDeviceBytes()
     const NSUInteger type = defaults.assetSyncLimitType();
     const auto limit = defaults.assetSyncLimit();
     const Limits limits = limitsOf(type, limit ? limit->unsignedIntegerValue() : 0);
-    const Selection selection = songsWithin(limits, assetSyncPlaylist(defaults));
-    const std::uint64_t bytes = std::min(selection.bytes, limits.bytes);
+    const Fit fit = songsWithin(limits, assetSyncPlaylist(defaults));
+    // Whatever the items say of their sizes, the pane shows no more than the user allowed.
+    const std::uint64_t bytes = std::min(fit.bytes, limits.bytes);
 
     const LMQuorlSyncStage stage = LMQuorlSyncManager::sharedManager()->syncStage();
+    // Asked once more, after the stage: another process may have switched sync off or made another
+    // choice meanwhile, and the sentence is about what is chosen now.
     LMSyncDefaults& current = LMSyncDefaults::sharedDefaults();
-    const bool isSyncing = current.isAssetSyncEnabled() && assetSyncPlaylist(current) != nullptr;
-    const auto text = isSyncing ? _limitFooterSentence(stage, selection.songs, bytes)
-                                : std::optional(localized(*this, noPlaylistText));
+    const bool isOnAndChosen =
+        current.isAssetSyncEnabled() && assetSyncPlaylist(current) != nullptr;
+    const auto text = isOnAndChosen ? _limitFooterSentence(stage, fit.songs, bytes)
+                                    : std::optional(localized(*this, noPlaylistText));
     if (_limitGroupSpecifier) {
         _limitGroupSpecifier->setProperty_forKey(text, PSFooterTextGroupKey);
     }
@@ -252,28 +237,17 @@ std::optional<std::string>
 LMQuorlSettingsController::_limitFooterSentence(NSInteger stage, NSUInteger songCount,
                                                 std::uint64_t bytes) const {
     const std::string sizeText = CPFSSizeStrings(static_cast<float>(bytes));
-    const bool isSpaceUnknown = _isAvailableDeviceBytesOutOfDate();
+    const Space space = _isAvailableDeviceBytesOutOfDate() ? Space::Unknown : Space::Known;
     std::string remainingText = "?";
     // Asked again on purpose: the figure may have turned stale since the line above.
     if (!_isAvailableDeviceBytesOutOfDate()) {
         remainingText =
             CPFSSizeStrings(static_cast<float>(_deviceBytesRemaining->unsignedLongLongValue()));
     }
-    const Sentence* sentence = sentenceFor(stage, songCount, isSpaceUnknown);
+    const Sentence* sentence = sentenceFor(stage, songCount, space);
     if (!sentence) {
         return std::nullopt;
     }
-    std::vector<NSFormatArgument> arguments;
-    for (const auto& argument : sentence->arguments) {
-        if (argument == Argument::Percent) {
-            arguments.emplace_back(syncedPercent());
-        } else if (argument == Argument::Songs) {
-            arguments.emplace_back(songCount);
-        } else if (argument == Argument::Size) {
-            arguments.emplace_back(sizeText);
-        } else if (argument == Argument::Remaining) {
-            arguments.emplace_back(remainingText);
-        }
-    }
+    const auto arguments = argumentsFor(sentence->occasion, songCount, sizeText, remainingText);
     return NSString::localizedStringWithFormat(localized(*this, sentence->text), arguments);
 }
