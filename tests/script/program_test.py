@@ -126,6 +126,50 @@ class Output(unittest.TestCase):
         self.assertIn(b"standard output", problem)
 
 
+class Inspection(unittest.TestCase):
+    LAYOUT = {"do": "layout", "title": [16, 10, 150, 20], "detail": [200, 10, 60, 20], "fits": 100, "scale": 2}
+
+    def setUp(self):
+        folder = tempfile.TemporaryDirectory()
+        self.addCleanup(folder.cleanup)
+        self.folder = pathlib.Path(folder.name)
+
+    def replies_of_plugin(self, library, root_class, *commands):
+        """What a plug-in of the interface of this tree answers."""
+        bundle = self.folder / "Other.bundle"
+        bundle.mkdir()
+        shutil.copy(library, bundle)
+        registration = json.loads((BUNDLES / "VeloraMusic.bundle/registration.json").read_text())
+        registration.update(library=pathlib.Path(library).name, rootClass=root_class)
+        (bundle / "registration.json").write_text(json.dumps(registration))
+        script = "".join(json.dumps(command) + "\n" for command in commands)
+        return replies(play(script.encode(), "--plugins", self.folder))
+
+    def test_asks_each_answer_once_and_in_order(self):
+        (reply,) = self.replies_of_plugin(os.environ["COUNTING_PLUGIN"], "CountingPane", {"do": "query"})
+
+        self.assertEqual(reply, {
+            "ok": True, "trace": [], "stage": 1, "progress": 2, "completedAssetCount": 3,
+            "totalAssetCount": 4, "assetSyncPlaylist": "5"})
+
+    def test_says_so_where_a_plugin_shows_nothing(self):
+        query, layout, after = self.replies_of_plugin(
+            os.environ["PLAIN_PLUGIN"], "TestPane", {"do": "query"}, self.LAYOUT, {"do": "open"})
+
+        for reply, wanted in ((query, "QuorlInspectionTable"), (layout, "LMQuorlPlaylistCell")):
+            self.assertFalse(reply["ok"])
+            self.assertIn("Other.bundle", reply["error"])
+            self.assertIn(wanted, reply["error"])
+        self.assertTrue(after["ok"])
+
+    def test_lays_a_cell_of_the_plugins_own_class_out(self):
+        (reply,) = replies(play(json.dumps(self.LAYOUT).encode()))
+
+        self.assertEqual(reply, {
+            "ok": True, "trace": [["dealloc", "LMQuorlPlaylistCell"]],
+            "title": [16, 10, 110, 20], "detail": [160, 10, 100, 20], "set": ["detail", "title"]})
+
+
 class Guide(unittest.TestCase):
     def test_every_example_of_the_guide_can_be_played(self):
         guide = (ROOT / "docs/scripting.md").read_text(encoding="utf-8")
