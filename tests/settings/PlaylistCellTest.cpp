@@ -54,6 +54,16 @@ TEST_F(PlaylistCell, TakesFromTheNameWhatTheStatusLacks) {
     EXPECT_EQ(title(), (CGRect{16, 12, 140, 20}));
 }
 
+TEST_F(PlaylistCell, KeepsTheGapThatTheRuntimeLeavesBesideALongName) {
+    cell_->textLabel().setText(std::string(100, 'n'));
+    cell_->detailTextLabel().setText("Synced");
+
+    cell_->layoutSubviews();
+
+    EXPECT_EQ(detail().width, 60);
+    EXPECT_EQ(detail().x, title().x + title().width + 8);
+}
+
 TEST_F(PlaylistCell, LetsTheStatusBeginNoFurtherLeftThan80) {
     layOut({16, 12, 100, 20}, {120, 12, 60, 20}, 150);
 
