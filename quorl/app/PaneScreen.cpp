@@ -1,5 +1,9 @@
 #include "quorl/app/PaneScreen.h"
 
+#include <QPointer>
+
+#include "platform/Dispatch.h"
+
 namespace quorl {
 
 namespace {
@@ -19,6 +23,18 @@ void PaneScreen::scheduleDrawing() {
     if (!timer_.isActive()) {
         timer_.start();
     }
+}
+
+void PaneScreen::whenDrawn(QObject& waiting, std::function<void()> next) {
+    constexpr auto once =
+        static_cast<Qt::ConnectionType>(Qt::QueuedConnection | Qt::SingleShotConnection);
+    dispatch_async(dispatch_get_main_queue(),
+                   [this, waiting = QPointer(&waiting), next = std::move(next)] {
+                       if (waiting) {
+                           connect(this, &PaneScreen::drawing, waiting, next, once);
+                           scheduleDrawing();
+                       }
+                   });
 }
 
 UIColor PaneScreen::tintColor() const { return tint; }

@@ -2,6 +2,7 @@
 
 #include <QObject>
 #include <QTimer>
+#include <functional>
 
 #include "runtime/host/Screen.h"
 
@@ -17,6 +18,10 @@ class PaneScreen : public QObject, public Screen {
 
     /// Has `drawing` emitted soon.
     void scheduleDrawing();
+
+    /// Has `next` called behind all that the main queue holds now and behind the drawing that this
+    /// leads to; not at all where `waiting` is gone by then.
+    void whenDrawn(QObject& waiting, std::function<void()> next);
 
     [[nodiscard]] UIColor tintColor() const override;
     [[nodiscard]] std::optional<UIColor> listTextColor() const override;

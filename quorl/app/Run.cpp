@@ -7,6 +7,8 @@
 #include <iostream>
 #include <optional>
 
+#include <unistd.h>
+
 #include "quorl/reports/Screenshot.h"
 #include "quorl/terminal/TextScreen.h"
 #include "quorl/terminal/TextSession.h"
@@ -73,7 +75,7 @@ ExitCode runInTerminal(char* program, const Options& options) {
     TextScreen screen;
     Notices notices;
     Companion companion(options, screen, notices);
-    const TextSession session(companion);
+    const TextSession session(companion, STDIN_FILENO, std::cout);
     companion.start();
     return static_cast<ExitCode>(QCoreApplication::exec());
 }

@@ -1,5 +1,6 @@
 #include "quorl/content/ListContent.h"
 
+#include <algorithm>
 #include <limits>
 
 #include "quorl/content/SwitchCell.h"
@@ -71,6 +72,20 @@ void ListContent::draw(NSInteger /*firstRow*/, NSInteger /*rowsOnScreen*/) {
     }
 }
 
+/// A list that is drawn anew for its texts keeps its rows.
+bool ListContent::isCurrent() const {
+    auto* list = dynamic_cast<PSListController*>(pane_.get());
+    if (!list) {
+        return true;
+    }
+    const auto& drawn = ListView::of(*list).rows();
+    const auto now = elements<PSSpecifier>(list->specifiers());
+    return std::equal(drawn.begin(), drawn.end(), now.begin(), now.end(),
+                      [](const ListView::Row& row, const std::shared_ptr<PSSpecifier>& specifier) {
+                          return row.specifier == specifier;
+                      });
+}
+
 const ListContent::Row* ListContent::rowAt(NSInteger row) const {
     return row >= 0 && row < static_cast<NSInteger>(rows_.size())
                ? &rows_[static_cast<std::size_t>(row)]
@@ -84,10 +99,10 @@ std::shared_ptr<UITableViewCell> ListContent::cell(NSInteger row) const {
 
 std::shared_ptr<UITableViewCell> ListContent::cellAnywhere(NSInteger row) { return cell(row); }
 
-void ListContent::tap(NSInteger row) {
+bool ListContent::tap(NSInteger row) {
     const Row* found = rowAt(row);
-    if (!found) {
-        return;
+    if (!found || !isCurrent()) {
+        return false;
     }
     const std::shared_ptr specifier = found->specifier;
     if (const auto* toggle = dynamic_cast<const SwitchCell*>(found->cell.get())) {
@@ -95,6 +110,7 @@ void ListContent::tap(NSInteger row) {
     } else {
         navigation_.open(specifier);
     }
+    return true;
 }
 
 std::optional<NSInteger> ListContent::row(const UITableView& /*table*/,

@@ -16,9 +16,10 @@ class ListContent final : public PaneContent {
 
     [[nodiscard]] const std::vector<Section>& sections() const override { return sections_; }
 
+    [[nodiscard]] bool isCurrent() const override;
     [[nodiscard]] std::shared_ptr<UITableViewCell> cell(NSInteger row) const override;
     [[nodiscard]] std::shared_ptr<UITableViewCell> cellAnywhere(NSInteger row) override;
-    void tap(NSInteger row) override;
+    bool tap(NSInteger row) override;
     [[nodiscard]] std::optional<NSInteger> row(const UITableView& table,
                                                const NSIndexPath& path) const override;
 

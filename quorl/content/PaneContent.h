@@ -33,15 +33,20 @@ class PaneContent {
     /// As last drawn.
     [[nodiscard]] virtual const std::vector<Section>& sections() const = 0;
 
+    /// Whether the pane still has the rows that were drawn last. Where it has not, nobody has seen
+    /// its rows, and none can be tapped before the next drawing.
+    [[nodiscard]] virtual bool isCurrent() const = 0;
+
     /// The cell of a row as last drawn; null for a row that is not on the screen.
     [[nodiscard]] virtual std::shared_ptr<UITableViewCell> cell(NSInteger row) const = 0;
 
-    /// The cell of any row of the pane, made for this call where the row is not on the screen; null
-    /// for no such row.
+    /// The cell of any row, made for this call where the row is not on the screen; null for no such
+    /// row, and off the screen while the rows are not current.
     [[nodiscard]] virtual std::shared_ptr<UITableViewCell> cellAnywhere(NSInteger row) = 0;
 
-    /// What a finger on a row of the screen does; nothing where there is no such row.
-    virtual void tap(NSInteger row) = 0;
+    /// What a finger on a row does. It reaches what was last drawn or nothing: false where the rows
+    /// are not current or this one is not on the screen.
+    virtual bool tap(NSInteger row) = 0;
 
     /// The row at `path` of `table`, or null where that is another pane's table.
     [[nodiscard]] virtual std::optional<NSInteger> row(const UITableView& table,

@@ -9,7 +9,6 @@ namespace quorl {
 TableView& TableContent::table() const { return TableView::of(*pane_); }
 
 void TableContent::draw(NSInteger firstRow, NSInteger rowsOnScreen) {
-    rowsOnScreen_ = rowsOnScreen;
     table().setRowsOnScreen(rowsOnScreen);
     table().scrollToRow(firstRow);
     quorl::draw(*pane_);
@@ -25,8 +24,7 @@ void TableContent::draw(NSInteger firstRow, NSInteger rowsOnScreen) {
     }
 }
 
-/// The pane may have other rows than those drawn last, and must not be asked for any other.
-void TableContent::drawAgain() { draw(table().firstRow(), rowsOnScreen_); }
+bool TableContent::isCurrent() const { return table().isLoaded(); }
 
 std::shared_ptr<UITableViewCell> TableContent::cell(NSInteger row) const {
     const auto found = cells_.find(row);
@@ -34,20 +32,20 @@ std::shared_ptr<UITableViewCell> TableContent::cell(NSInteger row) const {
 }
 
 std::shared_ptr<UITableViewCell> TableContent::cellAnywhere(NSInteger row) {
-    drawAgain();
     if (auto onScreen = cell(row)) {
         return onScreen;
     }
-    return row >= 0 && row < table().rowCount()
+    return isCurrent() && row >= 0 && row < table().rowCount()
                ? pane_->tableView_cellForRowAtIndexPath(table(), table().pathOfRow(row))
                : nullptr;
 }
 
-void TableContent::tap(NSInteger row) {
-    drawAgain();
-    if (cells_.contains(row)) {
-        pane_->tableView_didSelectRowAtIndexPath(table(), table().pathOfRow(row));
+bool TableContent::tap(NSInteger row) {
+    if (!isCurrent() || !cells_.contains(row)) {
+        return false;
     }
+    pane_->tableView_didSelectRowAtIndexPath(table(), table().pathOfRow(row));
+    return true;
 }
 
 std::optional<NSInteger> TableContent::row(const UITableView& table,

@@ -19,20 +19,19 @@ class TableContent final : public PaneContent {
 
     [[nodiscard]] const std::vector<Section>& sections() const override { return sections_; }
 
+    [[nodiscard]] bool isCurrent() const override;
     [[nodiscard]] std::shared_ptr<UITableViewCell> cell(NSInteger row) const override;
     [[nodiscard]] std::shared_ptr<UITableViewCell> cellAnywhere(NSInteger row) override;
-    void tap(NSInteger row) override;
+    bool tap(NSInteger row) override;
     [[nodiscard]] std::optional<NSInteger> row(const UITableView& table,
                                                const NSIndexPath& path) const override;
 
   private:
     [[nodiscard]] TableView& table() const;
-    void drawAgain();
 
     std::shared_ptr<UITableViewController> pane_;
     std::vector<Section> sections_;
     std::map<NSInteger, std::shared_ptr<UITableViewCell>> cells_; ///< those on the screen
-    NSInteger rowsOnScreen_ = 0;
 };
 
 } // namespace quorl

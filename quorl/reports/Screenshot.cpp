@@ -3,8 +3,6 @@
 #include <QCoreApplication>
 #include <QImageWriter>
 #include <QPixmap>
-#include <QPointer>
-#include <QTimer>
 #include <iostream>
 
 namespace quorl {
@@ -17,21 +15,8 @@ Screenshot::Screenshot(Options options, Companion& companion, MainWindow& window
 void Screenshot::beginWhenSettled() {
     if (companion_.isSettled()) {
         disconnect(&companion_, &Companion::idle, this, nullptr);
-        waitUntilDrawn(&Screenshot::openPane);
+        companion_.screen().whenDrawn(*this, [this] { openPane(); });
     }
-}
-
-/// Goes on behind all that the main queue holds now, and behind the drawing that it leads to.
-void Screenshot::waitUntilDrawn(void (Screenshot::*next)()) {
-    // The picture may have been given up meanwhile.
-    dispatch_async(dispatch_get_main_queue(), [self = QPointer(this), next] {
-        if (self) {
-            self->companion_.screen().scheduleDrawing();
-            connect(
-                &self->companion_.screen(), &PaneScreen::drawing, self, next,
-                static_cast<Qt::ConnectionType>(Qt::QueuedConnection | Qt::SingleShotConnection));
-        }
-    });
 }
 
 void Screenshot::openPane() {
@@ -41,7 +26,7 @@ void Screenshot::openPane() {
     } else if (view && options_.pane != Options::Pane::Root) {
         view->tap(options_.pane == Options::Pane::Playlist ? 0 : 1);
     }
-    waitUntilDrawn(&Screenshot::take);
+    companion_.screen().whenDrawn(*this, [this] { take(); });
 }
 
 void Screenshot::take() {

@@ -18,7 +18,6 @@ class Screenshot final : public QObject {
   private:
     void beginWhenSettled();
     void openPane();
-    void waitUntilDrawn(void (Screenshot::*next)());
     void take();
 
     const Options options_;

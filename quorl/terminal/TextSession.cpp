@@ -19,6 +19,7 @@ namespace {
 constexpr int usualWidth = 80;
 constexpr NSInteger rowsOnScreen = 200;
 constexpr const char* hint = "A number taps the row, b goes back, q leaves.\n";
+constexpr const char* unseen = "The rows have just changed. Look again before you tap one.\n";
 
 int terminalWidth() {
     winsize size{};
@@ -44,34 +45,42 @@ std::string textOfProblem(const std::string& problem, int width) {
 
 } // namespace
 
-TextSession::TextSession(Companion& companion)
-    : companion_(companion), input_(STDIN_FILENO, QSocketNotifier::Read) {
-    input_.setEnabled(false);
-    nextLine_.setSingleShot(true);
-    connect(&companion, &Companion::libraryRead, this, [this] { input_.setEnabled(!isAtEnd_); });
+TextSession::TextSession(Companion& companion, int input, std::ostream& output)
+    : companion_(companion),
+      input_(input),
+      output_(output),
+      notifier_(input, QSocketNotifier::Read) {
+    notifier_.setEnabled(false);
+    connect(&companion, &Companion::libraryRead, this, &TextSession::readOnceDrawn,
+            Qt::SingleShotConnection);
     connect(&companion.notices(), &Notices::added, this,
             [](const std::string& text) { std::cerr << "quorl: " << text << std::endl; });
     for (const std::string& text : companion.notices().texts()) {
         std::cerr << "quorl: " << text << std::endl;
     }
     connect(&companion.screen(), &PaneScreen::drawing, this, &TextSession::show);
-    connect(&input_, &QSocketNotifier::activated, this, &TextSession::readInput);
-    connect(&nextLine_, &QTimer::timeout, this, &TextSession::takeNextLine);
+    connect(&notifier_, &QSocketNotifier::activated, this, &TextSession::readInput);
+}
+
+void TextSession::readOnceDrawn() {
+    companion_.screen().whenDrawn(*this, [this] { notifier_.setEnabled(true); });
 }
 
 void TextSession::readInput() {
     std::array<char, 4096> buffer; // NOLINT(cppcoreguidelines-pro-type-member-init): read fills it
-    const ssize_t length = read(STDIN_FILENO, buffer.data(), buffer.size());
+    const ssize_t length = read(input_, buffer.data(), buffer.size());
     if (length > 0) {
         unread_.append(buffer.data(), static_cast<std::size_t>(length));
     } else if (length == 0 || (errno != EINTR && errno != EAGAIN)) {
         isAtEnd_ = true;
-        input_.setEnabled(false);
+        notifier_.setEnabled(false);
     }
-    nextLine_.start(0);
+    if (!isWaiting_) {
+        takeNextLine(); // at once: it was written by somebody who saw the rows of this moment
+    }
 }
 
-/// One line in each turn of the loop, so that each finds what the one before has led to.
+/// Each line finds what the one before has led to.
 void TextSession::takeNextLine() {
     if (isAtEnd_ && !unread_.empty() && unread_.back() != '\n') {
         unread_ += '\n';
@@ -80,8 +89,12 @@ void TextSession::takeNextLine() {
     if (end != std::string::npos) {
         const std::string command(base::trimmed(unread_.substr(0, end)));
         unread_.erase(0, end + 1);
-        nextLine_.start(0);
         take(command);
+        isWaiting_ = true;
+        companion_.screen().whenDrawn(*this, [this] {
+            isWaiting_ = false;
+            takeNextLine();
+        });
     } else if (isAtEnd_) {
         QCoreApplication::quit();
     }
@@ -89,8 +102,8 @@ void TextSession::takeNextLine() {
 
 void TextSession::take(const std::string& command) {
     if (command == "q") {
+        unread_.clear();
         QCoreApplication::quit();
-        nextLine_.stop();
     } else if (command == "b" && companion_.navigation().stack().size() > 1) {
         companion_.navigation().pop(false);
         firstRow_ = 0;
@@ -98,7 +111,7 @@ void TextSession::take(const std::string& command) {
     } else if (command == "+" || command == "-") {
         scroll(command == "+" ? rowsOnScreen : -rowsOnScreen);
     } else if (const auto number = numberIn(command);
-               number && content_ && *number >= 1 && *number <= content_->rowCount()) {
+               number && *number > 0 && content_ && content_->cell(*number - 1)) {
         tap(*number - 1);
     } else {
         print(hint);
@@ -106,12 +119,11 @@ void TextSession::take(const std::string& command) {
 }
 
 void TextSession::tap(NSInteger row) {
-    if (!content_->cell(row)) {
-        firstRow_ = row;
-        drawContent();
-    }
     const auto* pane = companion_.navigation().top().get();
-    content_->tap(row);
+    if (!content_->tap(row)) {
+        print(unseen); // and the drawing that is due prints the rows
+        return;
+    }
     if (pane != companion_.navigation().top().get()) {
         firstRow_ = 0;
     }
@@ -130,7 +142,7 @@ void TextSession::show() {
         content_ = PaneContent::of(top, companion_.navigation());
     }
     if (top) {
-        drawContent();
+        content_->draw(firstRow_, rowsOnScreen);
     }
     const auto text = top ? textOf(*content_, terminalWidth())
                           : textOfProblem(companion_.problem(), terminalWidth());
@@ -140,8 +152,6 @@ void TextSession::show() {
     }
 }
 
-void TextSession::drawContent() { content_->draw(firstRow_, rowsOnScreen); }
-
-void TextSession::print(const std::string& text) { std::cout << text << std::flush; }
+void TextSession::print(const std::string& text) { output_ << text << std::flush; }
 
 } // namespace quorl

@@ -1,7 +1,7 @@
 #pragma once
 
 #include <QSocketNotifier>
-#include <QTimer>
+#include <iosfwd>
 #include <optional>
 #include <string>
 
@@ -17,27 +17,30 @@ class TextSession final : public QObject {
     Q_OBJECT
 
   public:
-    /// `companion` outlives the session. Reads no command before the music folder has been read, so
-    /// that a script meets the same panes each time.
-    explicit TextSession(Companion& companion);
+    /// Reads commands from the descriptor `input`, and none before the music folder has been read
+    /// and the pane been drawn, so that a script meets the same panes each time. `companion` and
+    /// `output` outlive the session, and the descriptor stays open as long.
+    TextSession(Companion& companion, int input, std::ostream& output);
 
   private:
     void readInput();
+    void readOnceDrawn();
     void takeNextLine();
     void take(const std::string& command);
     void tap(NSInteger row);
     void scroll(NSInteger rows);
     void show();
     void print(const std::string& text);
-    void drawContent();
 
     Companion& companion_;
+    const int input_;
+    std::ostream& output_;
     std::unique_ptr<PaneContent> content_; ///< of the top pane; null for none
     NSInteger firstRow_ = 0;
     std::string shown_; ///< what was printed last
-    QSocketNotifier input_;
-    QTimer nextLine_;
-    std::string unread_; ///< input that is not taken yet
+    QSocketNotifier notifier_;
+    std::string unread_;     ///< input that is not taken yet
+    bool isWaiting_ = false; ///< for what the last command leads to
     bool isAtEnd_ = false;
 };
 

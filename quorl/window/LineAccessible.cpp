@@ -93,7 +93,7 @@ QStringList LineAccessible::actionNames() const {
 }
 
 void LineAccessible::doAction(const QString& name) {
-    if (!cell()) {
+    if (!cell() || !view_.content().isCurrent()) {
         return;
     }
     view_.setCurrentRow(line().row);

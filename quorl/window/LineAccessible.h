@@ -7,8 +7,8 @@
 
 namespace quorl {
 
-/// One title, row or footer of a pane for screen readers. Says what is there at the moment of
-/// asking; it is invalid where the pane has fewer lines by now. Main thread.
+/// One title, row or footer of a pane for screen readers. Says what was drawn last;
+/// it is invalid where the pane had fewer lines then. Main thread.
 class LineAccessible final : public QAccessibleInterface, public QAccessibleActionInterface {
   public:
     /// `view` outlives this object.

@@ -63,6 +63,9 @@ void RowsView::connectScreen() {
 }
 
 void RowsView::draw() {
+    if (press_ && !content_->isCurrent()) {
+        releasePress(); // the finger came down on another row
+    }
     layOut(); // the screen's geometry is that of this view before cells are laid out
     drawRows();
     layOut();
@@ -159,6 +162,10 @@ void RowsView::setCurrentRow(NSInteger row) {
 }
 
 void RowsView::tap(NSInteger row) {
+    if (!content_->isCurrent()) {
+        releasePress();
+        return;
+    }
     highlight_.stop();
     highlightedRow_ = row;
     currentRow_ = row;
@@ -222,13 +229,15 @@ void RowsView::changeEvent(QEvent* event) {
 void RowsView::scrollContentsBy(int /*horizontally*/, int /*vertically*/) {
     press_.reset();
     fadingRows_.clear();
-    drawRows();
+    if (content_->isCurrent()) { // else the layout is not that of the rows: `draw` takes both anew
+        drawRows();
+    }
     viewport()->update();
 }
 
 void RowsView::mousePressEvent(QMouseEvent* event) {
     const auto row = layout_.rowAt(onPane(event->position()));
-    if (event->button() == Qt::LeftButton && row) {
+    if (event->button() == Qt::LeftButton && row && content_->isCurrent()) {
         press_ = Press{*row, event->position()};
         showsCurrentRow_ = false;
         highlight_.stop();

@@ -37,7 +37,7 @@ class RowsView final : public QAbstractScrollArea {
     /// The row that keys act on; null for an empty pane.
     [[nodiscard]] std::optional<NSInteger> currentRow() const;
 
-    /// What a finger on the row does.
+    /// What a finger on the row does: nothing where that is not the row that was drawn.
     void tap(NSInteger row);
 
     /// Makes a row the one that keys act on, and scrolls until it is seen.

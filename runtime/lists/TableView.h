@@ -33,6 +33,10 @@ class TableView : public UITableView {
     /// Whether the table is on the screen; it is drawn only there.
     void setOnScreen(bool onScreen) { onScreen_ = onScreen; }
 
+    /// Whether the rows are still those that were drawn last: false from `reloadData` to the next
+    /// drawing.
+    [[nodiscard]] bool isLoaded() const { return loaded_; }
+
     /// How many rows the screen shows at once.
     void setRowsOnScreen(NSInteger count);
 
@@ -67,7 +71,7 @@ class TableView : public UITableView {
 
     UITableViewController& controller_;
     bool onScreen_ = false;
-    bool loaded_ = false; ///< false from `reloadData` to the next drawing
+    bool loaded_ = false;
     NSInteger rowsOnScreen_ = 0;
     NSInteger wantedFirstRow_ = 0;
     NSInteger firstRow_ = 0;

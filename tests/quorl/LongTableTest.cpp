@@ -1,3 +1,4 @@
+#include <QAccessible>
 #include <QScrollBar>
 #include <QTest>
 
@@ -62,10 +63,20 @@ class LongTableView : public testing::Test {
         Host::install(nullptr);
     }
 
+    void reload() { table_->tableView().reloadData(); }
+
+    void press() { QTest::mousePress(view_->viewport(), Qt::LeftButton, Qt::NoModifier, finger); }
+
+    void release() {
+        QTest::mouseRelease(view_->viewport(), Qt::LeftButton, Qt::NoModifier, finger);
+    }
+
     std::string textOfRow(NSInteger row) {
         const auto cell = view_->content().cell(row);
         return cell ? cell->textLabel().text().value_or("") : "none";
     }
+
+    static constexpr QPoint finger = QPoint(100, 300);
 
     WindowScreen screen_;
     Notices notices_;
@@ -116,6 +127,58 @@ TEST_F(LongTableView, tableThatShrinksUnderTheFingerIsNotAskedForRowsItLacks) {
     QCoreApplication::processEvents();
     EXPECT_EQ(view_->layout().rowCount(), 3);
     EXPECT_EQ(textOfRow(2), "2");
+}
+
+TEST_F(LongTableView, fingerThatWasDownBeforeAReloadTapsNothing) {
+    press();
+    reload();
+    view_->draw();
+    release();
+    EXPECT_EQ(table_->selected, std::nullopt);
+}
+
+TEST_F(LongTableView, fingerThatComesDownBetweenAReloadAndItsDrawingTapsNothing) {
+    reload();
+    press();
+    view_->draw();
+    release();
+    EXPECT_EQ(table_->selected, std::nullopt);
+}
+
+TEST_F(LongTableView, fingerTapsAgainAfterTheDrawing) {
+    reload();
+    view_->draw();
+    press();
+    release();
+    EXPECT_NE(table_->selected, std::nullopt);
+}
+
+TEST_F(LongTableView, fingerStaysOnARowWhileOnlyItsTextIsTakenAnew) {
+    press();
+    const auto row = *view_->layout().rowAt(QPointF(finger));
+    table_->tableView().reloadRowsAtIndexPaths_withRowAnimation({{0, row}},
+                                                                UITableViewRowAnimation::Fade);
+    view_->draw();
+    release();
+    EXPECT_EQ(table_->selected, row);
+}
+
+TEST_F(LongTableView, keyThatScrollsToTheCurrentRowTapsNothingBeforeTheDrawing) {
+    QTest::keyClick(view_.get(), Qt::Key_End);
+    view_->verticalScrollBar()->setValue(0);
+    reload();
+    QTest::keyClick(view_.get(), Qt::Key_Space);
+    EXPECT_EQ(table_->selected, std::nullopt);
+}
+
+TEST_F(LongTableView, screenReaderPressesNoRowThatWasNotDrawn) {
+    auto* list = QAccessible::queryAccessibleInterface(view_.get());
+    auto* line = list->child(view_->layout().lineOfRow(3));
+    ASSERT_EQ(line->text(QAccessible::Name), "3");
+    reload();
+    EXPECT_EQ(line->text(QAccessible::Name), "3");
+    line->actionInterface()->doAction(QAccessibleActionInterface::pressAction());
+    EXPECT_EQ(table_->selected, std::nullopt);
 }
 
 TEST_F(LongTableView, rowsAreTallEnoughForAFinger) {

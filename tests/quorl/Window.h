@@ -20,6 +20,8 @@ class Window {
 
     [[nodiscard]] MainWindow& widget() { return window_; }
 
+    [[nodiscard]] WindowScreen& screen() { return screen_; }
+
     /// The view of the top pane.
     [[nodiscard]] RowsView& view() { return *window_.topView(); }
 

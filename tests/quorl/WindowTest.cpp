@@ -12,6 +12,8 @@ namespace quorl::tests {
 
 namespace {
 
+constexpr int patience = 60'000; // milliseconds
+
 TEST(Window, rootPaneShowsPlaylistAndLimit) {
     Window window;
     EXPECT_TRUE(window.waitForRow("Synced Playlist: None"));
@@ -71,6 +73,31 @@ TEST(Window, fingerThatMovesOffARowTapsNothing) {
                         row.center().toPoint() + QPoint(0, 200));
     QCoreApplication::processEvents();
     EXPECT_EQ(window.title(), "Music");
+}
+
+TEST(Window, fingerReachesNoPlaylistThatTheUserHasNotSeen) {
+    Window window;
+    window.click(0);
+    ASSERT_EQ(window.rows().front(), "Long Run");
+    const auto& table = dynamic_cast<UITableViewController&>(window.view().content().pane());
+    {
+        const QSignalBlocker undrawn(window.screen());
+        window.music().addPlaylist("Above All");
+        ASSERT_TRUE(QTest::qWaitFor(
+            [&table] {
+                return !table.tableView().cellForRowAtIndexPath({0, 0});
+            },
+            patience));
+        window.click(0);
+        window.press(Qt::Key_Home);
+        window.press(Qt::Key_Return);
+    }
+    EXPECT_EQ(storedPreference("asset-sync-enabled"), "false");
+    window.screen().scheduleDrawing();
+    ASSERT_TRUE(window.waitForRow("Above All"));
+    EXPECT_THAT(window.rows(), testing::Contains("✓ None"));
+    window.click(0);
+    EXPECT_TRUE(window.waitForRow("✓ Above All: Sync Pending…"));
 }
 
 TEST(Window, phoneSizedWindowScrollsOnlyUpAndDown) {
