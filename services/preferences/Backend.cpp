@@ -20,7 +20,7 @@ std::string notDconf(const char* backend) {
     const std::string text =
         "The settings are not shared with the sync engine and may be lost when "
         "the program ends, because GSettings keeps them in " +
-        std::string{backend} + " instead of dconf. ";
+        std::string(backend) + " instead of dconf. ";
     if (const char* chosen = g_getenv("GSETTINGS_BACKEND")) {
         return text + "Unset the environment variable GSETTINGS_BACKEND, which asks for '" +
                chosen + "', and start the program again.";
@@ -35,7 +35,7 @@ std::string noSessionBus(const std::string& reason) {
 
 } // namespace
 
-Backend::Backend(GSettingsSchema& schema) : backend_{g_settings_backend_get_default()} {
+Backend::Backend(GSettingsSchema& schema) : backend_(g_settings_backend_get_default()) {
     const char* const name = G_OBJECT_TYPE_NAME(backend_.get());
     if (name != dconf) {
         problem_ = notDconf(name);
@@ -48,11 +48,11 @@ Backend::Backend(GSettingsSchema& schema) : backend_{g_settings_backend_get_defa
 }
 
 void Backend::keepInMemory(GSettingsSchema& schema) {
-    BackendPointer memory{g_memory_settings_backend_new()};
-    const SettingsPointer source{g_settings_new_full(&schema, backend_.get(), nullptr)};
-    const SettingsPointer target{g_settings_new_full(&schema, memory.get(), nullptr)};
+    BackendPointer memory(g_memory_settings_backend_new());
+    const SettingsPointer source(g_settings_new_full(&schema, backend_.get(), nullptr));
+    const SettingsPointer target(g_settings_new_full(&schema, memory.get(), nullptr));
     forEachPreference([&](const auto& preference) {
-        const VariantPointer value{g_settings_get_user_value(source.get(), preference.key)};
+        const VariantPointer value(g_settings_get_user_value(source.get(), preference.key));
         if (value) {
             g_settings_set_value(target.get(), preference.key, value.get());
         }
@@ -71,7 +71,7 @@ std::string Backend::connect() {
     bus_.reset();
     GError* failure = nullptr;
     bus_.reset(g_bus_get_sync(G_BUS_TYPE_SESSION, nullptr, &failure));
-    if (const ErrorPointer error{failure}) {
+    if (const auto error = ErrorPointer(failure)) {
         return noSessionBus(error->message);
     }
     g_dbus_connection_set_exit_on_close(bus_.get(), FALSE);
@@ -83,22 +83,22 @@ std::string Backend::storingProblem() {
         return problem;
     }
     GError* failure = nullptr;
-    const VariantPointer started{g_dbus_connection_call_sync(
+    const VariantPointer started(g_dbus_connection_call_sync(
         bus_.get(), "org.freedesktop.DBus", "/org/freedesktop/DBus", "org.freedesktop.DBus",
         "StartServiceByName", g_variant_new("(su)", "ca.desrt.dconf", 0U), nullptr,
-        G_DBUS_CALL_FLAGS_NONE, -1, nullptr, &failure)};
-    const ErrorPointer error{failure};
+        G_DBUS_CALL_FLAGS_NONE, -1, nullptr, &failure));
+    const ErrorPointer error(failure);
     if (!error) {
-        return std::string{
+        return std::string(
                    "The dconf service did not store it. Log in again if it hangs; otherwise make "
-                   "room on the disk, and see to it that "} +
+                   "room on the disk, and see to it that ") +
                g_get_user_config_dir() +
                "/dconf may be written and that the service runs for the same directory.";
     }
     if (g_dbus_connection_is_closed(bus_.get()) != FALSE) {
         return noSessionBus(error->message);
     }
-    return std::string{"The dconf service does not start ("} + error->message +
+    return std::string("The dconf service does not start (") + error->message +
            "). Install the package dconf-service, or log in again.";
 }
 

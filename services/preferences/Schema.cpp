@@ -28,30 +28,30 @@ std::string searchedDirectories() {
     if (const char* extra = g_getenv("GSETTINGS_SCHEMA_DIR")) {
         add(extra);
     }
-    add(std::filesystem::path{g_get_user_data_dir()} / schemaFolder);
+    add(std::filesystem::path(g_get_user_data_dir()) / schemaFolder);
     for (const char* const* data = g_get_system_data_dirs(); *data != nullptr; ++data) {
-        add(std::filesystem::path{*data} / schemaFolder);
+        add(std::filesystem::path(*data) / schemaFolder);
     }
     return text;
 }
 
 SchemaPointer lookUp() {
     GSettingsSchemaSource* const usual = g_settings_schema_source_get_default();
-    const SourcePointer besideProgram{g_settings_schema_source_new_from_directory(
-        directoryBesideProgram().c_str(), usual, FALSE, nullptr)};
+    const SourcePointer besideProgram(g_settings_schema_source_new_from_directory(
+        directoryBesideProgram().c_str(), usual, FALSE, nullptr));
     GSettingsSchemaSource* const source = besideProgram ? besideProgram.get() : usual;
-    return SchemaPointer{
-        source == nullptr ? nullptr : g_settings_schema_source_lookup(source, schemaID, TRUE)};
+    return SchemaPointer(
+        source == nullptr ? nullptr : g_settings_schema_source_lookup(source, schemaID, TRUE));
 }
 
 bool hasValue(GSettingsSchema& schema, const char* key, const char* type) {
     if (!g_settings_schema_has_key(&schema, key)) {
         return false;
     }
-    const KeyPointer description{g_settings_schema_get_key(&schema, key)};
+    const KeyPointer description(g_settings_schema_get_key(&schema, key));
     const char* const found =
         g_variant_type_peek_string(g_settings_schema_key_get_value_type(description.get()));
-    return found == std::string{type};
+    return found == std::string(type);
 }
 
 /// The keys that the schema lacks, or has with another type, separated by commas.
@@ -59,7 +59,7 @@ std::string misfits(GSettingsSchema& schema) {
     std::string text;
     forEachPreference([&]<class T>(const Preference<T>& preference) {
         if (!hasValue(schema, preference.key, Stored<T>::type)) {
-            text += (text.empty() ? "" : ", ") + std::string{preference.key};
+            text += (text.empty() ? "" : ", ") + std::string(preference.key);
         }
     });
     return text;
@@ -70,7 +70,7 @@ std::string misfits(GSettingsSchema& schema) {
 FoundSchema findSchema() {
     auto schema = lookUp();
     if (!schema) {
-        return {nullptr, std::string{"The settings cannot be opened, because their schema "} +
+        return {nullptr, std::string("The settings cannot be opened, because their schema ") +
                              schemaID +
                              " is in none of these directories: " + searchedDirectories() +
                              ". Install the program again; or run glib-compile-schemas on the one "
@@ -79,7 +79,7 @@ FoundSchema findSchema() {
     }
     if (const auto wrong = misfits(*schema); !wrong.empty()) {
         return {nullptr,
-                std::string{"The settings cannot be opened, because their schema "} + schemaID +
+                std::string("The settings cannot be opened, because their schema ") + schemaID +
                     " is of another version: it does not have " + wrong +
                     " as this program knows it. These directories were searched, the first "
                     "that has the schema counts: " +

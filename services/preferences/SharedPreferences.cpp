@@ -87,7 +87,7 @@ class SharedPreferences::Store {
     std::jthread thread_;
 };
 
-SharedPreferences::Store::Store(GSettingsSchema& schema) : context_{g_main_context_new()} {
+SharedPreferences::Store::Store(GSettingsSchema& schema) : context_(g_main_context_new()) {
     // GIO announces changes in the context that is the thread's default when the settings are made.
     g_main_context_push_thread_default(context_.get());
     backend_.emplace(schema);
@@ -102,7 +102,7 @@ SharedPreferences::Store::Store(GSettingsSchema& schema) : context_{g_main_conte
 
 void SharedPreferences::Store::listen(Listener listener) {
     listener_ = std::move(listener);
-    thread_ = std::jthread{[this](const std::stop_token& stop) { run(stop); }};
+    thread_ = std::jthread([this](const std::stop_token& stop) { run(stop); });
 }
 
 SharedPreferences::Store::~Store() {
@@ -120,17 +120,17 @@ SharedPreferences::Store::~Store() {
 }
 
 VariantPointer SharedPreferences::Store::read(const char* key) const {
-    const std::scoped_lock lock{touching_};
-    return VariantPointer{g_settings_get_value(settings_.get(), key)};
+    const std::scoped_lock lock(touching_);
+    return VariantPointer(g_settings_get_value(settings_.get(), key));
 }
 
 WriteResult SharedPreferences::Store::write(const char* key, VariantPointer value) {
-    const std::scoped_lock lock{knowing_};
+    const std::scoped_lock lock(knowing_);
     if (equal(read(key), value)) {
         return {};
     }
     if (const auto problem = store(key, value); !problem.empty()) {
-        return {false, std::string{"The setting "} + key + " was not changed. " + problem};
+        return {false, std::string("The setting ") + key + " was not changed. " + problem};
     }
     known_.at(key).value = std::move(value);
     return {true, {}};
@@ -159,7 +159,7 @@ bool SharedPreferences::Store::tryToStore(const char* key, const VariantPointer&
     const auto before = read(key);
     ++known.echoes;
     {
-        const std::scoped_lock lock{touching_};
+        const std::scoped_lock lock(touching_);
         g_settings_set_value(settings_.get(), key, value.get());
     }
     // Waits for dconf's answer. Without it, dconf would gather the writes that follow into one.
@@ -177,7 +177,7 @@ gboolean SharedPreferences::Store::onChange(GSettings* /*settings*/, const GQuar
                                             void* store) {
     Announcement announcement;
     if (keys != nullptr) {
-        for (const GQuark key : std::span{keys, static_cast<std::size_t>(count)}) {
+        for (const GQuark key : std::span(keys, static_cast<std::size_t>(count))) {
             announcement.insert(g_quark_to_string(key));
         }
     }
@@ -199,7 +199,7 @@ void SharedPreferences::Store::run(const std::stop_token& stop) {
 }
 
 KeySet SharedPreferences::Store::takeChanges(const Announcement& announcement) {
-    const std::scoped_lock lock{knowing_};
+    const std::scoped_lock lock(knowing_);
     KeySet changes;
     for (auto& [key, known] : known_) {
         const bool isNamed = announcement.contains(key);
@@ -227,7 +227,7 @@ bool SharedPreferences::Store::takeChange(std::string_view key, Known& known, bo
     return named;
 }
 
-SharedPreferences::SharedPreferences(std::unique_ptr<Store> store) : store_{std::move(store)} {}
+SharedPreferences::SharedPreferences(std::unique_ptr<Store> store) : store_(std::move(store)) {}
 
 SharedPreferences::~SharedPreferences() = default;
 
@@ -236,8 +236,8 @@ SharedPreferences::Opened SharedPreferences::open(Changed changed) {
     if (!schema) {
         return {nullptr, std::move(schemaProblem)};
     }
-    std::unique_ptr<SharedPreferences> preferences{
-        new SharedPreferences{std::make_unique<Store>(*schema)}};
+    std::unique_ptr<SharedPreferences> preferences(
+        new SharedPreferences(std::make_unique<Store>(*schema)));
     auto& store = *preferences->store_;
     store.listen([&self = *preferences, changed = std::move(changed)](const KeySet& keys) {
         if (changed) {

@@ -17,7 +17,7 @@ struct Stored<bool> {
     static constexpr const char* type = "b";
 
     static VariantPointer wrap(bool value) {
-        return VariantPointer{g_variant_ref_sink(g_variant_new_boolean(value ? TRUE : FALSE))};
+        return VariantPointer(g_variant_ref_sink(g_variant_new_boolean(value ? TRUE : FALSE)));
     }
 
     static bool unwrap(GVariant& variant) { return g_variant_get_boolean(&variant) != FALSE; }
@@ -28,7 +28,7 @@ struct Stored<std::uint64_t> {
     static constexpr const char* type = "t";
 
     static VariantPointer wrap(std::uint64_t value) {
-        return VariantPointer{g_variant_ref_sink(g_variant_new_uint64(value))};
+        return VariantPointer(g_variant_ref_sink(g_variant_new_uint64(value)));
     }
 
     static std::uint64_t unwrap(GVariant& variant) { return g_variant_get_uint64(&variant); }
@@ -40,13 +40,13 @@ struct Stored<std::optional<std::uint64_t>> {
 
     static VariantPointer wrap(std::optional<std::uint64_t> value) {
         GVariant* const child = value ? g_variant_new_uint64(*value) : nullptr;
-        return VariantPointer{
-            g_variant_ref_sink(g_variant_new_maybe(G_VARIANT_TYPE_UINT64, child))};
+        return VariantPointer(
+            g_variant_ref_sink(g_variant_new_maybe(G_VARIANT_TYPE_UINT64, child)));
     }
 
     static std::optional<std::uint64_t> unwrap(GVariant& variant) {
-        const VariantPointer child{g_variant_get_maybe(&variant)};
-        return child ? std::optional{g_variant_get_uint64(child.get())} : std::nullopt;
+        const VariantPointer child(g_variant_get_maybe(&variant));
+        return child ? std::optional(g_variant_get_uint64(child.get())) : std::nullopt;
     }
 };
 
