@@ -5,14 +5,14 @@
 
 #include <gtest/gtest.h>
 
-#include "tests/preferences/Session.h"
+#include "tests/preferences/DesktopSession.h"
 
 namespace {
 
 using namespace quorl::preferences;
 using namespace quorl::preferences::testing;
 
-class Changes : public SessionTest {};
+class Changes : public DesktopSessionTest {};
 
 TEST_F(Changes, ByAnotherProgramAreToldWithTheKeyOnceEach) {
     Told told;

@@ -7,7 +7,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "tests/preferences/Session.h"
+#include "tests/preferences/DesktopSession.h"
 
 namespace {
 
@@ -17,7 +17,7 @@ using ::testing::AllOf;
 using ::testing::HasSubstr;
 using ::testing::StartsWith;
 
-class Failures : public SessionTest {};
+class Failures : public DesktopSessionTest {};
 
 TEST_F(Failures, OfTheSettingsServiceAreMendedByTheNextWrite) {
     Told told;

@@ -16,7 +16,7 @@
 #include <thread>
 
 #include "services/preferences/SharedPreferences.h"
-#include "tests/preferences/Text.h"
+#include "tests/preferences/ValueText.h"
 
 namespace {
 

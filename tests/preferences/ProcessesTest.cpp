@@ -4,8 +4,8 @@
 
 #include <gtest/gtest.h>
 
-#include "tests/preferences/Session.h"
-#include "tests/preferences/Text.h"
+#include "tests/preferences/DesktopSession.h"
+#include "tests/preferences/ValueText.h"
 
 namespace {
 
@@ -14,7 +14,7 @@ using namespace quorl::preferences::testing;
 
 constexpr int manyTaps = 100;
 
-class Processes : public SessionTest {};
+class Processes : public DesktopSessionTest {};
 
 TEST_F(Processes, SeeEachOfManyQuickTapsWithTheAmountBeforeTheType) {
     Bystander bystander;

@@ -8,8 +8,8 @@
 
 #include "services/preferences/Schema.h"
 #include "services/preferences/Variant.h"
-#include "tests/preferences/Session.h"
-#include "tests/preferences/Text.h"
+#include "tests/preferences/DesktopSession.h"
+#include "tests/preferences/ValueText.h"
 
 namespace {
 
@@ -18,7 +18,7 @@ using namespace quorl::preferences::testing;
 
 constexpr auto largest = std::numeric_limits<std::uint64_t>::max();
 
-class Values : public SessionTest {};
+class Values : public DesktopSessionTest {};
 
 TEST_F(Values, AreTheDefaultsAsLongAsNobodyWroteThem) {
     const auto preferences = openShared();

@@ -18,9 +18,9 @@ namespace quorl::preferences::testing {
 
 /// A test that may change what is stored: it fails outside of tests/session-run, where that would
 /// be the person's own, and begins with the defaults.
-class SessionTest : public ::testing::Test {
+class DesktopSessionTest : public ::testing::Test {
   protected:
-    SessionTest();
+    DesktopSessionTest();
 };
 
 /// Environment of a program, on top of the test's own.

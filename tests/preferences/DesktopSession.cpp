@@ -1,4 +1,4 @@
-#include "tests/preferences/Session.h"
+#include "tests/preferences/DesktopSession.h"
 
 #include <csignal>
 #include <stdexcept>
@@ -77,7 +77,7 @@ std::optional<pid_t> processOf(const std::string& owner) {
 
 } // namespace
 
-SessionTest::SessionTest() {
+DesktopSessionTest::DesktopSessionTest() {
     if (g_getenv("QUORL_TEST_BUS_CONFIG") == nullptr) {
         throw std::runtime_error{"start this test with tests/session-run"};
     }
