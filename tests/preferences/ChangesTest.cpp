@@ -147,12 +147,12 @@ TEST_F(Changes, AreToldWhileAWriterHoldsALockThatTheListenerWants) {
     std::promise<void> listened;
     const auto preferences = openShared([&](SharedPreferences&, const KeySet&) {
         listening.set_value();
-        const std::scoped_lock held{lock};
+        const std::scoped_lock held(lock);
         listened.set_value();
     });
 
     {
-        const std::scoped_lock held{lock};
+        const std::scoped_lock held(lock);
         gsettings("set", {assetSyncEnabled.key, "true"});
         listening.get_future().wait();
         EXPECT_TRUE(preferences->set(assetSyncLimit, 25).changed);

@@ -14,9 +14,9 @@ constexpr auto schemaID = "org.quorl.Velora.AssetSync";
 constexpr std::string_view folder = "/org/quorl/velora/asset-sync/";
 
 void throwOn(GError* failure) {
-    const ErrorPointer error{failure};
+    const ErrorPointer error(failure);
     if (error) {
-        throw std::runtime_error{error->message};
+        throw std::runtime_error(error->message);
     }
 }
 
@@ -32,13 +32,13 @@ std::vector<const char*> cStrings(const std::vector<std::string>& strings) {
 
 ObjectPointer<GSubprocess> spawn(const std::vector<std::string>& command, GSubprocessFlags flags,
                                  const Environment& environment) {
-    const ObjectPointer<GSubprocessLauncher> launcher{g_subprocess_launcher_new(flags)};
+    const ObjectPointer<GSubprocessLauncher> launcher(g_subprocess_launcher_new(flags));
     for (const auto& [name, value] : environment) {
         g_subprocess_launcher_setenv(launcher.get(), name.c_str(), value.c_str(), TRUE);
     }
     GError* failure = nullptr;
-    ObjectPointer<GSubprocess> process{
-        g_subprocess_launcher_spawnv(launcher.get(), cStrings(command).data(), &failure)};
+    ObjectPointer<GSubprocess> process(
+        g_subprocess_launcher_spawnv(launcher.get(), cStrings(command).data(), &failure));
     throwOn(failure);
     return process;
 }
@@ -46,12 +46,12 @@ ObjectPointer<GSubprocess> spawn(const std::vector<std::string>& command, GSubpr
 /// Calls a method of the session bus itself. Gives back null where the bus answers with an error.
 VariantPointer callBus(const char* method, const std::string& argument) {
     GError* failure = nullptr;
-    const ObjectPointer<GDBusConnection> bus{g_bus_get_sync(G_BUS_TYPE_SESSION, nullptr, &failure)};
+    const ObjectPointer<GDBusConnection> bus(g_bus_get_sync(G_BUS_TYPE_SESSION, nullptr, &failure));
     throwOn(failure);
-    return VariantPointer{g_dbus_connection_call_sync(
+    return VariantPointer(g_dbus_connection_call_sync(
         bus.get(), "org.freedesktop.DBus", "/org/freedesktop/DBus", "org.freedesktop.DBus", method,
         g_variant_new("(s)", argument.c_str()), nullptr, G_DBUS_CALL_FLAGS_NONE, -1, nullptr,
-        nullptr)};
+        nullptr));
 }
 
 /// The name of the dconf service's connection to the bus; empty where it does not run.
@@ -79,17 +79,17 @@ std::optional<pid_t> processOf(const std::string& owner) {
 
 DesktopSessionTest::DesktopSessionTest() {
     if (g_getenv("QUORL_TEST_BUS_CONFIG") == nullptr) {
-        throw std::runtime_error{"start this test with tests/session-run"};
+        throw std::runtime_error("start this test with tests/session-run");
     }
     gsettings("reset-recursively");
 }
 
 Program::Program(const std::vector<std::string>& command, const Environment& environment)
-    : process_{spawn(command,
+    : process_(spawn(command,
                      static_cast<GSubprocessFlags>(G_SUBPROCESS_FLAGS_STDIN_PIPE |
                                                    G_SUBPROCESS_FLAGS_STDOUT_PIPE),
-                     environment)},
-      output_{g_data_input_stream_new(g_subprocess_get_stdout_pipe(process_.get()))} {}
+                     environment)),
+      output_(g_data_input_stream_new(g_subprocess_get_stdout_pipe(process_.get()))) {}
 
 Program::~Program() {
     kill();
@@ -106,8 +106,8 @@ void Program::say(const std::string& line) {
 
 std::string Program::nextLine() {
     GError* failure = nullptr;
-    const std::unique_ptr<char, FreedWith<g_free>> line{
-        g_data_input_stream_read_line(output_.get(), nullptr, nullptr, &failure)};
+    const std::unique_ptr<char, FreedWith<g_free>> line(
+        g_data_input_stream_read_line(output_.get(), nullptr, nullptr, &failure));
     throwOn(failure);
     return line ? line.get() : "";
 }
@@ -120,7 +120,7 @@ bool Program::wait() {
 }
 
 Peer::Peer(const Environment& environment, const std::filesystem::path& program)
-    : program_{{program.string()}, environment}, greeting_{reply()} {}
+    : program_(std::vector<std::string>{program.string()}, environment), greeting_(reply()) {}
 
 std::string Peer::reply() {
     for (;;) {
@@ -141,7 +141,7 @@ std::string Peer::nextTold() {
     if (told_.empty()) {
         const auto line = program_.nextLine();
         if (!line.starts_with(toldPrefix)) {
-            throw std::runtime_error{"the peer said '" + line + "' instead of what it was told"};
+            throw std::runtime_error("the peer said '" + line + "' instead of what it was told");
         }
         return line.substr(toldPrefix.size());
     }
@@ -156,10 +156,10 @@ std::string run(const std::vector<std::string>& command) {
     char* text = nullptr;
     GError* failure = nullptr;
     g_subprocess_communicate_utf8(process.get(), nullptr, nullptr, &text, nullptr, &failure);
-    const std::unique_ptr<char, FreedWith<g_free>> output{text};
+    const std::unique_ptr<char, FreedWith<g_free>> output(text);
     throwOn(failure);
     if (!g_subprocess_get_successful(process.get())) {
-        throw std::runtime_error{command.front() + " failed"};
+        throw std::runtime_error(command.front() + " failed");
     }
     std::string result = output.get();
     if (result.ends_with('\n')) {
@@ -176,14 +176,14 @@ std::string gsettings(const std::string& command, const std::vector<std::string>
 
 SharedPreferences::Changed Told::callback() {
     return [this](SharedPreferences& /*preferences*/, const KeySet& keys) {
-        const std::scoped_lock lock{mutex_};
+        const std::scoped_lock lock(mutex_);
         all_.push_back(keys);
         more_.notify_one();
     };
 }
 
 KeySet Told::next() {
-    std::unique_lock lock{mutex_};
+    std::unique_lock lock(mutex_);
     more_.wait(lock, [this] { return !all_.empty(); });
     auto keys = std::move(all_.front());
     all_.pop_front();
@@ -193,7 +193,7 @@ KeySet Told::next() {
 std::unique_ptr<SharedPreferences> openShared(SharedPreferences::Changed changed) {
     auto opened = SharedPreferences::open(std::move(changed));
     if (!opened.problem.empty()) {
-        throw std::runtime_error{opened.problem};
+        throw std::runtime_error(opened.problem);
     }
     return std::move(opened.preferences);
 }
@@ -212,9 +212,9 @@ Bystander::Bystander() {
         bus_.get(), nullptr, "ca.desrt.dconf.Writer", "Notify", nullptr, nullptr,
         G_DBUS_SIGNAL_FLAGS_NONE, onSignal, this, nullptr);
     // The answer to a call comes after the subscription has taken effect.
-    const VariantPointer answer{g_dbus_connection_call_sync(
+    const VariantPointer answer(g_dbus_connection_call_sync(
         bus_.get(), "org.freedesktop.DBus", "/org/freedesktop/DBus", "org.freedesktop.DBus",
-        "GetId", nullptr, nullptr, G_DBUS_CALL_FLAGS_NONE, -1, nullptr, &failure)};
+        "GetId", nullptr, nullptr, G_DBUS_CALL_FLAGS_NONE, -1, nullptr, &failure));
     throwOn(failure);
     g_main_context_pop_thread_default(context_.get());
 }
@@ -242,10 +242,10 @@ void Bystander::onSignal(GDBusConnection* /*connection*/, const char* /*sender*/
     const char* tag = nullptr;
     const char** suffixes = nullptr;
     g_variant_get(parameters, "(&s^a&s&s)", &prefix, &suffixes, &tag);
-    const std::unique_ptr<const char*, FreedWith<g_free>> owner{suffixes};
+    const std::unique_ptr<const char*, FreedWith<g_free>> owner(suffixes);
     std::string keys;
     for (; *suffixes != nullptr; ++suffixes) {
-        const auto whole = std::string{prefix} + *suffixes;
+        const auto whole = std::string(prefix) + *suffixes;
         keys += (keys.empty() ? "" : " ") +
                 (whole.starts_with(folder) ? whole.substr(folder.size()) : whole);
     }
@@ -269,13 +269,13 @@ bool killSettingsService() {
 }
 
 SecondBus::SecondBus()
-    : address_{std::string{"unix:path="} + g_get_user_runtime_dir() + "/second-bus"} {
+    : address_(std::string("unix:path=") + g_get_user_runtime_dir() + "/second-bus") {
     start();
 }
 
 void SecondBus::start() {
     daemon_ = std::make_unique<Program>(std::vector<std::string>{
-        "dbus-daemon", std::string{"--config-file="} + g_getenv("QUORL_TEST_BUS_CONFIG"),
+        "dbus-daemon", std::string("--config-file=") + g_getenv("QUORL_TEST_BUS_CONFIG"),
         "--nofork", "--print-address", "--address=" + address_});
     // It prints its address when it can be reached.
     (void)daemon_->nextLine();

@@ -118,7 +118,7 @@ class Bystander {
                          const char* interface, const char* member, GVariant* parameters,
                          void* bystander);
 
-    ContextPointer context_{g_main_context_new()};
+    ContextPointer context_ = ContextPointer(g_main_context_new());
     ObjectPointer<GDBusConnection> bus_;
     guint subscription_ = 0;
     std::deque<std::string> seen_;

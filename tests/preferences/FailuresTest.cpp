@@ -55,14 +55,14 @@ TEST_F(Failures, OfTheSettingsServiceInTheMiddleOfAWriteAreMendedByTheWriteItsel
 
 TEST_F(Failures, OfTheSettingsServiceInTheMiddleOfWritesLoseNothingSilently) {
     const auto preferences = openShared();
-    const std::jthread writer{[&](const std::stop_token& stop) {
+    const std::jthread writer([&](const std::stop_token& stop) {
         for (std::uint64_t limit = 1; !stop.stop_requested(); ++limit) {
             const auto before = preferences->get(assetSyncLimit);
             const auto result = preferences->set(assetSyncLimit, limit);
             EXPECT_EQ(result.changed, result.problem.empty());
             EXPECT_EQ(preferences->get(assetSyncLimit), result.changed ? limit : before);
         }
-    }};
+    });
 
     for (int kills = 0; kills < 100;) {
         kills += killSettingsService() ? 1 : 0;
@@ -71,7 +71,7 @@ TEST_F(Failures, OfTheSettingsServiceInTheMiddleOfWritesLoseNothingSilently) {
 
 TEST_F(Failures, OfTheSessionBusLeaveTheValuesReadableAndAreToldByTheNextWrite) {
     SecondBus bus;
-    Peer peer{{{"DBUS_SESSION_BUS_ADDRESS", bus.address()}}};
+    Peer peer(Environment{{"DBUS_SESSION_BUS_ADDRESS", bus.address()}});
     ASSERT_EQ(peer.greeting(), "ready");
     ASSERT_EQ(peer.ask("set asset-sync-limit 25"), "stored");
 
@@ -86,7 +86,7 @@ TEST_F(Failures, OfTheSessionBusLeaveTheValuesReadableAndAreToldByTheNextWrite) 
 
 TEST_F(Failures, OfTheSessionBusAreOverWhenItIsBack) {
     SecondBus bus;
-    Peer peer{{{"DBUS_SESSION_BUS_ADDRESS", bus.address()}}};
+    Peer peer(Environment{{"DBUS_SESSION_BUS_ADDRESS", bus.address()}});
     ASSERT_EQ(peer.ask("set asset-sync-limit 25"), "stored");
 
     bus.kill();
@@ -103,7 +103,7 @@ TEST_F(Failures, OfTheSessionBusAreOverWhenItIsBack) {
 TEST_F(Failures, ToFindASessionBusLeaveSettingsThatLastAsLongAsTheProgram) {
     gsettings("set", {assetSyncLimit.key, "25"});
 
-    Peer peer{{{"DBUS_SESSION_BUS_ADDRESS", "unix:path=/nonexistent"}}};
+    Peer peer(Environment{{"DBUS_SESSION_BUS_ADDRESS", "unix:path=/nonexistent"}});
 
     EXPECT_THAT(peer.greeting(), AllOf(StartsWith("limited: "), HasSubstr("no session bus"),
                                        HasSubstr("dbus-run-session")));
@@ -115,7 +115,7 @@ TEST_F(Failures, ToFindASessionBusLeaveSettingsThatLastAsLongAsTheProgram) {
 }
 
 TEST_F(Failures, ToFindDconfSayWhichPackageIsMissing) {
-    Peer peer{{{"GIO_MODULE_DIR", "/nonexistent"}}};
+    Peer peer(Environment{{"GIO_MODULE_DIR", "/nonexistent"}});
 
     EXPECT_THAT(peer.greeting(), AllOf(StartsWith("limited: "),
                                        HasSubstr("Install the package dconf-gsettings-backend")));
@@ -124,20 +124,20 @@ TEST_F(Failures, ToFindDconfSayWhichPackageIsMissing) {
 }
 
 TEST_F(Failures, ThatAnEnvironmentVariableCausesSayWhichOne) {
-    Peer peer{{{"GSETTINGS_BACKEND", "memory"}}};
+    Peer peer(Environment{{"GSETTINGS_BACKEND", "memory"}});
 
     EXPECT_THAT(peer.greeting(),
                 AllOf(StartsWith("limited: "), HasSubstr("Unset"), HasSubstr("GSETTINGS_BACKEND")));
 }
 
 TEST_F(Failures, ToStoreAValueKeepTheOldOne) {
-    const std::filesystem::path folder = std::filesystem::path{g_get_user_config_dir()} / "dconf";
+    const std::filesystem::path folder = std::filesystem::path(g_get_user_config_dir()) / "dconf";
     const auto preferences = openShared();
     ASSERT_TRUE(preferences->set(assetSyncLimit, 25).changed);
     ASSERT_TRUE(killSettingsService());
     // The service cannot make its folder where a file has the name.
     std::filesystem::rename(folder, folder.string() + "-away");
-    std::ofstream{folder} << "not a folder";
+    std::ofstream(folder) << "not a folder";
 
     const auto result = preferences->set(assetSyncLimit, 50);
 
@@ -163,17 +163,17 @@ class Installation : public Failures {
 
     /// Installs the schema as this command of sed changes it.
     void installSchema(const std::string& change) {
-        std::ofstream{schemas_ / "org.quorl.Velora.AssetSync.gschema.xml"}
+        std::ofstream(schemas_ / "org.quorl.Velora.AssetSync.gschema.xml")
             << run({"sed", change, SCHEMA_FILE});
         run({"glib-compile-schemas", "--strict", schemas_.string()});
     }
 
     [[nodiscard]] std::string greeting() const {
-        return Peer{{{"XDG_DATA_DIRS", "/nonexistent"}}, program_}.greeting();
+        return Peer(Environment{{"XDG_DATA_DIRS", "/nonexistent"}}, program_).greeting();
     }
 
     const std::filesystem::path prefix_ =
-        std::filesystem::path{g_get_user_runtime_dir()} / "installation";
+        std::filesystem::path(g_get_user_runtime_dir()) / "installation";
     const std::filesystem::path program_ = prefix_ / "bin" / "peer";
     const std::filesystem::path schemas_ = prefix_ / "share" / "glib-2.0" / "schemas";
 };

@@ -26,7 +26,7 @@ using namespace quorl::preferences;
 class Speaker {
   public:
     void say(const std::string& line) {
-        const std::scoped_lock lock{mutex_};
+        const std::scoped_lock lock(mutex_);
         std::cout << line << std::endl;
     }
 
@@ -54,10 +54,10 @@ void withPreference(const std::string& key, Action&& action) {
 class Peer {
   public:
     Peer(SharedPreferences& preferences, Speaker& speaker)
-        : preferences_{preferences}, speaker_{speaker} {}
+        : preferences_(preferences), speaker_(speaker) {}
 
     void obey(const std::string& line) {
-        std::istringstream words{line};
+        std::istringstream words(line);
         std::string command;
         std::string key;
         std::string argument;
@@ -100,12 +100,12 @@ class Peer {
     }
 
     void tap(std::uint64_t times) {
-        const std::jthread reader{[this](const std::stop_token& stop) {
+        const std::jthread reader([this](const std::stop_token& stop) {
             while (!stop.stop_requested()) {
                 (void)preferences_.get(assetSyncLimit);
                 (void)preferences_.get(assetSyncLimitType);
             }
-        }};
+        });
         for (std::uint64_t i = 1; i <= times; ++i) {
             const auto limit = preferences_.set(assetSyncLimit, i);
             const auto type = preferences_.set(assetSyncLimitType, i % 2);
@@ -124,7 +124,7 @@ class Peer {
 std::string told(const KeySet& keys) {
     std::string line = "told";
     for (const auto key : keys) {
-        line += " " + std::string{key};
+        line += " " + std::string(key);
     }
     return line;
 }
@@ -140,7 +140,7 @@ int main() {
         return 1;
     }
     speaker.say(opened.problem.empty() ? "ready" : "limited: " + opened.problem);
-    Peer peer{*opened.preferences, speaker};
+    Peer peer(*opened.preferences, speaker);
     for (std::string line; std::getline(std::cin, line);) {
         peer.obey(line);
     }

@@ -93,7 +93,7 @@ TEST_F(Processes, ThatWriteTheSameValueAtTheSameMomentBothSucceed) {
 /// A peer that counts a value up until it is killed.
 class Counter {
   public:
-    Counter(const char* key, std::uint64_t first) : key_{key} {
+    Counter(const char* key, std::uint64_t first) : key_(key) {
         peer_.say("count " + key_ + " " + std::to_string(first));
     }
 

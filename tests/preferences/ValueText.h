@@ -20,7 +20,7 @@ inline std::uint64_t numberIn(const std::string& text) {
     std::uint64_t number = 0;
     const auto [end, failure] = std::from_chars(text.data(), text.data() + text.size(), number);
     if (failure != std::errc{} || end != text.data() + text.size()) {
-        throw std::invalid_argument{"not a number: " + text};
+        throw std::invalid_argument("not a number: " + text);
     }
     return number;
 }
@@ -30,5 +30,5 @@ inline void readText(const std::string& text, bool& value) { value = text == "tr
 inline void readText(const std::string& text, std::uint64_t& value) { value = numberIn(text); }
 
 inline void readText(const std::string& text, std::optional<std::uint64_t>& value) {
-    value = text == "nothing" ? std::nullopt : std::optional{numberIn(text)};
+    value = text == "nothing" ? std::nullopt : std::optional(numberIn(text));
 }

@@ -35,16 +35,16 @@ TEST_F(Values, AreDeclaredInTheSchemaAsInTheTable) {
     std::size_t count = 0;
     forEachPreference([&, &found = *schema]<class T>(const Preference<T>& preference) {
         ++count;
-        const KeyPointer key{g_settings_schema_get_key(&found, preference.key)};
-        const VariantPointer byDefault{g_settings_schema_key_get_default_value(key.get())};
+        const KeyPointer key(g_settings_schema_get_key(&found, preference.key));
+        const VariantPointer byDefault(g_settings_schema_key_get_default_value(key.get()));
         EXPECT_STREQ(g_variant_get_type_string(byDefault.get()), Stored<T>::type);
         EXPECT_EQ(Stored<T>::unwrap(*byDefault), preference.defaultValue) << preference.key;
         EXPECT_STREQ(g_settings_schema_key_get_summary(key.get()), preference.description);
         EXPECT_STRNE(g_settings_schema_key_get_description(key.get()), nullptr) << preference.key;
     });
 
-    const std::unique_ptr<char*, FreedWith<g_strfreev>> keys{
-        g_settings_schema_list_keys(schema.get())};
+    const std::unique_ptr<char*, FreedWith<g_strfreev>> keys(
+        g_settings_schema_list_keys(schema.get()));
     EXPECT_EQ(g_strv_length(keys.get()), count) << "the schema has keys that the table lacks";
 }
 
