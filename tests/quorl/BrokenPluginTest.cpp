@@ -3,8 +3,8 @@
 
 #include <gmock/gmock.h>
 
-#include "tests/quorl/Music.h"
-#include "tests/quorl/Program.h"
+#include "tests/quorl/QuorlProcess.h"
+#include "tests/quorl/SampleMusic.h"
 
 namespace quorl::tests {
 
@@ -26,14 +26,15 @@ class BrokenPlugin : public testing::Test {
 
     /// The page in a terminal, in one line.
     [[nodiscard]] std::string page() const {
-        Program quorl({"--text", "--music", music_.path(), "--plugins", plugins_.path().string()});
+        QuorlProcess quorl(
+            {"--text", "--music", music_.path(), "--plugins", plugins_.path().string()});
         EXPECT_EQ(quorl.end(), 0) << quorl.errors();
         std::string text = quorl.output();
         std::ranges::replace(text, '\n', ' ');
         return text;
     }
 
-    Music music_;
+    SampleMusic music_;
     media::test::TemporaryFolder plugins_;
     std::filesystem::path bundle_ = plugins_ / "Broken.bundle";
     std::filesystem::path library_ = bundle_ / "libVeloraMusic.so";
@@ -97,7 +98,7 @@ TEST_F(BrokenPlugin, emptyPlaceFallsBackToTheInstalledPlugin) {
 
 TEST_F(BrokenPlugin, commandsGetAHintAndTheAppGoesOn) {
     registerAs("{");
-    Program quorl({"--text", "--music", music_.path(), "--plugins", plugins_.path().string()});
+    QuorlProcess quorl({"--text", "--music", music_.path(), "--plugins", plugins_.path().string()});
     quorl.say("1");
     quorl.readUntil("A number taps the row");
     quorl.say("q");
@@ -107,8 +108,8 @@ TEST_F(BrokenPlugin, commandsGetAHintAndTheAppGoesOn) {
 TEST_F(BrokenPlugin, isPicturedToo) {
     registerAs("{");
     const auto file = (music_.folder() / "shot.png").string();
-    Program quorl({"--screenshot", file, "--music", music_.path(), "--plugins",
-                   plugins_.path().string(), "--pane", "limit"});
+    QuorlProcess quorl({"--screenshot", file, "--music", music_.path(), "--plugins",
+                        plugins_.path().string(), "--pane", "limit"});
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_EQ(QImage(QString::fromStdString(file)).size(), QSize(360, 720));
 }

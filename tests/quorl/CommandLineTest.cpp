@@ -1,6 +1,6 @@
 #include <gmock/gmock.h>
 
-#include "tests/quorl/Program.h"
+#include "tests/quorl/QuorlProcess.h"
 
 namespace quorl::tests {
 
@@ -10,7 +10,7 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 
 TEST(CommandLine, helpTellsOptionsAndExitCodes) {
-    Program quorl({"--help"});
+    QuorlProcess quorl({"--help"});
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_THAT(quorl.output(), HasSubstr("--screenshot FILE"));
     EXPECT_THAT(quorl.output(), HasSubstr("Exit codes:"));
@@ -18,7 +18,7 @@ TEST(CommandLine, helpTellsOptionsAndExitCodes) {
 }
 
 TEST(CommandLine, versionIsOneLineWithTheName) {
-    Program quorl({"--version"});
+    QuorlProcess quorl({"--version"});
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_THAT(quorl.output(), testing::StartsWith("quorl "));
 }
@@ -26,7 +26,7 @@ TEST(CommandLine, versionIsOneLineWithTheName) {
 class Mistake : public testing::TestWithParam<std::vector<std::string>> {};
 
 TEST_P(Mistake, endsWithTwoAndSaysWhatToDo) {
-    Program quorl(GetParam());
+    QuorlProcess quorl(GetParam());
     EXPECT_EQ(quorl.end(), 2);
     EXPECT_THAT(quorl.errors(), HasSubstr("quorl --help"));
     EXPECT_THAT(quorl.output(), IsEmpty());
@@ -45,7 +45,7 @@ INSTANTIATE_TEST_SUITE_P(
                     std::vector<std::string>{"--plugins", "/nonexistent"}));
 
 TEST(CommandLine, windowWithoutADisplaySaysWhatToUseInstead) {
-    Program quorl({}, {{"DISPLAY", ""}, {"WAYLAND_DISPLAY", ""}});
+    QuorlProcess quorl({}, {{"DISPLAY", ""}, {"WAYLAND_DISPLAY", ""}});
     EXPECT_EQ(quorl.end(), 1);
     EXPECT_THAT(quorl.errors(), HasSubstr("--text"));
 }

@@ -5,8 +5,8 @@
 
 #include "services/engine/Client.h"
 #include "tests/engine/Process.h"
-#include "tests/quorl/Music.h"
-#include "tests/quorl/Program.h"
+#include "tests/quorl/QuorlProcess.h"
+#include "tests/quorl/SampleMusic.h"
 #include "tests/quorl/Window.h"
 
 namespace quorl::tests {
@@ -39,7 +39,7 @@ class WithEngine : public testing::Test {
                "quorl/wearable/Music" / name;
     }
 
-    Music music_;
+    SampleMusic music_;
     QProcess engine_;
 };
 
@@ -49,7 +49,7 @@ class WithSlowEngine : public WithEngine {
     WithSlowEngine() : WithEngine({QStringLiteral("--rate-limit"), QStringLiteral("20000")}) {}
 
     /// Chooses "Road Trip" in `quorl`, and waits until its songs are being copied.
-    static void choose(Program& quorl) {
+    static void choose(QuorlProcess& quorl) {
         quorl.say("1");
         quorl.say("2");
         quorl.readUntil("% Synced…");
@@ -58,7 +58,7 @@ class WithSlowEngine : public WithEngine {
 
 TEST_F(WithSlowEngine, appThatIsKilledAndOpenedAgainShowsTheRunningSessionToItsEnd) {
     {
-        Program quorl(arguments("--text"));
+        QuorlProcess quorl(arguments("--text"));
         choose(quorl);
         quorl.kill();
     }
@@ -76,7 +76,7 @@ TEST_F(WithSlowEngine, appThatIsKilledAndOpenedAgainShowsTheRunningSessionToItsE
 }
 
 TEST_F(WithSlowEngine, engineThatIsKilledLeavesNoSessionOnTheScreen) {
-    Program quorl(arguments("--text"));
+    QuorlProcess quorl(arguments("--text"));
     choose(quorl);
     engine_.kill();
     quorl.readUntil("  2  ✓ Road Trip: Sync Pending…\n");
@@ -87,10 +87,10 @@ TEST_F(WithSlowEngine, engineThatIsKilledLeavesNoSessionOnTheScreen) {
 }
 
 TEST(WithBusOfItsOwn, busThatGoesAwayIsToldAndTheAppNeitherEndsNorSpins) {
-    const Music music;
+    const SampleMusic music;
     syncd::testing::SecondBus bus;
-    Program quorl({"--text", "--music", music.path()},
-                  {{"DBUS_SESSION_BUS_ADDRESS", bus.address()}});
+    QuorlProcess quorl({"--text", "--music", music.path()},
+                       {{"DBUS_SESSION_BUS_ADDRESS", bus.address()}});
     quorl.say("1");
     quorl.readUntil("  3  ✓ None\n");
 
@@ -111,7 +111,7 @@ TEST(WithBusOfItsOwn, busThatGoesAwayIsToldAndTheAppNeitherEndsNorSpins) {
 }
 
 TEST_F(WithEngine, chosenPlaylistIsSyncedOnlyWhenItIsOnTheWearable) {
-    Program quorl(arguments("--text"));
+    QuorlProcess quorl(arguments("--text"));
     quorl.say("1");
     quorl.readUntil("  3  ✓ None\n");
     quorl.say("2");
@@ -121,7 +121,7 @@ TEST_F(WithEngine, chosenPlaylistIsSyncedOnlyWhenItIsOnTheWearable) {
 }
 
 TEST_F(WithEngine, offTheChargerThePlaylistWaits) {
-    Program quorl(arguments("--text"));
+    QuorlProcess quorl(arguments("--text"));
     quorl.say("b");
     quorl.readUntil("  2  On Charger: on\n");
     quorl.say("2");
@@ -142,7 +142,7 @@ TEST_F(WithEngine, offTheChargerThePlaylistWaits) {
 }
 
 TEST_F(WithEngine, pickingNoneLeavesTheWearableAsItIs) {
-    Program quorl(arguments("--text"));
+    QuorlProcess quorl(arguments("--text"));
     quorl.say("1");
     quorl.say("2");
     quorl.readUntil("  2  ✓ Road Trip: Synced\n");
@@ -154,7 +154,7 @@ TEST_F(WithEngine, pickingNoneLeavesTheWearableAsItIs) {
 
 TEST_F(WithEngine, statusIsPrintedForScripts) {
     {
-        Program quorl(arguments("--text"));
+        QuorlProcess quorl(arguments("--text"));
         quorl.say("1");
         quorl.say("2");
         quorl.readUntil("  2  ✓ Road Trip: Synced\n");
@@ -162,7 +162,7 @@ TEST_F(WithEngine, statusIsPrintedForScripts) {
     }
     auto asked = arguments("--status");
     asked.emplace_back("--json");
-    Program status(asked);
+    QuorlProcess status(asked);
     ASSERT_EQ(status.end(), 0);
     const auto json = nlohmann::json::parse(status.output());
     EXPECT_EQ(json["engine"], true);
@@ -173,15 +173,15 @@ TEST_F(WithEngine, statusIsPrintedForScripts) {
 }
 
 TEST(WithoutEngine, statusSaysSo) {
-    const Music music;
-    Program status({"--status", "--music", music.path()});
+    const SampleMusic music;
+    QuorlProcess status({"--status", "--music", music.path()});
     EXPECT_EQ(status.end(), 0);
     EXPECT_THAT(status.output(), HasSubstr("not running; start quorl-syncd"));
 }
 
 TEST(WithoutEngine, frontPageSaysWhatToDo) {
-    const Music music;
-    Program quorl({"--text", "--music", music.path()});
+    const SampleMusic music;
+    QuorlProcess quorl({"--text", "--music", music.path()});
     quorl.say("b");
     quorl.readUntil("The sync engine is not running");
     EXPECT_EQ(quorl.end(), 0);

@@ -1,7 +1,7 @@
 #include <gmock/gmock.h>
 
-#include "tests/quorl/Music.h"
-#include "tests/quorl/Program.h"
+#include "tests/quorl/QuorlProcess.h"
+#include "tests/quorl/SampleMusic.h"
 
 namespace quorl::tests {
 
@@ -10,8 +10,8 @@ namespace {
 using testing::HasSubstr;
 
 TEST(LibraryReport, namesEachPlaylistWithSongsSizeAndPath) {
-    const Music music;
-    Program quorl({"--library", "--music", music.path()});
+    const SampleMusic music;
+    QuorlProcess quorl({"--library", "--music", music.path()});
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_THAT(quorl.output(), HasSubstr("3 playlists, 3 songs listed"));
     EXPECT_THAT(quorl.output(), HasSubstr("Long Run: 3 songs, 3 MB, Long Run.m3u8\n"));
@@ -20,39 +20,39 @@ TEST(LibraryReport, namesEachPlaylistWithSongsSizeAndPath) {
 }
 
 TEST(LibraryReport, saysWhatWasLeftOutAndWhy) {
-    const Music music;
-    Program quorl({"--library", "--music", music.path()});
+    const SampleMusic music;
+    QuorlProcess quorl({"--library", "--music", music.path()});
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_THAT(quorl.output(), HasSubstr("Left out: 1\n"));
     EXPECT_THAT(quorl.output(), HasSubstr("Road Trip.m3u8: gone.flac: There is no such file."));
 }
 
 TEST(LibraryReport, marksFoldersOfPlaylists) {
-    const Music music;
+    const SampleMusic music;
     music.folder().write("Workout/Intervals.m3u8", "../one.flac\n");
-    Program quorl({"--library", "--music", music.path()});
+    QuorlProcess quorl({"--library", "--music", music.path()});
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_THAT(quorl.output(), HasSubstr("Workout: 1 song, 1 MB, Workout (folder)\n"));
 }
 
 TEST(LibraryReport, missingFolderEndsWithThreeAndSaysWhatToDo) {
-    Program quorl({"--library", "--music", "/nonexistent"});
+    QuorlProcess quorl({"--library", "--music", "/nonexistent"});
     EXPECT_EQ(quorl.end(), 3);
     EXPECT_THAT(quorl.errors(), HasSubstr("/nonexistent"));
     EXPECT_THAT(quorl.errors(), HasSubstr("--music"));
 }
 
 TEST(LibraryReport, withoutAnOptionReadsTheUsersMusicFolder) {
-    const Music music;
+    const SampleMusic music;
     const media::test::TemporaryFolder configuration;
     configuration.write("user-dirs.dirs", "XDG_MUSIC_DIR=\"" + music.path() + "\"\n");
-    Program quorl({"--library"}, {{"XDG_CONFIG_HOME", configuration.path().string()}});
+    QuorlProcess quorl({"--library"}, {{"XDG_CONFIG_HOME", configuration.path().string()}});
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_THAT(quorl.output(), HasSubstr("Road Trip"));
 }
 
 TEST(LibraryReport, listThatCannotBeWrittenIsAFailure) {
-    const Music music;
+    const SampleMusic music;
     QProcess shell;
     shell.start(QStringLiteral("sh"),
                 {QStringLiteral("-c"),

@@ -4,7 +4,7 @@
 
 #include "quorl/adapters/MusicLibrary.h"
 #include "quorl/app/MainQueueNotifier.h"
-#include "tests/quorl/Music.h"
+#include "tests/quorl/SampleMusic.h"
 
 namespace quorl::tests {
 
@@ -39,7 +39,7 @@ class TheLibrary : public testing::Test {
         return (*library_->playlistsMatching({}))[index];
     }
 
-    Music music_;
+    SampleMusic music_;
     MainQueueNotifier mainQueue_;
     int taken_ = 0;
     std::shared_ptr<MusicLibrary> library_ = ::create<MusicLibrary>();

@@ -2,8 +2,9 @@
 
 #include <gmock/gmock.h>
 
-#include "tests/quorl/Music.h"
-#include "tests/quorl/Program.h"
+#include "tests/quorl/QuorlProcess.h"
+#include "tests/quorl/SampleMusic.h"
+#include "tests/quorl/StoredPreferences.h"
 
 namespace quorl::tests {
 
@@ -18,12 +19,12 @@ class Screenshot : public testing::Test {
     QImage take(std::vector<std::string> options, const Environment& environment = {}) {
         const auto file = (music_.folder() / "shot.png").string();
         options.insert(options.end(), {"--screenshot", file, "--music", music_.path()});
-        Program quorl(options, environment);
+        QuorlProcess quorl(options, environment);
         EXPECT_EQ(quorl.end(), 0) << quorl.errors();
         return QImage(QString::fromStdString(file));
     }
 
-    Music music_;
+    SampleMusic music_;
 };
 
 /// Where the picture has the tint, below `top`.
@@ -75,7 +76,7 @@ TEST_F(Screenshot, rightToLeftLanguageMirrorsTheFinishedLayout) {
 TEST_F(Screenshot, playlistChooserShowsTheChosenPlaylist) {
     storePreference("asset-sync-enabled", "false");
     const auto none = tinted(take({"--pane", "playlist"}), headerHeight(1));
-    Program quorl({"--text", "--music", music_.path()});
+    QuorlProcess quorl({"--text", "--music", music_.path()});
     quorl.say("1");
     quorl.say("1");
     quorl.readUntil("✓ Long Run");
@@ -96,14 +97,14 @@ TEST_F(Screenshot, widestWindowKeepsTheCardsInTheMiddle) {
 }
 
 TEST_F(Screenshot, fileThatCannotBeWrittenIsNamed) {
-    Program quorl({"--screenshot", "/nonexistent/a.png", "--music", music_.path()});
+    QuorlProcess quorl({"--screenshot", "/nonexistent/a.png", "--music", music_.path()});
     EXPECT_EQ(quorl.end(), 1);
     EXPECT_THAT(quorl.errors(), HasSubstr("/nonexistent/a.png"));
 }
 
 TEST_F(Screenshot, missingMusicFolderIsPicturedWithANotice) {
     const auto file = (music_.folder() / "missing.png").string();
-    Program quorl({"--screenshot", file, "--music", "/nonexistent"});
+    QuorlProcess quorl({"--screenshot", file, "--music", "/nonexistent"});
     EXPECT_EQ(quorl.end(), 0);
     const QImage missing(QString::fromStdString(file));
     ASSERT_FALSE(missing.isNull());

@@ -8,8 +8,8 @@
 #include <unistd.h>
 
 #include "quorl/terminal/TextScreen.h"
-#include "tests/quorl/Music.h"
-#include "tests/quorl/Program.h"
+#include "tests/quorl/SampleMusic.h"
+#include "tests/quorl/StoredPreferences.h"
 
 namespace quorl::tests {
 
@@ -72,7 +72,7 @@ class TextSessionTest : public testing::Test {
         screen_.scheduleDrawing();
     }
 
-    Music music_;
+    SampleMusic music_;
     TextScreen screen_;
     Notices notices_;
     Companion companion_{optionsFor(music_.folder().path()), screen_, notices_};

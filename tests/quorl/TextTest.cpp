@@ -2,8 +2,9 @@
 
 #include <gmock/gmock.h>
 
-#include "tests/quorl/Music.h"
-#include "tests/quorl/Program.h"
+#include "tests/quorl/QuorlProcess.h"
+#include "tests/quorl/SampleMusic.h"
+#include "tests/quorl/StoredPreferences.h"
 
 namespace quorl::tests {
 
@@ -18,11 +19,11 @@ class Text : public testing::Test {
         return {"--text", "--music", music_.path()};
     }
 
-    Music music_;
+    SampleMusic music_;
 };
 
 TEST_F(Text, rootPaneHasNumberedRowsWithTheirValues) {
-    Program quorl(arguments());
+    QuorlProcess quorl(arguments());
     quorl.say("q");
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_THAT(quorl.output(), HasSubstr("Music\n\nMusic Syncing\n  1  Synced Playlist: None\n"));
@@ -30,7 +31,7 @@ TEST_F(Text, rootPaneHasNumberedRowsWithTheirValues) {
 }
 
 TEST_F(Text, footersAreWrappedToEightyColumnsWithoutATerminal) {
-    Program quorl(arguments());
+    QuorlProcess quorl(arguments());
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_THAT(quorl.output(), HasSubstr("      This playlist syncs when"));
     std::istringstream lines(quorl.output());
@@ -40,13 +41,13 @@ TEST_F(Text, footersAreWrappedToEightyColumnsWithoutATerminal) {
 }
 
 TEST_F(Text, endOfInputLeaves) {
-    Program quorl(arguments());
+    QuorlProcess quorl(arguments());
     quorl.closeInput();
     EXPECT_EQ(quorl.end(), 0);
 }
 
 TEST_F(Text, tappedPlaylistIsCheckedAndStored) {
-    Program quorl(arguments());
+    QuorlProcess quorl(arguments());
     quorl.say("1");
     quorl.readUntil("  3  ✓ None\n");
     quorl.say("2");
@@ -59,7 +60,7 @@ TEST_F(Text, tappedPlaylistIsCheckedAndStored) {
 }
 
 TEST_F(Text, generatedPlaylistsCannotBeChosen) {
-    Program quorl(arguments());
+    QuorlProcess quorl(arguments());
     quorl.say("1");
     EXPECT_THAT(quorl.readUntil("None\n\n"), Not(HasSubstr("Morning Mix")));
     EXPECT_EQ(quorl.end(), 0);
@@ -75,7 +76,7 @@ TEST_F(Text, lastLineWithoutALineFeedCountsToo) {
 }
 
 TEST_F(Text, whatIsNoCommandGetsAHint) {
-    Program quorl(arguments());
+    QuorlProcess quorl(arguments());
     for (const char* line : {"hello", "0", "7", "", "-1", "bb"}) {
         quorl.say(line);
         quorl.readUntil("A number taps the row, b goes back, q leaves.\n");
@@ -84,7 +85,7 @@ TEST_F(Text, whatIsNoCommandGetsAHint) {
 }
 
 TEST_F(Text, preferenceChangedByAnotherProgramShowsUp) {
-    Program quorl(arguments());
+    QuorlProcess quorl(arguments());
     quorl.readUntil("Playlist Limit: 500 MB");
     storePreference("asset-sync-limit", "just 1024");
     quorl.readUntil("Playlist Limit: 1 GB");
@@ -92,7 +93,7 @@ TEST_F(Text, preferenceChangedByAnotherProgramShowsUp) {
 }
 
 TEST_F(Text, playlistAddedOnDiskShowsUpInTheChooser) {
-    Program quorl(arguments());
+    QuorlProcess quorl(arguments());
     quorl.say("1");
     quorl.readUntil("  3  ✓ None");
     music_.addPlaylist("Quiet Evening");
@@ -101,7 +102,7 @@ TEST_F(Text, playlistAddedOnDiskShowsUpInTheChooser) {
 }
 
 TEST_F(Text, limitByNumberOfSongsIsShownOnTheRootPane) {
-    Program quorl(arguments());
+    QuorlProcess quorl(arguments());
     for (const char* line : {"2", "2", "5", "b"}) {
         quorl.say(line);
     }
@@ -112,7 +113,7 @@ TEST_F(Text, limitByNumberOfSongsIsShownOnTheRootPane) {
 
 TEST_F(Text, controlCharactersInNamesDoNotReachTheTerminal) {
     music_.folder().write("Evil.m3u8", "#PLAYLIST:Evil\x1b[2J\none.flac\n");
-    Program quorl(arguments());
+    QuorlProcess quorl(arguments());
     quorl.say("1");
     const auto shown = quorl.readUntil("✓ None");
     EXPECT_THAT(shown, HasSubstr("Evil"));
@@ -121,14 +122,14 @@ TEST_F(Text, controlCharactersInNamesDoNotReachTheTerminal) {
 }
 
 TEST_F(Text, missingMusicFolderIsToldOnStandardError) {
-    Program quorl({"--text", "--music", "/nonexistent"});
+    QuorlProcess quorl({"--text", "--music", "/nonexistent"});
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_THAT(quorl.errors(), HasSubstr("/nonexistent"));
     EXPECT_THAT(quorl.output(), HasSubstr("Synced Playlist: None"));
 }
 
 TEST_F(Text, withoutASessionBusItSaysSoAndWorksForItself) {
-    Program quorl(arguments(), {{"DBUS_SESSION_BUS_ADDRESS", ""}, {"XDG_RUNTIME_DIR", ""}});
+    QuorlProcess quorl(arguments(), {{"DBUS_SESSION_BUS_ADDRESS", ""}, {"XDG_RUNTIME_DIR", ""}});
     quorl.say("1");
     quorl.say("2");
     quorl.readUntil("✓ Road Trip");
@@ -137,7 +138,7 @@ TEST_F(Text, withoutASessionBusItSaysSoAndWorksForItself) {
 }
 
 TEST_F(Text, neverLooksForADisplay) {
-    Program quorl(arguments(), {{"DISPLAY", ":99"}, {"QT_QPA_PLATFORM", "none-such"}});
+    QuorlProcess quorl(arguments(), {{"DISPLAY", ":99"}, {"QT_QPA_PLATFORM", "none-such"}});
     EXPECT_EQ(quorl.end(), 0);
 }
 

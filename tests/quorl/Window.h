@@ -3,7 +3,7 @@
 #include <QRegularExpression>
 
 #include "quorl/window/MainWindow.h"
-#include "tests/quorl/Music.h"
+#include "tests/quorl/SampleMusic.h"
 
 namespace quorl::tests {
 
@@ -14,7 +14,7 @@ class Window {
     /// given here, or one of its own.
     explicit Window(const std::filesystem::path& music = {});
 
-    [[nodiscard]] Music& music() { return music_; }
+    [[nodiscard]] SampleMusic& music() { return music_; }
 
     [[nodiscard]] Companion& companion() { return companion_; }
 
@@ -44,7 +44,7 @@ class Window {
     [[nodiscard]] QStringList rows();
 
   private:
-    Music music_;
+    SampleMusic music_;
     WindowScreen screen_;
     Notices notices_;
     Companion companion_;

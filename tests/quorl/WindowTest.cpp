@@ -6,7 +6,7 @@
 
 #include <gmock/gmock.h>
 
-#include "tests/quorl/Program.h"
+#include "tests/quorl/StoredPreferences.h"
 
 namespace quorl::tests {
 

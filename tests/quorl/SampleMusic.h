@@ -6,9 +6,9 @@ namespace quorl::tests {
 
 /// A music folder with two playlists, "Long Run" of three songs and "Road Trip" of one, a generated
 /// mix "Morning Mix", and a song that a playlist names and that is not there.
-class Music {
+class SampleMusic {
   public:
-    Music();
+    SampleMusic();
 
     [[nodiscard]] const media::test::TemporaryFolder& folder() const { return folder_; }
 

@@ -1,4 +1,4 @@
-#include "tests/quorl/Program.h"
+#include "tests/quorl/QuorlProcess.h"
 
 #include <filesystem>
 #include <fstream>
@@ -35,22 +35,10 @@ QStringList toList(const std::vector<std::string>& texts) {
     return list;
 }
 
-std::string gsettings(const std::vector<std::string>& arguments) {
-    QProcess process;
-    process.start(QStringLiteral("gsettings"),
-                  QStringList{QStringLiteral("--schemadir"), QStringLiteral(SCHEMA_DIRECTORY)} +
-                      toList(arguments));
-    if (!process.waitForFinished(patience) || process.exitCode() != 0) {
-        throw std::runtime_error("gsettings: " + process.readAllStandardError().toStdString());
-    }
-    return process.readAllStandardOutput().trimmed().toStdString();
-}
-
-constexpr const char* schema = "org.quorl.Velora.AssetSync";
-
 } // namespace
 
-Program::Program(const std::vector<std::string>& arguments, const Environment& environment) {
+QuorlProcess::QuorlProcess(const std::vector<std::string>& arguments,
+                           const Environment& environment) {
     process_.setProcessEnvironment(environmentWith(environment));
     process_.start(QStringLiteral(QUORL_PROGRAM), toList(arguments));
     if (!process_.waitForStarted(patience)) {
@@ -58,28 +46,28 @@ Program::Program(const std::vector<std::string>& arguments, const Environment& e
     }
 }
 
-void Program::say(const std::string& line) {
+void QuorlProcess::say(const std::string& line) {
     process_.write((line + "\n").c_str());
     process_.waitForBytesWritten(patience);
 }
 
-void Program::closeInput() { process_.closeWriteChannel(); }
+void QuorlProcess::closeInput() { process_.closeWriteChannel(); }
 
-void Program::takeOutput() {
+void QuorlProcess::takeOutput() {
     output_ += process_.readAllStandardOutput().toStdString();
     errors_ += process_.readAllStandardError().toStdString();
 }
 
-std::string Program::readUntil(const std::string& text) {
+std::string QuorlProcess::readUntil(const std::string& text) {
     return take(output_, QProcess::StandardOutput, text);
 }
 
-std::string Program::readErrorsUntil(const std::string& text) {
+std::string QuorlProcess::readErrorsUntil(const std::string& text) {
     return take(errors_, QProcess::StandardError, text);
 }
 
-std::string Program::take(std::string& from, QProcess::ProcessChannel channel,
-                          const std::string& text) {
+std::string QuorlProcess::take(std::string& from, QProcess::ProcessChannel channel,
+                               const std::string& text) {
     process_.setReadChannel(channel);
     takeOutput();
     auto found = from.find(text);
@@ -96,7 +84,7 @@ std::string Program::take(std::string& from, QProcess::ProcessChannel channel,
     return read;
 }
 
-std::optional<std::string> Program::wakeUpsOfSleepingThreads() const {
+std::optional<std::string> QuorlProcess::wakeUpsOfSleepingThreads() const {
     const auto id = std::to_string(process_.processId());
     std::string wakeUps;
     for (const auto& thread : std::filesystem::directory_iterator("/proc/" + id + "/task")) {
@@ -113,12 +101,12 @@ std::optional<std::string> Program::wakeUpsOfSleepingThreads() const {
     return wakeUps;
 }
 
-void Program::kill() {
+void QuorlProcess::kill() {
     process_.kill();
     process_.waitForFinished(patience);
 }
 
-int Program::end() {
+int QuorlProcess::end() {
     closeInput();
     if (!process_.waitForFinished(patience)) {
         process_.kill();
@@ -126,12 +114,6 @@ int Program::end() {
     }
     takeOutput();
     return process_.exitStatus() == QProcess::NormalExit ? process_.exitCode() : -1;
-}
-
-std::string storedPreference(const std::string& key) { return gsettings({"get", schema, key}); }
-
-void storePreference(const std::string& key, const std::string& value) {
-    gsettings({"set", schema, key, value});
 }
 
 } // namespace quorl::tests

@@ -10,13 +10,13 @@ namespace quorl::tests {
 
 using Environment = std::map<std::string, std::string>;
 
-/// A program that runs beside the test: `quorl` itself unless it says otherwise. Whatever takes
-/// longer than a minute throws, with what the program has said.
-class Program {
+/// `quorl`, running beside the test. Whatever takes longer than a minute throws, with what the
+/// program has said.
+class QuorlProcess {
   public:
     /// Starts `quorl` with `arguments`. An empty value takes a variable out of the environment.
-    explicit Program(const std::vector<std::string>& arguments,
-                     const Environment& environment = {});
+    explicit QuorlProcess(const std::vector<std::string>& arguments,
+                          const Environment& environment = {});
 
     /// Writes a line to its standard input.
     void say(const std::string& line);
@@ -53,11 +53,5 @@ class Program {
     std::string output_;
     std::string errors_;
 };
-
-/// The value of a shared preference, as another program reads it.
-[[nodiscard]] std::string storedPreference(const std::string& key);
-
-/// Writes a shared preference as another program does.
-void storePreference(const std::string& key, const std::string& value);
 
 } // namespace quorl::tests
