@@ -10,15 +10,15 @@
 
 #include "platform/InterfaceVersion.h"
 #include "runtime/plugins/PluginBundle.h"
-#include "tests/runtime/TemporaryDirectory.h"
 #include "tests/support/TestHost.h"
+#include "tests/wearable/TemporaryDirectory.h"
 
 namespace {
 
 using quorl::BundleError;
 using quorl::PluginBundle;
-using quorl::tests::TemporaryDirectory;
 using quorl::tests::TestHost;
+using quorl::wearable::testing::TemporaryDirectory;
 using std::filesystem::path;
 using testing::ElementsAre;
 using testing::HasSubstr;

@@ -5,7 +5,7 @@
 
 #include <gmock/gmock.h>
 
-#include "tests/runtime/TemporaryDirectory.h"
+#include "tests/wearable/TemporaryDirectory.h"
 
 namespace {
 
@@ -56,7 +56,7 @@ TEST_F(StringTables, HaveNoTextInALanguageWithoutACatalogue) {
 }
 
 TEST_F(StringTables, ShowNoOtherLanguageToWhoPrefersEnglish) {
-    quorl::tests::TemporaryDirectory withoutEnglish;
+    quorl::wearable::testing::TemporaryDirectory withoutEnglish;
     std::filesystem::copy(std::filesystem::path(TEST_TEXTS) / "de", withoutEnglish.path() / "de",
                           std::filesystem::copy_options::recursive);
     const StringTable table(withoutEnglish.path());
@@ -77,7 +77,7 @@ TEST_F(StringTables, KeepTheirDomainsApart) {
 }
 
 TEST_F(StringTables, HaveNoTextWhereTheCatalogueIsDamaged) {
-    quorl::tests::TemporaryDirectory damaged;
+    quorl::wearable::testing::TemporaryDirectory damaged;
     const auto directory = damaged.path() / "de" / "LC_MESSAGES";
     std::filesystem::create_directories(directory);
     std::ofstream(directory / "default.mo") << "this is no catalogue";
