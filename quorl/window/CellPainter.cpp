@@ -24,13 +24,16 @@ QColor colorOr(const std::optional<UIColor>& name, const QColor& otherwise) {
     return color.isValid() ? color : otherwise;
 }
 
+/// Of a row: the side where reading starts, or the other one.
+enum class Side { Start, End };
+
 /// The painting of one cell.
 class Painting {
   public:
     Painting(QPainter& painter, const QRectF& place, Qt::LayoutDirection direction)
         : painter_(painter), place_(place), isMirrored_(direction == Qt::RightToLeft) {}
 
-    void label(const UILabel& label, const QColor& color, bool atEnd) {
+    void label(const UILabel& label, const QColor& color, Side side) {
         const QRectF frame = toRect(label.frame());
         if (!label.text() || frame.width() <= 0) {
             return;
@@ -38,10 +41,10 @@ class Painting {
         const QFontMetricsF metrics(painter_.font());
         const QString text = metrics.elidedText(QString::fromStdString(*label.text()),
                                                 Qt::ElideRight, frame.width() + roundingError);
-        const auto side = atEnd == isMirrored_ ? Qt::AlignLeft : Qt::AlignRight;
+        const auto alignment = (side == Side::End) == isMirrored_ ? Qt::AlignLeft : Qt::AlignRight;
         painter_.setPen(color);
         painter_.drawText(onPage(frame),
-                          static_cast<int>(side | Qt::AlignAbsolute) | Qt::AlignVCenter |
+                          static_cast<int>(alignment | Qt::AlignAbsolute) | Qt::AlignVCenter |
                               Qt::TextSingleLine | Qt::TextDontClip,
                           text);
     }
@@ -110,10 +113,11 @@ void paintCell(QPainter& painter, const UITableViewCell& cell, const QRectF& pla
     painter.setFont(font);
     painter.setLayoutDirection(Qt::LayoutDirectionAuto); // names read as they are written
     Painting painting(painter, place, direction);
-    painting.label(cell.textLabel(), colorOr(cell.textLabel().textColor(), colors.text), false);
+    painting.label(cell.textLabel(), colorOr(cell.textLabel().textColor(), colors.text),
+                   Side::Start);
     painting.label(cell.detailTextLabel(),
                    colorOr(cell.detailTextLabel().textColor(), colors.secondary),
-                   cell.style() != UITableViewCellStyle::Subtitle);
+                   cell.style() == UITableViewCellStyle::Subtitle ? Side::Start : Side::End);
     if (const auto* toggle = dynamic_cast<const SwitchCell*>(&cell)) {
         painting.toggle(toggle->isOn(), colors.tint, colors.faint);
     } else if (cell.accessoryType() == UITableViewCellAccessoryType::Checkmark) {

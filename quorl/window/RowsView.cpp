@@ -46,7 +46,7 @@ RowsView::RowsView(std::unique_ptr<PaneContent> content, WindowScreen& screen, Q
     prepare(fade_);
     connect(&highlight_, &QVariantAnimation::valueChanged, viewport(),
             qOverload<>(&QWidget::update));
-    connect(&highlight_, &QVariantAnimation::finished, this, [this] { stopHighlight(false); });
+    connect(&highlight_, &QVariantAnimation::finished, this, &RowsView::endHighlight);
     connect(&fade_, &QVariantAnimation::valueChanged, viewport(), qOverload<>(&QWidget::update));
     connect(&fade_, &QVariantAnimation::finished, this, [this] { fadingRows_.clear(); });
     connectScreen();
@@ -57,7 +57,7 @@ void RowsView::connectScreen() {
     connect(&screen_, &PaneScreen::rowWillBeDeselected, this,
             [this](const UITableView& table, const NSIndexPath& path, bool animated) {
                 if (content_->row(table, path) == highlightedRow_) {
-                    stopHighlight(animated);
+                    animated ? fadeHighlight() : endHighlight();
                 }
             });
 }
@@ -172,19 +172,17 @@ void RowsView::tap(NSInteger row) {
     viewport()->update();
     content_->tap(row);
     if (highlightedRow_ && highlight_.state() != QAbstractAnimation::Running) {
-        stopHighlight(true); // lists do not tell when to
+        fadeHighlight(); // lists do not tell when to
     }
     screen_.scheduleDrawing();
 }
 
-void RowsView::stopHighlight(bool animated) {
-    if (animated) {
-        startFading(highlight_, highlightDuration);
-    } else {
-        highlight_.stop();
-        highlightedRow_.reset();
-        viewport()->update();
-    }
+void RowsView::fadeHighlight() { startFading(highlight_, highlightDuration); }
+
+void RowsView::endHighlight() {
+    highlight_.stop();
+    highlightedRow_.reset();
+    viewport()->update();
 }
 
 /// Ends at once where the user wants no animations.
@@ -270,7 +268,7 @@ void RowsView::mouseReleaseEvent(QMouseEvent* event) {
 void RowsView::releasePress() {
     press_.reset();
     if (highlightedRow_) {
-        stopHighlight(true);
+        fadeHighlight();
     }
 }
 

@@ -72,7 +72,8 @@ class RowsView final : public QAbstractScrollArea {
 
     void fadeRows(const UITableView& table, const std::vector<NSIndexPath>& paths);
     void startFading(QVariantAnimation& animation, int milliseconds);
-    void stopHighlight(bool animated);
+    void fadeHighlight();
+    void endHighlight();
 
     void paintSection(QPainter& painter, std::size_t number, const QRectF& exposed) const;
     void paintCard(QPainter& painter, const RowsLayout::Section& section,
