@@ -1,30 +1,35 @@
 #include <iostream>
 
 #include "quorl/app/CommandLine.h"
-#include "quorl/app/Run.h"
 #include "quorl/reports/LibraryReport.h"
+#include "quorl/reports/Screenshot.h"
 #include "quorl/reports/StatusReport.h"
+#include "quorl/terminal/TerminalMode.h"
+#include "quorl/window/WindowMode.h"
+
+namespace quorl {
 
 namespace {
 
-quorl::ExitCode run(char* program, const quorl::Options& options) {
-    using Mode = quorl::Options::Mode;
+ExitCode run(char* program, const Options& options) {
     switch (options.mode) {
-    case Mode::Window:
-        return quorl::runInWindow(program, options);
-    case Mode::Text:
-        return quorl::runInTerminal(program, options);
-    case Mode::Screenshot:
-        return quorl::takeScreenshot(program, options);
-    case Mode::Library:
-        return quorl::printLibrary(options);
-    case Mode::Status:
-        return quorl::printStatus(options);
+    case Options::Mode::Window:
+        return runInWindow(program, options.places);
+    case Options::Mode::Text:
+        return runInTerminal(program, options.places);
+    case Options::Mode::Screenshot:
+        return takeScreenshot(program, options.places, options.picture);
+    case Options::Mode::Library:
+        return printLibrary(options.places.music);
+    case Options::Mode::Status:
+        return printStatus(options);
     }
-    return quorl::ExitCode::Failure;
+    return ExitCode::Failure;
 }
 
 } // namespace
+
+} // namespace quorl
 
 int main(int argc, char** argv) {
     const auto parsed = quorl::parseCommandLine(argc, argv);
@@ -32,7 +37,7 @@ int main(int argc, char** argv) {
         return static_cast<int>(*code);
     }
     try {
-        return static_cast<int>(run(argv[0], std::get<quorl::Options>(parsed)));
+        return static_cast<int>(quorl::run(argv[0], std::get<quorl::Options>(parsed)));
     } catch (const std::exception& error) {
         std::cerr << "quorl: " << error.what() << ". Close some programs, then try again.\n";
         return static_cast<int>(quorl::ExitCode::Failure);

@@ -42,13 +42,13 @@ T stored(const Preference<T>& /*preference*/, std::optional<std::uint64_t> value
 
 } // namespace
 
-PreferencesStore::PreferencesStore(Notices& notices) : notices_(notices) {
+PreferencesStore::PreferencesStore(Problem problem) : problem_(std::move(problem)) {
     auto opened =
         SharedPreferences::open([](SharedPreferences& /*preferences*/, const KeySet& /*keys*/) {
             SyncDefaults::announceChange();
         });
     preferences_ = std::move(opened.preferences);
-    notices_.set(Notices::Topic::Preferences, opened.problem);
+    problem_(opened.problem);
 }
 
 std::optional<std::uint64_t> PreferencesStore::value(SyncPreference preference) const {
@@ -60,13 +60,13 @@ std::optional<std::uint64_t> PreferencesStore::value(SyncPreference preference) 
 
 bool PreferencesStore::setValue(SyncPreference preference, std::optional<std::uint64_t> value) {
     if (!preferences_) {
-        return false; // the notice stands since the opening
+        return false; // it was told at the opening
     }
     const auto result = with(preference, [this, value](const auto& key) {
         return preferences_->set(key, stored(key, value));
     });
     if (!result.problem.empty()) {
-        notices_.set(Notices::Topic::Preferences, result.problem);
+        problem_(result.problem);
     }
     return result.problem.empty();
 }

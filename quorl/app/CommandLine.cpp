@@ -31,7 +31,7 @@ std::optional<int> side(std::string_view digits) {
 }
 
 /// Takes "360x720"; gives what is wrong back, empty for nothing.
-std::string takeSize(const std::string& text, Options& options) {
+std::string takeSize(const std::string& text, Picture& picture) {
     const auto separator = text.find('x');
     const auto width = side(std::string_view(text).substr(0, separator));
     const auto height = separator == std::string::npos
@@ -41,15 +41,15 @@ std::string takeSize(const std::string& text, Options& options) {
         return "give the size as WIDTHxHEIGHT, each from " + std::to_string(smallestSide) + " to " +
                std::to_string(largestSide) + ", for instance 360x720";
     }
-    options.width = *width;
-    options.height = *height;
+    picture.width = *width;
+    picture.height = *height;
     return {};
 }
 
 void addModes(CLI::App& app, Options& options, bool& text, bool& library, bool& status) {
     auto* textFlag =
         app.add_flag("--text", text, "Show the pane in the terminal, without any display");
-    auto* screenshot = app.add_option("--screenshot", options.screenshot,
+    auto* screenshot = app.add_option("--screenshot", options.picture.file,
                                       "Write a picture of the pane to FILE (PNG) and end")
                            ->type_name("FILE");
     auto* libraryFlag = app.add_flag(
@@ -62,64 +62,67 @@ void addModes(CLI::App& app, Options& options, bool& text, bool& library, bool& 
     libraryFlag->excludes(statusFlag);
 }
 
-void addPlaces(CLI::App& app, Options& options) {
-    app.add_option("--music", options.music, "The music folder, instead of the user's own")
+void addPlaces(CLI::App& app, Places& places) {
+    app.add_option("--music", places.music, "The music folder, instead of the user's own")
         ->type_name("DIR");
-    app.add_option("--wearable", options.wearable,
+    app.add_option("--wearable", places.wearable,
                    "The directory of a mounted Velora, instead of the one in this machine")
         ->type_name("DIR");
-    app.add_option("--plugins", options.plugins, "Look for plug-ins here before all other places")
+    app.add_option("--plugins", places.plugins, "Look for plug-ins here before all other places")
         ->type_name("DIR")
         ->check(CLI::ExistingDirectory);
 }
 
-void addPictureOptions(CLI::App& app, Options& options) {
+void addPictureOptions(CLI::App& app, Picture& picture) {
     auto* screenshot = app.get_option("--screenshot");
     app.add_option_function<std::string>(
            "--size",
-           [&options](const std::string& size) {
-               if (const auto problem = takeSize(size, options); !problem.empty()) {
+           [&picture](const std::string& size) {
+               if (const auto problem = takeSize(size, picture); !problem.empty()) {
                    throw CLI::ValidationError("--size", problem);
                }
            },
            "Size of the picture in points (default 360x720)")
         ->type_name("WxH")
         ->needs(screenshot);
-    app.add_option("--scale", options.scale, "Pixels of the picture to the point (default 1)")
+    app.add_option("--scale", picture.scale, "Pixels of the picture to the point (default 1)")
         ->type_name("N")
         ->check(CLI::Range(1.0, 4.0))
         ->needs(screenshot);
-    app.add_flag("--dark", options.dark, "Picture the dark look")->needs(screenshot);
-    static const std::map<std::string, Options::Pane> panes{{"root", Options::Pane::Root},
-                                                            {"playlist", Options::Pane::Playlist},
-                                                            {"limit", Options::Pane::Limit},
-                                                            {"front", Options::Pane::Front}};
+    app.add_flag("--dark", picture.isDark, "Picture the dark look")->needs(screenshot);
+    static const std::map<std::string, Picture::Pane> panes{{"root", Picture::Pane::Root},
+                                                            {"playlist", Picture::Pane::Playlist},
+                                                            {"limit", Picture::Pane::Limit},
+                                                            {"front", Picture::Pane::Front}};
     app.add_option_function<std::string>(
-           "--pane", [&options](const std::string& name) { options.pane = panes.at(name); },
+           "--pane", [&picture](const std::string& name) { picture.pane = panes.at(name); },
            "Picture this pane (default root)")
         ->type_name("root|playlist|limit|front")
         ->check(CLI::IsMember(panes).description(""))
         ->needs(screenshot);
 }
 
-void finish(Options& options, bool text, bool library, bool status) {
+void chooseMode(Options& options, bool text, bool library, bool status) {
     if (text) {
         options.mode = Options::Mode::Text;
     } else if (library) {
         options.mode = Options::Mode::Library;
     } else if (status) {
         options.mode = Options::Mode::Status;
-    } else if (!options.screenshot.empty()) {
+    } else if (!options.picture.file.empty()) {
         options.mode = Options::Mode::Screenshot;
     }
-    if (!options.wearable.empty()) {
-        options.wearable = absolute(options.wearable).lexically_normal();
+}
+
+void complete(Places& places) {
+    if (!places.wearable.empty()) {
+        places.wearable = absolute(places.wearable).lexically_normal();
     }
-    if (options.music.empty()) {
-        options.music =
+    if (places.music.empty()) {
+        places.music =
             QStandardPaths::writableLocation(QStandardPaths::MusicLocation).toStdString();
     }
-    options.music = absolute(options.music).lexically_normal();
+    places.music = absolute(places.music).lexically_normal();
 }
 
 } // namespace
@@ -134,8 +137,8 @@ std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* ar
     app.set_help_flag("-h,--help", "Print this help and end");
     app.footer(exitCodes);
     addModes(app, options, text, library, status);
-    addPlaces(app, options);
-    addPictureOptions(app, options);
+    addPlaces(app, options.places);
+    addPictureOptions(app, options.picture);
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
@@ -146,7 +149,8 @@ std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* ar
         std::cerr << "quorl: " << error.what() << "\nRun \"quorl --help\" for the options.\n";
         return ExitCode::Usage;
     }
-    finish(options, text, library, status);
+    chooseMode(options, text, library, status);
+    complete(options.places);
     return options;
 }
 

@@ -1,35 +1,21 @@
 #pragma once
 
-#include <filesystem>
-#include <string>
 #include <variant>
 
-namespace quorl {
+#include "quorl/app/ExitCode.h"
+#include "quorl/app/Picture.h"
+#include "quorl/app/Places.h"
 
-/// What `quorl` ends with; part of its interface, so the numbers stay as they are.
-enum class ExitCode : int {
-    Success = 0,
-    Failure = 1,       ///< it could not do what it was asked to
-    Usage = 2,         ///< the command line is wrong
-    NoMusicFolder = 3, ///< `--library` only
-};
+namespace quorl {
 
 /// What the command line asks for.
 struct Options {
     enum class Mode { Window, Text, Screenshot, Library, Status };
-    enum class Pane { Root, Playlist, Limit, Front };
 
     Mode mode = Mode::Window;
-    std::filesystem::path music;      ///< the music folder; never empty
-    std::filesystem::path wearable;   ///< a mounted wearable; empty for the embedded one
-    bool json = false;                ///< of the status
-    std::filesystem::path plugins;    ///< searched before all others; empty for none
-    std::filesystem::path screenshot; ///< the picture to write
-    int width = 360;                  ///< of the picture, in points
-    int height = 720;
-    double scale = 1; ///< device pixels to the point
-    bool dark = false;
-    Pane pane = Pane::Root;
+    Places places;
+    Picture picture;   ///< of the screenshot
+    bool json = false; ///< of the status
 };
 
 /// What the arguments ask for, or what to end with at once: after `--help` and `--version`, which

@@ -6,11 +6,11 @@
 
 namespace quorl {
 
-Companion::Companion(Options options, PaneScreen& screen, Notices& notices)
-    : options_(std::move(options)),
+Companion::Companion(Places places, PaneScreen& screen, Notices& notices)
+    : places_(std::move(places)),
       screen_(screen),
       notices_(notices),
-      host_(std::make_shared<CompanionHost>(options_, screen, notices)),
+      host_(std::make_shared<CompanionHost>(places_, screen, notices)),
       navigation_(::create<NavigationController>()) {
     connect(&mainQueue_, &MainQueueNotifier::drained, this, &Companion::idle);
     Host::install(host_);
@@ -25,13 +25,13 @@ Companion::~Companion() {
 }
 
 void Companion::makeFrontPage() {
-    const auto loaded = loadPane(pluginDirectories(options_.plugins));
+    const auto loaded = loadPane(pluginDirectories(places_.plugins));
     if (const auto* problem = std::get_if<PaneProblem>(&loaded)) {
         problem_ = problem->text;
         return;
     }
     frontPage_ = FrontPage::over(host_->engineLink(), std::get<Class>(loaded), "Music",
-                                 options_.wearable.empty());
+                                 places_.wearable.empty());
     navigation_->setRootPane(frontPage_);
     (void)frontPage_->specifiers(); // builds the rows before the page is shown
     host_->setEngineObserver([this] { frontPage_->refresh(); });
@@ -44,7 +44,7 @@ void Companion::start() {
                      "The Music pane cannot be shown. Install its plug-in again.");
     }
     screen_.scheduleDrawing();
-    host_->openLibrary(options_.music, [this] { Q_EMIT libraryRead(); });
+    host_->openLibrary(places_.music, [this] { Q_EMIT libraryRead(); });
 }
 
 void Companion::enterBackground() {

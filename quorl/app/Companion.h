@@ -1,10 +1,10 @@
 #pragma once
 
-#include "quorl/app/CommandLine.h"
 #include "quorl/app/CompanionHost.h"
 #include "quorl/app/MainQueueNotifier.h"
 #include "quorl/app/Notices.h"
 #include "quorl/app/PaneScreen.h"
+#include "quorl/app/Places.h"
 #include "runtime/lists/NavigationController.h"
 
 namespace quorl {
@@ -18,7 +18,7 @@ class Companion final : public QObject {
 
   public:
     /// Installs the host and makes the root pane. `screen` and `notices` outlive the companion.
-    Companion(Options options, PaneScreen& screen, Notices& notices);
+    Companion(Places places, PaneScreen& screen, Notices& notices);
 
     /// Takes the panes off the screen, lets go of them and takes the host back.
     ~Companion() override;
@@ -39,7 +39,7 @@ class Companion final : public QObject {
     void start();
 
     /// Whether the services have given what they were asked for when the panes came on the screen.
-    [[nodiscard]] bool isSettled() const { return host_->isSettled(); }
+    [[nodiscard]] bool hasAllAnswers() const { return host_->hasAllAnswers(); }
 
     /// Tells the panes, and whoever else listens, that the app leaves the screen, or comes back.
     void enterBackground();
@@ -55,7 +55,7 @@ class Companion final : public QObject {
   private:
     void makeFrontPage();
 
-    const Options options_;
+    const Places places_;
     PaneScreen& screen_;
     Notices& notices_;
     MainQueueNotifier mainQueue_;

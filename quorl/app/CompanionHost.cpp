@@ -6,21 +6,22 @@ namespace quorl {
 
 namespace {
 
-wearable::Wearable wearableOf(const Options& options) {
-    return options.wearable.empty() ? wearable::Wearable::embedded()
-                                    : wearable::Wearable::mounted(options.wearable);
+wearable::Wearable wearableOf(const Places& places) {
+    return places.wearable.empty() ? wearable::Wearable::embedded()
+                                   : wearable::Wearable::mounted(places.wearable);
 }
 
 } // namespace
 
-CompanionHost::CompanionHost(const Options& options, Screen& screen, Notices& notices)
+CompanionHost::CompanionHost(const Places& places, Screen& screen, Notices& notices)
     : screen_(screen),
       notices_(notices),
-      store_(notices),
+      store_(
+          [&notices](const std::string& text) { notices.set(Notices::Topic::Preferences, text); }),
       syncDefaults_(std::make_shared<SyncDefaults>(store_)),
       library_(std::make_shared<MusicLibrary>()),
-      wearable_(wearableOf(options)),
-      engine_({options.music, options.wearable},
+      wearable_(wearableOf(places)),
+      engine_({places.music, places.wearable},
               [this](const std::string& problem) { engineDidChange(problem); }) {}
 
 void CompanionHost::engineDidChange(const std::string& problem) {

@@ -4,7 +4,8 @@
 #include "quorl/adapters/MusicLibrary.h"
 #include "quorl/adapters/PreferencesStore.h"
 #include "quorl/adapters/WearableUsage.h"
-#include "quorl/app/CommandLine.h"
+#include "quorl/app/Notices.h"
+#include "quorl/app/Places.h"
 #include "runtime/host/Host.h"
 #include "runtime/host/Screen.h"
 
@@ -14,7 +15,7 @@ namespace quorl {
 class CompanionHost final : public Host {
   public:
     /// `screen` and `notices` outlive the host.
-    CompanionHost(const Options& options, Screen& screen, Notices& notices);
+    CompanionHost(const Places& places, Screen& screen, Notices& notices);
 
     [[nodiscard]] EngineLink& engineLink() { return engine_; }
 
@@ -27,7 +28,7 @@ class CompanionHost final : public Host {
 
     /// Whether the music folder has been read for the first time, the wearable has answered all
     /// that it was asked, and the sync engine has been heard of.
-    [[nodiscard]] bool isSettled() const {
+    [[nodiscard]] bool hasAllAnswers() const {
         return library_->isRead() && wearable_.isIdle() && isEngineHeardOf_;
     }
 

@@ -67,11 +67,10 @@ void printLeftOut(const media::Inventory& inventory) {
 
 } // namespace
 
-ExitCode printLibrary(const Options& options) {
-    const auto inventory = media::scan(options.music);
+ExitCode printLibrary(const std::filesystem::path& music) {
+    const auto inventory = media::scan(music);
     if (!inventory->rootFound) {
-        std::cerr << "quorl: There is no music folder at "
-                  << base::printable(options.music.string())
+        std::cerr << "quorl: There is no music folder at " << base::printable(music.string())
                   << ". Create it, or name another one with --music.\n";
         return ExitCode::NoMusicFolder;
     }

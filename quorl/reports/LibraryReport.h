@@ -1,10 +1,12 @@
 #pragma once
 
-#include "quorl/app/CommandLine.h"
+#include <filesystem>
+
+#include "quorl/app/ExitCode.h"
 
 namespace quorl {
 
-/// Prints what the music folder holds and what was left out of its playlists.
-[[nodiscard]] ExitCode printLibrary(const Options& options);
+/// Prints what the folder `music` holds and what was left out of its playlists.
+[[nodiscard]] ExitCode printLibrary(const std::filesystem::path& music);
 
 } // namespace quorl

@@ -1,44 +1,95 @@
 #include "quorl/reports/Screenshot.h"
 
-#include <QCoreApplication>
+#include <QApplication>
+#include <QCursor>
 #include <QImageWriter>
 #include <QPixmap>
 #include <iostream>
 
+#include "quorl/app/QtSetup.h"
+#include "quorl/window/MainWindow.h"
+
 namespace quorl {
 
-Screenshot::Screenshot(Options options, Companion& companion, MainWindow& window)
-    : options_(std::move(options)), companion_(companion), window_(window) {
-    connect(&companion, &Companion::idle, this, &Screenshot::beginWhenSettled);
+namespace {
+
+/// Takes the picture, then ends the application's event loop, with an exit code.
+class Photographer final : public QObject {
+  public:
+    /// All outlive the photographer.
+    Photographer(const Picture& picture, Companion& companion, MainWindow& window)
+        : picture_(picture), companion_(companion), window_(window) {
+        connect(&companion, &Companion::idle, this, &Photographer::beginWhenAnswered);
+    }
+
+  private:
+    void beginWhenAnswered() {
+        if (companion_.hasAllAnswers()) {
+            disconnect(&companion_, &Companion::idle, this, nullptr);
+            companion_.screen().whenDrawn(*this, [this] { openPane(); });
+        }
+    }
+
+    void openPane() {
+        RowsView* view = window_.topView();
+        if (picture_.pane == Picture::Pane::Front) {
+            window_.goBack();
+        } else if (view && picture_.pane != Picture::Pane::Root) {
+            view->tap(picture_.pane == Picture::Pane::Playlist ? 0 : 1);
+        }
+        companion_.screen().whenDrawn(*this, [this] { take(); });
+    }
+
+    void take() {
+        QImageWriter writer(QString::fromStdString(picture_.file.string()), "png");
+        if (writer.write(window_.grab().toImage())) {
+            QCoreApplication::exit(static_cast<int>(ExitCode::Success));
+            return;
+        }
+        std::cerr << "quorl: The picture could not be written to " << picture_.file.string() << ": "
+                  << writer.errorString().toStdString()
+                  << ". Choose another file, or make room for it.\n";
+        QCoreApplication::exit(static_cast<int>(ExitCode::Failure));
+    }
+
+    const Picture& picture_;
+    Companion& companion_;
+    MainWindow& window_;
+};
+
+void choosePlatform(const Picture& picture) {
+    if (!QtSetup::hasDisplay()) {
+        qputenv("QT_QPA_PLATFORM", "offscreen");
+    }
+    qputenv("QT_SCALE_FACTOR", QByteArray::number(picture.scale));
 }
 
-void Screenshot::beginWhenSettled() {
-    if (companion_.isSettled()) {
-        disconnect(&companion_, &Companion::idle, this, nullptr);
-        companion_.screen().whenDrawn(*this, [this] { openPane(); });
+void chooseLook(const Picture& picture) {
+    if (QGuiApplication::platformName() == QStringLiteral("offscreen")) {
+        QCursor::setPos(picture.width, picture.height); // nobody's pointer, out of the picture
+    }
+    if (picture.isDark) {
+        QApplication::setPalette(darkPalette());
     }
 }
 
-void Screenshot::openPane() {
-    RowsView* view = window_.topView();
-    if (options_.pane == Options::Pane::Front) {
-        window_.goBack();
-    } else if (view && options_.pane != Options::Pane::Root) {
-        view->tap(options_.pane == Options::Pane::Playlist ? 0 : 1);
-    }
-    companion_.screen().whenDrawn(*this, [this] { take(); });
-}
+} // namespace
 
-void Screenshot::take() {
-    QImageWriter writer(QString::fromStdString(options_.screenshot.string()), "png");
-    if (writer.write(window_.grab().toImage())) {
-        QCoreApplication::exit(static_cast<int>(ExitCode::Success));
-        return;
-    }
-    std::cerr << "quorl: The picture could not be written to " << options_.screenshot.string()
-              << ": " << writer.errorString().toStdString()
-              << ". Choose another file, or make room for it.\n";
-    QCoreApplication::exit(static_cast<int>(ExitCode::Failure));
+ExitCode takeScreenshot(char* program, const Places& places, const Picture& picture) {
+    choosePlatform(picture);
+    QtSetup setup(program);
+    const QApplication application(setup.argumentCount(), setup.arguments());
+    QtSetup::followUsersLanguage();
+    chooseLook(picture);
+    WindowScreen screen;
+    Notices notices;
+    Companion companion(places, screen, notices);
+    MainWindow window(companion, screen);
+    window.resize(picture.width, picture.height);
+    const Photographer photographer(picture, companion, window);
+    companion.start();
+    window.show();
+    return static_cast<ExitCode>(QApplication::exec());
 }
 
 } // namespace quorl

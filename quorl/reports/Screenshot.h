@@ -1,28 +1,14 @@
 #pragma once
 
-#include "quorl/app/CommandLine.h"
-#include "quorl/window/MainWindow.h"
+#include "quorl/app/ExitCode.h"
+#include "quorl/app/Picture.h"
+#include "quorl/app/Places.h"
 
 namespace quorl {
 
-/// Takes a picture of a window once it shows what is there: the music folder has been read, the
-/// wearable has answered, what that led to has been done, and the pane that is wanted is open. Then
-/// ends the application's event loop, with an exit code. Main thread.
-class Screenshot final : public QObject {
-    Q_OBJECT
-
-  public:
-    /// Both outlive the picture.
-    Screenshot(Options options, Companion& companion, MainWindow& window);
-
-  private:
-    void beginWhenSettled();
-    void openPane();
-    void take();
-
-    const Options options_;
-    Companion& companion_;
-    MainWindow& window_;
-};
+/// Writes a picture of a window once it shows what is there: the music folder has been read, the
+/// wearable has answered, what that led to has been done, and the pane that is wanted is open.
+/// `program` is how this program was called.
+[[nodiscard]] ExitCode takeScreenshot(char* program, const Places& places, const Picture& picture);
 
 } // namespace quorl

@@ -149,7 +149,7 @@ ExitCode printStatus(const Options& options) {
     if (!opened.preferences) {
         return ExitCode::Failure;
     }
-    const auto library = media::scan(options.music);
+    const auto library = media::scan(options.places.music);
     const Choice choice = choiceOf(*opened.preferences, *library, isRunning(word.state));
     if (options.json) {
         std::cout << jsonOf(word.state, choice).dump(2, ' ', false, Json::error_handler_t::replace)

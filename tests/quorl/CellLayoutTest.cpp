@@ -41,7 +41,7 @@ class CellLayout : public testing::TestWithParam<double> {
     WindowScreen screen_;
     Notices notices_;
     std::shared_ptr<CompanionHost> host_ =
-        std::make_shared<CompanionHost>(Options{}, screen_, notices_);
+        std::make_shared<CompanionHost>(Places{}, screen_, notices_);
 };
 
 TEST_P(CellLayout, labelsAreOnWholeDevicePixels) {

@@ -81,7 +81,7 @@ class LongTableView : public testing::Test {
     WindowScreen screen_;
     Notices notices_;
     std::shared_ptr<CompanionHost> host_ =
-        std::make_shared<CompanionHost>(Options{}, screen_, notices_);
+        std::make_shared<CompanionHost>(Places{}, screen_, notices_);
     std::shared_ptr<NavigationController> navigation_ = ::create<NavigationController>();
     std::shared_ptr<LongTable> table_;
     std::unique_ptr<RowsView> view_;

@@ -17,12 +17,6 @@ namespace {
 
 constexpr int patience = 60'000; // milliseconds
 
-Options optionsFor(const std::filesystem::path& music) {
-    Options options;
-    options.music = music;
-    return options;
-}
-
 /// The panes in a terminal of the test's own process.
 class TextSessionTest : public testing::Test {
   protected:
@@ -75,7 +69,7 @@ class TextSessionTest : public testing::Test {
     SampleMusic music_;
     TextScreen screen_;
     Notices notices_;
-    Companion companion_{optionsFor(music_.folder().path()), screen_, notices_};
+    Companion companion_ = Companion(Places{music_.folder().path(), {}, {}}, screen_, notices_);
     std::array<int, 2> input_{};
     std::ostringstream output_;
     std::optional<TextSession> session_;

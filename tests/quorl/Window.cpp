@@ -9,21 +9,15 @@ namespace {
 
 constexpr int patience = 60'000; // milliseconds
 
-Options optionsFor(const std::filesystem::path& music) {
-    Options options;
-    options.music = music;
-    return options;
-}
-
 } // namespace
 
 Window::Window(const std::filesystem::path& music)
-    : companion_(optionsFor(music.empty() ? music_.folder().path() : music), screen_, notices_),
+    : companion_(Places{music.empty() ? music_.folder().path() : music, {}, {}}, screen_, notices_),
       window_(companion_, screen_) {
     window_.resize(360, 720);
     companion_.start();
     window_.show();
-    if (!QTest::qWaitFor([this] { return companion_.isSettled() && window_.topView(); },
+    if (!QTest::qWaitFor([this] { return companion_.hasAllAnswers() && window_.topView(); },
                          patience)) {
         throw std::runtime_error("the music folder is not read: " + companion_.problem());
     }

@@ -1,0 +1,12 @@
+#pragma once
+
+#include "quorl/app/ExitCode.h"
+#include "quorl/app/Places.h"
+
+namespace quorl {
+
+/// Shows the panes in the terminal until the user leaves or the input ends. `program` is how this
+/// program was called.
+[[nodiscard]] ExitCode runInTerminal(char* program, const Places& places);
+
+} // namespace quorl

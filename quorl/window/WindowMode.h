@@ -1,0 +1,11 @@
+#pragma once
+
+#include "quorl/app/ExitCode.h"
+#include "quorl/app/Places.h"
+
+namespace quorl {
+
+/// Shows the panes in a window until the user closes it. `program` is how this program was called.
+[[nodiscard]] ExitCode runInWindow(char* program, const Places& places);
+
+} // namespace quorl
