@@ -4,11 +4,9 @@ namespace quorl {
 
 namespace {
 
-/// The two that are plain values have one when they are unset, too.
 std::optional<std::uint64_t> unsetValue(SyncPreference preference) {
-    const bool isPlain = preference == SyncPreference::AssetSyncEnabled ||
-                         preference == SyncPreference::AssetSyncLimitType;
-    return isPlain ? std::optional<std::uint64_t>(0) : std::nullopt;
+    const auto& declaration = syncPreferences.at(static_cast<std::size_t>(preference));
+    return declaration.canBeNull() ? std::nullopt : std::optional<std::uint64_t>(0);
 }
 
 Json idOf(const std::shared_ptr<NSNumber>& id) {

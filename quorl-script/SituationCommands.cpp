@@ -1,5 +1,6 @@
 // The commands that settle what the pane finds: library, preferences, sessions, wearable, clock.
 
+#include <algorithm>
 #include <thread>
 #include <unordered_map>
 
@@ -68,42 +69,38 @@ Json library(Stage& stage, const Field& command) {
 
 using PreferenceReader = std::uint64_t (*)(const Field&);
 
-struct Preference {
-    SyncPreference preference;
-    PreferenceReader read;
-};
+/// A script gives an id as a text, as JSON's numbers are not long enough; a revision either way.
+PreferenceReader readerOf(const SyncPreferenceDeclaration& declaration) {
+    if (declaration.type == "b") {
+        return [](const Field& it) { return std::uint64_t{it.boolean()}; };
+    }
+    if (declaration.name.ends_with("ID")) {
+        return [](const Field& it) { return it.id(); };
+    }
+    if (declaration.name.ends_with("Version")) {
+        return [](const Field& it) { return it.figure(); };
+    }
+    return [](const Field& it) { return it.count(std::numeric_limits<NSUInteger>::max()); };
+}
 
-const Preference& preferenceOf(const Field& field, const std::string& name) {
-    constexpr PreferenceReader flag = [](const Field& it) { return std::uint64_t{it.boolean()}; };
-    constexpr PreferenceReader id = [](const Field& it) { return it.id(); };
-    constexpr PreferenceReader figure = [](const Field& it) { return it.figure(); };
-    constexpr PreferenceReader word = [](const Field& it) {
-        return it.count(std::numeric_limits<NSUInteger>::max());
-    };
-    static const std::unordered_map<std::string, Preference> preferences{
-        {"assetSyncEnabled", {SyncPreference::AssetSyncEnabled, flag}},
-        {"assetSyncPlaylistPersistentID", {SyncPreference::AssetSyncPlaylistPersistentID, id}},
-        {"assetSyncLimitType", {SyncPreference::AssetSyncLimitType, word}},
-        {"assetSyncLimit", {SyncPreference::AssetSyncLimit, word}},
-        {"lastFullySentAssetSyncPlaylistPersistentID",
-         {SyncPreference::LastFullySentAssetSyncPlaylistPersistentID, id}},
-        {"lastFullySentAssetSyncPlaylistVersion",
-         {SyncPreference::LastFullySentAssetSyncPlaylistVersion, figure}}};
-    const auto found = preferences.find(name);
-    if (found == preferences.end()) {
+const SyncPreferenceDeclaration& preferenceOf(const Field& field, std::string_view name) {
+    const auto* const found =
+        std::find_if(syncPreferences.begin(), syncPreferences.end(),
+                     [name](const auto& declaration) { return declaration.name == name; });
+    if (found == syncPreferences.end()) {
         throw CommandError("\"" + field.name() + "\" is no preference");
     }
-    return found->second;
+    return *found;
 }
 
 Json prefs(Stage& stage, const Field& command) {
     const Field set = command["set"];
     std::vector<std::pair<SyncPreference, std::optional<std::uint64_t>>> values;
     for (const Field& field : set.members()) {
-        const auto& [preference, read] =
-            preferenceOf(field, field.name().substr(set.name().size() + 1));
-        values.emplace_back(preference,
-                            field.isGiven() ? std::optional(read(field)) : std::nullopt);
+        const auto& declaration = preferenceOf(field, field.name().substr(set.name().size() + 1));
+        values.emplace_back(declaration.preference,
+                            field.isGiven() ? std::optional(readerOf(declaration)(field))
+                                            : std::nullopt);
     }
     const bool isAnnounced = command["notify"].booleanOr(true);
 

@@ -1,6 +1,6 @@
 #include "quorl/adapters/PreferencesStore.h"
 
-#include <stdexcept>
+#include <optional>
 
 namespace quorl {
 
@@ -8,24 +8,18 @@ namespace {
 
 using namespace preferences;
 
-/// Calls `use` with the stored preference that stands for `preference`.
+/// Calls `use` with the stored preference that stands for `preference`: both are in the order of
+/// the schema.
 template <class Use>
 auto with(SyncPreference preference, Use use) {
-    switch (preference) {
-    case SyncPreference::AssetSyncEnabled:
-        return use(assetSyncEnabled);
-    case SyncPreference::AssetSyncPlaylistPersistentID:
-        return use(assetSyncPlaylistPersistentID);
-    case SyncPreference::AssetSyncLimitType:
-        return use(assetSyncLimitType);
-    case SyncPreference::AssetSyncLimit:
-        return use(assetSyncLimit);
-    case SyncPreference::LastFullySentAssetSyncPlaylistPersistentID:
-        return use(lastFullySentAssetSyncPlaylistPersistentID);
-    case SyncPreference::LastFullySentAssetSyncPlaylistVersion:
-        return use(lastFullySentAssetSyncPlaylistVersion);
-    }
-    throw std::invalid_argument("no such preference");
+    std::optional<decltype(use(assetSyncEnabled))> result;
+    auto place = static_cast<int>(preference);
+    forEachPreference([&](const auto& stored) {
+        if (place-- == 0) {
+            result.emplace(use(stored));
+        }
+    });
+    return std::move(result).value();
 }
 
 /// A preference that always has a value stores 0 in place of null.

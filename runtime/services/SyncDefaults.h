@@ -1,20 +1,9 @@
 #pragma once
 
-#include <array>
-
 #include "platform/SyncPreferences.h"
+#include "runtime/services/SyncPreference.h"
 
 namespace quorl {
-
-/// The shared preferences, one by one.
-enum class SyncPreference {
-    AssetSyncEnabled,
-    AssetSyncPlaylistPersistentID,
-    AssetSyncLimitType,
-    AssetSyncLimit,
-    LastFullySentAssetSyncPlaylistPersistentID,
-    LastFullySentAssetSyncPlaylistVersion,
-};
 
 /// Where a host keeps the shared preferences. Main thread only.
 class SyncPreferencesStore {
