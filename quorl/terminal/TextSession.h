@@ -11,8 +11,7 @@
 namespace quorl {
 
 /// The panes in a terminal: prints the top one again whenever it says something else, and takes
-/// commands from standard input, one a line. Ends the application's event loop at the end of the
-/// input. Main thread.
+/// commands, one a line. Ends the application's event loop at the end of the input. Main thread.
 class TextSession final : public QObject {
     Q_OBJECT
 
