@@ -1,9 +1,9 @@
 #pragma once
 
-#include "quorl-script/Field.h"
+#include "doubles/HostDouble.h"
 #include "quorl-script/Panes.h"
 #include "quorl-script/Plugin.h"
-#include "quorl-script/ScriptedHost.h"
+#include "quorl-script/input/Field.h"
 
 namespace quorl {
 

@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
-#include "quorl-script/Field.h"
 #include "quorl-script/Naming.h"
+#include "quorl-script/input/Field.h"
 #include "runtime/lists/TableView.h"
 
 namespace quorl {

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "quorl-script/ScriptedScreen.h"
+#include "doubles/ScreenDouble.h"
 #include "runtime/lists/NavigationController.h"
 
 namespace quorl {

@@ -1,6 +1,6 @@
 #include "quorl-script/Plugin.h"
 
-#include "quorl-script/Field.h"
+#include "quorl-script/input/Field.h"
 
 namespace quorl {
 

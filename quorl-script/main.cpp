@@ -9,7 +9,7 @@
 #include <unistd.h>
 
 #include "quorl-script/Interpreter.h"
-#include "quorl-script/LineReader.h"
+#include "quorl-script/input/LineReader.h"
 
 namespace {
 

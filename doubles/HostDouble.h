@@ -1,10 +1,10 @@
 #pragma once
 
-#include "quorl-script/ScriptedLibrary.h"
-#include "quorl-script/ScriptedPreferences.h"
-#include "quorl-script/ScriptedScreen.h"
-#include "quorl-script/ScriptedSessions.h"
-#include "quorl-script/ScriptedWearable.h"
+#include "doubles/PreferencesDouble.h"
+#include "doubles/ScreenDouble.h"
+#include "doubles/WearableDouble.h"
+#include "doubles/library/LibraryDouble.h"
+#include "doubles/sessions/SessionServiceDouble.h"
 #include "quorl-script/Trace.h"
 #include "runtime/host/Host.h"
 

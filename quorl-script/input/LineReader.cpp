@@ -1,4 +1,4 @@
-#include "quorl-script/LineReader.h"
+#include "quorl-script/input/LineReader.h"
 
 #include <algorithm>
 #include <cerrno>

@@ -1,4 +1,4 @@
-#include "quorl-script/Field.h"
+#include "quorl-script/input/Field.h"
 
 #include <charconv>
 #include <cmath>

@@ -1,4 +1,4 @@
-#include "quorl-script/ScriptedPreferences.h"
+#include "doubles/PreferencesDouble.h"
 
 namespace quorl {
 

@@ -1,4 +1,4 @@
-#include "quorl-script/ScriptedLibrary.h"
+#include "doubles/library/LibraryDouble.h"
 
 #include <algorithm>
 #include <map>

@@ -1,4 +1,4 @@
-#include "quorl-script/TracingNotificationCenter.h"
+#include "doubles/NotificationCenterDouble.h"
 
 #include "quorl-script/Naming.h"
 

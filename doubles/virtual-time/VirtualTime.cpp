@@ -1,4 +1,4 @@
-#include "quorl-script/virtual-time/VirtualTime.h"
+#include "doubles/virtual-time/VirtualTime.h"
 
 #include <algorithm>
 #include <limits>

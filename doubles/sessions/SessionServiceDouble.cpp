@@ -1,9 +1,9 @@
-#include "quorl-script/ScriptedSessions.h"
+#include "doubles/sessions/SessionServiceDouble.h"
 
 #include <algorithm>
 #include <iterator>
 
-#include "quorl-script/ById.h"
+#include "doubles/sessions/ById.h"
 
 namespace quorl {
 

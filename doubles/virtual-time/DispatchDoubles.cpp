@@ -2,7 +2,7 @@
 
 #include <dlfcn.h>
 
-#include "quorl-script/virtual-time/VirtualTime.h"
+#include "doubles/virtual-time/VirtualTime.h"
 
 namespace {
 

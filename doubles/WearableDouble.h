@@ -2,8 +2,8 @@
 
 #include <deque>
 
+#include "doubles/virtual-time/VirtualTime.h"
 #include "quorl-script/Trace.h"
-#include "quorl-script/virtual-time/VirtualTime.h"
 #include "runtime/services/WearableConnection.h"
 
 namespace quorl {

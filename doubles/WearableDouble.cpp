@@ -1,4 +1,4 @@
-#include "quorl-script/ScriptedWearable.h"
+#include "doubles/WearableDouble.h"
 
 #include <utility>
 

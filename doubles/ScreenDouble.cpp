@@ -1,4 +1,4 @@
-#include "quorl-script/ScriptedScreen.h"
+#include "doubles/ScreenDouble.h"
 
 #include <utility>
 

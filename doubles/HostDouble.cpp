@@ -1,10 +1,10 @@
-#include "quorl-script/ScriptedHost.h"
+#include "doubles/HostDouble.h"
 
 #include <array>
 #include <cstdint>
 #include <cstdio>
 
-#include "quorl-script/TracingNotificationCenter.h"
+#include "doubles/NotificationCenterDouble.h"
 
 namespace quorl {
 
