@@ -1,14 +1,15 @@
 #pragma once
 
-#include "quorl-script/Trace.h"
+#include "doubles/CallRecorder.h"
 #include "runtime/objects/NotificationCenter.h"
 
 namespace quorl {
 
-/// The runtime's notification centre with a trace. Any thread.
-class TracingNotificationCenter final : public NotificationCenter {
+/// The runtime's notification centre, with a recorder. Any thread.
+class NotificationCenterDouble final : public NotificationCenter {
   public:
-    explicit TracingNotificationCenter(std::shared_ptr<Trace> trace) : trace_(std::move(trace)) {}
+    explicit NotificationCenterDouble(std::shared_ptr<CallRecorder> recorder)
+        : recorder_(std::move(recorder)) {}
 
     void addObserver_selector_name_object(NSObject* observer, NSNotificationSelector selector,
                                           NSNotificationName name, const NSObject* object) override;
@@ -16,7 +17,7 @@ class TracingNotificationCenter final : public NotificationCenter {
     void postNotificationName_object(NSNotificationName name, NSObject* object) override;
 
   private:
-    std::shared_ptr<Trace> trace_;
+    std::shared_ptr<CallRecorder> recorder_;
 };
 
 } // namespace quorl

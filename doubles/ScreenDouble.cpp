@@ -2,31 +2,27 @@
 
 #include <utility>
 
-#include "quorl-script/Naming.h"
-
 namespace quorl {
 
-namespace {
-
-Json pathOf(const NSIndexPath& path) { return Json::array({path.section, path.row}); }
-
-} // namespace
-
-std::vector<const UILabel*> ScriptedScreen::tryLayout(UITableViewCell& cell,
-                                                      const CellLayout& layout) {
+std::vector<const UILabel*> ScreenDouble::tryLayout(UITableViewCell& cell,
+                                                    const CellLayout& layout) {
     layout_ = layout;
     cell.layoutSubviews();
     layout_.reset();
     return std::exchange(labelsSet_, {});
 }
 
-CGFloat ScriptedScreen::scale() const { return layout_ ? layout_->scale : looks_.scale; }
+CGFloat ScreenDouble::scale() const { return layout_ ? layout_->scale : looks.scale; }
 
-CGSize ScriptedScreen::sizeOfText(const UILabel& /*label*/) const {
-    return {layout_ ? layout_->detailWidth : 0, rowSize().height};
+CGSize ScreenDouble::sizeOfText(const UILabel& label) const {
+    if (layout_) {
+        return {layout_->detailWidth, rowSize().height};
+    }
+    const auto length = label.text() ? label.text()->size() : 0;
+    return length == 0 ? CGSize{} : CGSize{static_cast<CGFloat>(10 * length), 20};
 }
 
-void ScriptedScreen::layOutLabels(UITableViewCell& cell) {
+void ScreenDouble::layOutLabels(UITableViewCell& cell) {
     if (!layout_) {
         Screen::layOutLabels(cell);
         return;
@@ -36,61 +32,46 @@ void ScriptedScreen::layOutLabels(UITableViewCell& cell) {
     labelsSet_.clear();
 }
 
-void ScriptedScreen::labelDidSetFrame(UILabel& label) {
+void ScreenDouble::labelDidSetFrame(UILabel& label) {
+    recorder_->labelDidSetFrame(label);
     if (layout_) {
         labelsSet_.push_back(&label);
     }
 }
 
-void ScriptedScreen::specifierWillSetProperty(PSSpecifier& specifier,
-                                              const std::optional<std::string>& value,
-                                              std::string_view key) {
-    trace_->record("PSSpecifier", "setProperty:forKey:", textOf(specifier.name()), textOf(value),
-                   key);
+void ScreenDouble::specifierWillSetProperty(PSSpecifier& specifier,
+                                            const std::optional<std::string>& value,
+                                            std::string_view key) {
+    recorder_->specifierWillSetProperty(specifier, value, key);
 }
 
-void ScriptedScreen::listWillReloadSpecifier(PSListController& /*list*/,
-                                             const PSSpecifier* specifier) {
-    trace_->record("PSListController",
-                   "reloadSpecifier:", specifier ? textOf(specifier->name()) : Json(nullptr));
+void ScreenDouble::listWillReloadSpecifier(PSListController& /*list*/,
+                                           const PSSpecifier* specifier) {
+    recorder_->listWillReloadSpecifier(specifier);
 }
 
-void ScriptedScreen::listWillReload(PSListController& /*list*/) {
-    trace_->record("PSListController", "reload");
+void ScreenDouble::listWillReload(PSListController& /*list*/) { recorder_->listWillReload(); }
+
+void ScreenDouble::listWillShowController(PSListController& /*list*/, PSController* controller,
+                                          std::optional<bool> animate) {
+    recorder_->listWillShowController(controller, animate);
 }
 
-void ScriptedScreen::listWillShowController(PSListController& /*list*/, PSController* controller,
-                                            std::optional<bool> animate) {
-    const Json shown = classNameOrNull(dynamic_cast<NSObject*>(controller));
-    if (animate) {
-        trace_->record("PSListController", "showController:animate:", shown, *animate);
-    } else {
-        trace_->record("PSListController", "showController:", shown);
-    }
+void ScreenDouble::listWillHandleURL(PSListController& /*list*/, const std::string& url) {
+    recorder_->listWillHandleURL(url);
 }
 
-void ScriptedScreen::listWillHandleURL(PSListController& /*list*/, const std::string& url) {
-    trace_->record("PSListController", "handleURL:", url);
+void ScreenDouble::tableWillReloadData(UITableView& /*table*/) { recorder_->tableWillReloadData(); }
+
+void ScreenDouble::tableWillReloadRows(UITableView& /*table*/,
+                                       const std::vector<NSIndexPath>& paths,
+                                       UITableViewRowAnimation animation) {
+    recorder_->tableWillReloadRows(paths, animation);
 }
 
-void ScriptedScreen::tableWillReloadData(UITableView& /*table*/) {
-    trace_->record("UITableView", "reloadData");
-}
-
-void ScriptedScreen::tableWillReloadRows(UITableView& /*table*/,
-                                         const std::vector<NSIndexPath>& paths,
-                                         UITableViewRowAnimation animation) {
-    Json list = Json::array();
-    for (const NSIndexPath& path : paths) {
-        list.push_back(pathOf(path));
-    }
-    trace_->record("UITableView", "reloadRowsAtIndexPaths:withRowAnimation:", std::move(list),
-                   static_cast<NSInteger>(animation));
-}
-
-void ScriptedScreen::tableWillDeselectRow(UITableView& /*table*/, const NSIndexPath& path,
-                                          bool animated) {
-    trace_->record("UITableView", "deselectRowAtIndexPath:animated:", pathOf(path), animated);
+void ScreenDouble::tableWillDeselectRow(UITableView& /*table*/, const NSIndexPath& path,
+                                        bool animated) {
+    recorder_->tableWillDeselectRow(path, animated);
 }
 
 } // namespace quorl

@@ -1,11 +1,11 @@
 #pragma once
 
-#include "quorl-script/Trace.h"
+#include "doubles/CallRecorder.h"
 #include "runtime/host/Screen.h"
 
 namespace quorl {
 
-/// The looks of a script's screen.
+/// What can be chosen about a screen.
 struct Looks {
     NSInteger rows = 12; ///< rows of a table on the screen at once
     CGFloat scale = 2;
@@ -13,7 +13,7 @@ struct Looks {
     UIColor tintColor = "tint";
 };
 
-/// One layout of a cell, as a script wants it tried.
+/// One layout of a cell, as it is to be tried.
 struct CellLayout {
     CGRect title; ///< what the standard layout gives
     CGRect detail;
@@ -21,15 +21,13 @@ struct CellLayout {
     CGFloat scale = 1;
 };
 
-/// A screen that nobody looks at, with a trace of what panes ask of their lists and tables. Main
-/// thread.
-class ScriptedScreen final : public Screen {
+/// A screen of 320 points that nobody looks at, ten points for each byte of a text. Main thread.
+class ScreenDouble final : public Screen {
   public:
-    explicit ScriptedScreen(std::shared_ptr<Trace> trace) : trace_(std::move(trace)) {}
+    explicit ScreenDouble(std::shared_ptr<CallRecorder> recorder)
+        : recorder_(std::move(recorder)) {}
 
-    [[nodiscard]] const Looks& looks() const { return looks_; }
-
-    void setLooks(Looks looks) { looks_ = std::move(looks); }
+    Looks looks;
 
     /// Has `cell` lay itself out under the conditions of `layout`. Gives the labels back whose
     /// frames were set after the standard layout, in order.
@@ -38,9 +36,9 @@ class ScriptedScreen final : public Screen {
 
     [[nodiscard]] CGFloat scale() const override;
 
-    [[nodiscard]] UIColor tintColor() const override { return looks_.tintColor; }
+    [[nodiscard]] UIColor tintColor() const override { return looks.tintColor; }
 
-    [[nodiscard]] std::optional<UIColor> listTextColor() const override { return looks_.textColor; }
+    [[nodiscard]] std::optional<UIColor> listTextColor() const override { return looks.textColor; }
 
     [[nodiscard]] CGSize rowSize() const override { return {320, 44}; }
 
@@ -60,8 +58,7 @@ class ScriptedScreen final : public Screen {
     void tableWillDeselectRow(UITableView& table, const NSIndexPath& path, bool animated) override;
 
   private:
-    std::shared_ptr<Trace> trace_;
-    Looks looks_;
+    std::shared_ptr<CallRecorder> recorder_;
     std::optional<CellLayout> layout_; ///< null but during `tryLayout`
     std::vector<const UILabel*> labelsSet_;
 };

@@ -8,14 +8,14 @@ namespace {
 
 class Connection final : public WearableConnection {
   public:
-    explicit Connection(ScriptedWearable& wearable) : wearable_(wearable) {}
+    explicit Connection(WearableDouble& wearable) : wearable_(wearable) {}
 
     void requestUsage(LSSManager::UsageHandler reply) override {
         wearable_.request(std::move(reply));
     }
 
   private:
-    ScriptedWearable& wearable_;
+    WearableDouble& wearable_;
 };
 
 NSDictionary<NSNumber> dictionaryOf(const UsageFigures& figures) {
@@ -39,13 +39,12 @@ void tell(const LSSManager::UsageHandler& reply, const std::optional<UsageFigure
 
 } // namespace
 
-std::shared_ptr<WearableConnection> ScriptedWearable::connect(dispatch_queue_t queue) {
-    const bool isMain = queue == dispatch_get_main_queue();
-    trace_->record("LSSManager", "initWithQueue:", isMain ? "main" : "other");
+std::shared_ptr<WearableConnection> WearableDouble::connect(dispatch_queue_t queue) {
+    recorder_->wearableWillConnect(queue);
     return std::make_shared<Connection>(*this);
 }
 
-void ScriptedWearable::setAnswer(const UsageAnswer& answer) {
+void WearableDouble::setAnswer(const UsageAnswer& answer) {
     answer_ = answer;
     if (!answer.isHeld) {
         for (auto& reply : std::exchange(held_, {})) {
@@ -54,8 +53,20 @@ void ScriptedWearable::setAnswer(const UsageAnswer& answer) {
     }
 }
 
-void ScriptedWearable::request(LSSManager::UsageHandler reply) {
-    trace_->record("LSSManager", "getUsage:");
+LSSManager::UsageHandler WearableDouble::takeQuestion() {
+    auto question = std::move(held_.at(0));
+    held_.pop_front();
+    return question;
+}
+
+void WearableDouble::reply(const UsageFigures& figures) { tell(takeQuestion(), figures); }
+
+void WearableDouble::fail(const std::string& problem) {
+    takeQuestion()(nullptr, std::make_shared<NSError>(problem));
+}
+
+void WearableDouble::request(LSSManager::UsageHandler reply) {
+    recorder_->wearableWillBeAskedForUsage();
     if (answer_.isHeld) {
         held_.push_back(std::move(reply));
     } else {
@@ -63,7 +74,7 @@ void ScriptedWearable::request(LSSManager::UsageHandler reply) {
     }
 }
 
-void ScriptedWearable::answer(LSSManager::UsageHandler reply) const {
+void WearableDouble::answer(LSSManager::UsageHandler reply) const {
     if (answer_.delay == 0) {
         tell(reply, answer_.figures);
         return;

@@ -2,8 +2,8 @@
 
 #include <deque>
 
+#include "doubles/CallRecorder.h"
 #include "doubles/virtual-time/VirtualTime.h"
-#include "quorl-script/Trace.h"
 #include "runtime/services/WearableConnection.h"
 
 namespace quorl {
@@ -21,10 +21,11 @@ struct UsageAnswer {
     VirtualTime::Nanoseconds delay = 0;
 };
 
-/// The wearable of a script; at first it answers with an error. Main thread.
-class ScriptedWearable {
+/// A wearable that answers as it is told to, at first with an error. Main thread.
+class WearableDouble {
   public:
-    explicit ScriptedWearable(std::shared_ptr<Trace> trace) : trace_(std::move(trace)) {}
+    explicit WearableDouble(std::shared_ptr<CallRecorder> recorder)
+        : recorder_(std::move(recorder)) {}
 
     /// A connection for a client whose replies run on `queue`. The wearable outlives it.
     [[nodiscard]] std::shared_ptr<WearableConnection> connect(dispatch_queue_t queue);
@@ -32,12 +33,22 @@ class ScriptedWearable {
     /// From now on; held requests are answered now, in the order of asking.
     void setAnswer(const UsageAnswer& answer);
 
+    /// How many requests are held.
+    [[nodiscard]] std::size_t openQuestions() const { return held_.size(); }
+
+    /// Takes the oldest request that is held, which the caller answers.
+    [[nodiscard]] LSSManager::UsageHandler takeQuestion();
+
+    /// Answers the oldest request that is held, whatever becomes of later ones.
+    void reply(const UsageFigures& figures);
+    void fail(const std::string& problem);
+
     void request(LSSManager::UsageHandler reply);
 
   private:
     void answer(LSSManager::UsageHandler reply) const;
 
-    std::shared_ptr<Trace> trace_;
+    std::shared_ptr<CallRecorder> recorder_;
     UsageAnswer answer_;
     std::deque<LSSManager::UsageHandler> held_;
 };

@@ -9,7 +9,8 @@ namespace quorl {
 
 /// What commands work on.
 struct Stage {
-    ScriptedHost& host;
+    HostDouble& host;
+    std::shared_ptr<Trace> trace;
     const Plugin& plugin;
     Panes panes;
 };

@@ -80,7 +80,7 @@ Json Interpreter::carryOut(std::string_view line) {
     const nlohmann::json document = parse(line);
     Json results = perform(Field(&document, ""));
     settle();
-    return success(stage_.host.trace()->take(), std::move(results));
+    return success(stage_.trace->take(), std::move(results));
 }
 
 Json Interpreter::perform(const Field& command) {
@@ -107,7 +107,7 @@ Json Interpreter::performSteps(const Field& steps) {
 Json Interpreter::performStep(const Field& step) {
     try {
         Json results = perform(step);
-        return success(stage_.host.trace()->take(), std::move(results));
+        return success(stage_.trace->take(), std::move(results));
     } catch (const CommandError& error) {
         return failure(error);
     }

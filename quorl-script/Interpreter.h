@@ -10,9 +10,9 @@ namespace quorl {
 /// the host of the process.
 class Interpreter {
   public:
-    /// `plugin` outlives the interpreter; `host` is installed.
-    Interpreter(ScriptedHost& host, const Plugin& plugin)
-        : stage_{host, plugin, Panes(host.screen(), host.trace())} {}
+    /// `plugin` outlives the interpreter; `host`, which writes to `trace`, is installed.
+    Interpreter(HostDouble& host, const std::shared_ptr<Trace>& trace, const Plugin& plugin)
+        : stage_{host, trace, plugin, Panes(host.screen(), trace)} {}
 
     /// The reply to a line, without the end of the line. What is not a command has a reply too.
     [[nodiscard]] std::string reply(std::string_view line);

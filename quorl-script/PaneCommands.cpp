@@ -100,7 +100,7 @@ Json trace(Stage& stage, const Field& command) {
             classes->insert(element.text());
         }
     }
-    stage.host.trace()->select(std::move(classes));
+    stage.trace->select(std::move(classes));
     return nullptr;
 }
 
@@ -124,13 +124,13 @@ Json frameOf(const UILabel& label) {
     return sides;
 }
 
-CellLayout layoutOf(const ScriptedScreen& screen, const Field& command) {
+CellLayout layoutOf(const ScreenDouble& screen, const Field& command) {
     CellLayout layout;
     layout.title = frameOf(command["title"]);
     layout.detail = frameOf(command["detail"]);
     layout.detailWidth = static_cast<CGFloat>(command["fits"].number());
     const Field scale = command["scale"];
-    layout.scale = static_cast<CGFloat>(scale.numberOr(static_cast<double>(screen.looks().scale)));
+    layout.scale = static_cast<CGFloat>(scale.numberOr(static_cast<double>(screen.looks.scale)));
     if (!(layout.scale > 0)) {
         scale.refuse("a number above 0");
     }
@@ -138,10 +138,10 @@ CellLayout layoutOf(const ScriptedScreen& screen, const Field& command) {
 }
 
 Json layout(Stage& stage, const Field& command) {
-    ScriptedScreen& screen = stage.host.screen();
+    ScreenDouble& screen = stage.host.screen();
     const CellLayout layout = layoutOf(screen, command);
     const auto cell = stage.plugin.newPlaylistCell();
-    watchLife(*cell, className(*cell), stage.host.trace());
+    watchLife(*cell, className(*cell), stage.trace);
     const auto labels = screen.tryLayout(*cell, layout);
     Json set = Json::array();
     for (const UILabel* label : labels) {

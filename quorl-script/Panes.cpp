@@ -28,7 +28,7 @@ class WatchedNavigation final : public NavigationController {
 
 } // namespace
 
-Panes::Panes(ScriptedScreen& screen, std::shared_ptr<Trace> trace)
+Panes::Panes(ScreenDouble& screen, std::shared_ptr<Trace> trace)
     : screen_(screen),
       trace_(std::move(trace)),
       navigation_(std::make_shared<WatchedNavigation>(trace_)) {}
@@ -132,7 +132,7 @@ void Panes::draw() {
             continue;
         }
         TableView& table = TableView::of(*controller);
-        table.setRowsOnScreen(screen_.looks().rows);
+        table.setRowsOnScreen(screen_.looks.rows);
         table.draw();
         for (const auto& [path, cell] : table.visibleRows()) {
             if (cell) {

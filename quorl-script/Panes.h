@@ -1,6 +1,7 @@
 #pragma once
 
 #include "doubles/ScreenDouble.h"
+#include "quorl-script/Trace.h"
 #include "runtime/lists/NavigationController.h"
 
 namespace quorl {
@@ -10,7 +11,7 @@ namespace quorl {
 class Panes {
   public:
     /// `screen` outlives this object.
-    Panes(ScriptedScreen& screen, std::shared_ptr<Trace> trace);
+    Panes(ScreenDouble& screen, std::shared_ptr<Trace> trace);
 
     /// From the root pane to the top one.
     [[nodiscard]] const std::vector<std::shared_ptr<UIViewController>>& stack() const {
@@ -45,7 +46,7 @@ class Panes {
     [[nodiscard]] PSListController& root() const;
     [[nodiscard]] std::shared_ptr<PSSpecifier> rowOnScreen(const std::string& title) const;
 
-    ScriptedScreen& screen_;
+    ScreenDouble& screen_;
     std::shared_ptr<Trace> trace_;
     std::shared_ptr<NavigationController> navigation_;
     bool isOnScreen_ = false;

@@ -43,7 +43,7 @@ PlaylistDescription playlistOf(const Field& field) {
     playlist.isFresh = field["fresh"].booleanOr(false);
     if (const Field items = field["items"]; items.isGiven()) {
         for (const Field& size : items.elements()) {
-            playlist.itemSizes.push_back(countOrNull(size));
+            playlist.songSizes.push_back(countOrNull(size));
         }
     }
     return playlist;
@@ -60,9 +60,11 @@ Json library(Stage& stage, const Field& command) {
     }
     const bool isAnnounced = command["notify"].booleanOr(false);
 
-    stage.host.library().replace(playlists, mediaTypes);
+    LibraryDouble& library = stage.host.mediaLibrary();
+    library.replace(playlists);
+    library.setMediaTypes(mediaTypes);
     if (isAnnounced) {
-        stage.host.library().contentsDidChange();
+        library.contentsDidChange();
     }
     return nullptr;
 }
@@ -105,7 +107,7 @@ Json prefs(Stage& stage, const Field& command) {
     const bool isAnnounced = command["notify"].booleanOr(true);
 
     bool hasChanged = false;
-    ScriptedPreferences& preferences = stage.host.preferences;
+    PreferencesDouble& preferences = stage.host.preferences;
     for (const auto& [preference, value] : values) {
         const auto before = preferences.value(preference);
         (void)preferences.setValue(preference, value); // memory takes everything
@@ -123,10 +125,10 @@ TaskDescription taskOf(const Field& field) {
     task.id = field["id"].text();
     const std::string& group = field["group"].text();
     task.group = group == "asset" ? DVDeviceSyncSessionAssetTaskGroupingKey : group;
-    task.isRunning = field["running"].booleanOr(false);
-    task.total = static_cast<NSUInteger>(field["total"].countOr(0, largest));
-    task.completed = static_cast<NSUInteger>(field["completed"].countOr(0, largest));
-    task.progress = field["progress"].numberOr(0);
+    task.figures.isRunning = field["running"].booleanOr(false);
+    task.figures.total = static_cast<NSUInteger>(field["total"].countOr(0, largest));
+    task.figures.completed = static_cast<NSUInteger>(field["completed"].countOr(0, largest));
+    task.figures.progress = field["progress"].numberOr(0);
     return task;
 }
 
@@ -149,7 +151,7 @@ Json sessions(Stage& stage, const Field& command) {
     }
     const bool isAnnounced = command["notify"].booleanOr(true);
 
-    stage.host.sessionService().replace(descriptions);
+    stage.host.sessionService.replace(descriptions);
     if (isAnnounced) {
         NSNotificationCenter::defaultCenter().postNotificationName_object(
             DVSessionsDidChangeNotification, nullptr);
@@ -197,7 +199,7 @@ bool isOnOtherThread(const Field& field) {
     return thread == "other";
 }
 
-std::shared_ptr<ScriptedTask> taskOf(const ScriptedSession& session, const Field& field) {
+std::shared_ptr<TaskDouble> taskOf(const SessionDouble& session, const Field& field) {
     auto task = session.task(field.text());
     if (!task) {
         field.refuse("the id of a task of the session");
@@ -207,7 +209,7 @@ std::shared_ptr<ScriptedTask> taskOf(const ScriptedSession& session, const Field
 
 Json session(Stage& stage, const Field& command) {
     constexpr std::uint64_t mostTimes = 100'000;
-    const auto session = stage.host.sessionService().find(command["id"].text());
+    const auto session = stage.host.sessionService.find(command["id"].text());
     if (!session) {
         command["id"].refuse("the id of a session");
     }
@@ -263,17 +265,25 @@ Json usage(Stage& stage, const Field& command) {
     const Field after = command["after"];
     answer.delay = after.isGiven() ? durationOf(after) : 0;
 
-    stage.host.wearable().setAnswer(answer);
+    stage.host.wearable.setAnswer(answer);
     return nullptr;
 }
 
+std::shared_ptr<PSSpecifier> glanceRow(const std::string& title) {
+    return PSSpecifier::preferenceSpecifierNamed_target_set_get_detail_cell_edit(
+        title, nullptr, std::nullopt, std::nullopt, std::nullopt, PSCellType::LinkList,
+        std::nullopt);
+}
+
 Json glance(Stage& stage, const Field& command) {
-    stage.host.glance = command["row"].textOrNull();
+    const auto title = command["row"].textOrNull();
+
+    stage.host.glance = title ? glanceRow(*title) : nullptr;
     return nullptr;
 }
 
 Json strings(Stage& stage, const Field& command) {
-    ScriptedHost::Texts texts;
+    HostDouble::Texts texts;
     const Field table = command["table"];
     for (const Field& text : table.members()) {
         if (text.isGiven()) {
@@ -289,7 +299,7 @@ Json language(Stage& stage, const Field& command) {
     if (tag.text().empty()) {
         tag.refuse("a language's tag, for instance \"de\"");
     }
-    stage.host.language = tag.text();
+    stage.host.setLanguages({tag.text()});
     return nullptr;
 }
 
@@ -305,7 +315,8 @@ Json sizes(Stage& stage, const Field& command) {
             field.refuse("\"raw\" or \"platform\"");
         }
     }
-    stage.host.hasRawSizes = sizes == "raw";
+    stage.host.sizeTexts =
+        sizes == "raw" ? HostDouble::SizeTexts::Raw : HostDouble::SizeTexts::Platform;
     return nullptr;
 }
 
@@ -319,7 +330,7 @@ CGFloat scaleOf(const Field& field) {
 
 Json screen(Stage& stage, const Field& command) {
     constexpr std::uint64_t mostRows = 1'000'000;
-    Looks looks = stage.host.screen().looks();
+    Looks looks = stage.host.screen().looks;
     looks.rows = static_cast<NSInteger>(
         command["rows"].countOr(static_cast<std::uint64_t>(looks.rows), mostRows));
     if (const Field scale = command["scale"]; scale.isGiven()) {
@@ -330,19 +341,19 @@ Json screen(Stage& stage, const Field& command) {
     }
     looks.tintColor = command["tintColor"].textOrNull().value_or(looks.tintColor);
 
-    stage.host.screen().setLooks(std::move(looks));
+    stage.host.screen().looks = std::move(looks);
     return nullptr;
 }
 
 Json clock(Stage& stage, const Field& command) {
     const Field by = command["by"];
     const Field tick = command["tick"];
-    const std::int64_t shift = by.isGiven() ? by.seconds() : 0;
+    const std::chrono::nanoseconds shift(by.isGiven() ? by.seconds() : 0);
     const auto everyReading = tick.isGiven() ? std::optional(tick.seconds()) : std::nullopt;
 
     stage.host.clock.moveBy(shift);
     if (everyReading) {
-        stage.host.clock.setTick(*everyReading);
+        stage.host.clock.setTick(std::chrono::nanoseconds(*everyReading));
     }
     return nullptr;
 }

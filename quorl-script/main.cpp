@@ -9,6 +9,7 @@
 #include <unistd.h>
 
 #include "quorl-script/Interpreter.h"
+#include "quorl-script/TraceRecorder.h"
 #include "quorl-script/input/LineReader.h"
 
 namespace {
@@ -91,10 +92,11 @@ ExitCode run(const Options& options) {
     for (const std::string& name : options.scripts) {
         scripts.emplace_back(name);
     }
-    const auto host = std::make_shared<ScriptedHost>();
+    const auto trace = std::make_shared<Trace>();
+    const auto host = std::make_shared<HostDouble>(std::make_shared<TraceRecorder>(trace));
     Host::install(host);
     const Plugin plugin = Plugin::load(pluginDirectories(options.plugins));
-    Interpreter interpreter(*host, plugin);
+    Interpreter interpreter(*host, trace, plugin);
     for (const Script& script : scripts) {
         play(interpreter, script);
     }

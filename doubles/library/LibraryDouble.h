@@ -1,32 +1,32 @@
 #pragma once
 
-#include "quorl-script/Trace.h"
-#include "runtime/services/AnnouncingLibrary.h"
+#include <functional>
+
+#include "doubles/library/PlaylistDouble.h"
 
 namespace quorl {
 
-/// What a script says of a playlist.
-struct PlaylistDescription {
-    std::uint64_t id = 0;
-    std::optional<std::string> name;
-    std::optional<std::uint64_t> revision;
-    bool isFolder = false;
-    bool isAugurMix = false;
-    bool isAugurPlaylist = false;
-    std::vector<std::optional<std::uint64_t>> itemSizes; ///< bytes; null: the property is missing
-    bool isFresh = false; ///< another object than the one that had the id before
-};
-
-class ScriptedPlaylist;
-
-/// The media library of a script. Main thread.
-class ScriptedLibrary final : public AnnouncingLibrary {
+/// A media library in memory, without any media at first. Main thread.
+class LibraryDouble final : public AnnouncingLibrary {
   public:
-    explicit ScriptedLibrary(std::shared_ptr<Trace> trace) : trace_(std::move(trace)) {}
+    explicit LibraryDouble(std::shared_ptr<CallRecorder> recorder)
+        : recorder_(std::move(recorder)) {}
 
-    /// Puts other contents in place of these; announces nothing. A playlist whose id stays is the
+    /// Puts other playlists in place of these; announces nothing. A playlist whose id stays is the
     /// same object, which takes over what the description says.
-    void replace(const std::vector<PlaylistDescription>& playlists, NSUInteger mediaTypes);
+    void replace(const std::vector<PlaylistDescription>& playlists);
+
+    /// Adds one at the end; announces nothing.
+    std::shared_ptr<PlaylistDouble> addPlaylist(const PlaylistDescription& description);
+    std::shared_ptr<PlaylistDouble> addPlaylist(std::uint64_t id, std::optional<std::string> name);
+
+    void removePlaylist(const std::shared_ptr<PlaylistDouble>& playlist);
+
+    /// The types of which the library has items.
+    void setMediaTypes(NSUInteger mask) { mediaTypes_ = mask; }
+
+    /// What happens while the library is asked for its types the next time.
+    void duringNextQuestion(std::function<void()> act) { duringQuestion_ = std::move(act); }
 
     [[nodiscard]] bool hasMediaOfType(NSUInteger mask) const override;
     [[nodiscard]] NSArray<MPMediaPlaylist>
@@ -35,9 +35,10 @@ class ScriptedLibrary final : public AnnouncingLibrary {
     void endGeneratingLibraryChangeNotifications() override;
 
   private:
-    std::shared_ptr<Trace> trace_;
-    std::vector<std::shared_ptr<ScriptedPlaylist>> playlists_;
+    std::shared_ptr<CallRecorder> recorder_;
+    std::vector<std::shared_ptr<PlaylistDouble>> playlists_;
     NSUInteger mediaTypes_ = 0;
+    mutable std::function<void()> duringQuestion_;
 };
 
 } // namespace quorl

@@ -17,11 +17,12 @@ namespace quorl {
 
 /// A main queue and timers that follow a clock which moves only by `advance`.
 ///
-/// A program that links this library defines the functions of libdispatch that deal with the main
-/// queue and with time, so that libraries and plug-ins in the same process come here instead of to
-/// libdispatch; the program exports them (`ENABLE_EXPORTS`). Doubled are `dispatch_async_f`,
-/// `dispatch_after_f`, `dispatch_time`, timer sources with a handler function, and what manages
-/// such a source. What is not about the main queue or a timer goes on to libdispatch.
+/// A program that links the library `virtual-time` defines the functions of libdispatch that deal
+/// with the main queue and with time, so that libraries and plug-ins in the same process come here
+/// instead of to libdispatch. In any other program the clock stands still at 0. Doubled are
+/// `dispatch_async_f`, `dispatch_after_f`, `dispatch_time`, timer sources with a handler function,
+/// and what manages such a source. What is not about the main queue or a timer goes on to
+/// libdispatch.
 ///
 /// One for the process, as the main queue is. Work may be queued and timers may be armed on any
 /// thread; everything runs on the thread that calls `drain` and `advance`.

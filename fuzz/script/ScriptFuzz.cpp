@@ -4,6 +4,7 @@
 #include <cstdlib>
 
 #include "quorl-script/Interpreter.h"
+#include "quorl-script/TraceRecorder.h"
 
 namespace {
 
@@ -15,7 +16,7 @@ class Player {
     Player() {
         Host::install(host_);
         plugin_.emplace(Plugin::load({PLUGINS}));
-        interpreter_.emplace(*host_, *plugin_);
+        interpreter_.emplace(*host_, trace_, *plugin_);
     }
 
     void play(std::string_view script) {
@@ -39,7 +40,9 @@ class Player {
         }
     }
 
-    std::shared_ptr<ScriptedHost> host_ = std::make_shared<ScriptedHost>();
+    std::shared_ptr<Trace> trace_ = std::make_shared<Trace>();
+    std::shared_ptr<HostDouble> host_ =
+        std::make_shared<HostDouble>(std::make_shared<TraceRecorder>(trace_));
     std::optional<Plugin> plugin_;
     std::optional<Interpreter> interpreter_;
 };
