@@ -53,6 +53,12 @@ void WearableDouble::setAnswer(const UsageAnswer& answer) {
     }
 }
 
+void WearableDouble::holdReplies() {
+    UsageAnswer held;
+    held.isHeld = true;
+    setAnswer(held);
+}
+
 LSSManager::UsageHandler WearableDouble::takeQuestion() {
     auto question = std::move(held_.at(0));
     held_.pop_front();

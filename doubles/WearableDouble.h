@@ -33,6 +33,9 @@ class WearableDouble {
     /// From now on; held requests are answered now, in the order of asking.
     void setAnswer(const UsageAnswer& answer);
 
+    /// From now on requests are held until they are answered one by one, or by `setAnswer`.
+    void holdReplies();
+
     /// How many requests are held.
     [[nodiscard]] std::size_t openQuestions() const { return held_.size(); }
 

@@ -7,7 +7,7 @@
 
 #include <benchmark/benchmark.h>
 
-#include "bench/runtime/QuietHost.h"
+#include "doubles/HostDouble.h"
 #include "runtime/objects/MainQueue.h"
 #include "runtime/objects/NotificationCenter.h"
 #include "settings/LMQuorlSettingsController.h"
@@ -16,14 +16,33 @@
 
 namespace {
 
-using quorl::bench::QuietHost;
-using quorl::bench::Song;
+using quorl::HostDouble;
+using quorl::SyncPreference;
 
 constexpr NSNotificationName somethingHappened = "SomethingHappened";
+constexpr std::uint64_t playlistCount = 1'000;
+constexpr std::uint64_t chosen = playlistCount / 2;
 constexpr std::size_t songCount = 100'000;
 constexpr std::uint64_t songSize = 4'000'000;
 
-QuietHost& host() { return dynamic_cast<QuietHost&>(quorl::Host::required()); }
+HostDouble& host() { return dynamic_cast<HostDouble&>(quorl::Host::required()); }
+
+/// Sync is on without a limit, the playlist in the middle of the library is chosen, and the
+/// wearable keeps its replies back. Nobody takes notes.
+std::shared_ptr<HostDouble> quietHost() {
+    constexpr std::uint64_t noLimit = 2;
+    auto host = std::make_shared<HostDouble>();
+    for (std::uint64_t id = 1; id <= playlistCount; ++id) {
+        host->mediaLibrary().addPlaylist(id, "Playlist");
+    }
+    host->mediaLibrary().setMediaTypes(MPMediaTypeMusic);
+    (void)host->preferences.setValue(SyncPreference::AssetSyncEnabled, 1);
+    (void)host->preferences.setValue(SyncPreference::AssetSyncPlaylistPersistentID, chosen);
+    (void)host->preferences.setValue(SyncPreference::AssetSyncLimitType, noLimit);
+    host->wearable.holdReplies();
+    host->sizeTexts = HostDouble::SizeTexts::Platform;
+    return host;
+}
 
 class Observer : public NSObject {
   public:
@@ -57,24 +76,14 @@ void queriedPlaylist(benchmark::State& state) {
     for ([[maybe_unused]] auto turn : state) {
         const auto query = MPMediaQuery::playlistsQuery();
         query->addFilterPredicate(MPMediaPropertyPredicate::predicateWithValue_forProperty(
-            NSNumber::numberWithUnsignedLongLong(QuietHost::chosen),
-            MPMediaPlaylistPropertyPersistentID));
+            NSNumber::numberWithUnsignedLongLong(chosen), MPMediaPlaylistPropertyPersistentID));
         benchmark::DoNotOptimize(query->collections());
     }
 }
 
-void giveSongs(quorl::bench::Playlist& playlist) {
-    std::vector<std::shared_ptr<MPMediaItem>> songs;
-    for (std::size_t number = 0; number < songCount; ++number) {
-        songs.push_back(std::make_shared<Song>(number, MPMediaItemPropertyFileSize, songSize));
-    }
-    playlist.setItems(
-        std::make_shared<const std::vector<std::shared_ptr<MPMediaItem>>>(std::move(songs)));
-}
-
 /// A reply of the wearable works the footer out anew and does nothing else.
 void footerOfLongPlaylist(benchmark::State& state) {
-    giveSongs(host().mediaLibrary().playlist(QuietHost::chosen));
+    host().mediaLibrary().playlist(chosen)->setSongSizes(quorl::SongSizes(songCount, songSize));
     constexpr int refreshes = 50;
     const auto pane = create<LMQuorlSettingsController>();
     (void)pane->specifiers();
@@ -82,7 +91,7 @@ void footerOfLongPlaylist(benchmark::State& state) {
         pane->viewWillAppear(false); // asks the wearable, which has not replied yet
     }
     for ([[maybe_unused]] auto turn : state) {
-        host().wearable().reply(1, 2);
+        host().wearable.reply({1, 2});
         quorl::tests::runQueuedWork();
     }
 }
@@ -136,7 +145,7 @@ class Reporter : public benchmark::ConsoleReporter {
 int main(int argc, char** argv) {
     benchmark::Initialize(&argc, argv);
     (void)quorl::mainQueueDescriptor(); // before any thread is started
-    quorl::Host::install(std::make_shared<QuietHost>());
+    quorl::Host::install(quietHost());
     benchmark::RegisterBenchmark(postToOne, postTo, 1);
     benchmark::RegisterBenchmark(postToHundred, postTo, 100);
     benchmark::RegisterBenchmark(remembered, rememberedPlaylist);

@@ -36,6 +36,13 @@ void LibraryDouble::removePlaylist(const std::shared_ptr<PlaylistDouble>& playli
     std::erase(playlists_, playlist);
 }
 
+std::shared_ptr<PlaylistDouble> LibraryDouble::playlist(std::uint64_t id) const {
+    const auto found =
+        std::find_if(playlists_.begin(), playlists_.end(),
+                     [id](const auto& playlist) { return playlist->persistentID() == id; });
+    return found == playlists_.end() ? nullptr : *found;
+}
+
 bool LibraryDouble::hasMediaOfType(NSUInteger mask) const {
     recorder_->libraryWillLookForMedia(mask);
     if (const auto act = std::exchange(duringQuestion_, nullptr)) {

@@ -22,6 +22,9 @@ class LibraryDouble final : public AnnouncingLibrary {
 
     void removePlaylist(const std::shared_ptr<PlaylistDouble>& playlist);
 
+    /// The first with this id, or null.
+    [[nodiscard]] std::shared_ptr<PlaylistDouble> playlist(std::uint64_t id) const;
+
     /// The types of which the library has items.
     void setMediaTypes(NSUInteger mask) { mediaTypes_ = mask; }
 
