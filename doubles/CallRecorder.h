@@ -61,8 +61,6 @@ class CallRecorder {
 
     virtual void centerWillPost(NSNotificationName /*name*/, const NSObject* /*sender*/) {}
 
-    virtual void labelDidSetFrame(const UILabel& /*label*/) {}
-
     virtual void specifierWillSetProperty(const PSSpecifier& /*specifier*/,
                                           const std::optional<std::string>& /*value*/,
                                           std::string_view /*key*/) {}

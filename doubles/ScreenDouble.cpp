@@ -33,7 +33,6 @@ void ScreenDouble::layOutLabels(UITableViewCell& cell) {
 }
 
 void ScreenDouble::labelDidSetFrame(UILabel& label) {
-    recorder_->labelDidSetFrame(label);
     if (layout_) {
         labelsSet_.push_back(&label);
     }

@@ -30,7 +30,7 @@ class Library : public testing::Test {
     }
 
     std::shared_ptr<TestHost> host_ = TestHost::installed();
-    quorl::tests::TestLibrary& library_ = host_->mediaLibrary();
+    quorl::LibraryDouble& library_ = host_->mediaLibrary();
 };
 
 TEST_F(Library, AnnouncesChangesOnlyWhileSomebodyWantsToKnow) {

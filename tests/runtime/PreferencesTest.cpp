@@ -22,6 +22,12 @@ class Preferences : public testing::Test {
         return host_->journal.count("post LMSyncPreferencesDidChangeNotification");
     }
 
+    /// What another process does.
+    void changeElsewhere(SyncPreference preference, std::uint64_t value) {
+        (void)host_->preferences.setValue(preference, value);
+        quorl::SyncDefaults::announceChange();
+    }
+
     static std::shared_ptr<NSNumber> number(std::uint64_t value) {
         return NSNumber::numberWithUnsignedLongLong(value);
     }
@@ -115,9 +121,8 @@ TEST_F(Preferences, AnnounceNothingWhereTheStoreRefused) {
 }
 
 TEST_F(Preferences, ShowAndAnnounceWhatAnotherProcessChanged) {
-    host_->preferences.changeElsewhere(SyncPreference::LastFullySentAssetSyncPlaylistPersistentID,
-                                       7);
-    host_->preferences.changeElsewhere(SyncPreference::LastFullySentAssetSyncPlaylistVersion, 3);
+    changeElsewhere(SyncPreference::LastFullySentAssetSyncPlaylistPersistentID, 7);
+    changeElsewhere(SyncPreference::LastFullySentAssetSyncPlaylistVersion, 3);
 
     EXPECT_EQ(defaults_.lastFullySentAssetSyncPlaylistPersistentID()->unsignedLongLongValue(), 7U);
     EXPECT_EQ(defaults_.lastFullySentAssetSyncPlaylistVersion()->unsignedLongLongValue(), 3U);

@@ -73,8 +73,8 @@ class Screens : public testing::Test {
 };
 
 TEST_F(Screens, GiveTheirScaleAndColoursToPanes) {
-    host_->screen().setScale(3);
-    host_->screen().setListTextColor("#123456");
+    host_->screen().looks.scale = 3;
+    host_->screen().looks.textColor = "#123456";
 
     EXPECT_EQ(UIScreen::mainScreen().scale(), 3);
     EXPECT_EQ(PSListController::appearance().textColor, "#123456");
@@ -198,7 +198,7 @@ TEST(WithAHost, TheClockIsTheHosts) {
     const auto host = TestHost::installed();
     const auto earlier = NSDate::date();
 
-    host->clock.advance(481);
+    host->clock.moveBy(std::chrono::seconds(481));
 
     EXPECT_EQ(NSDate::date()->timeIntervalSinceDate(*earlier), 481.0);
     EXPECT_EQ(earlier->timeIntervalSinceDate(*NSDate::date()), -481.0);

@@ -4,13 +4,11 @@
 
 #include <gmock/gmock.h>
 
-#include "runtime/services/ObservedSession.h"
-#include "tests/support/TestSessions.h"
+#include "doubles/sessions/SessionDouble.h"
 
 namespace {
 
-using quorl::tests::Journal;
-using quorl::tests::TestSession;
+using quorl::SessionDouble;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
@@ -37,8 +35,8 @@ class Sessions : public testing::Test {
             [this](DVSessionObserver& observer) { observer.sessionWillBegin(*session_); });
     }
 
-    Journal journal_;
-    std::shared_ptr<TestSession> session_ = std::make_shared<TestSession>("A", journal_);
+    std::shared_ptr<SessionDouble> session_ =
+        std::make_shared<SessionDouble>("A", std::make_shared<quorl::CallRecorder>());
     std::vector<std::string> calls_;
 };
 

@@ -44,7 +44,7 @@ TEST_F(WearableSettings, AreNotThereWithoutAHost) {
 TEST_F(WearableSettings, AnswerAQuestionOnceAndLater) {
     ask();
     EXPECT_EQ(host_->wearable.openQuestions(), 1U);
-    host_->wearable.reply(1000, 0);
+    host_->wearable.reply({1000, 0});
     EXPECT_THAT(replies_, IsEmpty()) << "the reply comes on the queue";
 
     runQueuedWork();
@@ -56,8 +56,8 @@ TEST_F(WearableSettings, AnswerAQuestionOnceAndLater) {
 TEST_F(WearableSettings, AnswerEachQuestionByItself) {
     ask();
     ask();
-    host_->wearable.reply(1, 0);
-    host_->wearable.reply(2, 0);
+    host_->wearable.reply({1, 0});
+    host_->wearable.reply({2, 0});
     runQueuedWork();
 
     EXPECT_THAT(replies_, ElementsAre("1", "2"));
@@ -86,7 +86,7 @@ TEST_F(WearableSettings, AnswerAlsoAfterTheClientWasDestroyed) {
     ask();
 
     manager_.reset();
-    host_->wearable.reply(5, 0);
+    host_->wearable.reply({5, 0});
     runQueuedWork();
 
     EXPECT_THAT(replies_, ElementsAre("5"));
@@ -101,7 +101,7 @@ TEST_F(WearableSettings, LetGoOfWhatTheQuestionHeldOnlyAfterTheAnswer) {
     });
     EXPECT_FALSE(watched.expired());
 
-    host_->wearable.reply(1, 0);
+    host_->wearable.reply({1, 0});
     EXPECT_FALSE(watched.expired());
     runQueuedWork();
 

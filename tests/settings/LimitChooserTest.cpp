@@ -101,7 +101,7 @@ TEST_F(LimitChooser, ShowsStoragePresetsAsSongsForATypeThatIsNeither) {
 }
 
 TEST_F(LimitChooser, MakesSubtitleCellsOfTheListsTextColour) {
-    host_->screen().setListTextColor("#101010");
+    host_->screen().looks.textColor = "#101010";
     show(0, 100);
 
     const auto type = cell(storageRow);

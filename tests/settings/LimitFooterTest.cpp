@@ -8,9 +8,12 @@
 
 namespace {
 
+using quorl::SongSizes;
 using quorl::SyncPreference;
 using quorl::tests::PaneTest;
 using quorl::tests::runQueuedWork;
+using std::chrono::milliseconds;
+using std::chrono::seconds;
 using testing::ElementsAre;
 using testing::StartsWith;
 
@@ -18,15 +21,13 @@ constexpr std::uint64_t megabyte = 1ULL << 20U;
 
 class LimitFooter : public PaneTest {
   protected:
-    using Sizes = std::vector<std::optional<std::uint64_t>>;
-
     void limitTo(std::uint64_t type, std::uint64_t amount) {
         store(SyncPreference::AssetSyncLimitType, type);
         store(SyncPreference::AssetSyncLimit, amount);
     }
 
     /// "Morning" with songs of these sizes is chosen and was sent, without a limit.
-    void syncSongs(const Sizes& sizes) {
+    void syncSongs(const SongSizes& sizes) {
         morning_->setSongSizes(sizes);
         chooseMorning();
         sendMorning();
@@ -44,7 +45,7 @@ class LimitFooter : public PaneTest {
     /// Answers every question that is open.
     void reply(double available, double songs) {
         while (host_->wearable.openQuestions() > 0) {
-            host_->wearable.reply(available, songs);
+            host_->wearable.reply({available, songs});
         }
         runQueuedWork();
     }
@@ -66,7 +67,7 @@ struct Fit {
     const char* situation;
     std::uint64_t type;
     std::uint64_t amount;
-    std::vector<std::optional<std::uint64_t>> sizes;
+    SongSizes sizes;
     const char* count;
     std::uint64_t bytes;
 };
@@ -155,7 +156,7 @@ struct Sentence {
 class Sentences : public LimitFooter, public testing::WithParamInterface<Sentence> {
   protected:
     void arrange(Situation situation) {
-        syncSongs(Sizes(static_cast<std::size_t>(GetParam().songs), 3 * megabyte));
+        syncSongs(SongSizes(static_cast<std::size_t>(GetParam().songs), 3 * megabyte));
         switch (situation) {
         case Situation::Synced:
             break;
@@ -278,7 +279,7 @@ TEST_F(LimitFooter, AsksForAPlaylistWhereNoneIsThere) {
 }
 
 TEST_F(LimitFooter, TakesThatSentenceAsItIsWithoutFillingIt) {
-    host_->setText("SYNC_SETTINGS_FOOTER_NO_PLAYLIST", "100%% of %@");
+    host_->texts["SYNC_SETTINGS_FOOTER_NO_PLAYLIST"] = "100%% of %@";
 
     showFooter();
 
@@ -332,7 +333,7 @@ TEST_F(LimitFooter, DoesNotKnowTheSpaceBeforeTheWearableHasReplied) {
     EXPECT_THAT(host_->journal.lines({"wearable"}),
                 ElementsAre("wearable connect", "wearable usage"));
 
-    host_->wearable.reply(1'000'000'000, 500'000'000);
+    host_->wearable.reply({1'000'000'000, 500'000'000});
     EXPECT_EQ(footer(), synced("2", 3)) << "the reply comes on the main queue";
     runQueuedWork();
 
@@ -342,7 +343,7 @@ TEST_F(LimitFooter, DoesNotKnowTheSpaceBeforeTheWearableHasReplied) {
 
 struct Usage {
     const char* situation;
-    quorl::tests::TestWearable::Figures figures;
+    quorl::UsageFigures figures; ///< free, and of the songs
     std::uint64_t remaining;
 };
 
@@ -362,21 +363,12 @@ TEST_P(UsageReplies, GiveTheFreeSpaceAndThatOfTheSongsTogether) {
 
 INSTANTIATE_TEST_SUITE_P(
     Table, UsageReplies,
-    testing::Values(Usage{"both figures",
-                          {{"kLSSUsageAvailableStorageKey", 10.0}, {"kLSSUsageSongsKey", 20.0}},
-                          30},
-                    Usage{"songs missing", {{"kLSSUsageAvailableStorageKey", 10.0}}, 10},
-                    Usage{"free space missing", {{"kLSSUsageSongsKey", 20.0}}, 20},
-                    Usage{"both missing", {}, 0},
-                    Usage{"negative sum",
-                          {{"kLSSUsageAvailableStorageKey", -10.0}, {"kLSSUsageSongsKey", 0.0}},
-                          0},
-                    Usage{"negative figure in a positive sum",
-                          {{"kLSSUsageAvailableStorageKey", -10.0}, {"kLSSUsageSongsKey", 30.0}},
-                          20},
-                    Usage{"fraction of a byte",
-                          {{"kLSSUsageAvailableStorageKey", 10.5}, {"kLSSUsageSongsKey", 0.4}},
-                          10}));
+    testing::Values(Usage{"both figures", {10.0, 20.0}, 30},
+                    Usage{"songs missing", {10.0, std::nullopt}, 10},
+                    Usage{"free space missing", {std::nullopt, 20.0}, 20},
+                    Usage{"both missing", {}, 0}, Usage{"negative sum", {-10.0, 0.0}, 0},
+                    Usage{"negative figure in a positive sum", {-10.0, 30.0}, 20},
+                    Usage{"fraction of a byte", {10.5, 0.4}, 10}));
 
 TEST_F(LimitFooter, AsksAgainAtTheNextRefreshWhereTheWearableDidNotAnswer) {
     syncSongs({1, 2});
@@ -410,15 +402,15 @@ TEST_F(LimitFooter, TakesTheLaterOfTwoReplies) {
     showFooter();
     changeLibrary();
 
-    host_->wearable.reply(100, 0);
-    host_->wearable.reply(200, 0);
+    host_->wearable.reply({100, 0});
+    host_->wearable.reply({200, 0});
     runQueuedWork();
 
     EXPECT_THAT(footer().value_or(""), testing::HasSubstr(size(200)));
 }
 
 struct Age {
-    double seconds;
+    milliseconds duration;
     bool isFresh;
 };
 
@@ -429,7 +421,7 @@ TEST_P(FigureAges, DecideWhetherTheWearableIsAskedAgain) {
     showFooter();
     reply(10, 20);
 
-    host_->clock.advance(GetParam().seconds);
+    host_->clock.moveBy(GetParam().duration);
     changeLibrary();
 
     EXPECT_EQ(host_->wearable.openQuestions(), GetParam().isFresh ? 0U : 1U);
@@ -439,21 +431,23 @@ TEST_P(FigureAges, DecideWhetherTheWearableIsAskedAgain) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Table, FigureAges,
-                         testing::Values(Age{0, true}, Age{480, true}, Age{480.5, false},
-                                         Age{481, false}, Age{-480, true}, Age{-481, false}));
+                         testing::Values(Age{seconds(0), true}, Age{seconds(480), true},
+                                         Age{milliseconds(480'500), false},
+                                         Age{seconds(481), false}, Age{seconds(-480), true},
+                                         Age{seconds(-481), false}));
 
 TEST_F(LimitFooter, KeepsTheFigureOfAnOldReplyWhenTheNextOneFails) {
     syncSongs({1, 2});
     showFooter();
     reply(10, 20);
-    host_->clock.advance(481);
+    host_->clock.moveBy(seconds(481));
     changeLibrary();
 
     host_->wearable.fail("gone");
     runQueuedWork();
     EXPECT_EQ(footer(), synced("2", 3));
 
-    host_->clock.advance(-481); // the clock was set back to where it was
+    host_->clock.moveBy(seconds(-481)); // the clock was set back to where it was
     changeLibrary();
     EXPECT_THAT(footer().value_or(""), testing::HasSubstr(size(30)));
 }
@@ -463,7 +457,7 @@ TEST_F(LimitFooter, ShowsAQuestionMarkWhereTheFigureTurnsStaleInBetween) {
     showFooter();
     reply(10, 20);
 
-    host_->clock.advanceAfterReadings(1, 481); // fresh for the sentence, stale for the figure
+    host_->clock.setTick(seconds(481)); // fresh for the sentence, stale for the figure
     changeLibrary();
 
     EXPECT_EQ(footer(), "2 songs synced to Velora, taking up " + size(3) + " with ? remaining.");
@@ -532,7 +526,7 @@ TEST_F(LimitFooter, KeepsThePaneAliveUntilTheReplyHasCome) {
     EXPECT_FALSE(watched.expired());
 
     host_->journal.clear();
-    host_->wearable.reply(10, 20);
+    host_->wearable.reply({10, 20});
     runQueuedWork();
 
     EXPECT_TRUE(watched.expired());

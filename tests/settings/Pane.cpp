@@ -66,20 +66,20 @@ void PaneTest::sendMorning() {
     store(SyncPreference::LastFullySentAssetSyncPlaylistVersion, 1);
 }
 
-std::shared_ptr<TestTask> PaneTest::beginSync(NSUInteger total, double progress) {
-    auto task = host_->addSession("sync")->addAssetTask(
-        {.running = true, .total = total, .progress = progress});
+std::shared_ptr<TaskDouble> PaneTest::beginSync(NSUInteger total, double progress) {
+    auto task = host_->sessionService.add("sync")->addAssetTask(
+        {.isRunning = true, .total = total, .progress = progress});
     post(DVSessionsDidChangeNotification);
     return task;
 }
 
 void PaneTest::beginPreparation() {
-    host_->addSession("sync")->addOtherTask({.running = true});
+    host_->sessionService.add("sync")->addOtherTask({.isRunning = true});
     post(DVSessionsDidChangeNotification);
 }
 
 void PaneTest::endSync() {
-    host_->removeSessions();
+    host_->sessionService.replace({});
     post(DVSessionsDidChangeNotification);
 }
 

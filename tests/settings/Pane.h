@@ -39,7 +39,7 @@ class PaneTest : public testing::Test {
     void sendMorning();
 
     /// A session with a running asset task of these figures; announced.
-    std::shared_ptr<TestTask> beginSync(NSUInteger total, double progress);
+    std::shared_ptr<TaskDouble> beginSync(NSUInteger total, double progress);
 
     /// A session with another running task; announced.
     void beginPreparation();
@@ -60,7 +60,7 @@ class PaneTest : public testing::Test {
     void waitFor(const std::string& line, std::size_t count = 1);
 
     std::shared_ptr<TestHost> host_ = TestHost::installed();
-    std::shared_ptr<TestPlaylist> morning_;
+    std::shared_ptr<PlaylistDouble> morning_;
     std::shared_ptr<NavigationController> navigation_ = ::create<NavigationController>();
     std::shared_ptr<LMQuorlSettingsController> pane_;
 

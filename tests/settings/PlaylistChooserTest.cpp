@@ -9,13 +9,13 @@
 
 namespace {
 
+using quorl::PlaylistDouble;
 using quorl::SyncPreference;
 using quorl::tests::checked;
 using quorl::tests::row;
 using quorl::tests::runMainQueuePast;
 using quorl::tests::runQueuedWork;
 using quorl::tests::TablePaneTest;
-using quorl::tests::TestPlaylist;
 using std::chrono::milliseconds;
 using testing::ElementsAre;
 using testing::IsEmpty;
@@ -49,7 +49,7 @@ class PlaylistChooser : public TablePaneTest {
 
     [[nodiscard]] std::size_t reloads() const { return host_->journal.count(reload); }
 
-    std::shared_ptr<TestPlaylist> evening_;
+    std::shared_ptr<PlaylistDouble> evening_;
 };
 
 // How it begins and goes.
@@ -176,7 +176,7 @@ TEST_F(PlaylistChooser, ShowsAPlaylistWithoutAName) {
 }
 
 TEST_F(PlaylistChooser, MakesItsOwnKindOfCellsInTheHostsColours) {
-    host_->screen().setListTextColor("#101010");
+    host_->screen().looks.textColor = "#101010";
     showChooser();
 
     const auto made = cell(morningRow);
@@ -191,7 +191,7 @@ TEST_F(PlaylistChooser, MakesItsOwnKindOfCellsInTheHostsColours) {
 TEST_F(PlaylistChooser, LeavesTheColoursOfACellThatItUsesAgain) {
     showChooser();
 
-    host_->screen().setListTextColor("#101010");
+    host_->screen().looks.textColor = "#101010";
     controller_->willBecomeActive();
     draw();
 
@@ -339,7 +339,7 @@ TEST_F(PlaylistChooser, WritesBothAgainAndRedrawsTheStatusWhenTheSyncedPlaylistI
     const auto task = beginSync(10, 0.25);
     showChooser();
     host_->journal.clear();
-    task->become({.running = true, .total = 10, .progress = 0.5});
+    task->become({.isRunning = true, .total = 10, .progress = 0.5});
 
     tapRow(morningRow);
 
@@ -646,8 +646,8 @@ TEST_F(PlaylistChooser, LooksItsTextsUpAtEachUse) {
     sendMorning();
     showChooser();
 
-    host_->setText("SYNC_SETTINGS_PLAYLIST_SYNC_STATUS_SYNCED", "Done");
-    host_->setText("SYNC_SETTINGS_PLAYLIST_PICKER_NONE", "Nothing");
+    host_->texts["SYNC_SETTINGS_PLAYLIST_SYNC_STATUS_SYNCED"] = "Done";
+    host_->texts["SYNC_SETTINGS_PLAYLIST_PICKER_NONE"] = "Nothing";
     changeLibrary();
     draw();
 

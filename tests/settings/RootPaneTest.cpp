@@ -133,7 +133,7 @@ TEST_F(RootPane, HasTheGlanceRowOfTheMusicAppFirstWhereThereIsOne) {
     const auto glance = PSSpecifier::preferenceSpecifierNamed_target_set_get_detail_cell_edit(
         "Show in Glances", nullptr, std::nullopt, std::nullopt, std::nullopt, PSCellType::LinkList,
         std::nullopt);
-    host_->setGlance(glance);
+    host_->glance = glance;
     pane_ = create<LMQuorlSettingsController>();
 
     EXPECT_THAT(titlesOf(pane_->specifiers()),
@@ -347,7 +347,7 @@ TEST_F(RootPane, LooksItsTextsUpAtEachUse) {
     showPane();
     ASSERT_EQ(shownValue("Synced Playlist"), "Sync Pending…");
 
-    host_->setText("SYNC_SETTINGS_PLAYLIST_CELL_VALUE_TEXT_SYNC_PENDING", "Soon");
+    host_->texts["SYNC_SETTINGS_PLAYLIST_CELL_VALUE_TEXT_SYNC_PENDING"] = "Soon";
     changeLibrary();
 
     EXPECT_EQ(shownValue("Synced Playlist"), "Soon");
@@ -369,7 +369,7 @@ TEST_F(RootPane, FillsItsFormatsAsTheTranslationWantsIt) {
     store(SyncPreference::AssetSyncLimitType, 1);
     store(SyncPreference::AssetSyncLimit, 125);
 
-    host_->setText("SYNC_SETTINGS_USAGE_LIMIT_TYPE_N_SONGS", "Songs (%1$tu), 100%% %n %@");
+    host_->texts["SYNC_SETTINGS_USAGE_LIMIT_TYPE_N_SONGS"] = "Songs (%1$tu), 100%% %n %@";
 
     EXPECT_EQ(pane_->limit(nullptr), "Songs (125), 100% %n 125");
 }

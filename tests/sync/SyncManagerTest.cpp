@@ -11,12 +11,12 @@
 
 namespace {
 
+using quorl::PlaylistDouble;
 using quorl::SyncPreference;
+using quorl::TaskFigures;
 using quorl::tests::runMainQueueUntil;
 using quorl::tests::runQueuedWork;
 using quorl::tests::TestHost;
-using quorl::tests::TestPlaylist;
-using quorl::tests::TestTask;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
@@ -65,7 +65,7 @@ class SyncManager : public testing::Test {
     }
 
     /// Sync is on and a playlist of this revision is chosen.
-    std::shared_ptr<TestPlaylist> choosePlaylist(std::uint64_t revision = 1) {
+    std::shared_ptr<PlaylistDouble> choosePlaylist(std::uint64_t revision = 1) {
         const auto playlist = host_->mediaLibrary().addPlaylist(7, "Morning");
         playlist->setRevision(revision);
         store(SyncPreference::AssetSyncEnabled, 1);
@@ -84,8 +84,8 @@ class SyncManager : public testing::Test {
 };
 
 TEST_F(SyncManager, BeginsByListeningAndAttachingAndPostsAStatusLater) {
-    host_->addSession("A");
-    host_->addSession("B");
+    host_->sessionService.add("A");
+    host_->sessionService.add("B");
 
     const auto& manager = LMQuorlSyncManager::sharedManager();
 
@@ -204,7 +204,7 @@ TEST_F(SyncManager, ReadsThePlaylistThenTheIdTheRevisionAndWhatWasSent) {
 
 TEST_F(SyncManager, ReadsNoPreferencesWhileSomethingIsRunning) {
     choosePlaylist();
-    host_->addSession("A")->addOtherTask({.running = true});
+    host_->sessionService.add("A")->addOtherTask({.isRunning = true});
     (void)manager();
 
     (void)manager().syncStage();
@@ -214,8 +214,8 @@ TEST_F(SyncManager, ReadsNoPreferencesWhileSomethingIsRunning) {
 
 struct Stage {
     const char* situation;
-    std::vector<TestTask::Figures> assetTasks;
-    std::vector<TestTask::Figures> otherTasks;
+    std::vector<TaskFigures> assetTasks;
+    std::vector<TaskFigures> otherTasks;
     LMQuorlSyncStage expected;
 };
 
@@ -223,7 +223,7 @@ class SyncStages : public SyncManager, public testing::WithParamInterface<Stage>
 
 TEST_P(SyncStages, FollowFromTheRunningTasks) {
     choosePlaylist();
-    const auto session = host_->addSession("A");
+    const auto session = host_->sessionService.add("A");
     for (const auto& figures : GetParam().assetTasks) {
         session->addAssetTask(figures);
     }
@@ -239,34 +239,34 @@ INSTANTIATE_TEST_SUITE_P(
     testing::Values(
         Stage{"no task", {}, {}, LMQuorlSyncStagePending},
         Stage{"asset task that still counts",
-              {{.running = true, .total = 0}},
+              {{.isRunning = true, .total = 0}},
               {},
               LMQuorlSyncStageIndeterminateSyncing},
         Stage{"other kind of task",
               {},
-              {{.running = true, .total = 9}},
+              {{.isRunning = true, .total = 9}},
               LMQuorlSyncStageIndeterminateSyncing},
         Stage{"one asset task counts, one has counted",
-              {{.running = true, .total = 0}, {.running = true, .total = 5}},
+              {{.isRunning = true, .total = 0}, {.isRunning = true, .total = 5}},
               {},
               LMQuorlSyncStageSyncing},
         Stage{"asset task beside another kind",
-              {{.running = true, .total = 5}},
-              {{.running = true, .total = 0}},
+              {{.isRunning = true, .total = 5}},
+              {{.isRunning = true, .total = 0}},
               LMQuorlSyncStageSyncing},
         Stage{"asset task that does not run", {{.total = 5}}, {}, LMQuorlSyncStagePending},
         Stage{"asset task that does not run beside another kind that does",
               {{.total = 5}},
-              {{.running = true}},
+              {{.isRunning = true}},
               LMQuorlSyncStageIndeterminateSyncing},
         Stage{"totals that wrap around to 0 count as 0",
-              {{.running = true, .total = largestWord}, {.running = true, .total = 1}},
+              {{.isRunning = true, .total = largestWord}, {.isRunning = true, .total = 1}},
               {},
               LMQuorlSyncStageIndeterminateSyncing}));
 
 TEST_F(SyncManager, LooksAtTheTasksOfAllSessionsForTheStage) {
-    host_->addSession("A")->addOtherTask({});
-    host_->addSession("B")->addAssetTask({.running = true, .total = 3});
+    host_->sessionService.add("A")->addOtherTask({});
+    host_->sessionService.add("B")->addAssetTask({.isRunning = true, .total = 3});
 
     EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageSyncing);
 }
@@ -274,16 +274,16 @@ TEST_F(SyncManager, LooksAtTheTasksOfAllSessionsForTheStage) {
 TEST_F(SyncManager, LetsThePreferencesDecideWhereTheIdleTasksHaveItems) {
     choosePlaylist(5);
     storeLastSent(7, 5);
-    host_->addSession("A")->addAssetTask({.total = 5});
+    host_->sessionService.add("A")->addAssetTask({.total = 5});
 
     EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle);
 }
 
 TEST_F(SyncManager, ComputesEachAnswerAnew) {
-    const auto task = host_->addSession("A")->addAssetTask({.running = true, .total = 0});
+    const auto task = host_->sessionService.add("A")->addAssetTask({.isRunning = true, .total = 0});
     ASSERT_EQ(manager().syncStage(), LMQuorlSyncStageIndeterminateSyncing);
 
-    task->become({.running = true, .total = 8, .completed = 2, .progress = 0.25});
+    task->become({.isRunning = true, .total = 8, .completed = 2, .progress = 0.25});
 
     EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageSyncing);
     EXPECT_EQ(manager().progress(), 0.25F);
@@ -292,26 +292,26 @@ TEST_F(SyncManager, ComputesEachAnswerAnew) {
 }
 
 TEST_F(SyncManager, HasTheMeanProgressOfAllAssetTasks) {
-    const auto finished = host_->addSession("finished");
+    const auto finished = host_->sessionService.add("finished");
     finished->addAssetTask({.total = 1, .progress = 1.0});
     finished->finish();
-    const auto running = host_->addSession("running");
-    running->addAssetTask({.running = true, .total = 1000, .progress = 0.5});
-    running->addOtherTask({.running = true, .progress = 0.0});
+    const auto running = host_->sessionService.add("running");
+    running->addAssetTask({.isRunning = true, .total = 1000, .progress = 0.5});
+    running->addOtherTask({.isRunning = true, .progress = 0.0});
 
     EXPECT_EQ(manager().progress(), 0.75F);
 }
 
 TEST_F(SyncManager, CountsWaitingTasksIntoTheProgress) {
-    const auto session = host_->addSession("A");
-    session->addAssetTask({.running = true, .progress = 0.5});
-    session->addAssetTask({.running = false, .progress = 0.0});
+    const auto session = host_->sessionService.add("A");
+    session->addAssetTask({.isRunning = true, .progress = 0.5});
+    session->addAssetTask({.isRunning = false, .progress = 0.0});
 
     EXPECT_EQ(manager().progress(), 0.25F);
 }
 
 TEST_F(SyncManager, HasAllProgressOnceEverySessionHasFinished) {
-    const auto session = host_->addSession("A");
+    const auto session = host_->sessionService.add("A");
     session->addAssetTask({.progress = 0.2});
     session->finish();
 
@@ -319,27 +319,28 @@ TEST_F(SyncManager, HasAllProgressOnceEverySessionHasFinished) {
 }
 
 TEST_F(SyncManager, AsksEverySessionWhetherItHasFinished) {
-    host_->addSession("running");
-    host_->addSession("finished")->finish();
+    host_->sessionService.add("running");
+    host_->sessionService.add("finished")->finish();
     EXPECT_EQ(manager().progress(), 0.0F);
 }
 
 TEST_F(SyncManager, HasNoProgressWithoutAssetTasks) {
-    host_->addSession("A")->addOtherTask({.running = true, .progress = 0.9});
+    host_->sessionService.add("A")->addOtherTask({.isRunning = true, .progress = 0.9});
 
     EXPECT_EQ(manager().progress(), 0.0F);
 }
 
 TEST_F(SyncManager, DoesNotHoldItsProgressBetween0And1) {
-    const auto task = host_->addSession("A")->addAssetTask({.running = true, .progress = 1.5});
+    const auto task =
+        host_->sessionService.add("A")->addAssetTask({.isRunning = true, .progress = 1.5});
     EXPECT_EQ(manager().progress(), 1.5F);
 
-    task->become({.running = true, .progress = -0.5});
+    task->become({.isRunning = true, .progress = -0.5});
     EXPECT_EQ(manager().progress(), -0.5F);
 }
 
 TEST_F(SyncManager, DividesInDoublePrecisionAndNarrowsAfterwards) {
-    const auto session = host_->addSession("A");
+    const auto session = host_->sessionService.add("A");
     session->addAssetTask({.progress = 0.1});
     session->addAssetTask({.progress = 0.2});
     session->addAssetTask({.progress = 0.4});
@@ -348,11 +349,11 @@ TEST_F(SyncManager, DividesInDoublePrecisionAndNarrowsAfterwards) {
 }
 
 TEST_F(SyncManager, CountsTheItemsOfAllAssetTasksRunningOrNot) {
-    const auto one = host_->addSession("A");
-    one->addAssetTask({.running = true, .total = 10, .completed = 4});
+    const auto one = host_->sessionService.add("A");
+    one->addAssetTask({.isRunning = true, .total = 10, .completed = 4});
     one->addAssetTask({.total = 5, .completed = 5});
-    one->addOtherTask({.running = true, .total = 100, .completed = 100});
-    const auto finished = host_->addSession("B");
+    one->addOtherTask({.isRunning = true, .total = 100, .completed = 100});
+    const auto finished = host_->sessionService.add("B");
     finished->addAssetTask({.total = 3, .completed = 3});
     finished->finish();
 
@@ -361,7 +362,7 @@ TEST_F(SyncManager, CountsTheItemsOfAllAssetTasksRunningOrNot) {
 }
 
 TEST_F(SyncManager, TakesMissingTaskListsForEmptyOnes) {
-    host_->addSession("A")->loseTasks();
+    host_->sessionService.add("A")->loseTasks();
 
     EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle);
     EXPECT_EQ(manager().progress(), 0.0F);
@@ -381,7 +382,7 @@ struct SessionEvent {
 class SessionEvents : public SyncManager, public testing::WithParamInterface<SessionEvent> {};
 
 TEST_P(SessionEvents, AreAnsweredWithOnePostLater) {
-    const auto session = host_->addSession("A");
+    const auto session = host_->sessionService.add("A");
     const auto task = session->addAssetTask({});
     (void)manager();
 
@@ -427,7 +428,7 @@ INSTANTIATE_TEST_SUITE_P(
                                  1}));
 
 TEST_F(SyncManager, PostsOncePerCauseOnTheMainThreadAsTheSender) {
-    const auto session = host_->addSession("A");
+    const auto session = host_->sessionService.add("A");
     (void)manager();
 
     for (int event = 0; event < 3; ++event) {
@@ -444,7 +445,7 @@ TEST_F(SyncManager, PostsOncePerCauseOnTheMainThreadAsTheSender) {
 TEST_F(SyncManager, PostsOnTheMainThreadWhatASessionTellsOnOthers) {
     constexpr std::size_t threads = 4;
     constexpr std::size_t events = 250;
-    const auto session = host_->addSession("A");
+    const auto session = host_->sessionService.add("A");
     const auto task = session->addAssetTask({});
     (void)manager();
 
@@ -481,12 +482,12 @@ TEST_F(SyncManager, AnswersAPreferencesChangeWithOnePostAndNoFetch) {
 // Which sessions it is attached to.
 
 TEST_F(SyncManager, LeavesTheOldSessionsAndJoinsTheNewOnesWhenTheyChange) {
-    host_->addSession("A");
-    host_->addSession("B");
+    host_->sessionService.add("A");
+    host_->sessionService.add("B");
     (void)manager();
-    host_->removeSessions();
-    const auto added = host_->addSession("C");
-    added->addAssetTask({.running = true, .total = 1});
+    host_->sessionService.replace({});
+    const auto added = host_->sessionService.add("C");
+    added->addAssetTask({.isRunning = true, .total = 1});
 
     post(DVSessionsDidChangeNotification);
 
@@ -501,7 +502,7 @@ TEST_F(SyncManager, LeavesTheOldSessionsAndJoinsTheNewOnesWhenTheyChange) {
 TEST_F(SyncManager, KnowsANewSessionOnlyOnceItIsAnnounced) {
     (void)manager();
 
-    host_->addSession("A")->addAssetTask({.running = true, .total = 1});
+    host_->sessionService.add("A")->addAssetTask({.isRunning = true, .total = 1});
     EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageIdle);
 
     post(DVSessionsDidChangeNotification);
@@ -509,9 +510,9 @@ TEST_F(SyncManager, KnowsANewSessionOnlyOnceItIsAnnounced) {
 }
 
 TEST_F(SyncManager, LeavesItsSessionsInTheBackgroundAndJoinsTheSameOnesAgain) {
-    const auto session = host_->addSession("A");
+    const auto session = host_->sessionService.add("A");
     (void)manager();
-    host_->removeSessions(); // unannounced
+    host_->sessionService.replace({}); // unannounced
 
     post(UIApplicationDidEnterBackgroundNotification);
     session->tellObservers(
@@ -529,7 +530,7 @@ TEST_F(SyncManager, LeavesItsSessionsInTheBackgroundAndJoinsTheSameOnesAgain) {
 }
 
 TEST_F(SyncManager, AnswersQuestionsFromItsListInTheBackgroundToo) {
-    host_->addSession("A")->addAssetTask({.running = true, .total = 1});
+    host_->sessionService.add("A")->addAssetTask({.isRunning = true, .total = 1});
     (void)manager();
 
     post(UIApplicationDidEnterBackgroundNotification);
@@ -545,7 +546,7 @@ TEST_F(SyncManager, HearsOfPreferencesAndSessionsInTheBackgroundToo) {
     runQueuedWork();
     EXPECT_EQ(posts(), 1U);
 
-    const auto session = host_->addSession("A");
+    const auto session = host_->sessionService.add("A");
     post(DVSessionsDidChangeNotification);
     runQueuedWork();
     EXPECT_EQ(posts(), 2U);
@@ -556,7 +557,7 @@ TEST_F(SyncManager, HearsOfPreferencesAndSessionsInTheBackgroundToo) {
 }
 
 TEST_F(SyncManager, HearsASessionOnceHoweverOftenTheAppComesBack) {
-    const auto session = host_->addSession("A");
+    const auto session = host_->sessionService.add("A");
     (void)manager();
 
     post(UIApplicationWillEnterForegroundNotification);

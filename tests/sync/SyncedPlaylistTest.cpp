@@ -6,10 +6,10 @@
 
 namespace {
 
+using quorl::PlaylistDouble;
 using quorl::SyncPreference;
 using quorl::tests::runQueuedWork;
 using quorl::tests::TestHost;
-using quorl::tests::TestPlaylist;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::SizeIs;
@@ -42,8 +42,8 @@ class SyncedPlaylist : public testing::Test {
     }
 
     std::shared_ptr<TestHost> host_ = TestHost::installed();
-    std::shared_ptr<TestPlaylist> morning_ = host_->mediaLibrary().addPlaylist(7, "Morning");
-    std::shared_ptr<TestPlaylist> evening_ =
+    std::shared_ptr<PlaylistDouble> morning_ = host_->mediaLibrary().addPlaylist(7, "Morning");
+    std::shared_ptr<PlaylistDouble> evening_ =
         host_->mediaLibrary().addPlaylist(0x1'0000'0007, "Evening");
 };
 
