@@ -14,7 +14,7 @@
 #include "services/base/MountWatch.h"
 #include "services/base/RootWatch.h"
 #include "services/engine/BusLoop.h"
-#include "services/engine/Model.h"
+#include "services/engine/EngineState.h"
 #include "services/media/MusicFolder.h"
 #include "services/preferences/SharedPreferences.h"
 #include "services/wearable/Attachment.h"

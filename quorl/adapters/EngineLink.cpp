@@ -86,7 +86,7 @@ void EngineLink::tellPlaces() {
     }
 }
 
-void EngineLink::engineDidAppear(const engine::State& state) {
+void EngineLink::engineDidAppear(const engine::EngineState& state) {
     replaceSessions(state.sessions);
     dispatch_async(dispatch_get_main_queue(), [this, reference = std::weak_ptr(shared_)] {
         if (!reference.expired()) {

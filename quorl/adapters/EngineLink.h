@@ -33,13 +33,13 @@ class EngineLink final : public engine::Listener {
     /// The sessions of a type that exist now, never null.
     [[nodiscard]] NSArray<DVSession> sessions(const std::string& type) const;
 
-    [[nodiscard]] engine::State state() const { return client_.state(); }
+    [[nodiscard]] engine::EngineState state() const { return client_.state(); }
 
     void setConnected(bool connected) { client_.setConnected(connected); }
 
     void setOnCharger(bool onCharger) { client_.setOnCharger(onCharger); }
 
-    void engineDidAppear(const engine::State& state) override;
+    void engineDidAppear(const engine::EngineState& state) override;
     void engineDidVanish(const std::string& reason) override;
     void busDidVanish(const std::string& problem) override;
     void sessionWillBegin(const engine::SessionState& session) override;

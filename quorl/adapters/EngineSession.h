@@ -5,7 +5,7 @@
 #include <mutex>
 
 #include "runtime/services/ObservedSession.h"
-#include "services/engine/Model.h"
+#include "services/engine/EngineState.h"
 
 namespace quorl {
 

@@ -30,7 +30,7 @@ std::string timeText(std::uint64_t microseconds) {
 std::string sizeText(std::uint64_t bytes) { return CPFSSizeStrings(static_cast<float>(bytes)); }
 
 /// What the engine is about, and what its last session came to, as one paragraph.
-std::string statusText(const engine::State& state) {
+std::string statusText(const engine::EngineState& state) {
     if (!state.isThere) {
         return "The sync engine is not running, so nothing is synced. Start quorl-syncd, or log in "
                "again.";

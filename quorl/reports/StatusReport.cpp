@@ -19,13 +19,13 @@ using Json = nlohmann::ordered_json;
 class FirstWord final : public engine::Listener {
   public:
     struct Word {
-        engine::State state;
+        engine::EngineState state;
         std::string problem; ///< empty where there is a bus
     };
 
     [[nodiscard]] Word wait() { return word_.get_future().get(); }
 
-    void engineDidAppear(const engine::State& state) override { say({state, {}}); }
+    void engineDidAppear(const engine::EngineState& state) override { say({state, {}}); }
 
     void engineDidVanish(const std::string& /*reason*/) override { say({}); }
 
@@ -66,7 +66,7 @@ Choice choiceOf(const preferences::SharedPreferences& preferences, const media::
 
 /// The mean progress of the tasks that carry music in sessions that have not finished; null where
 /// none is running.
-std::optional<double> progressOf(const engine::State& state) {
+std::optional<double> progressOf(const engine::EngineState& state) {
     double sum = 0;
     int count = 0;
     for (const engine::SessionState& session : state.sessions) {
@@ -80,12 +80,12 @@ std::optional<double> progressOf(const engine::State& state) {
     return count == 0 ? std::nullopt : std::optional(sum / count);
 }
 
-bool isRunning(const engine::State& state) {
+bool isRunning(const engine::EngineState& state) {
     return std::any_of(state.sessions.begin(), state.sessions.end(),
                        [](const engine::SessionState& session) { return !session.isFinished; });
 }
 
-Json jsonOf(const engine::State& state, const Choice& choice) {
+Json jsonOf(const engine::EngineState& state, const Choice& choice) {
     Json json;
     json["engine"] = state.isThere;
     json["playlist"] = choice.name.empty() ? Json() : Json(choice.name);
@@ -108,7 +108,7 @@ Json jsonOf(const engine::State& state, const Choice& choice) {
     return json;
 }
 
-void printText(const engine::State& state, const Choice& choice) {
+void printText(const engine::EngineState& state, const Choice& choice) {
     std::cout << "Playlist:   " << (choice.name.empty() ? "none" : choice.name) << '\n'
               << "Sync:       " << choice.state;
     if (const auto progress = progressOf(state)) {

@@ -64,7 +64,7 @@ class Client::Connection {
     Connection(Listener& listener, std::string name);
     ~Connection();
 
-    [[nodiscard]] State state() const {
+    [[nodiscard]] EngineState state() const {
         const std::scoped_lock lock{mutex_};
         return state_;
     }
@@ -95,8 +95,9 @@ class Client::Connection {
     void onSessionCompleted(const std::string& path, sdbus::Message& message);
 
     /// Adds what the object is to `state`; true where it was a session or a task.
-    static void add(State& state, const std::string& path, const Interfaces& interfaces);
-    static std::pair<SessionState*, TaskState*> findTask(State& state, const std::string& path);
+    static void add(EngineState& state, const std::string& path, const Interfaces& interfaces);
+    static std::pair<SessionState*, TaskState*> findTask(EngineState& state,
+                                                         const std::string& path);
 
     template <class Change>
     auto change(Change change) {
@@ -118,7 +119,7 @@ class Client::Connection {
     std::uint64_t fetches_ = 0;
 
     mutable std::mutex mutex_;
-    State state_;
+    EngineState state_;
 
     std::thread thread_;
 };
@@ -184,7 +185,7 @@ void Client::Connection::fetchState() {
 
 /// What was signalled before this answer is in it, and was passed over.
 void Client::Connection::takeState(const Objects& objects) {
-    State state;
+    EngineState state;
     state.isThere = true;
     for (const auto& [path, interfaces] : objects) {
         if (propertiesOf(interfaces, taskInterface) == nullptr) {
@@ -196,13 +197,13 @@ void Client::Connection::takeState(const Objects& objects) {
             add(state, path, interfaces);
         }
     }
-    change([&](State& ours) { ours = state; });
+    change([&](EngineState& ours) { ours = state; });
     listener_.engineDidAppear(state);
 }
 
 void Client::Connection::noteEngineGone(const std::string& reason) {
     ++fetches_;
-    change([](State& state) { state = {}; });
+    change([](EngineState& state) { state = {}; });
     listener_.engineDidVanish(reason);
 }
 
@@ -246,7 +247,8 @@ void Client::Connection::onSignal(sdbus::Message& message) {
     }
 }
 
-void Client::Connection::add(State& state, const std::string& path, const Interfaces& interfaces) {
+void Client::Connection::add(EngineState& state, const std::string& path,
+                             const Interfaces& interfaces) {
     if (const auto* const properties = propertiesOf(interfaces, engineInterface)) {
         update(state.engine, *properties);
     }
@@ -268,7 +270,7 @@ void Client::Connection::add(State& state, const std::string& path, const Interf
 }
 
 void Client::Connection::onAdded(const std::string& path, const Interfaces& interfaces) {
-    const auto session = change([&](State& state) {
+    const auto session = change([&](EngineState& state) {
         add(state, path, interfaces);
         const auto* const added = find(state.sessions, path);
         return added == nullptr ? SessionState{} : *added;
@@ -279,7 +281,7 @@ void Client::Connection::onAdded(const std::string& path, const Interfaces& inte
 }
 
 void Client::Connection::onRemoved(const std::string& path) {
-    const auto session = change([&](State& state) {
+    const auto session = change([&](EngineState& state) {
         SessionState removed;
         if (const auto* const found = find(state.sessions, path)) {
             removed = *found;
@@ -300,7 +302,7 @@ void Client::Connection::onChanged(const std::string& path, const std::string& i
     if (interface == taskInterface) {
         SessionState session;
         TaskState task;
-        const bool isUpdate = change([&](State& state) {
+        const bool isUpdate = change([&](EngineState& state) {
             const auto [ofTask, changed] = findTask(state, path);
             if (changed == nullptr) {
                 return false;
@@ -316,13 +318,13 @@ void Client::Connection::onChanged(const std::string& path, const std::string& i
             listener_.taskDidUpdate(session, task);
         }
     } else if (interface == sessionInterface) {
-        change([&](State& state) {
+        change([&](EngineState& state) {
             if (auto* const session = find(state.sessions, path)) {
                 update(*session, properties);
             }
         });
     } else if (interface == engineInterface || interface == wearableInterface) {
-        change([&](State& state) {
+        change([&](EngineState& state) {
             if (interface == engineInterface) {
                 update(state.engine, properties);
             } else {
@@ -333,7 +335,7 @@ void Client::Connection::onChanged(const std::string& path, const std::string& i
     }
 }
 
-std::pair<SessionState*, TaskState*> Client::Connection::findTask(State& state,
+std::pair<SessionState*, TaskState*> Client::Connection::findTask(EngineState& state,
                                                                   const std::string& path) {
     for (auto& session : state.sessions) {
         if (auto* const task = find(session.tasks, path)) {
@@ -437,7 +439,7 @@ Client::Client(Listener& listener, std::string name)
 
 Client::~Client() = default;
 
-State Client::state() const { return connection_->state(); }
+EngineState Client::state() const { return connection_->state(); }
 
 void Client::startNow(Reply reply) {
     connection_->callMethod(enginePath, engineInterface, "StartNow", std::move(reply));

@@ -4,7 +4,7 @@
 #include <memory>
 #include <string>
 
-#include "services/engine/Model.h"
+#include "services/engine/EngineState.h"
 #include "services/engine/Names.h"
 
 namespace quorl::engine {
@@ -18,7 +18,7 @@ class Listener {
 
     /// The engine is there, and `state` is everything that it had to tell. Comes again whenever it
     /// was restarted. Sessions that are running then are not told one by one.
-    virtual void engineDidAppear(const State& /*state*/) {}
+    virtual void engineDidAppear(const EngineState& /*state*/) {}
 
     /// There is no engine, or none any more; no sessions either. That is no error: one may come.
     /// `reason` says why, for the user.
@@ -69,7 +69,7 @@ class Client {
     Client(const Client&) = delete;
     Client& operator=(const Client&) = delete;
 
-    [[nodiscard]] State state() const;
+    [[nodiscard]] EngineState state() const;
 
     void startNow(Reply reply = {});
     void cancel(Reply reply = {});

@@ -404,7 +404,7 @@ TEST_F(Engine, SyncsToADeviceThatIsPluggedInAndNoticesWhenItGoes) {
     start();
     EXPECT_EQ(recorder_.ask(&engine::Client::setWearableDirectory, device.string()), "");
     choose();
-    recorder_.awaitState([](const engine::State& state) {
+    recorder_.awaitState([](const engine::EngineState& state) {
         return state.engine.status.find("cannot be reached") != std::string::npos;
     });
     EXPECT_FALSE(recorder_.client().state().wearable.isConnected);

@@ -41,10 +41,10 @@ Event Recorder::next(const std::function<bool(const Event&)>& isWanted) {
 }
 
 void Recorder::awaitStatus(const std::string& status) {
-    awaitState([&](const engine::State& state) { return state.engine.status == status; });
+    awaitState([&](const engine::EngineState& state) { return state.engine.status == status; });
 }
 
-void Recorder::awaitState(const std::function<bool(const engine::State&)>& isWanted) {
+void Recorder::awaitState(const std::function<bool(const engine::EngineState&)>& isWanted) {
     std::unique_lock lock{mutex_};
     for (;;) {
         // Each change of the state is followed by an event; one that comes while the state is

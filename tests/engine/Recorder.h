@@ -54,7 +54,7 @@ class Recorder : private engine::Listener {
     void awaitStatus(const std::string& status);
 
     /// Waits until the state is as it is wanted.
-    void awaitState(const std::function<bool(const engine::State&)>& isWanted);
+    void awaitState(const std::function<bool(const engine::EngineState&)>& isWanted);
 
     /// All that was told so far.
     [[nodiscard]] std::vector<Event> all();
@@ -76,7 +76,9 @@ class Recorder : private engine::Listener {
 
     void note(Event event);
 
-    void engineDidAppear(const engine::State& /*state*/) override { note({Kind::EngineDidAppear}); }
+    void engineDidAppear(const engine::EngineState& /*state*/) override {
+        note({Kind::EngineDidAppear});
+    }
 
     void engineDidVanish(const std::string& reason) override {
         note({Kind::EngineDidVanish, {}, {}, false, reason});

@@ -1,4 +1,4 @@
-#include "services/engine/Model.h"
+#include "services/engine/EngineState.h"
 
 namespace quorl::engine {
 

@@ -68,7 +68,7 @@ struct EngineStatus {
 };
 
 /// Everything, at one moment.
-struct State {
+struct EngineState {
     /// False: there is no engine, and everything below is empty.
     bool isThere = false;
     EngineStatus engine;
@@ -76,7 +76,7 @@ struct State {
     /// In the order in which they began.
     std::vector<SessionState> sessions;
 
-    bool operator==(const State&) const = default;
+    bool operator==(const EngineState&) const = default;
 };
 
 using Properties = std::map<std::string, sdbus::Variant>;
