@@ -5,26 +5,12 @@
 #include <Engine-adaptor.h>
 #include <Wearable-adaptor.h>
 
+#include "quorl-syncd/bus/Published.h"
 #include "quorl-syncd/engine/Engine.h"
-#include "services/engine/Names.h"
 
 namespace quorl::syncd {
 
 namespace {
-
-/// The names of the properties whose values differ. `fields` pairs names with member pointers.
-template <class Status, class... Field>
-std::vector<std::string> changes(const Status& before, const Status& now,
-                                 const std::pair<const char*, Field>&... fields) {
-    std::vector<std::string> names;
-    const auto compare = [&](const auto& field) {
-        if (before.*field.second != now.*field.second) {
-            names.emplace_back(field.first);
-        }
-    };
-    (compare(fields), ...);
-    return names;
-}
 
 /// Has the caller on the bus told what went wrong, in words.
 template <class Act>
@@ -45,26 +31,13 @@ class BusObjects::EngineObject final
                                       sdbus::Properties_adaptor> {
   public:
     EngineObject(sdbus::IConnection& bus, Engine& engine)
-        : AdaptorInterfaces{bus, engine::enginePath}, engine_{engine}, published_{engine.status()} {
+        : AdaptorInterfaces{bus, engine::enginePath}, engine_{engine}, published_(engine.status()) {
         registerAdaptor();
     }
 
     ~EngineObject() { unregisterAdaptor(); }
 
-    void publish() {
-        using Status = engine::EngineStatus;
-        const auto now = engine_.status();
-        const auto names = changes(published_, now, std::pair{"MusicFolder", &Status::musicFolder},
-                                   std::pair{"RateLimit", &Status::rateLimit},
-                                   std::pair{"Status", &Status::status},
-                                   std::pair{"LastSuccess", &Status::lastSuccess},
-                                   std::pair{"LastMessage", &Status::lastMessage},
-                                   std::pair{"LastTime", &Status::lastTime});
-        published_ = now;
-        if (!names.empty()) {
-            emitPropertiesChangedSignal(engine::engineInterface, names);
-        }
-    }
+    void publish() { published_.change(*this, engine_.status()); }
 
   private:
     void StartNow() override {
@@ -73,28 +46,28 @@ class BusObjects::EngineObject final
 
     void Cancel() override { engine_.cancel(); }
 
-    std::string MusicFolder() override { return engine_.status().musicFolder; }
+    std::string MusicFolder() override { return engine::valueOf<"MusicFolder">(*published_); }
 
     void MusicFolder(const std::string& path) override {
         answering(engine::notReadyError, [&] { engine_.setMusicFolder(path); });
     }
 
-    std::uint64_t RateLimit() override { return engine_.status().rateLimit; }
+    std::uint64_t RateLimit() override { return engine::valueOf<"RateLimit">(*published_); }
 
     void RateLimit(const std::uint64_t& bytesPerSecond) override {
         engine_.setRateLimit(bytesPerSecond);
     }
 
-    std::string Status() override { return engine_.status().status; }
+    std::string Status() override { return engine::valueOf<"Status">(*published_); }
 
-    bool LastSuccess() override { return engine_.status().lastSuccess; }
+    bool LastSuccess() override { return engine::valueOf<"LastSuccess">(*published_); }
 
-    std::string LastMessage() override { return engine_.status().lastMessage; }
+    std::string LastMessage() override { return engine::valueOf<"LastMessage">(*published_); }
 
-    std::uint64_t LastTime() override { return engine_.status().lastTime; }
+    std::uint64_t LastTime() override { return engine::valueOf<"LastTime">(*published_); }
 
     Engine& engine_;
-    engine::EngineStatus published_;
+    Published<engine::EngineStatus> published_;
 };
 
 class BusObjects::WearableObject final
@@ -104,64 +77,51 @@ class BusObjects::WearableObject final
     WearableObject(sdbus::IConnection& bus, Engine& engine)
         : AdaptorInterfaces{bus, engine::wearablePath},
           engine_{engine},
-          published_{engine.wearable()} {
+          published_(engine.wearable()) {
         registerAdaptor();
     }
 
     ~WearableObject() { unregisterAdaptor(); }
 
-    void publish() {
-        using Status = engine::WearableStatus;
-        const auto now = engine_.wearable();
-        const auto names = changes(
-            published_, now, std::pair{"Directory", &Status::directory},
-            std::pair{"Embedded", &Status::isEmbedded},
-            std::pair{"Connected", &Status::isConnected},
-            std::pair{"OnCharger", &Status::isOnCharger}, std::pair{"Capacity", &Status::capacity},
-            std::pair{"Available", &Status::available}, std::pair{"Songs", &Status::songs});
-        published_ = now;
-        if (!names.empty()) {
-            emitPropertiesChangedSignal(engine::wearableInterface, names);
-        }
-    }
+    void publish() { published_.change(*this, engine_.wearable()); }
 
   private:
-    std::string Directory() override { return engine_.wearable().directory; }
+    std::string Directory() override { return engine::valueOf<"Directory">(*published_); }
 
     void Directory(const std::string& path) override {
         answering(engine::notReadyError, [&] { engine_.setWearableDirectory(path); });
     }
 
-    std::string Name() override { return engine_.wearable().name; }
+    std::string Name() override { return engine::valueOf<"Name">(*published_); }
 
-    bool Embedded() override { return engine_.wearable().isEmbedded; }
+    bool Embedded() override { return engine::valueOf<"Embedded">(*published_); }
 
-    bool Connected() override { return engine_.wearable().isConnected; }
+    bool Connected() override { return engine::valueOf<"Connected">(*published_); }
 
     void Connected(const bool& connected) override {
         answering(engine::readOnlyError, [&] {
-            engine_.attach({connected, engine_.attachment().onCharger});
+            engine_.attach({.connected = connected, .onCharger = engine_.attachment().onCharger});
         });
     }
 
-    bool OnCharger() override { return engine_.wearable().isOnCharger; }
+    bool OnCharger() override { return engine::valueOf<"OnCharger">(*published_); }
 
     void OnCharger(const bool& onCharger) override {
         answering(engine::readOnlyError, [&] {
-            engine_.attach({engine_.attachment().connected, onCharger});
+            engine_.attach({.connected = engine_.attachment().connected, .onCharger = onCharger});
         });
     }
 
-    std::uint64_t Capacity() override { return engine_.wearable().capacity; }
+    std::uint64_t Capacity() override { return engine::valueOf<"Capacity">(*published_); }
 
-    std::uint64_t Available() override { return engine_.wearable().available; }
+    std::uint64_t Available() override { return engine::valueOf<"Available">(*published_); }
 
-    std::uint64_t Songs() override { return engine_.wearable().songs; }
+    std::uint64_t Songs() override { return engine::valueOf<"Songs">(*published_); }
 
     void Refresh() override { engine_.refreshWearable(); }
 
     Engine& engine_;
-    engine::WearableStatus published_;
+    Published<engine::WearableStatus> published_;
 };
 
 BusObjects::BusObjects(sdbus::IConnection& bus, Engine& engine)

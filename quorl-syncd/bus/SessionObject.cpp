@@ -5,7 +5,7 @@
 #include <Session-adaptor.h>
 #include <Task-adaptor.h>
 
-#include "services/engine/Names.h"
+#include "quorl-syncd/bus/Published.h"
 
 namespace quorl::syncd {
 
@@ -24,8 +24,9 @@ std::string pathOf(std::uint64_t session) {
 }
 
 /// Below 1 until everything is done, for there is something to do after the last byte.
-double fractionOf(const CopyProgress& progress) {
-    return static_cast<double>(progress.bytes) / (static_cast<double>(progress.totalBytes) + 1.0);
+engine::Fraction fractionOf(const CopyProgress& progress) {
+    return engine::Fraction(static_cast<double>(progress.bytes) /
+                            (static_cast<double>(progress.totalBytes) + 1.0));
 }
 
 /// Tells that an object leaves the bus, which may be gone itself.
@@ -45,7 +46,12 @@ class SessionObject::Session final
                                       sdbus::Properties_adaptor, sdbus::ManagedObject_adaptor> {
   public:
     Session(sdbus::IConnection& bus, const std::string& path, std::function<void()> cancel)
-        : AdaptorInterfaces{bus, path}, cancel_{std::move(cancel)} {
+        : AdaptorInterfaces(bus, path),
+          cancel_(std::move(cancel)),
+          published_({.typeIdentifier = engine::deviceSyncType,
+                      .operation = "velora-sync",
+                      .startTime = microsecondsNow(),
+                      .isCancelable = true}) {
         registerAdaptor();
         emitInterfacesAddedSignal({engine::sessionInterface});
     }
@@ -56,58 +62,52 @@ class SessionObject::Session final
     }
 
     void copied(const CopyProgress& progress) {
-        if (!isKnown_) {
-            isKnown_ = true;
-            bytes_ = progress.totalBytes;
+        if (!published_->isProgressValid) {
             begun_ = Clock::now();
-            emitPropertiesChangedSignal(engine::sessionInterface, {"ProgressValid", "Bytes"});
         }
         const std::chrono::duration<double> elapsed = Clock::now() - begun_;
-        rate_ = static_cast<std::uint64_t>(static_cast<double>(progress.bytes) /
-                                           std::max(elapsed.count(), 0.001));
-        progress_ = fractionOf(progress);
-        emitPropertiesChangedSignal(engine::sessionInterface, {"Progress", "Rate"});
+        auto now = *published_;
+        now.isProgressValid = true;
+        now.bytes = progress.totalBytes;
+        now.rate = static_cast<std::uint64_t>(static_cast<double>(progress.bytes) /
+                                              std::max(elapsed.count(), 0.001));
+        now.progress = fractionOf(progress);
+        published_.change(*this, now);
     }
 
     void finish(bool success, const std::string& message) {
-        isFinished_ = true;
-        if (success) {
-            progress_ = 1.0;
-        }
-        emitPropertiesChangedSignal(engine::sessionInterface,
-                                    {"Finished", "Progress", "Cancelable"});
+        auto now = *published_;
+        now.isFinished = true;
+        now.isCancelable = false;
+        now.progress = success ? engine::Fraction(1) : now.progress;
+        published_.change(*this, now);
         emitCompleted(success, message);
     }
 
   private:
-    std::string TypeIdentifier() override { return engine::deviceSyncType; }
+    std::string TypeIdentifier() override { return engine::valueOf<"TypeIdentifier">(*published_); }
 
-    bool Finished() override { return isFinished_; }
+    bool Finished() override { return engine::valueOf<"Finished">(*published_); }
 
-    std::string Operation() override { return "velora-sync"; }
+    std::string Operation() override { return engine::valueOf<"Operation">(*published_); }
 
-    double Progress() override { return progress_; }
+    double Progress() override { return engine::valueOf<"Progress">(*published_); }
 
-    bool ProgressValid() override { return isKnown_; }
+    bool ProgressValid() override { return engine::valueOf<"ProgressValid">(*published_); }
 
-    std::uint64_t Bytes() override { return bytes_; }
+    std::uint64_t Bytes() override { return engine::valueOf<"Bytes">(*published_); }
 
-    std::uint64_t Rate() override { return rate_; }
+    std::uint64_t Rate() override { return engine::valueOf<"Rate">(*published_); }
 
-    std::uint64_t StartTime() override { return startTime_; }
+    std::uint64_t StartTime() override { return engine::valueOf<"StartTime">(*published_); }
 
-    bool Cancelable() override { return !isFinished_; }
+    bool Cancelable() override { return engine::valueOf<"Cancelable">(*published_); }
 
     void Cancel(const std::map<std::string, sdbus::Variant>& /*options*/) override { cancel_(); }
 
     const std::function<void()> cancel_;
-    const std::uint64_t startTime_ = microsecondsNow();
     Clock::time_point begun_;
-    bool isKnown_ = false;
-    bool isFinished_ = false;
-    std::uint64_t bytes_ = 0;
-    std::uint64_t rate_ = 0;
-    double progress_ = 0.0;
+    Published<engine::SessionState> published_;
 };
 
 class SessionObject::Task final
@@ -115,10 +115,9 @@ class SessionObject::Task final
                                       sdbus::Properties_adaptor, sdbus::ManagedObject_adaptor> {
   public:
     Task(sdbus::IConnection& bus, const std::string& session, const std::string& name,
-         std::string groupingKey)
-        : AdaptorInterfaces{bus, session + "/Tasks/" + name},
-          session_{session},
-          groupingKey_{std::move(groupingKey)} {
+         const std::string& groupingKey)
+        : AdaptorInterfaces(bus, session + "/Tasks/" + name),
+          published_({.session = sdbus::ObjectPath(session), .groupingKey = groupingKey}) {
         registerAdaptor();
         emitInterfacesAddedSignal({engine::taskInterface});
     }
@@ -128,52 +127,53 @@ class SessionObject::Task final
         unregisterAdaptor();
     }
 
-    [[nodiscard]] bool isRunning() const { return isRunning_; }
+    [[nodiscard]] bool isRunning() const { return published_->isRunning; }
 
-    void begin() {
+    /// `progress` is what is told of it as soon as it runs.
+    void begin(const CopyProgress& progress) {
         emitWillBegin();
-        isRunning_ = true;
-        emitPropertiesChangedSignal(engine::taskInterface,
-                                    {"Running", "TotalItemCount", "CompletedItemCount"});
+        auto now = with(progress);
+        now.isRunning = true;
+        published_.change(*this, now);
         emitDidBegin();
     }
 
-    void copied(const CopyProgress& progress) {
-        copied_ = progress;
-        progress_ = fractionOf(progress);
-        if (isRunning_) {
-            emitPropertiesChangedSignal(engine::taskInterface,
-                                        {"Progress", "TotalItemCount", "CompletedItemCount"});
-        }
-    }
+    void copied(const CopyProgress& progress) { published_.change(*this, with(progress)); }
 
     void finish(bool success, const std::string& message) {
-        isRunning_ = false;
-        if (success) {
-            progress_ = 1.0;
-        }
-        emitPropertiesChangedSignal(engine::taskInterface, {"Running", "Progress"});
+        auto now = *published_;
+        now.isRunning = false;
+        now.progress = success ? engine::Fraction(1) : now.progress;
+        published_.change(*this, now);
         emitCompleted(success, message);
     }
 
   private:
-    sdbus::ObjectPath Session() override { return session_; }
+    [[nodiscard]] engine::TaskState with(const CopyProgress& progress) const {
+        auto state = *published_;
+        state.totalItemCount = progress.totalSongs;
+        state.completedItemCount = progress.songs;
+        state.progress = fractionOf(progress);
+        return state;
+    }
 
-    std::string GroupingKey() override { return groupingKey_; }
+    sdbus::ObjectPath Session() override { return engine::valueOf<"Session">(*published_); }
 
-    bool Running() override { return isRunning_; }
+    std::string GroupingKey() override { return engine::valueOf<"GroupingKey">(*published_); }
 
-    std::uint64_t TotalItemCount() override { return copied_.totalSongs; }
+    bool Running() override { return engine::valueOf<"Running">(*published_); }
 
-    std::uint64_t CompletedItemCount() override { return copied_.songs; }
+    std::uint64_t TotalItemCount() override {
+        return engine::valueOf<"TotalItemCount">(*published_);
+    }
 
-    double Progress() override { return progress_; }
+    std::uint64_t CompletedItemCount() override {
+        return engine::valueOf<"CompletedItemCount">(*published_);
+    }
 
-    const sdbus::ObjectPath session_;
-    const std::string groupingKey_;
-    bool isRunning_ = false;
-    CopyProgress copied_;
-    double progress_ = 0.0;
+    double Progress() override { return engine::valueOf<"Progress">(*published_); }
+
+    Published<engine::TaskState> published_;
 };
 
 SessionObject::SessionObject(sdbus::IConnection& bus, std::uint64_t number,
@@ -181,19 +181,20 @@ SessionObject::SessionObject(sdbus::IConnection& bus, std::uint64_t number,
     : session_{std::make_unique<Session>(bus, pathOf(number), std::move(cancel))},
       preparing_{std::make_unique<Task>(bus, pathOf(number), "1", engine::preparingGroupingKey)},
       copying_{std::make_unique<Task>(bus, pathOf(number), "2", engine::assetGroupingKey)} {
-    preparing_->begin();
+    preparing_->begin({});
 }
 
 SessionObject::~SessionObject() = default;
 
 void SessionObject::copied(const CopyProgress& progress) {
     session_->copied(progress);
-    copying_->copied(progress);
-    if (preparing_->isRunning()) {
-        // In this order something is running at every moment.
-        copying_->begin();
-        preparing_->finish(true, "Prepared.");
+    if (!preparing_->isRunning()) {
+        copying_->copied(progress);
+        return;
     }
+    // In this order something is running at every moment.
+    copying_->begin(progress);
+    preparing_->finish(true, "Prepared.");
 }
 
 void SessionObject::finish(bool success, const std::string& message) {

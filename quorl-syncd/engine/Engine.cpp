@@ -378,14 +378,16 @@ void Engine::publish() {
         status_.status = status_.lastMessage;
     }
     const auto usage = usage_.value_or(wearable::Usage{});
-    wearableStatus_ = {wearable_.root,
-                       wearable::wearableName,
-                       wearable_.isEmbedded(),
-                       usage_ && attachment_.connected,
-                       usage_ && attachment_.onCharger,
-                       usage.capacity,
-                       usage.available,
-                       usage.songs};
+    wearableStatus_ = {
+        .directory = wearable_.root,
+        .name = wearable::wearableName,
+        .isEmbedded = wearable_.isEmbedded(),
+        .isConnected = usage_ && attachment_.connected,
+        .isOnCharger = usage_ && attachment_.onCharger,
+        .capacity = usage.capacity,
+        .available = usage.available,
+        .songs = usage.songs,
+    };
     changed_();
 }
 

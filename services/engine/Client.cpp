@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "services/engine/BusLoop.h"
+#include "services/engine/Interface.h"
 
 namespace quorl::engine {
 
@@ -73,10 +74,18 @@ class Client::Connection {
 
     void request(Action action, Reply reply);
     void callMethod(const char* path, const char* interface, const char* method, Reply reply);
-    void setProperty(const char* path, const char* interface, const char* property,
-                     sdbus::Variant value, Reply reply);
+
+    template <class State, PropertyName name, class T>
+    void setProperty(const char* path, const T& value, Reply reply) {
+        constexpr auto property = propertyOf<State, name>();
+        static_assert(property.access == Access::ReadWrite);
+        static_assert(std::is_same_v<T, std::decay_t<decltype(valueOf<name>(State()))>>);
+        set(path, Interface<State>::name, property.name, sdbus::Variant(value), std::move(reply));
+    }
 
   private:
+    void set(const char* path, const char* interface, const char* property, sdbus::Variant value,
+             Reply reply);
     void work();
     void open();
     void fetchState();
@@ -418,8 +427,8 @@ void Client::Connection::callMethod(const char* path, const char* interface, con
         std::move(reply));
 }
 
-void Client::Connection::setProperty(const char* path, const char* interface, const char* property,
-                                     sdbus::Variant value, Reply reply) {
+void Client::Connection::set(const char* path, const char* interface, const char* property,
+                             sdbus::Variant value, Reply reply) {
     request(
         [this, path, interface, property, value = std::move(value)](auto done) {
             auto& proxy = proxies_[path];
@@ -450,26 +459,26 @@ void Client::cancel(Reply reply) {
 }
 
 void Client::setMusicFolder(const std::string& path, Reply reply) {
-    connection_->setProperty(enginePath, engineInterface, "MusicFolder", path, std::move(reply));
+    connection_->setProperty<EngineStatus, "MusicFolder">(enginePath, path, std::move(reply));
 }
 
 void Client::setRateLimit(std::uint64_t bytesPerSecond, Reply reply) {
-    connection_->setProperty(enginePath, engineInterface, "RateLimit", bytesPerSecond,
-                             std::move(reply));
+    connection_->setProperty<EngineStatus, "RateLimit">(enginePath, bytesPerSecond,
+                                                        std::move(reply));
 }
 
 void Client::setWearableDirectory(const std::string& path, Reply reply) {
-    connection_->setProperty(wearablePath, wearableInterface, "Directory", path, std::move(reply));
+    connection_->setProperty<WearableStatus, "Directory">(wearablePath, path, std::move(reply));
 }
 
 void Client::setConnected(bool connected, Reply reply) {
-    connection_->setProperty(wearablePath, wearableInterface, "Connected", connected,
-                             std::move(reply));
+    connection_->setProperty<WearableStatus, "Connected">(wearablePath, connected,
+                                                          std::move(reply));
 }
 
 void Client::setOnCharger(bool onCharger, Reply reply) {
-    connection_->setProperty(wearablePath, wearableInterface, "OnCharger", onCharger,
-                             std::move(reply));
+    connection_->setProperty<WearableStatus, "OnCharger">(wearablePath, onCharger,
+                                                          std::move(reply));
 }
 
 void Client::refreshWearable(Reply reply) {

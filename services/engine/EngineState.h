@@ -7,20 +7,23 @@
 
 #include <sdbus-c++/sdbus-c++.h>
 
+#include "services/engine/Fraction.h"
+
 /// What a sync engine tells about itself, as plain values.
 namespace quorl::engine {
 
 /// A piece of a session's work.
 struct TaskState {
     /// Tells it from all others for as long as the engine runs.
-    std::string path;
-    std::string groupingKey;
+    std::string path = {};
+    /// The path of its session.
+    sdbus::ObjectPath session = {};
+    std::string groupingKey = {};
     bool isRunning = false;
     /// Songs to be copied; 0 as long as that is not known.
     std::uint64_t totalItemCount = 0;
     std::uint64_t completedItemCount = 0;
-    /// From 0 to 1.
-    double progress = 0.0;
+    Fraction progress = {};
 
     bool operator==(const TaskState&) const = default;
 };
@@ -28,19 +31,31 @@ struct TaskState {
 /// One run of the engine.
 struct SessionState {
     /// Tells it from all others for as long as the engine runs.
-    std::string path;
-    std::string typeIdentifier;
+    std::string path = {};
+    std::string typeIdentifier = {};
     bool isFinished = false;
+    /// What kind of job it is, for programs that show jobs of any kind.
+    std::string operation = {};
+    Fraction progress = {};
+    /// False as long as it is not known how much there is to copy.
+    bool isProgressValid = false;
+    /// To be copied; 0 as long as that is not known.
+    std::uint64_t bytes = 0;
+    /// Bytes a second, on average; 0 as long as nothing was copied.
+    std::uint64_t rate = 0;
+    /// Microseconds since 1970.
+    std::uint64_t startTime = 0;
+    bool isCancelable = false;
     /// In the order in which they were announced.
-    std::vector<TaskState> tasks;
+    std::vector<TaskState> tasks = {};
 
     bool operator==(const SessionState&) const = default;
 };
 
 /// The wearable that the engine syncs to. Byte counts are as last looked at.
 struct WearableStatus {
-    std::string directory;
-    std::string name;
+    std::string directory = {};
+    std::string name = {};
     bool isEmbedded = false;
     bool isConnected = false;
     bool isOnCharger = false;
@@ -53,14 +68,14 @@ struct WearableStatus {
 
 /// The engine itself.
 struct EngineStatus {
-    std::string musicFolder;
+    std::string musicFolder = {};
     /// Bytes a second; 0 for no limit.
     std::uint64_t rateLimit = 0;
     /// A sentence for the user: what the engine does, or what it waits for.
-    std::string status;
+    std::string status = {};
     /// What became of the last session with this wearable; no text before the first.
     bool lastSuccess = false;
-    std::string lastMessage;
+    std::string lastMessage = {};
     /// Microseconds since 1970.
     std::uint64_t lastTime = 0;
 
@@ -71,21 +86,14 @@ struct EngineStatus {
 struct EngineState {
     /// False: there is no engine, and everything below is empty.
     bool isThere = false;
-    EngineStatus engine;
-    WearableStatus wearable;
+    EngineStatus engine = {};
+    WearableStatus wearable = {};
     /// In the order in which they began.
-    std::vector<SessionState> sessions;
+    std::vector<SessionState> sessions = {};
 
     bool operator==(const EngineState&) const = default;
 };
 
 using Properties = std::map<std::string, sdbus::Variant>;
-
-/// Take over those of the properties that are known and of the right type; the others are left as
-/// they are, so that other engines may have more.
-void update(TaskState& task, const Properties& properties);
-void update(SessionState& session, const Properties& properties);
-void update(WearableStatus& wearable, const Properties& properties);
-void update(EngineStatus& engine, const Properties& properties);
 
 } // namespace quorl::engine
