@@ -60,6 +60,10 @@ class BusObjects::EngineObject final
 
     std::string Status() override { return engine::valueOf<"Status">(*published_); }
 
+    std::string SyncState() override { return engine::valueOf<"SyncState">(*published_); }
+
+    std::string PlaylistName() override { return engine::valueOf<"PlaylistName">(*published_); }
+
     bool LastSuccess() override { return engine::valueOf<"LastSuccess">(*published_); }
 
     std::string LastMessage() override { return engine::valueOf<"LastMessage">(*published_); }

@@ -9,6 +9,7 @@
 
 #include "quorl-syncd/bus/SessionObject.h"
 #include "quorl-syncd/bus/SleepInhibitor.h"
+#include "quorl-syncd/engine/SyncState.h"
 #include "services/base/AtomicFile.h"
 
 namespace quorl::syncd {
@@ -234,23 +235,25 @@ std::optional<Order> Engine::currentOrder(bool ignoresCharger) {
     if (playlist == nullptr || !obstacle_.empty()) {
         return std::nullopt;
     }
-    const wearable::Selection selection{playlist->id, playlist->revision,
-                                        preferences_.get(preferences::assetSyncLimitType),
-                                        preferences_.get(preferences::assetSyncLimit).value_or(0)};
-    return Order{library_, selection, wearable_};
+    return Order{library_, selectionOf(*playlist), wearable_};
 }
 
-bool Engine::isSent(const Order& order) const {
+wearable::Selection Engine::selectionOf(const media::Playlist& playlist) const {
+    return {playlist.id, playlist.revision, preferences_.get(preferences::assetSyncLimitType),
+            preferences_.get(preferences::assetSyncLimit).value_or(0)};
+}
+
+/// A wearable that is not there does not say otherwise.
+bool Engine::isSent(const wearable::Selection& selection) const {
     using namespace preferences;
-    return usage_->sent == order.selection &&
-           preferences_.get(lastFullySentAssetSyncPlaylistPersistentID) ==
-               order.selection.playlist &&
-           preferences_.get(lastFullySentAssetSyncPlaylistVersion) == order.selection.revision;
+    return (!usage_ || usage_->sent == selection) &&
+           preferences_.get(lastFullySentAssetSyncPlaylistPersistentID) == selection.playlist &&
+           preferences_.get(lastFullySentAssetSyncPlaylistVersion) == selection.revision;
 }
 
 bool Engine::isDue(const Order& order) const {
     return isStartRequested_ ||
-           (Clock::now() >= settled_ && givenUp_ != order.selection && !isSent(order));
+           (Clock::now() >= settled_ && givenUp_ != order.selection && !isSent(order.selection));
 }
 
 /// Begins or ends a sync, where what is wished for asks for it.
@@ -370,7 +373,21 @@ std::string Engine::remember(const Order& order) {
         .problem;
 }
 
+/// Has clients told which playlist is to be synced, and how far that is.
+void Engine::takeChoice() {
+    const auto id = preferences_.get(preferences::assetSyncPlaylistPersistentID);
+    const bool isWished = preferences_.get(preferences::assetSyncEnabled) && id;
+    const auto* const playlist = isWished && library_ ? library_->playlist(*id) : nullptr;
+    status_.playlistName = playlist ? playlist->name : "";
+    status_.syncState = syncStateOf({.isWished = isWished,
+                                     .isLibraryRead = library_ != nullptr,
+                                     .isPlaylistThere = playlist != nullptr,
+                                     .isSent = playlist && isSent(selectionOf(*playlist)),
+                                     .isRunning = run_ != nullptr});
+}
+
 void Engine::publish() {
+    takeChoice();
     status_.status = run_                ? "Syncing music."
                      : obstacle_.empty() ? "Everything is up to date."
                                          : obstacle_;

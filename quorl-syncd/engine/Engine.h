@@ -91,7 +91,8 @@ class Engine {
     void consider();
     [[nodiscard]] std::optional<Order> currentOrder(bool ignoresCharger);
     [[nodiscard]] bool isDue(const Order& order) const;
-    [[nodiscard]] bool isSent(const Order& order) const;
+    [[nodiscard]] wearable::Selection selectionOf(const media::Playlist& playlist) const;
+    [[nodiscard]] bool isSent(const wearable::Selection& selection) const;
 
     void begin(Order order);
     void stop(const std::string& why);
@@ -105,6 +106,7 @@ class Engine {
     void watchWearable();
     void mountsDidChange();
     void unwatchWearable();
+    void takeChoice();
     void publish();
 
     engine::BusLoop& loop_;

@@ -73,6 +73,10 @@ struct EngineStatus {
     std::uint64_t rateLimit = 0;
     /// A sentence for the user: what the engine does, or what it waits for.
     std::string status = {};
+    /// How far the chosen playlist has come, as one of the words of Names.h.
+    std::string syncState = {};
+    /// The chosen playlist, by the name that is shown; empty for none.
+    std::string playlistName = {};
     /// What became of the last session with this wearable; no text before the first.
     bool lastSuccess = false;
     std::string lastMessage = {};

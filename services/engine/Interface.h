@@ -38,6 +38,8 @@ struct Interface<EngineStatus> {
         Property{"MusicFolder", &EngineStatus::musicFolder, Access::ReadWrite},
         Property{"RateLimit", &EngineStatus::rateLimit, Access::ReadWrite},
         Property{"Status", &EngineStatus::status},
+        Property{"SyncState", &EngineStatus::syncState},
+        Property{"PlaylistName", &EngineStatus::playlistName},
         Property{"LastSuccess", &EngineStatus::lastSuccess},
         Property{"LastMessage", &EngineStatus::lastMessage},
         Property{"LastTime", &EngineStatus::lastTime},

@@ -18,6 +18,12 @@ inline constexpr auto taskInterface = "org.quorl.Velora.Sync.Task";
 inline constexpr auto notReadyError = "org.quorl.Velora.Sync.Error.NotReady";
 inline constexpr auto readOnlyError = "org.freedesktop.DBus.Error.PropertyReadOnly";
 
+inline constexpr auto syncOff = "off";
+inline constexpr auto syncPending = "pending";
+inline constexpr auto syncSyncing = "syncing";
+inline constexpr auto syncSynced = "synced";
+inline constexpr auto syncUnknown = "unknown";
+
 inline constexpr auto deviceSyncType = "DVSessionTypeDeviceSync";
 inline constexpr auto assetGroupingKey = "DVDeviceSyncSessionAssetTaskGroupingKey";
 inline constexpr auto preparingGroupingKey = "org.quorl.preparing";
