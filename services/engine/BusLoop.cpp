@@ -46,11 +46,12 @@ void BusLoop::stop() {
 std::string BusLoop::run() {
     try {
         while (!stopped_) {
-            serveBus();
+            // One message at a time, so that a flood of them keeps nothing else waiting.
+            const bool mayHaveMore = serveBus();
             callPosted();
             callDue();
             if (!stopped_) {
-                wait();
+                wait(mayHaveMore ? 0 : timeout());
             }
         }
         return {};
@@ -60,10 +61,7 @@ std::string BusLoop::run() {
     }
 }
 
-void BusLoop::serveBus() {
-    while (isBusThere_ && !stopped_ && bus_->processPendingRequest()) {
-    }
-}
+bool BusLoop::serveBus() { return isBusThere_ && bus_->processPendingRequest(); }
 
 int BusLoop::timeout() const {
     const auto ofBus = isBusThere_ ? bus_->getEventLoopPollData().getPollTimeout() : -1;
@@ -77,7 +75,7 @@ int BusLoop::timeout() const {
     return ofBus < 0 ? ofTimers : std::min(ofBus, ofTimers);
 }
 
-void BusLoop::wait() {
+void BusLoop::wait(int milliseconds) {
     std::vector<pollfd> polled{{-1, 0, 0}};
     if (isBusThere_) {
         const auto data = bus_->getEventLoopPollData();
@@ -86,7 +84,7 @@ void BusLoop::wait() {
     for (const auto& [descriptor, watched] : watched_) {
         polled.push_back({descriptor, watched.events, 0});
     }
-    if (poll(polled.data(), polled.size(), timeout()) < 0 && errno != EINTR) {
+    if (poll(polled.data(), polled.size(), milliseconds) < 0 && errno != EINTR) {
         throw std::system_error{errno, std::generic_category(), "poll"};
     }
     for (std::size_t at = 1; at < polled.size(); ++at) {

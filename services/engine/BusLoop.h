@@ -55,9 +55,10 @@ class BusLoop {
         Work ready;
     };
 
-    void serveBus();
+    /// Whether there was a message; there may be more then.
+    bool serveBus();
     [[nodiscard]] int timeout() const;
-    void wait();
+    void wait(int milliseconds);
     void callReady(int descriptor);
     void callPosted();
     void callDue();
