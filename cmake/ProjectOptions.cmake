@@ -5,9 +5,16 @@ set(CMAKE_CXX_EXTENSIONS OFF)
 set(CMAKE_POSITION_INDEPENDENT_CODE ON)
 set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
 set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
-set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
+# The build tree is laid out like an installation, so that what is built is what is installed: a search
+# path that CMake changes at install ends in an empty entry before, which stands for the working directory.
+set(QUORL_LIBRARY_DIR ${CMAKE_INSTALL_LIBDIR}/quorl)
+set(QUORL_BUNDLE_DIR ${QUORL_LIBRARY_DIR}/plugins/VeloraMusic.bundle)
+set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/${QUORL_LIBRARY_DIR})
+set(CMAKE_BUILD_WITH_INSTALL_RPATH ON)
 # From a program to our libraries, and from one of these to another.
-set(CMAKE_INSTALL_RPATH "$ORIGIN/../${CMAKE_INSTALL_LIBDIR}/quorl" "$ORIGIN")
+set(CMAKE_INSTALL_RPATH "$ORIGIN/../${QUORL_LIBRARY_DIR}" "$ORIGIN")
+# The same for a test that is linked to the plug-in, which hosts load from its bundle.
+set(QUORL_TEST_RPATH ${CMAKE_INSTALL_RPATH} "$ORIGIN/../${QUORL_BUNDLE_DIR}")
 
 if(NOT CMAKE_BUILD_TYPE)
   set(CMAKE_BUILD_TYPE RelWithDebInfo CACHE STRING "" FORCE)
