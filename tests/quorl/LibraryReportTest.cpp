@@ -35,6 +35,18 @@ TEST(LibraryReport, marksFoldersOfPlaylists) {
     EXPECT_THAT(quorl.output(), HasSubstr("Workout: 1 song, 1 MB, Workout (folder)\n"));
 }
 
+TEST(LibraryReport, namesSteerNoTerminal) {
+    const Music music;
+    music.folder().write("\x1B[2JList\xFF.m3u", "\x1B]0;title\a.mp3\n\xC2\x9B.mp3\n");
+    Program quorl({"--library", "--music", music.path()});
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_THAT(quorl.output(), HasSubstr("\uFFFD[2JList\uFFFD.m3u\n"));
+    EXPECT_TRUE(std::ranges::none_of(quorl.output(), [](char byte) {
+        return byte != '\n' && byte >= 0 && byte < ' ';
+    })) << quorl.output();
+    EXPECT_THAT(quorl.output(), testing::Not(HasSubstr("\u009B")));
+}
+
 TEST(LibraryReport, missingFolderEndsWithThreeAndSaysWhatToDo) {
     QuorlProcess quorl({"--library", "--music", "/nonexistent"});
     EXPECT_EQ(quorl.end(), 3);
