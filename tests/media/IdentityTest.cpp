@@ -53,7 +53,7 @@ TEST(IdentityTest, TheIdStaysWhateverThePlaylistSays) {
 TEST(IdentityTest, DifferentPathsHaveDifferentIds) {
     const TemporaryFolder folder;
     folder.write("a.m3u", "#PLAYLIST:Same\n");
-    folder.write("a.pls", "");
+    folder.write("a.pls", "[playlist]");
     folder.write("b/a.m3u", "#PLAYLIST:Same\n");
 
     EXPECT_NE(idOf(folder, "a.m3u"), idOf(folder, "a.pls"));

@@ -33,8 +33,10 @@ constexpr std::array explanations{
     Explanation{Reason::PlaylistUnreadable,
                 "The playlist cannot be read. Check its permissions and the disk."},
     Explanation{Reason::PlaylistTooLarge, "The playlist is larger than 64 MiB. Split it."},
-    Explanation{Reason::PlaylistBroken,
-                "The playlist is damaged. Save it again with the program that made it."},
+    Explanation{
+        Reason::PlaylistBroken,
+        "The playlist is damaged, or not in an encoding that is known. Save it again with the "
+        "program that made it, in UTF-8."},
     Explanation{Reason::TooManyEntries,
                 "The playlist lists more than a million entries, and those after are ignored. "
                 "Split it."},

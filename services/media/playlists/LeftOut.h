@@ -19,7 +19,8 @@ enum class Reason : std::uint8_t {
     NotMusic,            ///< Neither audio nor video by its content type; playlists are not either.
     PlaylistUnreadable,  ///< The playlist file could not be opened or read.
     PlaylistTooLarge,    ///< The playlist file has more than `maximumPlaylistBytes`.
-    PlaylistBroken,      ///< The playlist file is not well-formed, or not of its format at all.
+    PlaylistBroken,      ///< The playlist file is not well-formed, of its format, or in a known
+                         ///< encoding.
     TooManyEntries,      ///< The playlist lists more than `maximumEntries`; the rest is left out.
     SameAsAnother,       ///< Another playlist has the same path in another Unicode normalisation.
     DirectoryUnreadable, ///< A directory could not be opened or read; nothing below it is known.

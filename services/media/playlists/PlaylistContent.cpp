@@ -7,9 +7,10 @@
 #include <vector>
 
 #include <glib.h>
-#include <pugixml.hpp>
 
 #include "services/base/Utf8.h"
+#include "services/media/playlists/Encoding.h"
+#include "services/media/playlists/XmlPlaylist.h"
 
 namespace quorl::media {
 
@@ -32,10 +33,6 @@ bool equalsIgnoringCase(std::string_view left, std::string_view right) {
            g_ascii_strncasecmp(left.data(), right.data(), left.size()) == 0;
 }
 
-Generated generatedValue(std::string_view value) {
-    return base::trimmed(value) == "mix" ? Generated::Mix : Generated::Playlist;
-}
-
 /// Takes the marker from the text of a comment, the comment character left out.
 void readMarker(std::string_view comment, PlaylistContent& content) {
     constexpr std::string_view marker = "GENERATED";
@@ -46,21 +43,9 @@ void readMarker(std::string_view comment, PlaylistContent& content) {
     }
 }
 
-void addEntry(std::string_view entry, PlaylistContent& content) {
-    if (content.entries.size() == maximumEntries) {
-        content.truncated = true;
-    } else {
-        content.entries.add(base::toUtf8(entry));
-    }
-}
-
 /// Calls `use` with each line that has something in it, without the white space around it.
 template <class Use>
 void forEachLine(std::string_view bytes, Use use) {
-    constexpr std::string_view byteOrderMark = "\uFEFF";
-    if (bytes.starts_with(byteOrderMark)) {
-        bytes.remove_prefix(byteOrderMark.size());
-    }
     while (!bytes.empty()) {
         const std::size_t end = std::min(bytes.find_first_of("\r\n"), bytes.size());
         const std::string_view line = base::trimmed(bytes.substr(0, end));
@@ -71,8 +56,11 @@ void forEachLine(std::string_view bytes, Use use) {
     }
 }
 
-PlaylistContent parseM3u(std::string_view bytes) {
+std::optional<PlaylistContent> parseM3u(std::string_view bytes) {
     constexpr std::string_view nameDirective = "#PLAYLIST:";
+    if (base::trimmed(bytes).starts_with('<')) {
+        return std::nullopt; // a page that tells of an error was saved in place of the list
+    }
     PlaylistContent content;
     forEachLine(bytes, [&](std::string_view line) {
         if (line.starts_with(nameDirective)) {
@@ -80,7 +68,7 @@ PlaylistContent parseM3u(std::string_view bytes) {
         } else if (line.front() == '#') {
             readMarker(line.substr(1), content);
         } else {
-            addEntry(line, content);
+            content.add(line);
         }
     });
     return content;
@@ -98,13 +86,16 @@ std::optional<std::uint64_t> fileNumber(std::string_view key) {
     return result.ec == std::errc() && result.ptr == end ? std::optional(number) : std::nullopt;
 }
 
-PlaylistContent parsePls(std::string_view bytes) {
+std::optional<PlaylistContent> parsePls(std::string_view bytes) {
+    bool isPls = false;
     PlaylistContent content;
     std::vector<std::pair<std::uint64_t, std::string_view>> files;
     forEachLine(bytes, [&](std::string_view line) {
         const std::size_t equals = line.find('=');
         if (line.front() == '#' || line.front() == ';') {
             readMarker(line.substr(1), content);
+        } else if (equalsIgnoringCase(line, "[playlist]")) {
+            isPls = true;
         } else if (equals != std::string_view::npos) {
             if (const auto number = fileNumber(base::trimmed(line.substr(0, equals)))) {
                 files.emplace_back(*number, base::trimmed(line.substr(equals + 1)));
@@ -113,73 +104,43 @@ PlaylistContent parsePls(std::string_view bytes) {
     });
     std::ranges::stable_sort(files, {}, &std::pair<std::uint64_t, std::string_view>::first);
     for (const auto& [number, file] : files) {
-        addEntry(file, content);
+        content.add(file);
     }
-    return content;
+    return isPls || !files.empty() ? std::optional(std::move(content)) : std::nullopt;
 }
 
-/// Whether `node` is an element of this name, in whichever namespace prefix.
-bool isElement(const pugi::xml_node& node, std::string_view name) {
-    std::string_view ownName = node.name();
-    ownName.remove_prefix(std::min(ownName.find(':') + 1, ownName.size()));
-    return ownName == name;
+using Parse = std::optional<PlaylistContent>(std::string_view);
+
+/// What holds a NUL is no text.
+std::optional<PlaylistContent> parseUtf8(Parse* parse, std::string_view text) {
+    return text.find('\0') == std::string_view::npos ? parse(text) : std::nullopt;
 }
 
-std::string_view textOf(const pugi::xml_node& element) {
-    return base::trimmed(element.text().get());
-}
-
-/// The address of a track: its first location, or the first that is on this machine, for a track
-/// may list several places where the same song is found.
-std::string_view locationOf(const pugi::xml_node& track) {
-    std::string_view location;
-    for (const pugi::xml_node& child : track) {
-        if (!isElement(child, "location")) {
-            continue;
-        }
-        const std::string_view candidate = textOf(child);
-        const bool local =
-            candidate.starts_with("file:") || candidate.find("://") == std::string_view::npos;
-        if (local && !candidate.empty()) {
-            return candidate;
-        }
-        location = location.empty() ? candidate : location;
+std::optional<PlaylistContent> parseText(Parse* parse, std::string_view bytes) {
+    const Encoding encoding = encodingOfText(bytes);
+    bytes.remove_prefix(encoding.markSize);
+    if (encoding.name == "UTF-8") {
+        return parseUtf8(parse, bytes);
     }
-    return location;
-}
-
-void readTracks(const pugi::xml_node& trackList, PlaylistContent& content) {
-    for (const pugi::xml_node& track : trackList) {
-        if (isElement(track, "track")) {
-            addEntry(locationOf(track), content);
-        }
-    }
-}
-
-std::optional<PlaylistContent> parseXspf(std::string_view bytes) {
-    pugi::xml_document document;
-    if (!document.load_buffer(bytes.data(), bytes.size())) {
-        return std::nullopt;
-    }
-    const pugi::xml_node playlist = document.document_element();
-    if (!isElement(playlist, "playlist")) {
-        return std::nullopt;
-    }
-    PlaylistContent content;
-    for (const pugi::xml_node& child : playlist) {
-        if (isElement(child, "title")) {
-            content.name = base::toUtf8(textOf(child));
-        } else if (isElement(child, "meta") &&
-                   child.attribute("rel").value() == std::string_view("urn:quorl:generated")) {
-            content.generated = generatedValue(textOf(child));
-        } else if (isElement(child, "trackList")) {
-            readTracks(child, content);
-        }
-    }
-    return content;
+    const auto text = converted(bytes, encoding.name);
+    return text ? parseUtf8(parse, *text) : std::nullopt;
 }
 
 } // namespace
+
+void PlaylistContent::add(std::string_view entry) {
+    constexpr std::size_t maximumBytes = 2 * maximumPlaylistBytes; // more only by an `xml:base`
+    const std::string text = base::toUtf8(entry);
+    truncated = truncated || entries.size() == maximumEntries ||
+                text.size() > maximumBytes - entries.bytes();
+    if (!truncated) {
+        entries.add(text);
+    }
+}
+
+Generated generatedValue(std::string_view value) {
+    return base::trimmed(value) == "mix" ? Generated::Mix : Generated::Playlist;
+}
 
 std::optional<Format> playlistFormat(std::string_view fileName) {
     const std::size_t dot = fileName.rfind('.');
@@ -198,13 +159,13 @@ std::optional<PlaylistContent> parsePlaylist(Format format, std::string_view byt
     std::optional<PlaylistContent> content;
     switch (format) {
     case Format::M3u:
-        content = parseM3u(bytes);
+        content = parseText(&parseM3u, bytes);
         break;
     case Format::Pls:
-        content = parsePls(bytes);
+        content = parseText(&parsePls, bytes);
         break;
     case Format::Xspf:
-        content = parseXspf(bytes);
+        content = parseXmlPlaylist(bytes);
         break;
     }
     if (content) {

@@ -32,16 +32,24 @@ struct PlaylistContent {
     /// The entries as they are written, in UTF-8, in order. An empty one is a track without
     /// address.
     TextList entries;
-    /// There were more than `maximumEntries`.
+    /// There were more than `maximumEntries`, or more text than a playlist file can hold.
     bool truncated = false;
+
+    /// Appends an entry, which need not be valid UTF-8, as far as there is room.
+    void add(std::string_view entry);
 };
 
 /// The format that a file of this name has by its extension, in any case; null: not a playlist.
 [[nodiscard]] std::optional<Format> playlistFormat(std::string_view fileName);
 
-/// Reads the bytes of a playlist file. Any bytes are safe. They are UTF-8, with or without
-/// byte-order mark, each text that is not valid UTF-8 being taken as Latin-1; XML may declare
-/// another encoding. Null: the bytes are not a playlist of this format, which only happens to XML.
+/// What the text of a marker means: `Generated::Playlist` unless it is known.
+[[nodiscard]] Generated generatedValue(std::string_view value);
+
+/// Reads the bytes of a playlist file. Any bytes are safe. They are UTF-8, UTF-16 or UTF-32, with
+/// byte-order mark or plainly so; XML may declare another encoding. What claims to be UTF-8 is
+/// taken as Latin-1 text by text where it is not valid.
+///
+/// Null: the bytes are not a playlist of this format, so that nobody takes them for an empty one.
 [[nodiscard]] std::optional<PlaylistContent> parsePlaylist(Format format, std::string_view bytes);
 
 } // namespace quorl::media

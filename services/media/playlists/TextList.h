@@ -15,6 +15,9 @@ class TextList {
   public:
     [[nodiscard]] std::uint32_t size() const { return static_cast<std::uint32_t>(ends_.size()); }
 
+    /// Of all texts together.
+    [[nodiscard]] std::size_t bytes() const { return text_.size(); }
+
     /// The text at `index`, which is below `size()`. Valid until the next `add` or `shrink`.
     [[nodiscard]] std::string_view operator[](std::uint32_t index) const;
 
