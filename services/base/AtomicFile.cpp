@@ -58,9 +58,12 @@ void syncToDevice(int descriptor) {
 void replaceFile(int directory, const std::string& name, std::string_view text) {
     const auto temporary = "." + name + ".new";
     constexpr mode_t forEverybodyToRead = 0644;
+    // What is left of an earlier try may be anything by now, even a pipe that would be waited for.
+    if (unlinkat(directory, temporary.c_str(), 0) != 0 && errno != ENOENT) {
+        fail(name);
+    }
     const FileDescriptor file{openat(directory, temporary.c_str(),
-                                     O_WRONLY | O_CREAT | O_TRUNC | O_NOFOLLOW | O_CLOEXEC,
-                                     forEverybodyToRead)};
+                                     O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, forEverybodyToRead)};
     if (!file) {
         fail(name);
     }

@@ -3,9 +3,11 @@
 #include <algorithm>
 #include <charconv>
 
+#include <fcntl.h>
 #include <nlohmann/json.hpp>
 
 #include "services/base/AtomicFile.h"
+#include "services/base/FileStatus.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
@@ -118,6 +120,22 @@ Manifest manifestOf(const json& value) {
                       fileName + " from it to begin anew; the music that is on it then stays."};
 }
 
+/// The device may have been in other hands: what could be waited for without end, or would fill the
+/// memory, is not read.
+void checkFile(int root, const std::string& path) {
+    constexpr off_t maximumBytes = off_t{64} << 20;
+    base::FileStatus status{};
+    if (fstatat(root, path.c_str(), &status, AT_SYMLINK_NOFOLLOW) != 0) {
+        return; // reading it tells why, unless there is none
+    }
+    if (!S_ISREG(status.st_mode)) {
+        reject("it is not a regular file");
+    }
+    if (status.st_size > maximumBytes) {
+        reject("it is larger than 64 MiB");
+    }
+}
+
 } // namespace
 
 std::string toText(const Manifest& manifest) {
@@ -149,7 +167,9 @@ Manifest parseManifest(std::string_view text) {
 }
 
 Manifest loadManifest(int root) {
-    return parseManifest(base::readFile(root, std::string{ownDirectory} + "/" + fileName));
+    const auto path = std::string{ownDirectory} + "/" + fileName;
+    checkFile(root, path);
+    return parseManifest(base::readFile(root, path));
 }
 
 void saveManifest(int root, const Manifest& manifest) {

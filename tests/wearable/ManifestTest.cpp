@@ -2,10 +2,12 @@
 
 #include "services/wearable/Manifest.h"
 
+#include <fstream>
 #include <limits>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include "services/base/AtomicFile.h"
 #include "services/wearable/Attachment.h"
@@ -62,6 +64,61 @@ TEST(Manifest, ThatIsBrokenSaysWhatToDo) {
             EXPECT_THAT(error.what(), HasSubstr("Remove the file .quorl/manifest.json"));
         }
     }
+}
+
+/// Why the manifest of `device` is rejected.
+std::string rejectionOf(const TemporaryDirectory& device) {
+    try {
+        static_cast<void>(loadManifest(quorl::base::openRoot(device.path().c_str()).get()));
+    } catch (const BadManifest& error) {
+        return error.what();
+    }
+    return {};
+}
+
+TEST(Manifest, ThatIsNoFileIsRejectedAndNotWaitedFor) {
+    const TemporaryDirectory device;
+    const auto manifest = device.path() / ".quorl/manifest.json";
+    std::filesystem::create_directory(device.path() / ".quorl");
+    ASSERT_EQ(mkfifo(manifest.c_str(), 0644), 0);
+    EXPECT_THAT(rejectionOf(device), HasSubstr("not a regular file"));
+
+    std::filesystem::remove(manifest);
+    std::filesystem::create_directory(manifest);
+    EXPECT_THAT(rejectionOf(device), HasSubstr("not a regular file"));
+
+    std::filesystem::remove(manifest);
+    std::filesystem::create_symlink("/dev/zero", manifest);
+    EXPECT_THAT(rejectionOf(device), HasSubstr("not a regular file"));
+}
+
+TEST(Manifest, OfAGigabyteIsRejectedUnread) {
+    const TemporaryDirectory device;
+    std::filesystem::create_directory(device.path() / ".quorl");
+    const auto manifest = device.path() / ".quorl/manifest.json";
+    std::ofstream{manifest}.close();
+    std::filesystem::resize_file(manifest, std::uintmax_t{1} << 30);
+
+    EXPECT_THAT(rejectionOf(device), HasSubstr("larger than 64 MiB"));
+}
+
+TEST(Manifest, IsWrittenPastAPipeThatLiesInTheWay) {
+    const TemporaryDirectory device;
+    std::filesystem::create_directory(device.path() / ".quorl");
+    ASSERT_EQ(mkfifo((device.path() / ".quorl/.manifest.json.new").c_str(), 0644), 0);
+    const auto root = quorl::base::openRoot(device.path().c_str());
+
+    saveManifest(root.get(), everything());
+
+    EXPECT_EQ(loadManifest(root.get()), everything());
+}
+
+TEST(Manifest, KeepsTheEarliestAndTheLatestTime) {
+    auto manifest = everything();
+    manifest.strays.front().modified = std::numeric_limits<std::int64_t>::min();
+    manifest.songs.front().modified = std::numeric_limits<std::int64_t>::max();
+
+    EXPECT_EQ(parseManifest(toText(manifest)), manifest);
 }
 
 TEST(Manifest, IsNotWrittenThroughALinkThatLeadsOffTheWearable) {
