@@ -1,8 +1,8 @@
 #include "quorl-syncd/transfer/Device.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
-#include <cstdlib>
 #include <memory>
 #include <optional>
 #include <system_error>
@@ -75,8 +75,10 @@ std::optional<FileState> fileAt(int directory, const std::string& name) {
 
 /// FAT keeps times to two seconds.
 bool isSameTime(std::int64_t first, std::int64_t second) {
-    constexpr std::int64_t tolerance = 2'000'000'000;
-    return std::llabs(first - second) <= tolerance;
+    constexpr std::uint64_t tolerance = 2'000'000'000;
+    const auto [earlier, later] = std::minmax({first, second});
+    // Unsigned, for a manifest may name times that are further apart than an int64_t can say.
+    return static_cast<std::uint64_t>(later) - static_cast<std::uint64_t>(earlier) <= tolerance;
 }
 
 } // namespace
