@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <cstdlib>
-#include <fstream>
 
 #include <dlfcn.h>
 #include <nlohmann/json.hpp>
@@ -27,18 +26,25 @@ std::string textField(const json& object, const char* name, const std::filesyste
 }
 
 json readObject(const std::filesystem::path& file) {
-    std::ifstream stream(file);
-    std::error_code ignored; // what is no file can be opened, but reading it throws
-    if (!stream || !std::filesystem::is_regular_file(file, ignored)) {
-        throw BundleError(file,
-                          "this file is missing or cannot be read; install the plug-in again");
-    }
-    auto object = json::parse(stream, nullptr, false);
+    constexpr std::size_t maximumBytes = std::size_t{1} << 20;
+    auto object = json::parse(readBundleFile(file, maximumBytes), nullptr, false);
     if (!object.is_object()) {
         throw BundleError(file, "this file is damaged: it is not a JSON object; "
                                 "install the plug-in again");
     }
     return object;
+}
+
+Digests digests(const json& object, const std::filesystem::path& file) {
+    const auto field = object.find("sha256");
+    const bool isTexts =
+        field != object.end() && field->is_object() &&
+        std::ranges::all_of(*field, [](const json& digest) { return digest.is_string(); });
+    if (!isTexts) {
+        throw BundleError(file, "the field \"sha256\" is missing or not an object of texts; "
+                                "install the plug-in again");
+    }
+    return field->get<Digests>();
 }
 
 int interfaceVersion(const json& object, const std::filesystem::path& file) {
@@ -70,18 +76,21 @@ std::shared_ptr<PluginBundle> PluginBundle::open(const std::filesystem::path& di
         throw BundleError(file, "the field \"library\" must name a file of the bundle itself; "
                                 "install the plug-in again");
     }
+    registration.digests = digests(object, file);
     return std::make_shared<PluginBundle>(directory, std::move(registration));
 }
 
 PluginBundle::PluginBundle(std::filesystem::path directory, Registration registration)
     : directory_(std::move(directory)),
       registration_(std::move(registration)),
-      strings_(directory_ / "locale") {}
+      files_(directory_, registration_.digests),
+      strings_(files_) {}
 
 void PluginBundle::load() const {
     if (handle_) {
         return;
     }
+    (void)files_.read(registration_.library);
     const auto file = std::filesystem::absolute(directory_ / registration_.library);
     if (const auto problem = problemOfSharedObject(file)) {
         throw BundleError(file, *problem);

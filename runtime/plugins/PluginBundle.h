@@ -1,25 +1,13 @@
 #pragma once
 
 #include <filesystem>
-#include <stdexcept>
 
 #include "platform/Foundation.h"
+#include "runtime/plugins/BundleError.h"
+#include "runtime/plugins/BundleFiles.h"
 #include "runtime/plugins/StringTable.h"
 
 namespace quorl {
-
-/// What is wrong with a bundle.
-class BundleError : public std::runtime_error {
-  public:
-    BundleError(std::filesystem::path file, const std::string& problem)
-        : std::runtime_error(file.string() + ": " + problem), file_(std::move(file)) {}
-
-    /// The file that the problem is in.
-    [[nodiscard]] const std::filesystem::path& file() const { return file_; }
-
-  private:
-    std::filesystem::path file_;
-};
 
 /// What a bundle says of itself in its file `registration.json`.
 struct Registration {
@@ -27,6 +15,9 @@ struct Registration {
     std::string rootClass;
     std::string library; ///< the shared object, a file of the bundle's directory
     int interfaceVersion = 0;
+    /// Of every other file of the bundle. What is not among them is not used: a bundle without
+    /// digests is refused, though its interface version, which is about declarations, may fit.
+    Digests digests;
 };
 
 /// A plug-in: a directory named `*.bundle` with a registration, a shared object and string tables.
@@ -45,7 +36,8 @@ class PluginBundle : public NSBundle {
 
     /// The class that the registration names, loaded from the shared object at the first call. Code
     /// that was loaded stays for the life of the process. Throws `BundleError` where the shared
-    /// object is missing, damaged, cannot be loaded, or does not offer that class.
+    /// object is missing, damaged, not the one that was made with the registration, cannot be
+    /// loaded, or does not offer that class.
     [[nodiscard]] Class rootClass() const;
 
     /// A class that the shared object, which `rootClass` has loaded, exports under this name; null
@@ -67,6 +59,7 @@ class PluginBundle : public NSBundle {
 
     std::filesystem::path directory_;
     Registration registration_;
+    BundleFiles files_;
     StringTable strings_;
     mutable void* handle_ = nullptr;
 };

@@ -2,10 +2,13 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <iostream>
 #include <stdexcept>
 
-#include <boost/locale/generator.hpp>
+#include <boost/locale/gnu_gettext.hpp>
 #include <boost/locale/message.hpp>
+
+#include "runtime/plugins/BundleError.h"
 
 namespace quorl {
 
@@ -36,9 +39,23 @@ std::string languageName(std::string_view tag) {
     return isPath || name == "C" || name == "POSIX" ? std::string() : name;
 }
 
-/// "sr_RS@latin" as a locale of UTF-8: "sr_RS.UTF-8@latin".
-std::string localeName(std::string language) {
-    return language.insert(std::min(language.find('@'), language.size()), ".UTF-8");
+using Messages = boost::locale::message_format<char>;
+
+/// The catalogue in the `bytes` of `file`, whose language makes no difference.
+std::locale localeWith(const std::string& bytes, const std::filesystem::path& file) {
+    boost::locale::gnu_gettext::messages_info info;
+    info.encoding = "UTF-8";
+    info.domains.emplace_back("default");
+    info.paths.emplace_back();
+    info.callback = [&bytes](const std::string& /*file*/, const std::string& /*encoding*/) {
+        return std::vector<char>(bytes.begin(), bytes.end());
+    };
+    try {
+        return {std::locale::classic(),
+                boost::locale::gnu_gettext::create_messages_facet<char>(info)};
+    } catch (const std::runtime_error& error) {
+        throw BundleError(file, std::string(error.what()) + "; install the plug-in again");
+    }
 }
 
 const char* environmentValue(std::initializer_list<const char*> names) {
@@ -71,16 +88,12 @@ std::vector<std::string> environmentLanguages() {
 const std::locale* StringTable::catalogue(const std::string& language,
                                           const std::string& domain) const {
     auto [entry, isNew] = catalogues_.try_emplace({language, domain});
-    const auto file = directory_ / language / "LC_MESSAGES" / (domain + ".mo");
-    if (std::error_code ignored; isNew && std::filesystem::exists(file, ignored)) {
-        boost::locale::generator generator;
-        generator.categories(boost::locale::message_facet);
-        generator.add_messages_path(directory_.string());
-        generator.add_messages_domain(domain);
+    const auto file = "locale/" + language + "/LC_MESSAGES/" + domain + ".mo";
+    if (isNew && files_.has(file)) {
         try {
-            entry->second = generator(localeName(language));
-        } catch (const std::runtime_error&) {
-            // A damaged catalogue counts as none: whoever asks for a text has a default for it.
+            entry->second = localeWith(files_.read(file), files_.path(file));
+        } catch (const BundleError& error) {
+            std::clog << error.what() << std::endl;
         }
     }
     return entry->second ? &*entry->second : nullptr;
@@ -95,7 +108,6 @@ std::optional<std::string> StringTable::text(const std::vector<std::string>& lan
     for (const std::string& language : languages) {
         for (const std::string& name : namesFor(languageName(language))) {
             if (const std::locale* locale = catalogue(name, domain)) {
-                using Messages = boost::locale::message_format<char>;
                 const char* text = std::use_facet<Messages>(*locale).get(0, nullptr, key.c_str());
                 return text ? std::optional<std::string>(text) : std::nullopt;
             }

@@ -1,23 +1,26 @@
 #pragma once
 
-#include <filesystem>
 #include <locale>
 #include <map>
 #include <optional>
 #include <string>
 #include <vector>
 
+#include "runtime/plugins/BundleFiles.h"
+
 namespace quorl {
 
-/// A bundle's texts: one gettext catalogue for each language, `<language>/LC_MESSAGES/<domain>.mo`
-/// in a directory, with keys as message ids. No locale needs to be installed for a language. Main
-/// thread.
+/// A bundle's texts: one gettext catalogue for each language,
+/// `locale/<language>/LC_MESSAGES/<domain>.mo`, with keys as message ids. A damaged one counts as
+/// none, for whoever asks for a text has a default for it; that is told on the standard error
+/// stream once. No locale needs to be installed for a language. Main thread.
 class StringTable {
   public:
     /// The domain of a bundle's default table.
     static constexpr const char* defaultDomain = "default";
 
-    explicit StringTable(std::filesystem::path directory) : directory_(std::move(directory)) {}
+    /// `files` outlive the table.
+    explicit StringTable(const BundleFiles& files) : files_(files) {}
 
     /// The text for `key` in the first of `languages` that has a catalogue; "de_AT" is served by
     /// "de" too, and "en" ends the search. Null where that catalogue lacks the key.
@@ -29,7 +32,7 @@ class StringTable {
     [[nodiscard]] const std::locale* catalogue(const std::string& language,
                                                const std::string& domain) const;
 
-    std::filesystem::path directory_;
+    const BundleFiles& files_;
     mutable std::map<std::pair<std::string, std::string>, std::optional<std::locale>> catalogues_;
 };
 

@@ -7,9 +7,13 @@
 
 #include <elf.h>
 #include <gmock/gmock.h>
+#include <nlohmann/json.hpp>
+#include <sys/stat.h>
 
 #include "platform/InterfaceVersion.h"
 #include "runtime/plugins/PluginBundle.h"
+#include "tests/runtime/Digests.h"
+#include "tests/support/Damage.h"
 #include "tests/support/TestHost.h"
 #include "tests/wearable/TemporaryDirectory.h"
 
@@ -17,6 +21,7 @@ namespace {
 
 using quorl::BundleError;
 using quorl::PluginBundle;
+using quorl::tests::bytesOf;
 using quorl::tests::TestHost;
 using quorl::wearable::testing::TemporaryDirectory;
 using std::filesystem::path;
@@ -28,11 +33,6 @@ using testing::StartsWith;
 const path builtPlugin = TEST_PLUGIN;
 const path builtTexts = TEST_TEXTS;
 
-std::string contentOf(const path& file) {
-    std::ifstream stream(file, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
-}
-
 void write(const path& file, const std::string& content) {
     std::ofstream(file, std::ios::binary) << content;
 }
@@ -41,11 +41,16 @@ class OfThisProgram : public NSObject {};
 
 class Bundles : public testing::Test {
   protected:
-    /// A registration in good order, but for what is replaced in its text.
-    static std::string registration(const std::string& replaced = {},
-                                    const std::string& replacement = {}) {
+    /// A registration in good order, with the digests that the files of the bundle have now, but
+    /// for what is replaced in its text.
+    [[nodiscard]] std::string registration(const std::string& replaced = {},
+                                           const std::string& replacement = {}) const {
+        auto digests = quorl::tests::digestsOfTexts(bundle_);
+        digests["libTestPlugin.so"] = quorl::sha256(bytesOf(library_));
         std::string text = R"({"identifier": "org.quorl.test", "interfaceVersion": VERSION,)"
-                           R"( "library": "libTestPlugin.so", "rootClass": "TestPane"})";
+                           R"( "library": "libTestPlugin.so", "rootClass": "TestPane",)"
+                           R"( "sha256": )" +
+                           nlohmann::json(digests).dump() + "}";
         text.replace(text.find("VERSION"), 7, std::to_string(QuorlInterfaceVersion));
         if (!replaced.empty()) {
             text.replace(text.find(replaced), replaced.size(), replacement);
@@ -79,6 +84,13 @@ class Bundles : public testing::Test {
     [[nodiscard]] std::string problemOfRegistration(const std::string& text) const {
         write(registration_, text);
         return problemIn(registration_, [this] { (void)PluginBundle::open(bundle_); });
+    }
+
+    /// Of `bytes` in the place of the shared object, with which the plug-in was made.
+    [[nodiscard]] std::string problemOfLibrary(const std::string& bytes) const {
+        write(library_, bytes);
+        write(registration_, registration());
+        return problemOfLibrary();
     }
 
     [[nodiscard]] std::string problemOfLibrary() const {
@@ -190,6 +202,47 @@ TEST_F(Bundles, WhoseRegistrationIsADirectoryAreRefused) {
                 HasSubstr("install the plug-in again"));
 }
 
+TEST_F(Bundles, WhoseRegistrationIsAPipeOrADeviceAreRefusedAndNotWaitedFor) {
+    std::filesystem::create_directories(bundle_);
+    const auto open = [this] { (void)PluginBundle::open(bundle_); };
+    ASSERT_EQ(mkfifo(registration_.c_str(), 0644), 0);
+    EXPECT_THAT(problemIn(registration_, open), HasSubstr("install the plug-in again"));
+
+    std::filesystem::remove(registration_);
+    std::filesystem::create_symlink("/dev/zero", registration_);
+    EXPECT_THAT(problemIn(registration_, open), HasSubstr("install the plug-in again"));
+}
+
+TEST_F(Bundles, WhoseRegistrationIsAGigabyteAreRefusedUnread) {
+    makeBundle();
+    std::filesystem::resize_file(registration_, std::uintmax_t{1} << 30);
+
+    EXPECT_THAT(problemIn(registration_, [this] { (void)PluginBundle::open(bundle_); }),
+                HasSubstr("larger than any of its kind"));
+}
+
+TEST_F(Bundles, WhoseRegistrationWasDamagedAreRefusedOrOpened) {
+    makeBundle();
+    const std::string whole = registration();
+    quorl::tests::Damage damage;
+
+    for (int count = 0; count < 1000; ++count) {
+        write(registration_, damage.of(whole));
+        try {
+            EXPECT_FALSE(PluginBundle::open(bundle_)->registration().rootClass.empty());
+        } catch (const BundleError& error) {
+            EXPECT_EQ(error.file(), registration_);
+        }
+    }
+}
+
+TEST(Digest, IsThatOfTheStandard) {
+    EXPECT_EQ(quorl::sha256(""),
+              "e3b0c44298fc1c149afbf4c8996fb92427ae41e4649b934ca495991b7852b855");
+    EXPECT_EQ(quorl::sha256("abc"),
+              "ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad");
+}
+
 TEST_F(Bundles, WhoseRegistrationWasCutShortAreRefusedAtEveryLength) {
     makeBundle();
     const std::string whole = registration();
@@ -202,7 +255,8 @@ TEST_F(Bundles, WhoseRegistrationWasCutShortAreRefusedAtEveryLength) {
 TEST_F(Bundles, ThatLackAFieldAreRefusedWithItsName) {
     makeBundle();
 
-    for (const std::string field : {"identifier", "interfaceVersion", "library", "rootClass"}) {
+    for (const std::string field :
+         {"identifier", "interfaceVersion", "library", "rootClass", "sha256"}) {
         EXPECT_THAT(problemOfRegistration(registration('"' + field + '"', "\"other\"")),
                     HasSubstr('"' + field + '"'));
     }
@@ -249,31 +303,33 @@ TEST_F(Bundles, WithoutTheirLibraryAreNotLoaded) {
 
     std::filesystem::create_directory(library_);
     EXPECT_THAT(problemOfLibrary(), HasSubstr("missing"));
+
+    std::filesystem::remove(library_);
+    ASSERT_EQ(mkfifo(library_.c_str(), 0644), 0);
+    EXPECT_THAT(problemOfLibrary(), HasSubstr("missing"));
 }
 
 TEST_F(Bundles, WhoseLibraryWasCutShortAreNotLoadedAtAnyLength) {
     makeBundle();
-    const std::string whole = contentOf(builtPlugin);
+    const std::string whole = bytesOf(builtPlugin);
     std::vector<std::size_t> lengths{0, 1, 4, 16, 63, 64, 65, whole.size() / 2, whole.size() - 1};
     for (std::size_t length = 100; length < whole.size(); length += whole.size() / 50) {
         lengths.push_back(length);
     }
 
     for (const std::size_t length : lengths) {
-        write(library_, whole.substr(0, length));
-        EXPECT_THAT(problemOfLibrary(), HasSubstr("damaged")) << length;
+        EXPECT_THAT(problemOfLibrary(whole.substr(0, length)), HasSubstr("damaged")) << length;
     }
 }
 
 TEST_F(Bundles, WhoseLibraryNamesMoreThanItHoldsAreNotLoaded) {
     makeBundle();
-    std::string longer = contentOf(builtPlugin);
+    std::string longer = bytesOf(builtPlugin);
     auto* const header = reinterpret_cast<Elf64_Ehdr*>(longer.data());
     auto* const segment = reinterpret_cast<Elf64_Phdr*>(longer.data() + header->e_phoff);
     for (const auto field : {&Elf64_Phdr::p_offset, &Elf64_Phdr::p_filesz}) {
         const auto sound = std::exchange(segment->*field, longer.size() + 1);
-        write(library_, longer);
-        EXPECT_THAT(problemOfLibrary(), HasSubstr("its end is missing"));
+        EXPECT_THAT(problemOfLibrary(longer), HasSubstr("its end is missing"));
         segment->*field = sound;
     }
 }
@@ -290,21 +346,39 @@ TEST_F(Bundles, WhoseLibraryIsSomethingElseAreNotLoaded) {
                                        "\x7f"
                                        "ELF" +
                                            garbage}) {
-        write(library_, content);
-        EXPECT_THAT(problemOfLibrary(), HasSubstr("install the plug-in"));
+        EXPECT_THAT(problemOfLibrary(content), HasSubstr("install the plug-in"));
     }
-    std::filesystem::copy("/proc/self/exe", library_,
-                          std::filesystem::copy_options::overwrite_existing);
-    EXPECT_THAT(problemOfLibrary(), HasSubstr("install the plug-in again"));
+    EXPECT_THAT(problemOfLibrary(bytesOf("/proc/self/exe")),
+                HasSubstr("install the plug-in again"));
+}
+
+TEST_F(Bundles, WhoseLibraryWasDamagedAreNotLoadedWhateverTheDamage) {
+    makeBundle();
+    const std::string whole = bytesOf(builtPlugin);
+    const auto opened = PluginBundle::open(bundle_);
+    quorl::tests::Damage damage;
+
+    for (int count = 0; count < 1000; ++count) {
+        write(library_, damage.of(whole));
+        ASSERT_THAT(problemIn(library_, [&opened] { (void)opened->rootClass(); }),
+                    HasSubstr("not the one that the plug-in was made with; install the plug-in"))
+            << count;
+    }
+}
+
+TEST_F(Bundles, WhoseLibraryWasNeverRecordedAreNotLoaded) {
+    makeBundle();
+    write(registration_, registration("\"libTestPlugin.so\":", "\"other.so\":"));
+
+    EXPECT_THAT(problemOfLibrary(), HasSubstr("not the one"));
 }
 
 TEST_F(Bundles, ForAnotherKindOfMachineAreNotLoaded) {
     makeBundle();
-    std::string foreign = contentOf(builtPlugin);
+    std::string foreign = bytesOf(builtPlugin);
     foreign[offsetof(Elf64_Ehdr, e_machine)] = EM_68K;
-    write(library_, foreign);
 
-    EXPECT_THAT(problemOfLibrary(), HasSubstr("another kind of machine"));
+    EXPECT_THAT(problemOfLibrary(foreign), HasSubstr("another kind of machine"));
 }
 
 TEST_F(Bundles, WithoutTheClassThatTheyNameAreNotLoaded) {

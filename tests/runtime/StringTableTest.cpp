@@ -2,15 +2,25 @@
 
 #include <cstdlib>
 #include <fstream>
+#include <functional>
 
 #include <gmock/gmock.h>
 
+#include "tests/runtime/Digests.h"
+#include "tests/support/Damage.h"
 #include "tests/wearable/TemporaryDirectory.h"
 
 namespace {
 
+using quorl::BundleFiles;
+using quorl::Digests;
 using quorl::StringTable;
+using quorl::tests::bytesOf;
+using quorl::tests::digestsOfTexts;
+using quorl::wearable::testing::TemporaryDirectory;
 using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
 
 class StringTables : public testing::Test {
   protected:
@@ -19,7 +29,40 @@ class StringTables : public testing::Test {
         return table_.text(languages, StringTable::defaultDomain, key);
     }
 
-    StringTable table_{TEST_TEXTS};
+    const std::filesystem::path bundle_ = std::filesystem::path(TEST_TEXTS).parent_path();
+    BundleFiles files_{bundle_, digestsOfTexts(bundle_)};
+    StringTable table_{files_};
+};
+
+/// The bundle of a test that changes its German table.
+class DamagedStringTables : public testing::Test {
+  protected:
+    DamagedStringTables() {
+        std::filesystem::create_directory(bundle_.path() / "locale");
+        std::filesystem::copy(std::filesystem::path(TEST_TEXTS) / "de",
+                              bundle_.path() / "locale/de",
+                              std::filesystem::copy_options::recursive);
+    }
+
+    void write(std::string_view bytes) const {
+        std::ofstream(bundle_.path() / germanTable, std::ios::binary | std::ios::trunc) << bytes;
+    }
+
+    [[nodiscard]] std::optional<std::string> title(const Digests& digests) const {
+        const BundleFiles files(bundle_.path(), digests);
+        return StringTable(files).text({"de"}, StringTable::defaultDomain, "TITLE");
+    }
+
+    /// What is told on the standard error stream while `act` runs.
+    static std::string told(const std::function<void()>& act) {
+        testing::internal::CaptureStderr();
+        act();
+        return testing::internal::GetCapturedStderr();
+    }
+
+    static constexpr const char* germanTable = "locale/de/LC_MESSAGES/default.mo";
+
+    TemporaryDirectory bundle_;
 };
 
 TEST_F(StringTables, GiveTheTextOfTheFirstLanguageThatHasACatalogue) {
@@ -56,10 +99,13 @@ TEST_F(StringTables, HaveNoTextInALanguageWithoutACatalogue) {
 }
 
 TEST_F(StringTables, ShowNoOtherLanguageToWhoPrefersEnglish) {
-    quorl::wearable::testing::TemporaryDirectory withoutEnglish;
-    std::filesystem::copy(std::filesystem::path(TEST_TEXTS) / "de", withoutEnglish.path() / "de",
+    TemporaryDirectory withoutEnglish;
+    std::filesystem::create_directory(withoutEnglish.path() / "locale");
+    std::filesystem::copy(std::filesystem::path(TEST_TEXTS) / "de",
+                          withoutEnglish.path() / "locale/de",
                           std::filesystem::copy_options::recursive);
-    const StringTable table(withoutEnglish.path());
+    const BundleFiles files(withoutEnglish.path(), digestsOfTexts(withoutEnglish.path()));
+    const StringTable table(files);
 
     EXPECT_EQ(table.text({"en_GB", "de"}, StringTable::defaultDomain, "TITLE"), std::nullopt);
     EXPECT_EQ(table.text({"fr", "de"}, StringTable::defaultDomain, "TITLE"), "Ein Titel");
@@ -76,14 +122,49 @@ TEST_F(StringTables, KeepTheirDomainsApart) {
     EXPECT_EQ(table_.text({"de"}, "other", "TITLE"), std::nullopt);
 }
 
-TEST_F(StringTables, HaveNoTextWhereTheCatalogueIsDamaged) {
-    quorl::wearable::testing::TemporaryDirectory damaged;
-    const auto directory = damaged.path() / "de" / "LC_MESSAGES";
-    std::filesystem::create_directories(directory);
-    std::ofstream(directory / "default.mo") << "this is no catalogue";
-    const StringTable table(damaged.path());
+TEST_F(DamagedStringTables, CountAsNoneAndAreToldOnce) {
+    const Digests digests = digestsOfTexts(bundle_.path());
+    EXPECT_THAT(told([&] { EXPECT_EQ(title(digests), "Ein Titel"); }), IsEmpty());
+    write(bytesOf(bundle_.path() / germanTable) + "\n");
 
-    EXPECT_EQ(table.text({"de"}, StringTable::defaultDomain, "TITLE"), std::nullopt);
+    const BundleFiles files(bundle_.path(), digests);
+    const StringTable table(files);
+    const auto ask = [&] {
+        EXPECT_EQ(table.text({"de"}, StringTable::defaultDomain, "TITLE"), std::nullopt);
+    };
+
+    EXPECT_THAT(told(ask), testing::AllOf(HasSubstr((bundle_.path() / germanTable).string()),
+                                          HasSubstr("install the plug-in again")));
+    EXPECT_THAT(told(ask), IsEmpty());
+}
+
+TEST_F(DamagedStringTables, CountAsNoneWhereTheyAreMissingOrWereNeverRecorded) {
+    const Digests digests = digestsOfTexts(bundle_.path());
+
+    EXPECT_THAT(told([&] { EXPECT_EQ(title({}), std::nullopt); }), HasSubstr("default.mo"));
+    std::filesystem::remove(bundle_.path() / germanTable);
+    EXPECT_THAT(told([&] { EXPECT_EQ(title(digests), std::nullopt); }), HasSubstr("missing"));
+    EXPECT_THAT(told([&] { EXPECT_EQ(title({}), std::nullopt); }), IsEmpty());
+}
+
+TEST_F(DamagedStringTables, CountAsNoneWhereTheyWereNoCatalogueFromTheStart) {
+    write("this is no catalogue");
+
+    EXPECT_THAT(told([&] { EXPECT_EQ(title(digestsOfTexts(bundle_.path())), std::nullopt); }),
+                HasSubstr("default.mo: "));
+}
+
+TEST_F(DamagedStringTables, NeverCrashWhateverTheDamage) {
+    const Digests digests = digestsOfTexts(bundle_.path());
+    const std::string whole = bytesOf(bundle_.path() / germanTable);
+    quorl::tests::Damage damage;
+
+    static_cast<void>(told([&] {
+        for (int count = 0; count < 1000; ++count) {
+            write(damage.of(whole));
+            ASSERT_EQ(title(digests), std::nullopt) << count;
+        }
+    }));
 }
 
 class EnvironmentLanguages : public testing::Test {
