@@ -22,7 +22,7 @@ namespace quorl::media {
 namespace {
 
 /// The coarsest clock among common file systems (FAT) ticks every two seconds.
-constexpr std::int64_t settlingTime = 2'000'000'000;
+constexpr std::int64_t quietTime = 2'000'000'000;
 
 struct CloseDirectory {
     void operator()(DIR* stream) const { closedir(stream); }
@@ -35,10 +35,10 @@ PlaylistFile::State stateOf(const base::FileStatus& status) {
             base::nanoseconds(status.st_mtim), base::nanoseconds(status.st_ctim)};
 }
 
-bool isSettled(const PlaylistFile::State& state) {
+bool isQuiet(const PlaylistFile::State& state) {
     timespec now{};
     clock_gettime(CLOCK_REALTIME, &now);
-    return std::max(state.modified, state.changed) < base::nanoseconds(now) - settlingTime;
+    return std::max(state.modified, state.changed) < base::nanoseconds(now) - quietTime;
 }
 
 /// Everything in `file` up to one byte more than a playlist may have; null: it cannot be read.
@@ -228,7 +228,7 @@ class DirectoryReader {
 
         base::FileStatus status{};
         if (PlaylistFile* const previous = previousPlaylist(name);
-            previous != nullptr && previous->settled &&
+            previous != nullptr && previous->isQuiet &&
             fstatat(descriptor_, name, &status, 0) == 0 && stateOf(status) == previous->state) {
             directory_.playlists.push_back(
                 {name, previous->state, true, std::move(previous->content)});
@@ -242,10 +242,10 @@ class DirectoryReader {
             return;
         }
         PlaylistFile playlist{name, stateOf(status), false, Reason::PlaylistUnreadable};
-        const bool settledBefore = isSettled(playlist.state);
+        const bool wasQuietBefore = isQuiet(playlist.state);
         playlist.content = readPlaylist(file.get(), status, format);
-        playlist.settled =
-            settledBefore && std::holds_alternative<PlaylistContent>(playlist.content);
+        playlist.isQuiet =
+            wasQuietBefore && std::holds_alternative<PlaylistContent>(playlist.content);
         directory_.playlists.push_back(std::move(playlist));
     }
 

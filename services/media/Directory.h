@@ -54,7 +54,7 @@ struct PlaylistFile {
     State state;
     /// The file had not just been written when it was read. While it has, a further write may leave
     /// the state as it is, for clocks of file systems tick slowly.
-    bool settled = false;
+    bool isQuiet = false;
     /// A reason stands for a file that could not be read.
     std::variant<PlaylistContent, Reason> content = Reason::PlaylistUnreadable;
 };
