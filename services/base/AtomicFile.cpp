@@ -1,6 +1,5 @@
 #include "services/base/AtomicFile.h"
 
-#include <array>
 #include <cerrno>
 #include <cstdio>
 #include <system_error>
@@ -9,22 +8,14 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "services/base/FileContents.h"
+
 namespace quorl::base {
 
 namespace {
 
 [[noreturn]] void fail(const std::string& what) {
-    throw std::system_error{errno, std::generic_category(), what};
-}
-
-void writeAll(int file, std::string_view text, const std::string& name) {
-    while (!text.empty()) {
-        const auto written = write(file, text.data(), text.size());
-        if (written < 0 && errno != EINTR) {
-            fail(name);
-        }
-        text.remove_prefix(written > 0 ? static_cast<std::size_t>(written) : 0);
-    }
+    throw std::system_error(errno, std::generic_category(), what);
 }
 
 } // namespace
@@ -34,7 +25,7 @@ FileDescriptor openDirectory(int parent, const char* name) {
     if (mkdirat(parent, name, forEverybodyToRead) != 0 && errno != EEXIST) {
         fail(name);
     }
-    FileDescriptor directory{openat(parent, name, O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC)};
+    FileDescriptor directory(openat(parent, name, O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
     if (!directory) {
         fail(name);
     }
@@ -42,7 +33,7 @@ FileDescriptor openDirectory(int parent, const char* name) {
 }
 
 FileDescriptor openRoot(const char* path) {
-    FileDescriptor directory{open(path, O_RDONLY | O_DIRECTORY | O_CLOEXEC)};
+    FileDescriptor directory(open(path, O_RDONLY | O_DIRECTORY | O_CLOEXEC));
     if (!directory) {
         fail(path);
     }
@@ -62,12 +53,12 @@ void replaceFile(int directory, const std::string& name, std::string_view text) 
     if (unlinkat(directory, temporary.c_str(), 0) != 0 && errno != ENOENT) {
         fail(name);
     }
-    const FileDescriptor file{openat(directory, temporary.c_str(),
-                                     O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, forEverybodyToRead)};
+    const FileDescriptor file(openat(directory, temporary.c_str(),
+                                     O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, forEverybodyToRead));
     if (!file) {
         fail(name);
     }
-    writeAll(file.get(), text, name);
+    writeAll(file.get(), std::as_bytes(std::span(text)));
     syncToDevice(file.get());
     if (renameat(directory, temporary.c_str(), directory, name.c_str()) != 0) {
         fail(name);
@@ -76,26 +67,15 @@ void replaceFile(int directory, const std::string& name, std::string_view text) 
 }
 
 std::string readFile(int directory, const std::string& name) {
-    const FileDescriptor file{
-        openat(directory, name.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC)};
+    const FileDescriptor file(
+        openat(directory, name.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC));
     if (!file) {
         if (errno == ENOENT) {
             return {};
         }
         fail(name);
     }
-    std::string text;
-    std::array<char, 65536> buffer{};
-    for (;;) {
-        const auto size = read(file.get(), buffer.data(), buffer.size());
-        if (size < 0 && errno != EINTR) {
-            fail(name);
-        }
-        if (size == 0) {
-            return text;
-        }
-        text.append(buffer.data(), size > 0 ? static_cast<std::size_t>(size) : 0);
-    }
+    return readAll(file.get());
 }
 
 } // namespace quorl::base

@@ -1,7 +1,5 @@
 #include "services/base/MountWatch.h"
 
-#include <array>
-#include <cstddef>
 #include <sstream>
 #include <string_view>
 #include <system_error>
@@ -11,6 +9,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "services/base/FileContents.h"
 #include "services/base/FileStatus.h"
 #include "services/base/Paths.h"
 
@@ -18,15 +17,14 @@ namespace quorl::base {
 
 namespace {
 
-std::string readFromStart(int file) {
-    std::string text;
-    std::array<char, 16384>
-        buffer; // NOLINT(cppcoreguidelines-pro-type-member-init): read() fills it
-    lseek(file, 0, SEEK_SET);
-    for (ssize_t size = 0; (size = read(file, buffer.data(), buffer.size())) > 0;) {
-        text.append(buffer.data(), static_cast<std::size_t>(size));
+/// Empty where it cannot be read, which counts as a change.
+std::string textOf(const FileDescriptor& table) {
+    try {
+        lseek(table.get(), 0, SEEK_SET);
+        return readAll(table.get());
+    } catch (const std::system_error&) {
+        return {};
     }
-    return text;
 }
 
 /// A field of the mount table, in which blanks and backslashes are written as three octal digits.
@@ -69,7 +67,7 @@ std::string MountWatch::describe() const {
     std::error_code error;
     std::string canonical = std::filesystem::canonical(root_, error).string();
     canonical = canonical == "/" ? "" : canonical;
-    std::istringstream table(readFromStart(table_.get()));
+    std::istringstream table(textOf(table_));
     for (std::string line; std::getline(table, line);) {
         std::istringstream fields(line);
         std::string id, parent, device, rootInDevice, mountPoint;

@@ -5,12 +5,14 @@
 #include <cstdlib>
 #include <ctime>
 #include <iterator>
+#include <system_error>
 #include <utility>
 
 #include <dirent.h>
 #include <fcntl.h>
 #include <sys/stat.h>
 
+#include "services/base/FileContents.h"
 #include "services/base/FileDescriptor.h"
 #include "services/base/FileStatus.h"
 #include "services/base/MallocText.h"
@@ -42,24 +44,12 @@ bool isQuiet(const PlaylistFile::State& state) {
 }
 
 /// Everything in `file` up to one byte more than a playlist may have; null: it cannot be read.
-std::optional<std::string> readBytes(int file, std::size_t expected) {
-    std::string bytes(std::min(expected, maximumPlaylistBytes) + 1, '\0');
-    std::size_t size = 0;
-    while (size <= maximumPlaylistBytes) {
-        if (size == bytes.size()) {
-            bytes.resize(std::min(2 * size, maximumPlaylistBytes + 1));
-        }
-        const ssize_t count = read(file, bytes.data() + size, bytes.size() - size);
-        if (count < 0 && errno != EINTR) {
-            return std::nullopt;
-        }
-        if (count == 0) {
-            break;
-        }
-        size += count > 0 ? static_cast<std::size_t>(count) : 0;
+std::optional<std::string> readBytes(int file) {
+    try {
+        return base::readAll(file, maximumPlaylistBytes + 1);
+    } catch (const std::system_error&) {
+        return std::nullopt;
     }
-    bytes.resize(size);
-    return bytes;
 }
 
 std::variant<PlaylistContent, Reason> readPlaylist(int file, const base::FileStatus& status,
@@ -67,11 +57,10 @@ std::variant<PlaylistContent, Reason> readPlaylist(int file, const base::FileSta
     if (!S_ISREG(status.st_mode)) {
         return Reason::NotRegularFile;
     }
-    const auto expected = static_cast<std::uint64_t>(status.st_size);
-    if (expected > maximumPlaylistBytes) {
+    if (static_cast<std::uint64_t>(status.st_size) > maximumPlaylistBytes) {
         return Reason::PlaylistTooLarge;
     }
-    const auto bytes = readBytes(file, static_cast<std::size_t>(expected));
+    const auto bytes = readBytes(file);
     if (!bytes) {
         return Reason::PlaylistUnreadable;
     }
