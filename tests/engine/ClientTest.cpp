@@ -1,6 +1,7 @@
 // The connection of an app to the engine.
 
 #include <csignal>
+#include <fstream>
 
 #include <sdbus-c++/sdbus-c++.h>
 

@@ -1,6 +1,7 @@
 #include "tests/engine/Folders.h"
 
 #include <algorithm>
+#include <fstream>
 #include <sstream>
 
 #include <fcntl.h>

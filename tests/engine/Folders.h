@@ -7,12 +7,12 @@
 #include "quorl-syncd/transfer/RateLimit.h"
 #include "quorl-syncd/transfer/Sync.h"
 #include "services/preferences/Preference.h"
-#include "tests/wearable/TemporaryDirectory.h"
+#include "tests/base/TemporaryDirectory.h"
 
 /// A music folder and a wearable, both real directories.
 namespace quorl::syncd::testing {
 
-using wearable::testing::TemporaryDirectory;
+using tests::TemporaryDirectory;
 
 /// File names and contents.
 using Contents = std::map<std::string, std::string>;

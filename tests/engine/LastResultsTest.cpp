@@ -5,13 +5,13 @@
 #include <gtest/gtest.h>
 
 #include "quorl-syncd/engine/RetryDelay.h"
-#include "tests/wearable/TemporaryDirectory.h"
+#include "tests/base/TemporaryDirectory.h"
 
 namespace {
 
 using namespace quorl::syncd;
 using namespace std::chrono_literals;
-using quorl::wearable::testing::TemporaryDirectory;
+using quorl::tests::TemporaryDirectory;
 
 const LastResult sent{true, "3 songs synced to Velora.", 1'700'000'000'000'000};
 const LastResult full{false, "The Velora is full.", 1'700'000'001'000'000};

@@ -5,7 +5,7 @@
 #include <thread>
 
 #include "services/base/FileDescriptor.h"
-#include "tests/wearable/TemporaryDirectory.h"
+#include "tests/base/TemporaryDirectory.h"
 
 namespace quorl::syncd::testing {
 
@@ -36,7 +36,7 @@ class SlowDevice {
   private:
     void answer();
 
-    wearable::testing::TemporaryDirectory folder_;
+    tests::TemporaryDirectory folder_;
     bool isMounted_ = false;
     base::FileDescriptor watch_;
     base::FileDescriptor end_;

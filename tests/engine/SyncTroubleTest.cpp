@@ -1,5 +1,7 @@
 // What can go wrong in the middle of a sync.
 
+#include <fstream>
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <sys/mount.h>

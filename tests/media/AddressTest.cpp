@@ -7,7 +7,8 @@
 
 #include "services/media/MusicFolder.h"
 #include "services/media/playlists/PlaylistContent.h"
-#include "tests/media/TemporaryFolder.h"
+#include "tests/base/TemporaryDirectory.h"
+#include "tests/media/Inventories.h"
 
 namespace quorl::media::test {
 
@@ -15,6 +16,7 @@ namespace {
 
 using testing::ElementsAre;
 using testing::IsEmpty;
+using tests::TemporaryDirectory;
 
 struct Reference {
     std::string_view base;
@@ -62,7 +64,7 @@ INSTANTIATE_TEST_SUITE_P(Relative, ReferenceTest,
                                          Reference{"Album/", "12: one.mp3", "Album/12: one.mp3"}));
 
 TEST(AddressBaseTest, LocationsStartFromTheBasesAroundThem) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"lists/My Album/Disc 1/one.mp3", "lists/My Album/two.mp3", "lists/three.mp3",
                        "four.mp3", "lists/Other/five.mp3"});
     folder.write("lists/List.xspf",
@@ -85,7 +87,7 @@ TEST(AddressBaseTest, LocationsStartFromTheBasesAroundThem) {
 }
 
 TEST(AddressBaseTest, ABaseLeadsNoFurtherThanALocationDoes) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Music/one.mp3", "outside.mp3"});
     folder.write(
         "Music/List.xspf",

@@ -10,7 +10,8 @@
 
 #include "services/media/MusicFolder.h"
 #include "services/media/playlists/PlaylistContent.h"
-#include "tests/media/TemporaryFolder.h"
+#include "tests/base/TemporaryDirectory.h"
+#include "tests/media/Inventories.h"
 
 namespace quorl::media::test {
 
@@ -18,6 +19,7 @@ namespace {
 
 using testing::ElementsAre;
 using testing::IsEmpty;
+using tests::TemporaryDirectory;
 
 constexpr std::string_view m3u = "#EXTM3U\r\n#PLAYLIST:Füße\r\nFüße 東京.mp3\r\none.mp3\r\n";
 constexpr std::string_view pls = "[playlist]\r\nFile1=Füße 東京.mp3\r\nFile2=one.mp3\r\n";
@@ -49,7 +51,7 @@ class WideText : public testing::TestWithParam<Written> {
 } // namespace
 
 TEST_P(WideText, IsReadInEveryFormat) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Füße 東京.mp3", "one.mp3"});
     folder.write("a.m3u", written(m3u));
     folder.write("b.m3u8", written(m3u));
@@ -68,7 +70,7 @@ TEST_P(WideText, IsReadInEveryFormat) {
 }
 
 TEST_P(WideText, ThatWasCutWithinACharacterIsLeftOut) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     const std::string text = written(pls);
     folder.write("c.pls", std::string_view(text).substr(0, text.size() - 1));
 
@@ -87,7 +89,7 @@ INSTANTIATE_TEST_SUITE_P(Encodings, WideText,
                                          Written{"UTF-32BE", "\0\0\xFE\xFF"sv}));
 
 TEST(EncodingTest, XmlIsReadInTheEncodingThatItDeclares) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Füße.mp3", "Don’t.mp3", "Привет.mp3", "東京.mp3"});
     folder.write("latin.xspf", xspf("ISO-8859-1", "F\xFC\xDF"
                                                   "e.mp3"));
@@ -104,7 +106,7 @@ TEST(EncodingTest, XmlIsReadInTheEncodingThatItDeclares) {
 }
 
 TEST(EncodingTest, ADeclarationOfUtf16ThatReadsAsAsciiWasLeftBehindByAConversion) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Füße.mp3"});
     folder.write("List.xspf", xspf("utf-16", "Füße.mp3"));
 
@@ -112,7 +114,7 @@ TEST(EncodingTest, ADeclarationOfUtf16ThatReadsAsAsciiWasLeftBehindByAConversion
 }
 
 TEST(EncodingTest, XmlInAnUnknownEncodingOrNotInTheOneThatItDeclaresIsLeftOut) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("a.xspf", xspf("no-such-encoding", "one.mp3"));
     folder.write("b.xspf", xspf("windows-1252", "\x81.mp3"));
     folder.write("c.xspf", xspf("windows-1252", "one.mp3").insert(0, "\xFF\xFE"));
@@ -126,7 +128,7 @@ TEST(EncodingTest, XmlInAnUnknownEncodingOrNotInTheOneThatItDeclaresIsLeftOut) {
 }
 
 TEST(EncodingTest, WhatIsNoTextOrOfAnotherFormatIsNotAnEmptyPlaylist) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     for (const char* const name : {"song.m3u", "song.pls"}) {
         folder.write(name, "ID3\x04\0\0\0\0\x01\x02"sv);
     }

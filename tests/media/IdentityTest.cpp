@@ -4,24 +4,27 @@
 #include <gtest/gtest.h>
 
 #include "services/media/MusicFolder.h"
-#include "tests/media/TemporaryFolder.h"
+#include "tests/base/TemporaryDirectory.h"
+#include "tests/media/Inventories.h"
 
 namespace quorl::media::test {
 
+using tests::TemporaryDirectory;
+
 namespace {
 
-std::uint64_t idOf(const TemporaryFolder& folder, std::string_view path) {
+std::uint64_t idOf(const TemporaryDirectory& folder, std::string_view path) {
     return playlistAt(*scan(folder.path()), path).id;
 }
 
-std::uint64_t revisionOf(const TemporaryFolder& folder, std::string_view path) {
+std::uint64_t revisionOf(const TemporaryDirectory& folder, std::string_view path) {
     return playlistAt(*scan(folder.path()), path).revision;
 }
 
 } // namespace
 
 TEST(IdentityTest, TheIdIsTheSameOnEveryMachine) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("Road Trip.m3u8", "");
     folder.write("Workout/Intervals.m3u8", "");
 
@@ -30,9 +33,9 @@ TEST(IdentityTest, TheIdIsTheSameOnEveryMachine) {
 }
 
 TEST(IdentityTest, TheIdDoesNotDependOnHowAccentsAreStored) {
-    const TemporaryFolder composed;
+    const TemporaryDirectory composed;
     composed.write("Caf\u00E9.m3u", "");
-    const TemporaryFolder decomposed;
+    const TemporaryDirectory decomposed;
     decomposed.write("Cafe\u0301.m3u", "");
 
     EXPECT_EQ(idOf(composed, "Caf\u00E9.m3u"), 0xA3FF65FA69ACFD06U);
@@ -40,7 +43,7 @@ TEST(IdentityTest, TheIdDoesNotDependOnHowAccentsAreStored) {
 }
 
 TEST(IdentityTest, TheIdStaysWhateverThePlaylistSays) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     folder.write("List.m3u", "");
     const std::uint64_t before = idOf(folder, "List.m3u");
@@ -51,7 +54,7 @@ TEST(IdentityTest, TheIdStaysWhateverThePlaylistSays) {
 }
 
 TEST(IdentityTest, DifferentPathsHaveDifferentIds) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("a.m3u", "#PLAYLIST:Same\n");
     folder.write("a.pls", "[playlist]");
     folder.write("b/a.m3u", "#PLAYLIST:Same\n");
@@ -62,7 +65,7 @@ TEST(IdentityTest, DifferentPathsHaveDifferentIds) {
 }
 
 TEST(IdentityTest, APlaylistIsFoundByItsIdAndAnUnknownIdFindsNone) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("a.m3u", "");
     folder.write("b.m3u", "");
 
@@ -93,7 +96,7 @@ class RevisionTest : public testing::Test {
         EXPECT_EQ(revisionOf(folder_, "lists"), folderBefore_);
     }
 
-    TemporaryFolder folder_;
+    TemporaryDirectory folder_;
     std::uint64_t before_ = 0;
     std::uint64_t folderBefore_ = 0;
 };

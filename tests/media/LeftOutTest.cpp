@@ -9,9 +9,13 @@
 
 #include "services/media/MusicFolder.h"
 #include "services/media/playlists/PlaylistContent.h"
-#include "tests/media/TemporaryFolder.h"
+#include "tests/base/TemporaryDirectory.h"
+#include "tests/media/Inventories.h"
+#include "tests/media/WithoutPrivileges.h"
 
 namespace quorl::media::test {
+
+using tests::TemporaryDirectory;
 
 namespace {
 
@@ -30,7 +34,7 @@ LeftOut onlyOneOf(const Inventory& inventory) {
 } // namespace
 
 TEST(LeftOutTest, ARecordTellsPlaylistEntryAndReasonAndTheOtherEntriesStay) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3", "two.mp3"});
     folder.write("lists/List.m3u", "../one.mp3\n..\\gone%20away.mp3\n../two.mp3\n");
 
@@ -42,7 +46,7 @@ TEST(LeftOutTest, ARecordTellsPlaylistEntryAndReasonAndTheOtherEntriesStay) {
 }
 
 TEST(LeftOutTest, RecordsAreInTheOrderOfPathsAndEntries) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("b.m3u", "#PLAYLIST:A\nz\ny\n");
     folder.write("a.m3u", "#PLAYLIST:B\nx\n");
 
@@ -54,7 +58,7 @@ TEST(LeftOutTest, RecordsAreInTheOrderOfPathsAndEntries) {
 }
 
 TEST(LeftOutTest, AnEntryThatIsNotUtf8IsRecordedInUtf8) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("List.m3u", "F\xFC\xDF"
                              "e.mp3\n");
 
@@ -62,7 +66,7 @@ TEST(LeftOutTest, AnEntryThatIsNotUtf8IsRecordedInUtf8) {
 }
 
 TEST(LeftOutTest, AddressesOnOtherMachines) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("a.m3u", "http://radio.example/stream.mp3\nmms://a.example/b\n"
                           "SMB://server/share/one.mp3\nfile://server/share/one.mp3\n");
     folder.write("b.xspf", "<playlist><trackList><track><location>https://a.example/1.mp3"
@@ -77,7 +81,7 @@ TEST(LeftOutTest, AddressesOnOtherMachines) {
 }
 
 TEST(LeftOutTest, AbsolutePathsOfOtherSystems) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("a.m3u", "C:\\Music\\one.mp3\nd:/Music/one.mp3\n\\\\server\\share\\one.mp3\n"
                           "\\Music\\one.mp3\nfile:///C:/Music/one.mp3\nfile://C:/Music/one.mp3\n"
                           "/D:/one.mp3\n");
@@ -92,7 +96,7 @@ TEST(LeftOutTest, AbsolutePathsOfOtherSystems) {
 }
 
 TEST(LeftOutTest, FilesOutsideTheFolderWhetherTheyExistOrNot) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"outside.mp3", "MusicOther/one.mp3"});
     folder.link("Music/link.mp3", "../outside.mp3");
     folder.link("Music/linked", "../MusicOther");
@@ -110,7 +114,7 @@ TEST(LeftOutTest, FilesOutsideTheFolderWhetherTheyExistOrNot) {
 }
 
 TEST(LeftOutTest, FilesThatAreMissing) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     folder.link("dangling.mp3", "nowhere.mp3");
     folder.link("circle.mp3", "circle.mp3");
@@ -126,7 +130,7 @@ TEST(LeftOutTest, FilesThatAreMissing) {
 }
 
 TEST(LeftOutTest, FilesThatAreMissingBehindALinkToTheFolder) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.makeDirectory("disk");
     folder.link("Music", "disk");
     folder.write("disk/List.m3u", (folder / "Music/gone.mp3").string() + "\n" +
@@ -137,7 +141,7 @@ TEST(LeftOutTest, FilesThatAreMissingBehindALinkToTheFolder) {
 }
 
 TEST(LeftOutTest, FilesInADirectoryThatMayNotBeEntered) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"locked/one.mp3"});
     folder.write("List.m3u", "locked/one.mp3\n");
     folder.setPermissions("locked", std::filesystem::perms::none);
@@ -151,7 +155,7 @@ TEST(LeftOutTest, FilesInADirectoryThatMayNotBeEntered) {
 }
 
 TEST(LeftOutTest, AFolderThatMayNotBeReadIsNamedItself) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.setPermissions("", std::filesystem::perms::owner_exec);
     const WithoutPrivileges ordinary;
 
@@ -162,7 +166,7 @@ TEST(LeftOutTest, AFolderThatMayNotBeReadIsNamedItself) {
 }
 
 TEST(LeftOutTest, HiddenFiles) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({".one.mp3", ".trash/one.mp3"});
     folder.link("link", ".trash");
     folder.write("List.m3u", ".one.mp3\n.trash/one.mp3\nlink/one.mp3\n");
@@ -172,7 +176,7 @@ TEST(LeftOutTest, HiddenFiles) {
 }
 
 TEST(LeftOutTest, DirectoriesAndPipes) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.makeDirectory("Album.mp3");
     ASSERT_EQ(mkfifo((folder / "pipe.mp3").c_str(), 0644), 0);
     folder.link("link.mp3", "pipe.mp3");
@@ -184,7 +188,7 @@ TEST(LeftOutTest, DirectoriesAndPipes) {
 }
 
 TEST(LeftOutTest, FilesThatAreNeitherAudioNorVideo) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("cover.jpg", "");
     folder.write("other.m3u", "");
     folder.link("linked.jpg", "cover.jpg");
@@ -196,7 +200,7 @@ TEST(LeftOutTest, FilesThatAreNeitherAudioNorVideo) {
 }
 
 TEST(LeftOutTest, TracksWithoutAddress) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("a.xspf", "<playlist><trackList><track><title>One</title></track>"
                            "<track><location> </location></track></trackList></playlist>");
     folder.write("b.pls", "[playlist]\nFile1=\n");
@@ -211,7 +215,7 @@ TEST(LeftOutTest, TracksWithoutAddress) {
 // Whole playlists.
 
 TEST(LeftOutTest, APlaylistThatMayNotBeRead) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("List.m3u", "");
     folder.setPermissions("List.m3u", std::filesystem::perms::none);
     const WithoutPrivileges ordinary;
@@ -223,7 +227,7 @@ TEST(LeftOutTest, APlaylistThatMayNotBeRead) {
 }
 
 TEST(LeftOutTest, APlaylistOfMoreThan64MiBButNotOneOfExactlyThat) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("large.m3u", std::string(maximumPlaylistBytes + 1, '#'));
     folder.write("largest.m3u", std::string(maximumPlaylistBytes, '#'));
 
@@ -234,7 +238,7 @@ TEST(LeftOutTest, APlaylistOfMoreThan64MiBButNotOneOfExactlyThat) {
 }
 
 TEST(LeftOutTest, BrokenXml) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("cut off.xspf", "<playlist><trackList>" + std::string(track));
     folder.write("empty.xspf", "");
     folder.write("html.xspf", "<html><body/></html>");
@@ -248,7 +252,7 @@ TEST(LeftOutTest, BrokenXml) {
 }
 
 TEST(LeftOutTest, APlaylistThatIsAPipeIsNotWaitedFor) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     ASSERT_EQ(mkfifo((folder / "pipe.m3u").c_str(), 0644), 0);
     folder.link("link.pls", "pipe.m3u");
 
@@ -260,7 +264,7 @@ TEST(LeftOutTest, APlaylistThatIsAPipeIsNotWaitedFor) {
 }
 
 TEST(LeftOutTest, APlaylistThatIsALinkOutOfTheFolderOrToNowhere) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("secret.m3u", "");
     folder.link("Music/out.m3u", "../secret.m3u");
     folder.link("Music/nowhere.m3u", "gone.m3u");
@@ -273,7 +277,7 @@ TEST(LeftOutTest, APlaylistThatIsALinkOutOfTheFolderOrToNowhere) {
 }
 
 TEST(LeftOutTest, EntriesAfterTheFirstMillion) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"a.mp3"});
     std::string bytes;
     for (std::uint32_t entry = 0; entry < maximumEntries; ++entry) {
@@ -290,7 +294,7 @@ TEST(LeftOutTest, EntriesAfterTheFirstMillion) {
 }
 
 TEST(LeftOutTest, OfTwoPlaylistsWhosePathsDifferInStoredAccentsOnlyOneIsThere) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("Caf\u00E9.m3u", "");
     folder.write("Cafe\u0301.m3u", "");
 

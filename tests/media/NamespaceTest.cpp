@@ -10,10 +10,12 @@
 #include <gtest/gtest.h>
 #include <sys/mount.h>
 
-#include "tests/media/TemporaryFolder.h"
+#include "tests/base/TemporaryDirectory.h"
 #include "tests/media/WatchedFolder.h"
 
 namespace quorl::media::test {
+
+using tests::TemporaryDirectory;
 
 namespace {
 
@@ -68,7 +70,7 @@ class Limit {
 } // namespace
 
 TEST(MountTest, ADiskThatIsMountedAtTheFolderIsReadAndWatchedAndCanBeUnmounted) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("Music/Inside.m3u", "");
     WatchedFolder watched(folder / "Music");
     watched.waitForSongs("Inside.m3u", 0);
@@ -93,7 +95,7 @@ TEST(MountTest, ADiskThatIsMountedAtTheFolderIsReadAndWatchedAndCanBeUnmounted) 
 }
 
 TEST(MountTest, ADiskThatIsMountedOnTheWayToTheFolderIsNoticed) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.makeDirectory("disk with space");
     folder.link("Music", "disk with space/Music");
     WatchedFolder watched(folder / "Music");
@@ -112,7 +114,7 @@ TEST(MountTest, ADiskThatIsMountedOnTheWayToTheFolderIsNoticed) {
 }
 
 TEST(MountTest, ADiskThatIsMountedInTheFolderIsPartOfIt) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.makeDirectory("Music/my disk");
     WatchedFolder watched(folder / "Music");
     folder.makeDirectory("prepared");
@@ -129,7 +131,7 @@ TEST(MountTest, ADiskThatIsMountedInTheFolderIsPartOfIt) {
 }
 
 TEST(LimitTest, DirectoriesThatCannotBeWatchedAreCountedAndReadByARescan) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     for (int directory = 0; directory < 20; ++directory) {
         folder.makeDirectory("directory " + std::to_string(directory));
     }
@@ -160,7 +162,7 @@ TEST(LimitTest, DirectoriesThatCannotBeWatchedAreCountedAndReadByARescan) {
 }
 
 TEST(LimitTest, WithoutAnyWatchTheFolderIsStillRead) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("List.m3u", "");
     const Limit limit("max_inotify_instances");
     limit.set(0);

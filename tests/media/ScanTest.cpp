@@ -9,9 +9,12 @@
 #include <sys/stat.h>
 
 #include "services/media/MusicFolder.h"
-#include "tests/media/TemporaryFolder.h"
+#include "tests/base/TemporaryDirectory.h"
+#include "tests/media/Inventories.h"
 
 namespace quorl::media::test {
+
+using tests::TemporaryDirectory;
 
 namespace {
 
@@ -60,7 +63,7 @@ std::string xspfTracks(const std::string& tracks) {
 } // namespace
 
 TEST(ScanTest, AnEmptyFolderIsAnEmptyLibrary) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
 
     const auto inventory = scan(folder.path());
 
@@ -74,7 +77,7 @@ TEST(ScanTest, AnEmptyFolderIsAnEmptyLibrary) {
 }
 
 TEST(ScanTest, AMissingFolderIsAnEmptyLibraryThatSaysSo) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
 
     const auto inventory = scan(folder / "Music");
 
@@ -83,14 +86,14 @@ TEST(ScanTest, AMissingFolderIsAnEmptyLibraryThatSaysSo) {
 }
 
 TEST(ScanTest, AFileInPlaceOfTheFolderIsAnEmptyLibraryThatSaysSo) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("Music", "no directory");
 
     EXPECT_FALSE(scan(folder / "Music")->rootFound);
 }
 
 TEST(ScanTest, AFolderGivenRelativeToTheWorkingDirectoryAndWithASlashAtItsEndIsFound) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     folder.write("List.m3u", (folder / "one.mp3").string());
     const auto relative = std::filesystem::relative(folder.path()).string() + "/";
@@ -102,7 +105,7 @@ TEST(ScanTest, AFolderGivenRelativeToTheWorkingDirectoryAndWithASlashAtItsEndIsF
 }
 
 TEST(ScanTest, PlaylistsOfEveryFormatListTheirSongsInOrder) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3", "two.ogg"});
     folder.write("a.m3u", "two.ogg\none.mp3\n");
     folder.write("b.M3U8", "two.ogg\none.mp3");
@@ -120,7 +123,7 @@ TEST(ScanTest, PlaylistsOfEveryFormatListTheirSongsInOrder) {
 }
 
 TEST(ScanTest, PlaylistsAtAnyDepthListSongsRelativeToThemselves) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"top.mp3", "a/b/c/deep.mp3", "a/other.mp3"});
     folder.write("a/b/c/List.m3u", "deep.mp3\n../../other.mp3\n../../../top.mp3\n./deep.mp3\n"
                                    "..//../b/c/deep.mp3\n");
@@ -131,7 +134,7 @@ TEST(ScanTest, PlaylistsAtAnyDepthListSongsRelativeToThemselves) {
 }
 
 TEST(ScanTest, ASongThatIsListedTwiceIsThereTwice) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3", "two.mp3"});
     folder.write("List.m3u", "one.mp3\ntwo.mp3\none.mp3\n");
 
@@ -142,7 +145,7 @@ TEST(ScanTest, ASongThatIsListedTwiceIsThereTwice) {
 }
 
 TEST(ScanTest, SongsKnowTheirDirectoryNameSizeTimeAndKind) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Album/one.mp3"}, 1234);
     folder.setModified("Album/one.mp3", 1'600'000'000'123'456'789);
     folder.write("List.m3u", "Album/one.mp3");
@@ -160,7 +163,7 @@ TEST(ScanTest, SongsKnowTheirDirectoryNameSizeTimeAndKind) {
 }
 
 TEST(ScanTest, ASongOfMoreThanFourGigabytesKeepsItsSize) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"long.flac"});
     std::filesystem::resize_file(folder / "long.flac", 5'000'000'000);
     folder.write("List.m3u", "long.flac");
@@ -171,7 +174,7 @@ TEST(ScanTest, ASongOfMoreThanFourGigabytesKeepsItsSize) {
 // Encodings and line ends.
 
 TEST(ScanTest, PlaylistsInUtf8AreReadWithAndWithoutByteOrderMark) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Füße.mp3"});
     folder.write("plain.m3u", "Füße.mp3\n");
     folder.write("marked.m3u", "\uFEFFFüße.mp3\n");
@@ -187,7 +190,7 @@ TEST(ScanTest, PlaylistsInUtf8AreReadWithAndWithoutByteOrderMark) {
 }
 
 TEST(ScanTest, TextThatIsNotUtf8IsTakenAsLatin1) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Füße.mp3"});
     folder.write("a.m3u", "#PLAYLIST:F\xFC\xDF"
                           "e\nF\xFC\xDF"
@@ -208,7 +211,7 @@ TEST(ScanTest, TextThatIsNotUtf8IsTakenAsLatin1) {
 }
 
 TEST(ScanTest, QuotationMarksThatWindowsWritesInLatin1AreUnderstood) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Don’t.mp3"});
     folder.write("List.m3u", "Don\x92t.mp3\n");
 
@@ -216,7 +219,7 @@ TEST(ScanTest, QuotationMarksThatWindowsWritesInLatin1AreUnderstood) {
 }
 
 TEST(ScanTest, OneLineInLatin1LeavesTheOthersInUtf8) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Füße.mp3", "Käse.mp3"});
     folder.write("List.m3u", "K\xE4se.mp3\nFüße.mp3\n");
 
@@ -224,7 +227,7 @@ TEST(ScanTest, OneLineInLatin1LeavesTheOthersInUtf8) {
 }
 
 TEST(ScanTest, XmlMayDeclareItsEncoding) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Füße.mp3"});
     folder.write("List.xspf",
                  "<?xml version=\"1.0\" encoding=\"ISO-8859-1\"?><playlist><trackList><track>"
@@ -235,7 +238,7 @@ TEST(ScanTest, XmlMayDeclareItsEncoding) {
 }
 
 TEST(ScanTest, LinesMayEndInAnyWayAndCommentsAndBlankLinesAreNoEntries) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3", "two.mp3", "three.mp3"});
     folder.write("windows.m3u", "#EXTM3U\r\n\r\n#EXTINF:12,One\r\none.mp3\r\n  \r\ntwo.mp3");
     folder.write("classic.m3u", "one.mp3\rtwo.mp3\r");
@@ -252,7 +255,7 @@ TEST(ScanTest, LinesMayEndInAnyWayAndCommentsAndBlankLinesAreNoEntries) {
 }
 
 TEST(ScanTest, EntriesOfAPlsFileAreInTheOrderOfTheirNumbers) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3", "two.mp3", "ten.mp3"});
     folder.write("List.pls", "[playlist]\nFile10=ten.mp3\nfile2=two.mp3\nFILE1=one.mp3\n"
                              "FileX=ten.mp3\nFile=ten.mp3\nFile99999999999999999999=ten.mp3\n");
@@ -264,7 +267,7 @@ TEST(ScanTest, EntriesOfAPlsFileAreInTheOrderOfTheirNumbers) {
 // Ways to write an entry.
 
 TEST(ScanTest, BackslashesAreSeparatorsWhereNoFileHasThemInItsName) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Album/one.mp3", "back\\slash.mp3"});
     folder.write("a.m3u", "Album\\one.mp3\nback\\slash.mp3\n");
     folder.write("lists/b.m3u", "..\\Album\\one.mp3\n");
@@ -278,7 +281,7 @@ TEST(ScanTest, BackslashesAreSeparatorsWhereNoFileHasThemInItsName) {
 }
 
 TEST(ScanTest, PercentEncodedEntriesAreDecodedWhereNoFileHasTheCodesInItsName) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"My Album/one.mp3", "100%25 pure.mp3", "50% off.mp3"});
     folder.write("a.m3u", "My%20Album/one.mp3\n100%25 pure.mp3\n50% off.mp3\n");
     folder.write("b.xspf", xspfTracks("<track><location>My%20Album/one.mp3</location></track>"
@@ -294,7 +297,7 @@ TEST(ScanTest, PercentEncodedEntriesAreDecodedWhereNoFileHasTheCodesInItsName) {
 }
 
 TEST(ScanTest, FileAddressesAreUnderstood) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"My Album/one.mp3"});
     const std::string path = folder.path().string();
     folder.write("List.m3u", "file://" + path + "/My%20Album/one.mp3\n" +              //
@@ -308,7 +311,7 @@ TEST(ScanTest, FileAddressesAreUnderstood) {
 }
 
 TEST(ScanTest, AbsolutePathsInTheFolderAreUnderstoodAlsoThroughALinkToTheFolder) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"disk/one.mp3"});
     folder.link("Music", "disk");
     folder.write("disk/List.m3u", (folder / "disk/one.mp3").string() + "\n" +
@@ -320,7 +323,7 @@ TEST(ScanTest, AbsolutePathsInTheFolderAreUnderstoodAlsoThroughALinkToTheFolder)
 }
 
 TEST(ScanTest, AnEntryThatLeavesTheFolderAndComesBackIsInTheFolder) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Music/one.mp3"});
     folder.write("Music/List.m3u", "../Music/one.mp3\n");
 
@@ -328,7 +331,7 @@ TEST(ScanTest, AnEntryThatLeavesTheFolderAndComesBackIsInTheFolder) {
 }
 
 TEST(ScanTest, AccentsMayBeStoredOtherwiseInThePlaylistThanInTheFileName) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Caf\u00E9.mp3", "Bje\u0301.mp3"});
     folder.write("List.m3u", "Cafe\u0301.mp3\nBj\u00E9.mp3\n");
 
@@ -337,7 +340,7 @@ TEST(ScanTest, AccentsMayBeStoredOtherwiseInThePlaylistThanInTheFileName) {
 }
 
 TEST(ScanTest, OfSeveralLocationsOfATrackTheOneOnThisMachineCounts) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     folder.write("List.xspf",
                  xspfTracks("<track><title>One</title><location>http://a.example/1.mp3</location>"
@@ -347,7 +350,7 @@ TEST(ScanTest, OfSeveralLocationsOfATrackTheOneOnThisMachineCounts) {
 }
 
 TEST(ScanTest, XspfWithANamespacePrefixIsUnderstood) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"R&B.mp3"});
     folder.write("List.xspf",
                  R"(<x:playlist xmlns:x="http://xspf.org/ns/0/"><x:title>Prefix</x:title>
@@ -363,7 +366,7 @@ TEST(ScanTest, XspfWithANamespacePrefixIsUnderstood) {
 // Names, order and folders.
 
 TEST(ScanTest, APlaylistHasTheNameThatItGivesItselfElseThatOfItsFile) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("a.m3u", "#EXTM3U\n#PLAYLIST: Road Trip \n");
     folder.write("b.xspf", xspf("<title>Quiet Evening</title>"));
     folder.write("lists/Long Run.v2.pls", "[playlist]\n");
@@ -380,14 +383,14 @@ TEST(ScanTest, APlaylistHasTheNameThatItGivesItselfElseThatOfItsFile) {
 }
 
 TEST(ScanTest, ANameTooLongToBeOneIsIgnored) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("a.m3u", "#PLAYLIST:" + std::string(100'000, 'x') + "\n");
 
     EXPECT_THAT(namesOf(*scan(folder.path())), ElementsAre("a"));
 }
 
 TEST(ScanTest, PlaylistsAreInTheOrderOfTheUsersLanguage) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     for (const char* const file : {"Zebra.m3u", "Ärger.m3u", "apfel.m3u", "Banane.m3u"}) {
         folder.write(file, "");
     }
@@ -404,7 +407,7 @@ TEST(ScanTest, PlaylistsAreInTheOrderOfTheUsersLanguage) {
 }
 
 TEST(ScanTest, PlaylistsOfTheSameNameAreInTheOrderOfTheirPaths) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     for (const char* const file : {"c.m3u", "a.m3u", "b/x.m3u"}) {
         folder.write(file, "#PLAYLIST:Same\n");
     }
@@ -419,7 +422,7 @@ TEST(ScanTest, PlaylistsOfTheSameNameAreInTheOrderOfTheirPaths) {
 }
 
 TEST(ScanTest, ADirectoryThatHoldsPlaylistsIsAFolderWithTheirSongsInTheirOrder) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3", "two.mp3", "three.mp3"});
     folder.write("Workout/Z first.m3u", "#PLAYLIST:Abc\n../three.mp3\n../one.mp3\n");
     folder.write("Workout/A second.m3u", "#PLAYLIST:Xyz\n../one.mp3\n../two.mp3\n");
@@ -439,7 +442,7 @@ TEST(ScanTest, ADirectoryThatHoldsPlaylistsIsAFolderWithTheirSongsInTheirOrder) 
 }
 
 TEST(ScanTest, ADirectoryOfDirectoriesOrOfBrokenPlaylistsIsNoFolder) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("Outer/Inner/List.m3u", "");
     folder.write("Broken/List.xspf", "<playlist>");
 
@@ -458,7 +461,7 @@ void PrintTo(const Marked& marked, std::ostream* stream) { *stream << marked.sit
 class MarkerTest : public testing::TestWithParam<Marked> {};
 
 TEST_P(MarkerTest, TellsWhetherAProgramMadeThePlaylist) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write(GetParam().file, GetParam().bytes);
 
     EXPECT_EQ(playlistAt(*scan(folder.path()), GetParam().file).generated, GetParam().generated);
@@ -491,7 +494,7 @@ INSTANTIATE_TEST_SUITE_P(
 // What is a song, and what is not looked at.
 
 TEST(ScanTest, SongsAreToldByTheirContentType) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"a.mp3", "b.FLAC", "c.opus", "d.m4a", "e.ogg", "f.mp4", "g.mkv", "h.webm"});
     folder.write("List.m3u", "a.mp3\nb.FLAC\nc.opus\nd.m4a\ne.ogg\nf.mp4\ng.mkv\nh.webm\n");
 
@@ -507,7 +510,7 @@ TEST(ScanTest, SongsAreToldByTheirContentType) {
 }
 
 TEST(ScanTest, FirstBytesTellWhereTheNameDoesNot) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("song", "fLaC" + std::string(100, '\0'));
     folder.write("Artist. Song no. 5", "fLaC" + std::string(100, '\0'));
     folder.write("notes", "just text\n");
@@ -521,19 +524,19 @@ TEST(ScanTest, FirstBytesTellWhereTheNameDoesNot) {
 }
 
 TEST(ScanTest, AudioAndVideoAreNoticedAlsoInNoPlaylist) {
-    const TemporaryFolder audio;
+    const TemporaryDirectory audio;
     audio.writeSongs({"deep/down/one.mp3"});
     EXPECT_TRUE(scan(audio.path())->hasAudio);
     EXPECT_FALSE(scan(audio.path())->hasMusicVideo);
 
-    const TemporaryFolder video;
+    const TemporaryDirectory video;
     video.writeSongs({"one.mp4"});
     EXPECT_FALSE(scan(video.path())->hasAudio);
     EXPECT_TRUE(scan(video.path())->hasMusicVideo);
 }
 
 TEST(ScanTest, PlaylistsAndTextsAreNoAudio) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     for (const char* const file :
          {"a.m3u", "b.m3u8", "c.pls", "d.txt", "e.jpg", "f.asx", "g.m4u"}) {
         folder.write(file, "");
@@ -547,7 +550,7 @@ TEST(ScanTest, PlaylistsAndTextsAreNoAudio) {
 }
 
 TEST(ScanTest, HiddenFilesAndDirectoriesAreSkipped) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({".hidden.mp3", ".trash/one.mp3"});
     folder.write(".hidden.m3u", "");
     folder.write(".trash/List.m3u", "one.mp3");
@@ -560,7 +563,7 @@ TEST(ScanTest, HiddenFilesAndDirectoriesAreSkipped) {
 }
 
 TEST(ScanTest, LinkedDirectoriesAreNotWalked) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Album/one.mp3"});
     folder.write("Album/List.m3u", "one.mp3");
     folder.link("Album/loop", "..");
@@ -570,7 +573,7 @@ TEST(ScanTest, LinkedDirectoriesAreNotWalked) {
 }
 
 TEST(ScanTest, LinksToFilesInTheFolderAreSongsAndPlaylists) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Album/one.mp3"}, 77);
     folder.link("favourite.mp3", "Album/one.mp3");
     folder.write("lists/real.m3u", "favourite.mp3\nAlbum/one.mp3\nagain/one.mp3\n");
@@ -585,7 +588,7 @@ TEST(ScanTest, LinksToFilesInTheFolderAreSongsAndPlaylists) {
 }
 
 TEST(ScanTest, FoldersDeeperThanAPathCanSayDoNoHarm) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     folder.write("List.m3u", "one.mp3");
     const std::string name(200, 'd');

@@ -11,10 +11,14 @@
 #include <gtest/gtest.h>
 
 #include "services/media/MusicFolder.h"
-#include "tests/media/TemporaryFolder.h"
+#include "tests/base/TemporaryDirectory.h"
+#include "tests/media/Inventories.h"
 #include "tests/media/WatchedFolder.h"
+#include "tests/media/WithoutPrivileges.h"
 
 namespace quorl::media::test {
+
+using tests::TemporaryDirectory;
 
 namespace {
 
@@ -29,7 +33,7 @@ std::size_t lengthOfEventQueue() {
 } // namespace
 
 TEST(WatchTest, TheFirstInventoryIsToldAndThenThere) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     folder.write("List.m3u", "one.mp3\n");
     std::promise<std::shared_ptr<const Inventory>> told;
@@ -44,7 +48,7 @@ TEST(WatchTest, TheFirstInventoryIsToldAndThenThere) {
 }
 
 TEST(WatchTest, NobodyNeedsToListen) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("List.m3u", "");
     MusicFolder music(folder.path(), nullptr);
     std::promise<void> done;
@@ -58,7 +62,7 @@ TEST(WatchTest, NobodyNeedsToListen) {
 // Songs.
 
 TEST(WatchTest, AMissingSongThatIsAddedIsListed) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("List.m3u", "Album/one.mp3\n");
     WatchedFolder watched(folder.path());
 
@@ -71,7 +75,7 @@ TEST(WatchTest, AMissingSongThatIsAddedIsListed) {
 }
 
 TEST(WatchTest, ASongThatIsRemovedIsLeftOut) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Album/one.mp3"});
     folder.write("List.m3u", "Album/one.mp3\n");
     WatchedFolder watched(folder.path());
@@ -85,7 +89,7 @@ TEST(WatchTest, ASongThatIsRemovedIsLeftOut) {
 }
 
 TEST(WatchTest, ASongThatGrowsHasItsNewSizeAndThePlaylistANewRevision) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Album/one.mp3"}, 10);
     folder.write("List.m3u", "Album/one.mp3\n");
     WatchedFolder watched(folder.path());
@@ -100,7 +104,7 @@ TEST(WatchTest, ASongThatGrowsHasItsNewSizeAndThePlaylistANewRevision) {
 }
 
 TEST(WatchTest, ASongThatGetsAnotherTimeHasIt) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     folder.write("List.m3u", "one.mp3\n");
     WatchedFolder watched(folder.path());
@@ -112,7 +116,7 @@ TEST(WatchTest, ASongThatGetsAnotherTimeHasIt) {
 }
 
 TEST(WatchTest, ASongThatIsRenamedIsFoundUnderItsNewName) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     folder.write("Old.m3u", "one.mp3\n");
     folder.write("New.m3u", "two.mp3\n");
@@ -124,7 +128,7 @@ TEST(WatchTest, ASongThatIsRenamedIsFoundUnderItsNewName) {
 }
 
 TEST(WatchTest, WhatALinkLeadsToIsLookedAtWithEveryChange) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Album/one.mp3"}, 10);
     folder.link("links/favourite.mp3", "../Album/one.mp3");
     folder.write("List.m3u", "links/favourite.mp3\n");
@@ -138,7 +142,7 @@ TEST(WatchTest, WhatALinkLeadsToIsLookedAtWithEveryChange) {
 // Playlists.
 
 TEST(WatchTest, APlaylistThatIsAddedRenamedAndRemovedComesMovesAndGoes) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     WatchedFolder watched(folder.path());
 
@@ -153,7 +157,7 @@ TEST(WatchTest, APlaylistThatIsAddedRenamedAndRemovedComesMovesAndGoes) {
 }
 
 TEST(WatchTest, APlaylistThatIsEditedInPlaceListsTheNewSongs) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3", "two.mp3"});
     folder.write("lists/List.m3u", "../one.mp3\n");
     WatchedFolder watched(folder.path());
@@ -164,7 +168,7 @@ TEST(WatchTest, APlaylistThatIsEditedInPlaceListsTheNewSongs) {
 }
 
 TEST(WatchTest, APlaylistThatIsSavedByRenamingListsTheNewSongs) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3", "two.mp3"});
     folder.write("List.m3u", "one.mp3\n");
     WatchedFolder watched(folder.path());
@@ -175,7 +179,7 @@ TEST(WatchTest, APlaylistThatIsSavedByRenamingListsTheNewSongs) {
 }
 
 TEST(WatchTest, EditsInQuickSuccessionThatLeaveTheSizeAreAllSeen) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3", "two.mp3"});
     folder.write("List.m3u", "one.mp3\n");
     WatchedFolder watched(folder.path());
@@ -189,7 +193,7 @@ TEST(WatchTest, EditsInQuickSuccessionThatLeaveTheSizeAreAllSeen) {
 }
 
 TEST(WatchTest, APlaylistThatWasNotWrittenLatelyIsReadAgainAfterAnEdit) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3", "two.mp3"});
     folder.write("List.m3u", "one.mp3\n");
     folder.setModified("List.m3u", 1'600'000'000'000'000'000);
@@ -209,7 +213,7 @@ TEST(WatchTest, APlaylistThatWasNotWrittenLatelyIsReadAgainAfterAnEdit) {
 }
 
 TEST(WatchTest, APlaylistIsReadOnceItMayBe) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     folder.write("List.m3u", "one.mp3\n");
     folder.setPermissions("List.m3u", std::filesystem::perms::none);
@@ -226,7 +230,7 @@ TEST(WatchTest, APlaylistIsReadOnceItMayBe) {
 // Directories.
 
 TEST(WatchTest, ADirectoryIsReadOnceItMayBe) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"locked/one.mp3"});
     folder.write("locked/List.m3u", "one.mp3\n");
     folder.setPermissions("locked", std::filesystem::perms::none);
@@ -239,7 +243,7 @@ TEST(WatchTest, ADirectoryIsReadOnceItMayBe) {
 }
 
 TEST(WatchTest, ADirectoryThatIsMovedInIsReadAndWatchedAndOneMovedOutIsForgotten) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.makeDirectory("Music");
     folder.writeSongs({"outside/inner/one.mp3", "outside/inner/two.mp3"});
     folder.write("outside/inner/List.m3u", "one.mp3\n");
@@ -261,7 +265,7 @@ TEST(WatchTest, ADirectoryThatIsMovedInIsReadAndWatchedAndOneMovedOutIsForgotten
 }
 
 TEST(WatchTest, ADirectoryThatIsMovedWithinTheFolderIsStillWatched) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"z/album/one.mp3", "z/album/two.mp3"});
     folder.write("z/album/List.m3u", "one.mp3\n");
     folder.makeDirectory("a");
@@ -279,7 +283,7 @@ TEST(WatchTest, ADirectoryThatIsMovedWithinTheFolderIsStillWatched) {
 }
 
 TEST(WatchTest, ADirectoryThatIsDeletedAndMadeAnewIsWatched) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"album/one.mp3", "album/two.mp3"});
     folder.write("album/List.m3u", "one.mp3\n");
     WatchedFolder watched(folder.path());
@@ -298,7 +302,7 @@ TEST(WatchTest, ADirectoryThatIsDeletedAndMadeAnewIsWatched) {
 }
 
 TEST(WatchTest, ADirectoryThatIsReplacedByAnotherOfItsNameIsReadAndWatched) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Music/one.mp3"});
     folder.write("Music/album/List.m3u", "../one.mp3\n");
     folder.write("other/List.m3u", "../one.mp3\n../one.mp3\n");
@@ -317,7 +321,7 @@ TEST(WatchTest, ADirectoryThatIsReplacedByAnotherOfItsNameIsReadAndWatched) {
 }
 
 TEST(WatchTest, DirectoriesThatAreMadeOneInAnotherAreAllFound) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     WatchedFolder watched(folder.path());
 
     for (int round = 0; round < 20; ++round) {
@@ -331,7 +335,7 @@ TEST(WatchTest, DirectoriesThatAreMadeOneInAnotherAreAllFound) {
 // The music folder itself.
 
 TEST(WatchTest, AFolderThatIsDeletedIsEmptyAndFoundAgainWhenItIsMade) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"Music/one.mp3"});
     folder.write("Music/List.m3u", "one.mp3\n");
     WatchedFolder watched(folder / "Music");
@@ -351,7 +355,7 @@ TEST(WatchTest, AFolderThatIsDeletedIsEmptyAndFoundAgainWhenItIsMade) {
 }
 
 TEST(WatchTest, AFolderIsFoundWhenItAndTheDirectoriesAboveItAreMadeLater) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     WatchedFolder watched(folder / "home/user/Music");
     EXPECT_FALSE(watched.waitFor([](const Inventory&) { return true; })->rootFound);
 
@@ -363,7 +367,7 @@ TEST(WatchTest, AFolderIsFoundWhenItAndTheDirectoriesAboveItAreMadeLater) {
 }
 
 TEST(WatchTest, AFolderThatIsMovedAwayWithADirectoryAboveItIsEmptyUntilItIsBack) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"home/user/Music/one.mp3"});
     folder.write("home/user/Music/List.m3u", "one.mp3\n");
     WatchedFolder watched(folder / "home/user/Music");
@@ -379,7 +383,7 @@ TEST(WatchTest, AFolderThatIsMovedAwayWithADirectoryAboveItIsEmptyUntilItIsBack)
 }
 
 TEST(WatchTest, AFolderThatIsReplacedByAnotherIsReadAndWatched) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("Music/Old.m3u", "");
     folder.write("other/New.m3u", "");
     WatchedFolder watched(folder / "Music");
@@ -398,7 +402,7 @@ TEST(WatchTest, AFolderThatIsReplacedByAnotherIsReadAndWatched) {
 }
 
 TEST(WatchTest, AFolderThatIsALinkIsReadWhereTheLinkLeads) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("first/First.m3u", "");
     folder.write("second/Second.m3u", "");
     folder.link("Music", "first");
@@ -414,7 +418,7 @@ TEST(WatchTest, AFolderThatIsALinkIsReadWhereTheLinkLeads) {
 // What is told, and when.
 
 TEST(WatchTest, NothingIsToldWhenNothingOfInterestChanges) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     folder.write("List.m3u", "one.mp3\n");
     folder.setModified("List.m3u", 1'600'000'000'000'000'000);
@@ -434,7 +438,7 @@ TEST(WatchTest, NothingIsToldWhenNothingOfInterestChanges) {
 
 TEST(WatchTest, ChangesThatCameTogetherAreToldTogether) {
     constexpr int count = 500;
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     std::string entries;
     for (int song = 0; song < count; ++song) {
         entries += "Album/" + std::to_string(song) + ".mp3\n";
@@ -457,7 +461,7 @@ TEST(WatchTest, ChangesThatCameTogetherAreToldTogether) {
 }
 
 TEST(WatchTest, ChangesAreSeenAlsoWhenThereWereTooManyToRecord) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("noise/a", "");
     folder.write("noise/b", "");
     folder.write("quiet/List.m3u", "one.mp3\n");
@@ -479,7 +483,7 @@ TEST(WatchTest, ChangesAreSeenAlsoWhenThereWereTooManyToRecord) {
 }
 
 TEST(WatchTest, ARescanIsToldAsDoneAfterWhatItFound) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.writeSongs({"one.mp3"});
     WatchedFolder watched(folder.path());
 
@@ -493,7 +497,7 @@ TEST(WatchTest, ARescanIsToldAsDoneAfterWhatItFound) {
 // The end.
 
 TEST(WatchTest, AFolderCanBeDestroyedAtAnyMomentOfItsFirstScan) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     std::string entries;
     for (int directory = 0; directory < 200; ++directory) {
         const std::string song = std::to_string(directory) + "/one.mp3";
@@ -520,7 +524,7 @@ TEST(WatchTest, AFolderCanBeDestroyedAtAnyMomentOfItsFirstScan) {
 }
 
 TEST(WatchTest, DestructionWaitsForACallThatIsRunningAndMakesNoFurther) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     folder.write("List.m3u", "");
     std::promise<void> begun;
     std::promise<void> release;

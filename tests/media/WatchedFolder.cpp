@@ -5,7 +5,7 @@
 #include <stdexcept>
 #include <utility>
 
-#include "tests/media/TemporaryFolder.h"
+#include "tests/media/Inventories.h"
 
 namespace quorl::media::test {
 

@@ -43,7 +43,7 @@ class BrokenPlugin : public testing::Test {
     }
 
     SampleMusic music_;
-    media::test::TemporaryFolder plugins_;
+    TemporaryDirectory plugins_;
     std::filesystem::path bundle_ = plugins_ / "Broken.bundle";
     std::filesystem::path library_ = bundle_ / "libVeloraMusic.so";
 };

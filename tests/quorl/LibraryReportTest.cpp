@@ -56,7 +56,7 @@ TEST(LibraryReport, missingFolderEndsWithThreeAndSaysWhatToDo) {
 
 TEST(LibraryReport, withoutAnOptionReadsTheUsersMusicFolder) {
     const SampleMusic music;
-    const media::test::TemporaryFolder configuration;
+    const TemporaryDirectory configuration;
     configuration.write("user-dirs.dirs", "XDG_MUSIC_DIR=\"" + music.path() + "\"\n");
     QuorlProcess quorl({"--library"}, {{"XDG_CONFIG_HOME", configuration.path().string()}});
     EXPECT_EQ(quorl.end(), 0);

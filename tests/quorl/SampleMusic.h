@@ -1,6 +1,6 @@
 #pragma once
 
-#include "tests/media/TemporaryFolder.h"
+#include "tests/base/TemporaryDirectory.h"
 
 namespace quorl::tests {
 
@@ -10,7 +10,7 @@ class SampleMusic {
   public:
     SampleMusic();
 
-    [[nodiscard]] const media::test::TemporaryFolder& folder() const { return folder_; }
+    [[nodiscard]] const TemporaryDirectory& folder() const { return folder_; }
 
     [[nodiscard]] std::string path() const { return folder_.path().string(); }
 
@@ -18,7 +18,7 @@ class SampleMusic {
     void addPlaylist(const std::string& name) const;
 
   private:
-    media::test::TemporaryFolder folder_;
+    TemporaryDirectory folder_;
 };
 
 } // namespace quorl::tests

@@ -12,18 +12,18 @@
 
 #include "platform/InterfaceVersion.h"
 #include "runtime/plugins/PluginBundle.h"
+#include "tests/base/TemporaryDirectory.h"
 #include "tests/runtime/Digests.h"
 #include "tests/support/Damage.h"
 #include "tests/support/TestHost.h"
-#include "tests/wearable/TemporaryDirectory.h"
 
 namespace {
 
 using quorl::BundleError;
 using quorl::PluginBundle;
 using quorl::tests::bytesOf;
+using quorl::tests::TemporaryDirectory;
 using quorl::tests::TestHost;
-using quorl::wearable::testing::TemporaryDirectory;
 using std::filesystem::path;
 using testing::ElementsAre;
 using testing::HasSubstr;

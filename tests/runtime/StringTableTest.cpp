@@ -6,9 +6,9 @@
 
 #include <gmock/gmock.h>
 
+#include "tests/base/TemporaryDirectory.h"
 #include "tests/runtime/Digests.h"
 #include "tests/support/Damage.h"
-#include "tests/wearable/TemporaryDirectory.h"
 
 namespace {
 
@@ -17,7 +17,7 @@ using quorl::Digests;
 using quorl::StringTable;
 using quorl::tests::bytesOf;
 using quorl::tests::digestsOfTexts;
-using quorl::wearable::testing::TemporaryDirectory;
+using quorl::tests::TemporaryDirectory;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;

@@ -11,12 +11,12 @@
 
 #include "services/base/AtomicFile.h"
 #include "services/wearable/Attachment.h"
-#include "tests/wearable/TemporaryDirectory.h"
+#include "tests/base/TemporaryDirectory.h"
 
 namespace {
 
 using namespace quorl::wearable;
-using quorl::wearable::testing::TemporaryDirectory;
+using quorl::tests::TemporaryDirectory;
 using ::testing::HasSubstr;
 
 Manifest everything() {

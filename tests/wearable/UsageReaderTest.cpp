@@ -12,13 +12,13 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "tests/wearable/TemporaryDirectory.h"
+#include "tests/base/TemporaryDirectory.h"
 
 namespace {
 
 using namespace quorl::wearable;
 using namespace std::chrono_literals;
-using quorl::wearable::testing::TemporaryDirectory;
+using quorl::tests::TemporaryDirectory;
 
 constexpr auto forever = std::chrono::hours{1};
 

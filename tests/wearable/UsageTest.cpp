@@ -8,12 +8,12 @@
 #include <sys/statvfs.h>
 
 #include "services/base/AtomicFile.h"
-#include "tests/wearable/TemporaryDirectory.h"
+#include "tests/base/TemporaryDirectory.h"
 
 namespace {
 
 using namespace quorl::wearable;
-using quorl::wearable::testing::TemporaryDirectory;
+using quorl::tests::TemporaryDirectory;
 
 TEST(Usage, OfTheEmbeddedWearableCountsWhatIsUsedAgainstItsCapacity) {
     const TemporaryDirectory device;
