@@ -8,7 +8,7 @@
 #include <unordered_set>
 
 #include "quorl-syncd/transfer/ContentHash.h"
-#include "quorl-syncd/transfer/DeviceNames.h"
+#include "quorl-syncd/transfer/device/DeviceNames.h"
 #include "quorl-syncd/transfer/RateLimit.h"
 #include "services/base/AtomicFile.h"
 

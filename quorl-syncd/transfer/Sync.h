@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "quorl-syncd/transfer/Device.h"
+#include "quorl-syncd/transfer/device/Device.h"
 #include "quorl-syncd/transfer/Order.h"
 #include "quorl-syncd/transfer/SongSource.h"
 

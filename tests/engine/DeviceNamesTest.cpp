@@ -1,6 +1,6 @@
 // Names that every wearable can hold, whatever the song is called.
 
-#include "quorl-syncd/transfer/DeviceNames.h"
+#include "quorl-syncd/transfer/device/DeviceNames.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

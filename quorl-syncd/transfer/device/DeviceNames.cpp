@@ -1,4 +1,4 @@
-#include "quorl-syncd/transfer/DeviceNames.h"
+#include "quorl-syncd/transfer/device/DeviceNames.h"
 
 #include <algorithm>
 #include <array>

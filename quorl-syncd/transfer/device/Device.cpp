@@ -1,4 +1,4 @@
-#include "quorl-syncd/transfer/Device.h"
+#include "quorl-syncd/transfer/device/Device.h"
 
 #include <algorithm>
 #include <cerrno>
