@@ -19,7 +19,10 @@
 #include <unistd.h>
 
 #include "quorl-syncd/transfer/RateLimit.h"
+#include "quorl-syncd/transfer/SteadyClock.h"
 #include "quorl-syncd/transfer/Sync.h"
+#include "quorl-syncd/transfer/device/PosixDevice.h"
+#include "quorl-syncd/transfer/songs/PosixSongSource.h"
 #include "services/media/MusicFolder.h"
 
 namespace {
@@ -73,8 +76,13 @@ double secondsOfSync(const std::filesystem::path& music, const std::filesystem::
     const syncd::Order order{
         library, {playlist.id, playlist.revision, noLimit, 0}, wearable::Wearable::mounted(target)};
     syncd::RateLimit rate;
+    syncd::PosixSongSource songs;
+    const syncd::SteadyClock clock;
+    const syncd::SyncPorts ports{
+        [](const auto& wearable) { return std::make_unique<syncd::PosixDevice>(wearable); }, songs,
+        rate, clock};
     return secondsOf([&] {
-        const auto outcome = syncd::Sync{order, rate, {}, [](const syncd::CopyProgress&) {}}.run();
+        const auto outcome = syncd::Sync(order, ports, {}, [](const syncd::CopyProgress&) {}).run();
         if (outcome.kind != syncd::Outcome::Kind::Sent) {
             throw std::runtime_error{outcome.message};
         }

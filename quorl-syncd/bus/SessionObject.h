@@ -7,7 +7,7 @@
 
 #include <sdbus-c++/sdbus-c++.h>
 
-#include "quorl-syncd/transfer/Sync.h"
+#include "quorl-syncd/transfer/CopyProgress.h"
 
 namespace quorl::syncd {
 

@@ -10,13 +10,16 @@
 #include "quorl-syncd/bus/SessionObject.h"
 #include "quorl-syncd/bus/SleepInhibitor.h"
 #include "quorl-syncd/engine/SyncState.h"
+#include "quorl-syncd/transfer/SteadyClock.h"
+#include "quorl-syncd/transfer/device/PosixDevice.h"
+#include "quorl-syncd/transfer/songs/PosixSongSource.h"
 #include "services/base/AtomicFile.h"
 
 namespace quorl::syncd {
 
 namespace {
 
-using Clock = engine::BusLoop::Clock;
+using LoopClock = engine::BusLoop::Clock;
 using namespace std::chrono_literals;
 
 /// The app writes several values for one choice.
@@ -82,7 +85,7 @@ Engine::~Engine() {
 
 void Engine::preferencesDidChange() {
     givenUp_.reset();
-    settled_ = Clock::now() + settlingTime;
+    settled_ = LoopClock::now() + settlingTime;
     loop_.callAt(settled_, [this] { consider(); });
     consider();
 }
@@ -253,7 +256,7 @@ bool Engine::isSent(const wearable::Selection& selection) const {
 
 bool Engine::isDue(const Order& order) const {
     return isStartRequested_ ||
-           (Clock::now() >= settled_ && givenUp_ != order.selection && !isSent(order.selection));
+           (LoopClock::now() >= settled_ && givenUp_ != order.selection && !isSent(order.selection));
 }
 
 /// Begins or ends a sync, where what is wished for asks for it.
@@ -281,17 +284,22 @@ void Engine::begin(Order order) {
     run_->thread = std::jthread{[this, order = std::move(order)](const std::stop_token& stop) {
         const SleepInhibitor awake;
         CopyProgress last;
-        Clock::time_point told;
+        LoopClock::time_point told;
         const auto tell = [&](const CopyProgress& progress) {
-            const bool isStep = progress.songs != last.songs || told == Clock::time_point{};
-            if (!isStep && Clock::now() - told < timeBetweenUpdates) {
+            const bool isStep = progress.songs != last.songs || told == LoopClock::time_point{};
+            if (!isStep && LoopClock::now() - told < timeBetweenUpdates) {
                 return;
             }
             last = progress;
-            told = Clock::now();
+            told = LoopClock::now();
             loop_.post([this, progress] { run_->session->copied(progress); });
         };
-        const auto outcome = Sync{order, rate_, stop, tell}.run();
+        PosixSongSource songs;
+        const SteadyClock clock;
+        const SyncPorts ports{
+            [](const auto& wearable) { return std::make_unique<PosixDevice>(wearable); }, songs,
+            rate_, clock};
+        const auto outcome = Sync(order, ports, stop, tell).run();
         loop_.post([this, outcome] { finish(outcome); });
     }};
 }
@@ -349,7 +357,7 @@ void Engine::tellLastResult() {
 }
 
 void Engine::tryAgainLater() {
-    loop_.callAt(Clock::now() + retry_.next(), [this, failed = sessions_] {
+    loop_.callAt(LoopClock::now() + retry_.next(), [this, failed = sessions_] {
         // Where there was another session since, that one counts.
         if (failed == sessions_) {
             givenUp_.reset();

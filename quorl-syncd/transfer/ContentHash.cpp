@@ -2,16 +2,19 @@
 
 #include <array>
 #include <new>
+#include <vector>
 
 #include <xxhash.h>
+
+#include "quorl-syncd/transfer/Stopped.h"
 
 namespace quorl::syncd {
 
 void ContentHash::Free::operator()(XXH3_state_s* state) const { XXH3_freeState(state); }
 
-ContentHash::ContentHash() : state_{XXH3_createState()} {
+ContentHash::ContentHash() : state_(XXH3_createState()) {
     if (!state_ || XXH3_128bits_reset(state_.get()) != XXH_OK) {
-        throw std::bad_alloc{};
+        throw std::bad_alloc();
     }
 }
 
@@ -29,6 +32,26 @@ std::string ContentHash::text() const {
         text += digits[byte & 0xFU];
     }
     return text;
+}
+
+std::string hashOf(std::string_view text) {
+    ContentHash hash;
+    hash.add(std::as_bytes(std::span(text)));
+    return hash.text();
+}
+
+std::string hashOf(Reader& reader, const std::stop_token& stop) {
+    constexpr std::size_t pieceSize = 1 << 20;
+    ContentHash hash;
+    std::vector<std::byte> buffer(pieceSize);
+    for (;;) {
+        stopIf(stop);
+        const auto size = reader.read(buffer);
+        if (size == 0) {
+            return hash.text();
+        }
+        hash.add(std::span(buffer).first(size));
+    }
 }
 
 } // namespace quorl::syncd

@@ -3,7 +3,11 @@
 #include <cstddef>
 #include <memory>
 #include <span>
+#include <stop_token>
 #include <string>
+#include <string_view>
+
+#include "quorl-syncd/transfer/Reader.h"
 
 struct XXH3_state_s;
 
@@ -27,5 +31,10 @@ class ContentHash {
 
     std::unique_ptr<XXH3_state_s, Free> state_;
 };
+
+[[nodiscard]] std::string hashOf(std::string_view text);
+
+/// Of everything that is left to read. Throws `Stopped` soon after `stop` was requested.
+[[nodiscard]] std::string hashOf(Reader& reader, const std::stop_token& stop);
 
 } // namespace quorl::syncd

@@ -7,14 +7,14 @@ namespace quorl::syncd {
 
 void RateLimit::set(std::uint64_t bytesPerSecond) {
     {
-        const std::scoped_lock lock{mutex_};
+        const std::scoped_lock lock(mutex_);
         bytesPerSecond_ = bytesPerSecond;
     }
     changed_.notify_all();
 }
 
 std::uint64_t RateLimit::get() const {
-    const std::scoped_lock lock{mutex_};
+    const std::scoped_lock lock(mutex_);
     return bytesPerSecond_;
 }
 
@@ -29,11 +29,11 @@ std::size_t RateLimit::chunk() const {
 
 void RateLimit::pace(std::uint64_t bytes, const std::stop_token& stop) {
     const auto begun = std::chrono::steady_clock::now();
-    std::unique_lock lock{mutex_};
+    std::unique_lock lock(mutex_);
     while (bytesPerSecond_ != 0 && !stop.stop_requested()) {
         const auto rate = bytesPerSecond_;
-        const std::chrono::duration<double> duration{static_cast<double>(bytes) /
-                                                     static_cast<double>(rate)};
+        const std::chrono::duration<double> duration(static_cast<double>(bytes) /
+                                                     static_cast<double>(rate));
         const auto due = begun + std::chrono::ceil<std::chrono::steady_clock::duration>(duration);
         if (!changed_.wait_until(lock, stop, due, [&] { return bytesPerSecond_ != rate; })) {
             return;

@@ -4,8 +4,11 @@
 #include <fstream>
 #include <sstream>
 
-#include <fcntl.h>
-
+#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/RateLimit.h"
+#include "quorl-syncd/transfer/SteadyClock.h"
+#include "quorl-syncd/transfer/device/PosixDevice.h"
+#include "quorl-syncd/transfer/songs/PosixSongSource.h"
 #include "services/base/AtomicFile.h"
 #include "services/media/MusicFolder.h"
 
@@ -64,7 +67,14 @@ Order wishFor(const Music& music, const Player& player, std::uint64_t limitType,
 
 Outcome sync(const Order& order, const Sync::Told& told, std::stop_token stop) {
     RateLimit rate;
-    return Sync{order, rate, std::move(stop), told ? told : [](const CopyProgress&) {}}.run();
+    PosixSongSource songs;
+    const SteadyClock clock;
+    const SyncPorts ports{
+        [](const auto& wearable) { return std::make_unique<PosixDevice>(wearable); }, songs, rate,
+        clock};
+    return Sync(
+               order, ports, std::move(stop), told ? told : [](const CopyProgress&) {})
+        .run();
 }
 
 std::string whatIsWrongWith(const std::filesystem::path& wearable) {
@@ -72,11 +82,10 @@ std::string whatIsWrongWith(const std::filesystem::path& wearable) {
     const auto manifest = wearable::loadManifest(root.get());
     const auto music = wearable / wearable::musicDirectory;
     for (const auto& song : manifest.songs) {
-        const base::FileDescriptor file{open((music / song.name).c_str(), O_RDONLY | O_CLOEXEC)};
-        if (!file) {
+        if (!std::filesystem::exists(music / song.name)) {
             return song.name + " is not there";
         }
-        if (hashOf(file.get(), {}) != song.hash) {
+        if (hashOf(textOf(music / song.name)) != song.hash) {
             return song.name + " is not complete";
         }
     }

@@ -4,7 +4,6 @@
 #include <string>
 #include <vector>
 
-#include "quorl-syncd/transfer/RateLimit.h"
 #include "quorl-syncd/transfer/Sync.h"
 #include "services/preferences/Preference.h"
 #include "tests/base/TemporaryDirectory.h"

@@ -1,81 +1,94 @@
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
+#include <memory>
+#include <optional>
+#include <span>
 #include <string>
-#include <string_view>
 #include <vector>
 
-#include "services/base/FileDescriptor.h"
+#include "quorl-syncd/transfer/Reader.h"
+#include "services/base/FileStatus.h"
 #include "services/wearable/Manifest.h"
-#include "services/wearable/Wearable.h"
 
 namespace quorl::syncd {
 
-/// The directory of a wearable, open for one sync. What happens to its path in the meantime makes
-/// no difference: everything goes to the directory that was there at the beginning.
+/// A file on the device that is not in the music directory yet, open for writing. Every failure
+/// throws `std::system_error`. The file stays behind, incomplete, when this is destroyed.
+class UnfinishedFile {
+  public:
+    virtual ~UnfinishedFile() = default;
+
+    /// Has the empty file share the contents of an open file of this machine, so that nothing has
+    /// to be written. False: the device cannot, and the file is as it was.
+    [[nodiscard]] virtual bool share(int descriptor) = 0;
+
+    /// Appends. What is written need not be on the device before `sync`.
+    virtual void write(std::span<const std::byte> bytes) = 0;
+
+    /// Nothing more is written. Gives the file its modification time, in nanoseconds since 1970,
+    /// where the device keeps any, and has the device begin with what it still holds back.
+    virtual void complete(std::int64_t modified) = 0;
+
+    /// Waits until the contents outlive a loss of power. Whether the file is there then, and under
+    /// which name, is the matter of `Device::finish` and `Device::syncMusic`.
+    virtual void sync() = 0;
+};
+
+/// A wearable, open for one sync, which nobody else can open meanwhile. The only way in which a
+/// sync touches it. One thread.
 ///
-/// Every failure throws `std::system_error`, unless another one is named.
+/// There are two directories: the music directory, in which there may be files of others, and one
+/// of our own, which holds the manifest and unfinished files. Every failure throws
+/// `std::system_error`, unless another one is named; the errors that have a sentence of their own
+/// are in `troubleOf`.
 class Device {
   public:
-    /// Opens the wearable and makes the directories that we need on it. Throws `std::runtime_error`
-    /// with a sentence when another program is syncing to it.
-    explicit Device(const wearable::Wearable& wearable);
+    /// What to do where there is a file of the new name already.
+    enum class IfThere { Fail, Replace };
 
-    [[nodiscard]] wearable::Manifest loadManifest() const {
-        return wearable::loadManifest(root_.get());
-    }
+    virtual ~Device() = default;
 
-    void save(const wearable::Manifest& manifest) const {
-        wearable::saveManifest(root_.get(), manifest);
-    }
+    /// Empty where there is none. Throws `wearable::BadManifest` where it cannot be understood.
+    [[nodiscard]] virtual wearable::Manifest loadManifest() = 0;
+
+    /// Puts it in the place of the old one, and returns once it outlives a loss of power. At every
+    /// moment there is one of the two, as a whole.
+    virtual void saveManifest(const wearable::Manifest& manifest) = 0;
 
     /// What may still be written, in bytes.
-    [[nodiscard]] std::uint64_t available() const;
+    [[nodiscard]] virtual std::uint64_t available() = 0;
 
     /// Of everything in the music directory, whoever put it there.
-    [[nodiscard]] std::vector<std::string> musicNames() const;
+    [[nodiscard]] virtual std::vector<std::string> musicNames() = 0;
 
-    /// Whether the file of an entry that was complete is still there.
-    [[nodiscard]] bool has(const wearable::Entry& entry) const;
+    /// The regular file of this name in the music directory; nothing where there is none.
+    [[nodiscard]] virtual std::optional<base::FileState> find(const std::string& name) = 0;
 
-    /// Whether there is a file of this name in the music directory.
-    [[nodiscard]] bool hasFile(const std::string& name) const;
+    /// Opens a file of the music directory. Reading throws `std::system_error`.
+    [[nodiscard]] virtual std::unique_ptr<Reader> openMusic(const std::string& name) = 0;
 
-    /// Whether the file of this name is the one that we were about to put there or to remove, and
-    /// not one that somebody else has put there since.
-    [[nodiscard]] bool isOurs(const wearable::Entry& stray) const;
+    /// Removes a file of the music directory; one that is gone already is no failure. Only outlives
+    /// a loss of power after `syncMusic`.
+    virtual void removeMusic(const std::string& name) = 0;
 
-    /// Opens a file of the music directory for reading.
-    [[nodiscard]] base::FileDescriptor openMusic(const std::string& name) const;
+    /// Makes an empty file in our own directory, or empties the one of that name.
+    [[nodiscard]] virtual std::unique_ptr<UnfinishedFile>
+    createUnfinished(const std::string& name) = 0;
 
-    void removeMusic(const std::string& name) const;
+    /// Moves a file that is complete into the music directory, at once and as a whole. With
+    /// `IfThere::Fail` throws `EEXIST` where there is a file of that name. Only outlives a loss of
+    /// power after `syncMusic`.
+    virtual void finish(const std::string& unfinished, const std::string& name,
+                        IfThere ifThere) = 0;
 
-    /// Makes an empty file that is not in the music directory yet.
-    [[nodiscard]] base::FileDescriptor createUnfinished(const std::string& name) const;
+    /// Removes all that `createUnfinished` has made and `finish` has not moved, in this sync and in
+    /// earlier ones.
+    virtual void removeUnfinished() = 0;
 
-    /// Moves a complete file into the music directory. Throws `EEXIST` where there is a file of
-    /// that name. Only outlives a loss of power after `syncMusic`.
-    void finish(const std::string& unfinished, const std::string& name) const;
-
-    /// Removes all that `createUnfinished` has made, in this sync and in earlier ones.
-    void removeUnfinished() const;
-
-    void syncMusic() const;
-
-    /// Writes a small file of the music directory, and waits until it is on the device. Throws
-    /// `EEXIST` where there is a file of that name.
-    void writeMusic(const std::string& name, std::string_view text) const;
-
-    /// As `writeMusic`, in the place of a file of which it is known that it is ours.
-    void replaceMusic(const std::string& name, std::string_view text) const;
-
-  private:
-    void writeUnfinished(const std::string& name, std::string_view text) const;
-
-    wearable::Wearable wearable_;
-    base::FileDescriptor root_;
-    base::FileDescriptor music_;
-    base::FileDescriptor own_;
+    /// Waits until the names in the music directory outlive a loss of power.
+    virtual void syncMusic() = 0;
 };
 
 } // namespace quorl::syncd

@@ -1,0 +1,118 @@
+#include "quorl-syncd/transfer/Copier.h"
+
+#include <algorithm>
+#include <iterator>
+#include <system_error>
+#include <utility>
+
+#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/Stopped.h"
+
+namespace quorl::syncd {
+
+namespace {
+
+using wearable::Entry;
+
+constexpr std::size_t largestPiece = 1 << 20;
+
+} // namespace
+
+Copier::Copier(const Work& work, const CopyProgress& progress)
+    : work_(work), progress_(progress), rule_(work.ports.clock.now()) {}
+
+std::vector<std::string> Copier::copy(std::vector<Entry>& songs) {
+    std::vector<std::string> problems;
+    for (auto& song : songs) {
+        if (!song.hash.empty()) {
+            continue;
+        }
+        try {
+            copySong(song);
+        } catch (const SongProblem& problem) {
+            problems.emplace_back(problem.what());
+        } catch (const Stopped&) {
+            commit();
+            throw;
+        }
+        if (rule_.isDue(work_.ports.clock.now())) {
+            commit();
+        }
+    }
+    commit();
+    std::erase_if(songs, [](const Entry& song) { return song.hash.empty(); });
+    return problems;
+}
+
+void Copier::copySong(Entry& song) {
+    auto unfinished = std::to_string(copied_.size());
+    const auto source = work_.ports.songs.open(work_.root, song.source, {song.size, song.modified});
+    auto destination = work_.device.createUnfinished(unfinished);
+    try {
+        auto hash = copyContents(*source, *destination, song.size);
+        source->requireUnchanged();
+        destination->complete(song.modified);
+        song.hash = std::move(hash);
+    } catch (const std::system_error& error) {
+        if (error.code() == std::errc::file_too_large) {
+            throw SongProblem(SongTrouble::TooLarge, song.name);
+        }
+        throw;
+    }
+    rule_.songWasCopied(song.size);
+    copied_.push_back({song, std::move(unfinished), std::move(destination)});
+}
+
+/// Gives back the hash of the contents, for which they are read in any case; a copy within the
+/// kernel would read them a second time.
+std::string Copier::copyContents(OpenSong& source, UnfinishedFile& destination,
+                                 std::uint64_t size) {
+    const bool isShared = destination.share(source.descriptor());
+    const auto mostBytes = progress_.bytes + size;
+    ContentHash hash;
+    std::vector<std::byte> buffer(largestPiece);
+    for (std::uint64_t copied = 0;;) {
+        stopIf(work_.stop);
+        const auto most = std::min(work_.ports.throttle.chunk(), largestPiece);
+        const auto piece = std::span(buffer).first(source.read(std::span(buffer).first(most)));
+        if (piece.empty()) {
+            return hash.text();
+        }
+        hash.add(piece);
+        if (!isShared) {
+            destination.write(piece);
+        }
+        copied += piece.size();
+        if (copied > size) {
+            source.requireUnchanged();
+        }
+        work_.ports.throttle.pace(piece.size(), work_.stop);
+        pieceWasCopied(piece.size(), mostBytes);
+    }
+}
+
+void Copier::pieceWasCopied(std::uint64_t bytes, std::uint64_t mostBytes) {
+    progress_.bytes = std::min(progress_.bytes + bytes, mostBytes);
+    work_.told(progress_);
+}
+
+/// Brings the copies onto the device, under the names that they are to have.
+void Copier::commit() {
+    const auto begun = work_.ports.clock.now();
+    for (const auto& [song, unfinished, file] : copied_) {
+        file->sync();
+        work_.device.finish(unfinished, song.name, Device::IfThere::Fail);
+    }
+    if (!copied_.empty()) {
+        work_.device.syncMusic();
+    }
+    std::vector<Entry> songs;
+    std::ranges::transform(copied_, std::back_inserter(songs), &Copied::song);
+    work_.ledger.songsAreThere(songs);
+    progress_.songs += copied_.size();
+    copied_.clear();
+    rule_.groupWasCommitted(begun, work_.ports.clock.now());
+    work_.told(progress_);
+}
+
+} // namespace quorl::syncd

@@ -1,0 +1,63 @@
+#pragma once
+
+#include <filesystem>
+#include <functional>
+#include <memory>
+#include <stop_token>
+#include <string>
+#include <vector>
+
+#include "quorl-syncd/transfer/CommitRule.h"
+#include "quorl-syncd/transfer/CopyProgress.h"
+#include "quorl-syncd/transfer/Ledger.h"
+#include "quorl-syncd/transfer/SyncPorts.h"
+
+namespace quorl::syncd {
+
+/// Copies songs to a device, and brings them onto it in groups. Once.
+class Copier {
+  public:
+    using Told = std::function<void(const CopyProgress&)>;
+
+    /// What a copier works on; all of it outlives the copier.
+    struct Work {
+        const SyncPorts& ports;
+        Device& device;
+        Ledger& ledger;
+        /// The music folder.
+        const std::filesystem::path& root;
+        const std::stop_token& stop;
+        const Told& told;
+    };
+
+    /// @param progress what there is to copy.
+    Copier(const Work& work, const CopyProgress& progress);
+
+    /// Copies those of `songs` that have no hash, under the names that they have, and gives them
+    /// their hashes. Those that cannot be copied are taken out of `songs`.
+    ///
+    /// Gives back a sentence for each of these. Throws `Stopped`, when all that was copied is on
+    /// the device, and what the device throws.
+    [[nodiscard]] std::vector<std::string> copy(std::vector<wearable::Entry>& songs);
+
+  private:
+    /// A song whose copy is complete, but perhaps not on the device yet.
+    struct Copied {
+        wearable::Entry song;
+        std::string unfinished;
+        std::unique_ptr<UnfinishedFile> file;
+    };
+
+    void copySong(wearable::Entry& song);
+    [[nodiscard]] std::string copyContents(OpenSong& source, UnfinishedFile& destination,
+                                           std::uint64_t size);
+    void pieceWasCopied(std::uint64_t bytes, std::uint64_t mostBytes);
+    void commit();
+
+    const Work work_;
+    CopyProgress progress_;
+    CommitRule rule_;
+    std::vector<Copied> copied_;
+};
+
+} // namespace quorl::syncd

@@ -1,0 +1,83 @@
+#include "quorl-syncd/transfer/Ledger.h"
+
+#include <algorithm>
+#include <iterator>
+#include <unordered_set>
+#include <utility>
+
+namespace quorl::syncd {
+
+namespace {
+
+using wearable::Entry;
+
+template <class Entries>
+void eraseNamesOf(const Entries& named, std::vector<Entry>& entries) {
+    std::unordered_set<std::string> names;
+    std::ranges::transform(named, std::inserter(names, names.end()), &Entry::name);
+    std::erase_if(entries, [&](const Entry& entry) { return names.contains(entry.name); });
+}
+
+void eraseName(const Entry& named, std::vector<Entry>& entries) {
+    std::erase_if(entries, [&](const Entry& entry) { return entry.name == named.name; });
+}
+
+} // namespace
+
+Ledger::Ledger(Device& device)
+    : device_(device), manifest_(device.loadManifest()), saved_(manifest_) {}
+
+void Ledger::save() {
+    if (manifest_ != saved_) {
+        device_.saveManifest(manifest_);
+        saved_ = manifest_;
+    }
+}
+
+void Ledger::replaceByWhatIsThere(wearable::Manifest manifest) { manifest_ = std::move(manifest); }
+
+void Ledger::adopt(const Entry& song) {
+    eraseName(song, manifest_.strays);
+    manifest_.songs.push_back(song);
+}
+
+void Ledger::straysAreGone() { manifest_.strays.clear(); }
+
+void Ledger::announce(const Entry& entry) {
+    eraseName(entry, manifest_.strays);
+    manifest_.strays.push_back(entry);
+}
+
+void Ledger::beginChanges() {
+    if (manifest_ != saved_) {
+        manifest_.sent.reset();
+    }
+    save();
+}
+
+void Ledger::songsAreThere(std::span<const Entry> songs) {
+    eraseNamesOf(songs, manifest_.strays);
+    manifest_.songs.insert(manifest_.songs.end(), songs.begin(), songs.end());
+}
+
+void Ledger::playlistIsThere(const Entry& playlist) {
+    eraseName(playlist, manifest_.strays);
+    const auto old = std::exchange(manifest_.playlist, playlist);
+    if (old && old->name != playlist.name) {
+        manifest_.strays.push_back(*old);
+    }
+}
+
+void Ledger::keepOnly(const std::vector<Entry>& songs) {
+    auto old = std::exchange(manifest_.songs, songs);
+    eraseNamesOf(songs, old);
+    eraseNamesOf(songs, manifest_.strays);
+    manifest_.strays.insert(manifest_.strays.end(), old.begin(), old.end());
+    if (!manifest_.strays.empty()) {
+        manifest_.sent.reset();
+    }
+}
+
+void Ledger::wasSent(const wearable::Selection& selection) { manifest_.sent = selection; }
+
+} // namespace quorl::syncd

@@ -1,0 +1,59 @@
+#pragma once
+
+#include <span>
+#include <string>
+#include <vector>
+
+#include "quorl-syncd/transfer/device/Device.h"
+#include "services/wearable/Manifest.h"
+
+namespace quorl::syncd {
+
+/// What of ours is on a device, or about to be. Each step of a sync is written here before it is
+/// done, or after, so that the list on the device is right whenever the power goes: between two
+/// calls of `save` the device must only be changed in ways that both lists allow.
+class Ledger {
+  public:
+    /// Reads the list of the device, which outlives the ledger.
+    explicit Ledger(Device& device);
+
+    [[nodiscard]] const wearable::Manifest& manifest() const { return manifest_; }
+
+    /// Writes the list where it differs from the one on the device.
+    void save();
+
+    /// The device was looked through: what is not in `manifest` is not there.
+    void replaceByWhatIsThere(wearable::Manifest manifest);
+
+    /// A file that an earlier sync has left behind is a complete song.
+    void adopt(const wearable::Entry& song);
+
+    /// Files that were about to be copied or removed are not there any more.
+    void straysAreGone();
+
+    /// A file is about to be put on the device under a name that is free.
+    void announce(const wearable::Entry& entry);
+
+    /// What is on the device is about to change, if this ledger says so; saves that.
+    void beginChanges();
+
+    /// Announced songs are there, complete.
+    void songsAreThere(std::span<const wearable::Entry> songs);
+
+    /// The playlist is there. The one before is to be removed, if it has another name.
+    void playlistIsThere(const wearable::Entry& playlist);
+
+    /// All other songs, and what was announced and never came, are to be removed.
+    void keepOnly(const std::vector<wearable::Entry>& songs);
+
+    /// Everything of the selection is there.
+    void wasSent(const wearable::Selection& selection);
+
+  private:
+    Device& device_;
+    wearable::Manifest manifest_;
+    /// As it was when it was last read or written.
+    wearable::Manifest saved_;
+};
+
+} // namespace quorl::syncd

@@ -1,0 +1,240 @@
+#include "quorl-syncd/transfer/Plan.h"
+
+#include <algorithm>
+#include <filesystem>
+#include <limits>
+#include <unordered_map>
+#include <unordered_set>
+
+#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/device/DeviceNames.h"
+#include "quorl-syncd/transfer/songs/SongProblem.h"
+#include "services/base/Utf8.h"
+
+namespace quorl::syncd {
+
+namespace {
+
+using wearable::Entry;
+
+/// FAT keeps times to two seconds.
+bool isSameTime(std::int64_t first, std::int64_t second) {
+    constexpr std::uint64_t tolerance = 2'000'000'000;
+    const auto [earlier, later] = std::minmax(first, second);
+    return static_cast<std::uint64_t>(later) - static_cast<std::uint64_t>(earlier) <= tolerance;
+}
+
+const base::FileState* fileOf(const Entry& entry, const Files& files) {
+    const auto found = files.find(entry.name);
+    return found == files.end() ? nullptr : &found->second;
+}
+
+bool isThere(const Entry& entry, const Files& files) {
+    const auto* const file = fileOf(entry, files);
+    return file != nullptr && file->size == entry.size;
+}
+
+/// Whether it is what we were about to put there or to remove, and not a file that somebody else
+/// has put there since.
+bool isOurs(const Entry& stray, const Files& files, const Hashes& hashes) {
+    return isThere(stray, files) &&
+           (isSameTime(fileOf(stray, files)->modified, stray.modified) ||
+            (!stray.hash.empty() && hashes.ofCopy(stray.name) == stray.hash));
+}
+
+/// By source, of which there may be an old and a new copy.
+using Index = std::unordered_multimap<std::string, const Entry*>;
+
+Index indexOf(const std::vector<Entry>& entries) {
+    Index index;
+    for (const auto& entry : entries) {
+        index.emplace(entry.source, &entry);
+    }
+    return index;
+}
+
+/// One of the entries with this source, which `isWanted`; null: there is none.
+template <class IsWanted>
+const Entry* findIn(const Index& index, const std::string& source, IsWanted isWanted) {
+    const auto [begin, end] = index.equal_range(source);
+    const auto found =
+        std::find_if(begin, end, [&](const auto& each) { return isWanted(*each.second); });
+    return found == end ? nullptr : found->second;
+}
+
+/// A song whose time alone has changed need not be copied again.
+bool isCopyOf(const Entry& song, const Entry& copy, const Hashes& hashes) {
+    return copy.size == song.size &&
+           (copy.modified == song.modified || hashes.ofSong(song) == copy.hash);
+}
+
+/// A copy that an interrupted sync has left behind counts if it is like the song, byte for byte.
+/// Gives back the hash of both; empty where it is not.
+std::string hashOfBoth(const Entry& song, const Entry& stray, const Hashes& hashes) {
+    if (stray.size != song.size || stray.modified != song.modified) {
+        return {};
+    }
+    const auto hash = hashes.ofSong(song);
+    return hashes.ofCopy(stray.name) == hash ? hash : std::string();
+}
+
+std::vector<Entry> wishedFor(const Order& order) {
+    std::vector<Entry> songs;
+    std::unordered_set<media::SongIndex> seen;
+    for (const auto index : songsWithinLimit(order)) {
+        if (seen.insert(index).second) {
+            const auto song = order.library->songs[index];
+            songs.push_back({"", song.path(), song.size, song.modified, ""});
+        }
+    }
+    return songs;
+}
+
+std::uint64_t sum(std::uint64_t first, std::uint64_t second) {
+    const auto most = std::numeric_limits<std::uint64_t>::max();
+    return first > most - second ? most : first + second;
+}
+
+/// Finds out which songs are there.
+class Matching {
+  public:
+    Matching(Plan& plan, const wearable::Manifest& there, const Hashes& hashes)
+        : plan_(plan),
+          hashes_(hashes),
+          songs_(indexOf(there.songs)),
+          strays_(indexOf(there.strays)) {}
+
+    void add(Entry song) {
+        try {
+            if (!findCopy(song) && !findStray(song)) {
+                ++plan_.progress.totalSongs;
+                plan_.progress.totalBytes = sum(plan_.progress.totalBytes, song.size);
+            }
+            plan_.songs.push_back(std::move(song));
+        } catch (const SongProblem& problem) {
+            plan_.problems.emplace_back(problem.what());
+        }
+    }
+
+  private:
+    bool findCopy(Entry& song) const {
+        const auto* const copy = findIn(
+            songs_, song.source, [&](const Entry& each) { return isCopyOf(song, each, hashes_); });
+        if (copy != nullptr) {
+            song.name = copy->name;
+            song.hash = copy->hash;
+        }
+        return copy != nullptr;
+    }
+
+    bool findStray(Entry& song) const {
+        const auto* const stray = findIn(strays_, song.source, [&](const Entry& each) {
+            song.hash = hashOfBoth(song, each, hashes_);
+            return !song.hash.empty();
+        });
+        if (stray != nullptr) {
+            song.name = stray->name;
+            plan_.adopted.push_back(song);
+        }
+        return stray != nullptr;
+    }
+
+    Plan& plan_;
+    const Hashes& hashes_;
+    const Index songs_;
+    const Index strays_;
+};
+
+std::vector<Entry> without(const std::vector<Entry>& adopted, std::vector<Entry> strays) {
+    std::erase_if(strays, [&](const Entry& stray) {
+        return std::ranges::find(adopted, stray.name, &Entry::name) != adopted.end();
+    });
+    return strays;
+}
+
+/// The names that are there once `removed` is gone, as devices may spell them.
+TakenNames takenNames(const std::vector<std::string>& names, const std::vector<Entry>& removed) {
+    std::unordered_set<std::string> free;
+    for (const auto& entry : removed) {
+        free.insert(base::composed(entry.name));
+    }
+    TakenNames taken;
+    for (const auto& name : names) {
+        if (!free.contains(base::composed(name))) {
+            taken.add(name);
+        }
+    }
+    return taken;
+}
+
+void choosePlaylist(Plan& plan, const Order& order, const std::optional<Entry>& there,
+                    TakenNames& names) {
+    const auto& title = order.playlist().name;
+    plan.isPlaylistNew = !there || there->source != title;
+    if (plan.isPlaylistNew) {
+        const auto text = playlistText(order, plan.songs);
+        plan.playlist = {names.take(title + ".m3u8"), title, text.size(), 0, hashOf(text)};
+    } else {
+        plan.playlist = *there;
+    }
+}
+
+} // namespace
+
+wearable::Manifest whatIsThere(wearable::Manifest manifest, const Files& files,
+                               const Hashes& hashes) {
+    std::erase_if(manifest.strays,
+                  [&](const Entry& stray) { return !isOurs(stray, files, hashes); });
+    if (std::erase_if(manifest.songs, [&](const Entry& song) { return !isThere(song, files); }) >
+        0) {
+        manifest.sent.reset();
+    }
+    if (manifest.playlist && !isThere(*manifest.playlist, files)) {
+        manifest.sent.reset();
+        // It may have been replaced by a sync that was then interrupted.
+        manifest.playlist->hash.clear();
+        if (fileOf(*manifest.playlist, files) == nullptr) {
+            manifest.playlist.reset();
+        }
+    }
+    return manifest;
+}
+
+Plan planOf(const Order& order, const wearable::Manifest& there,
+            const std::vector<std::string>& names, const Hashes& hashes) {
+    Plan plan;
+    Matching matching(plan, there, hashes);
+    for (auto& song : wishedFor(order)) {
+        matching.add(std::move(song));
+    }
+    plan.useless = without(plan.adopted, there.strays);
+    auto taken = takenNames(names, plan.useless);
+    for (auto& song : plan.songs) {
+        if (song.hash.empty()) {
+            song.name = taken.take(std::filesystem::path(song.source).filename().native());
+        }
+    }
+    choosePlaylist(plan, order, there.playlist, taken);
+    return plan;
+}
+
+std::string playlistText(const Order& order, const std::vector<Entry>& songs) {
+    std::unordered_map<std::string_view, std::string_view> names;
+    for (const auto& song : songs) {
+        names.emplace(song.source, song.name);
+    }
+    auto title = order.playlist().name;
+    std::ranges::replace_if(
+        title, [](unsigned char byte) { return byte < ' '; }, ' ');
+    std::string text = "#EXTM3U\n#PLAYLIST:" + title + "\n";
+    for (const auto index : songsWithinLimit(order)) {
+        const auto name = names.find(order.library->songs[index].path());
+        if (name != names.end()) {
+            // What begins with # would be a comment.
+            text.append(name->second.starts_with('#') ? "./" : "").append(name->second) += '\n';
+        }
+    }
+    return text;
+}
+
+} // namespace quorl::syncd

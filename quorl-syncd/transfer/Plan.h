@@ -1,0 +1,62 @@
+#pragma once
+
+#include <functional>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "quorl-syncd/transfer/CopyProgress.h"
+#include "quorl-syncd/transfer/Order.h"
+#include "services/base/FileStatus.h"
+#include "services/wearable/Manifest.h"
+
+/// What is to be done to a device, worked out from plain values.
+namespace quorl::syncd {
+
+/// Contents that have to be compared where names, sizes and times do not tell enough. What they
+/// throw ends the planning, but for `SongProblem`, which leaves out the song.
+struct Hashes {
+    /// Of a song of the music folder.
+    std::function<std::string(const wearable::Entry& song)> ofSong;
+    /// Of the file of this name in the device's music directory.
+    std::function<std::string(const std::string& name)> ofCopy;
+};
+
+/// Regular files of a music directory, by name.
+using Files = std::map<std::string, base::FileState>;
+
+/// The part of `manifest` that is true of a device.
+/// @param files those that the manifest names, where they are there.
+[[nodiscard]] wearable::Manifest whatIsThere(wearable::Manifest manifest, const Files& files,
+                                             const Hashes& hashes);
+
+/// What an order asks for on a certain device.
+struct Plan {
+    /// The songs that are to be there, in the order of the playlist, each once. Those without a
+    /// hash are not there yet, and to be copied under these names.
+    std::vector<wearable::Entry> songs;
+    /// Those of `songs` that an earlier sync has left behind, complete.
+    std::vector<wearable::Entry> adopted;
+    /// Files that an earlier sync has left behind and that are of no use.
+    std::vector<wearable::Entry> useless;
+    /// The playlist as it will be if all songs can be copied.
+    wearable::Entry playlist;
+    /// There is no such file yet.
+    bool isPlaylistNew = false;
+    /// What there is to copy; nothing of it is done.
+    CopyProgress progress;
+    /// A sentence for each song that cannot be sent.
+    std::vector<std::string> problems;
+};
+
+/// @param there as `whatIsThere` has given it.
+/// @param names of all that is in the device's music directory, whoever put it there.
+[[nodiscard]] Plan planOf(const Order& order, const wearable::Manifest& there,
+                          const std::vector<std::string>& names, const Hashes& hashes);
+
+/// The playlist file of the order, with those of its songs that are among `songs`, under the names
+/// that they have on the device.
+[[nodiscard]] std::string playlistText(const Order& order,
+                                       const std::vector<wearable::Entry>& songs);
+
+} // namespace quorl::syncd

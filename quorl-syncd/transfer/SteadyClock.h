@@ -1,0 +1,13 @@
+#pragma once
+
+#include "quorl-syncd/transfer/Clock.h"
+
+namespace quorl::syncd {
+
+/// The clock of this machine.
+class SteadyClock final : public Clock {
+  public:
+    [[nodiscard]] TimePoint now() const override { return std::chrono::steady_clock::now(); }
+};
+
+} // namespace quorl::syncd
