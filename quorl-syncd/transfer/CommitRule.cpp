@@ -10,7 +10,7 @@ constexpr std::size_t mostSongs = 64;
 constexpr std::uint64_t smallestLimit = std::uint64_t{16} << 20;
 constexpr std::uint64_t largestLimit = std::uint64_t{512} << 20;
 constexpr std::chrono::seconds longest{1};
-constexpr auto quickly = longest / 4;
+constexpr auto quickly = longest / 4.0;
 
 } // namespace
 
