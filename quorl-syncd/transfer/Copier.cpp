@@ -18,8 +18,8 @@ constexpr std::size_t largestPiece = 1 << 20;
 
 } // namespace
 
-Copier::Copier(const Work& work, const CopyProgress& progress)
-    : work_(work), progress_(progress), rule_(work.ports.clock.now()) {}
+Copier::Copier(const Means& means, const CopyProgress& progress)
+    : means_(means), progress_(progress), rule_(means.ports.clock.now()) {}
 
 std::vector<std::string> Copier::copy(std::vector<Entry>& songs) {
     std::vector<std::string> problems;
@@ -35,7 +35,7 @@ std::vector<std::string> Copier::copy(std::vector<Entry>& songs) {
             commit();
             throw;
         }
-        if (rule_.isDue(work_.ports.clock.now())) {
+        if (rule_.isDue(means_.ports.clock.now())) {
             commit();
         }
     }
@@ -46,8 +46,9 @@ std::vector<std::string> Copier::copy(std::vector<Entry>& songs) {
 
 void Copier::copySong(Entry& song) {
     auto unfinished = std::to_string(copied_.size());
-    const auto source = work_.ports.songs.open(work_.root, song.source, {song.size, song.modified});
-    auto destination = work_.device.createUnfinished(unfinished);
+    const auto source =
+        means_.ports.songs.open(means_.root, song.source, {song.size, song.modified});
+    auto destination = means_.device.createUnfinished(unfinished);
     try {
         auto hash = copyContents(*source, *destination, song.size);
         source->requireUnchanged();
@@ -72,8 +73,8 @@ std::string Copier::copyContents(OpenSong& source, UnfinishedFile& destination,
     ContentHash hash;
     std::vector<std::byte> buffer(largestPiece);
     for (std::uint64_t copied = 0;;) {
-        stopIf(work_.stop);
-        const auto most = std::min(work_.ports.throttle.chunk(), largestPiece);
+        stopIf(means_.stop);
+        const auto most = std::min(means_.ports.throttle.chunk(), largestPiece);
         const auto piece = std::span(buffer).first(source.read(std::span(buffer).first(most)));
         if (piece.empty()) {
             return hash.text();
@@ -86,33 +87,33 @@ std::string Copier::copyContents(OpenSong& source, UnfinishedFile& destination,
         if (copied > size) {
             source.requireUnchanged();
         }
-        work_.ports.throttle.pace(piece.size(), work_.stop);
+        means_.ports.throttle.pace(piece.size(), means_.stop);
         pieceWasCopied(piece.size(), mostBytes);
     }
 }
 
 void Copier::pieceWasCopied(std::uint64_t bytes, std::uint64_t mostBytes) {
     progress_.bytes = std::min(progress_.bytes + bytes, mostBytes);
-    work_.told(progress_);
+    means_.told(progress_);
 }
 
 /// Brings the copies onto the device, under the names that they are to have.
 void Copier::commit() {
-    const auto begun = work_.ports.clock.now();
+    const auto begun = means_.ports.clock.now();
     for (const auto& [song, unfinished, file] : copied_) {
         file->sync();
-        work_.device.finish(unfinished, song.name, Device::IfThere::Fail);
+        means_.device.finish(unfinished, song.name, Device::IfThere::Fail);
     }
     if (!copied_.empty()) {
-        work_.device.syncMusic();
+        means_.device.syncMusic();
     }
     std::vector<Entry> songs;
     std::ranges::transform(copied_, std::back_inserter(songs), &Copied::song);
-    work_.ledger.songsAreThere(songs);
+    means_.ledger.songsAreThere(songs);
     progress_.songs += copied_.size();
     copied_.clear();
-    rule_.groupWasCommitted(begun, work_.ports.clock.now());
-    work_.told(progress_);
+    rule_.groupWasCommitted(begun, means_.ports.clock.now());
+    means_.told(progress_);
 }
 
 } // namespace quorl::syncd

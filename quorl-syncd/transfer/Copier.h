@@ -19,8 +19,8 @@ class Copier {
   public:
     using Told = std::function<void(const CopyProgress&)>;
 
-    /// What a copier works on; all of it outlives the copier.
-    struct Work {
+    /// What a copier works with; all of it outlives the copier.
+    struct Means {
         const SyncPorts& ports;
         Device& device;
         Ledger& ledger;
@@ -31,7 +31,7 @@ class Copier {
     };
 
     /// @param progress what there is to copy.
-    Copier(const Work& work, const CopyProgress& progress);
+    Copier(const Means& means, const CopyProgress& progress);
 
     /// Copies those of `songs` that have no hash, under the names that they have, and gives them
     /// their hashes. Those that cannot be copied are taken out of `songs`.
@@ -54,7 +54,7 @@ class Copier {
     void pieceWasCopied(std::uint64_t bytes, std::uint64_t mostBytes);
     void commit();
 
-    const Work work_;
+    const Means means_;
     CopyProgress progress_;
     CommitRule rule_;
     std::vector<Copied> copied_;
