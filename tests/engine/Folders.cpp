@@ -1,8 +1,13 @@
 #include "tests/engine/Folders.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <fstream>
 #include <sstream>
+#include <system_error>
+
+#include <fcntl.h>
+#include <sys/stat.h>
 
 #include "quorl-syncd/transfer/ContentHash.h"
 #include "quorl-syncd/transfer/RateLimit.h"
@@ -10,6 +15,7 @@
 #include "quorl-syncd/transfer/device/PosixDevice.h"
 #include "quorl-syncd/transfer/songs/PosixSongSource.h"
 #include "services/base/AtomicFile.h"
+#include "services/base/FileStatus.h"
 #include "services/media/MusicFolder.h"
 
 namespace quorl::syncd::testing {
@@ -38,6 +44,16 @@ void Music::write(const std::string& name, const std::string& text) {
     const auto time = std::filesystem::file_time_type::clock::now() - std::chrono::hours{1000} +
                       std::chrono::seconds{10 * ++writes_};
     std::filesystem::last_write_time(path() / name, time);
+}
+
+std::time_t Music::setTime(const std::string& name, std::time_t seconds) const {
+    const auto file = path() / name;
+    const timespec times[]{{seconds, 0}, {seconds, 0}};
+    base::FileStatus status{};
+    if (utimensat(AT_FDCWD, file.c_str(), times, 0) != 0 || stat(file.c_str(), &status) != 0) {
+        throw std::system_error(errno, std::generic_category(), name);
+    }
+    return status.st_mtim.tv_sec;
 }
 
 void Music::remove(const std::string& name) const { std::filesystem::remove(path() / name); }

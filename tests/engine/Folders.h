@@ -1,5 +1,6 @@
 #pragma once
 
+#include <ctime>
 #include <map>
 #include <string>
 #include <vector>
@@ -28,6 +29,10 @@ class Music {
 
     /// Writes a song, and sets its time so that each write makes a difference.
     void write(const std::string& name, const std::string& text);
+
+    /// Sets the time of a song, in seconds since 1970; gives back the one that the file system has
+    /// made of it.
+    [[nodiscard]] std::time_t setTime(const std::string& name, std::time_t seconds) const;
 
     void remove(const std::string& name) const;
 

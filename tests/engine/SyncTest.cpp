@@ -108,6 +108,21 @@ TEST_F(SyncedWearable, DoesNotGetASongAgainOfWhichOnlyTheTimeHasChanged) {
     EXPECT_EQ(copiedSongs_, 0);
 }
 
+TEST_F(SyncedWearable, GetsASongFromTheFarFutureOnce) {
+    constexpr std::time_t year2500 = 16'725'225'600;
+    constexpr std::time_t beyondWhatIsTold = 8'500'000'000;
+    if (music_.setTime("Album/one.mp3", year2500) <= beyondWhatIsTold) {
+        GTEST_SKIP() << "this file system has no such times";
+    }
+
+    const auto outcome = syncAll();
+
+    EXPECT_EQ(outcome.kind, Kind::Sent) << outcome.message;
+    EXPECT_EQ(copiedSongs_, 2);
+    EXPECT_EQ(syncAll().kind, Kind::Sent);
+    EXPECT_EQ(copiedSongs_, 0);
+}
+
 TEST_F(SyncedWearable, GetsASongAgainThatSomebodyHasRemovedFromIt) {
     ASSERT_EQ(syncAll().kind, Kind::Sent);
     std::filesystem::remove(player_.path() / "Music/one.mp3");
