@@ -1,15 +1,25 @@
 // quorl-syncd: brings the chosen playlist to the wearable.
 
 #include <csignal>
+#include <functional>
 #include <iostream>
 #include <memory>
 
 #include <CLI/CLI.hpp>
+#include <glib.h>
 #include <poll.h>
 #include <sys/signalfd.h>
 
+#include "quorl-syncd/bus/BusAnnouncer.h"
 #include "quorl-syncd/bus/BusObjects.h"
+#include "quorl-syncd/bus/SleepInhibitor.h"
+#include "quorl-syncd/daemon/LocalMusic.h"
+#include "quorl-syncd/daemon/LocalWearables.h"
+#include "quorl-syncd/daemon/LoopTurns.h"
+#include "quorl-syncd/daemon/SharedChoices.h"
+#include "quorl-syncd/daemon/SyncThreads.h"
 #include "quorl-syncd/engine/Engine.h"
+#include "quorl-syncd/engine/LastResults.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Names.h"
 #include "services/preferences/SharedPreferences.h"
@@ -32,22 +42,24 @@ base::FileDescriptor blockSignals() {
     sigaddset(&signals, SIGTERM);
     sigaddset(&signals, SIGINT);
     pthread_sigmask(SIG_BLOCK, &signals, nullptr);
-    return base::FileDescriptor{signalfd(-1, &signals, SFD_CLOEXEC)};
+    return base::FileDescriptor(signalfd(-1, &signals, SFD_CLOEXEC));
 }
 
-int serve(const syncd::EngineSettings& options) {
+/// What the daemon is started with.
+struct Options {
+    syncd::EngineSettings engine;
+    std::uint64_t embeddedCapacity = wearable::embeddedCapacity;
+};
+
+int serve(const Options& options) {
     const auto signals = blockSignals();
-    engine::BusLoop loop{sdbus::createSessionBusConnection()};
+    engine::BusLoop loop(sdbus::createSessionBusConnection());
     loop.watch(signals.get(), POLLIN, [&] { loop.stop(); });
 
-    std::unique_ptr<syncd::Engine> engine;
+    std::function<void()> choicesDidChange;
     auto opened = preferences::SharedPreferences::open(
         [&](const auto& /*preferences*/, const auto& /*keys*/) {
-            loop.post([&] {
-                if (engine) {
-                    engine->preferencesDidChange();
-                }
-            });
+            loop.post([&] { choicesDidChange(); });
         });
     if (!opened.preferences) {
         return complain(CannotStart, opened.problem);
@@ -57,17 +69,26 @@ int serve(const syncd::EngineSettings& options) {
     }
 
     std::unique_ptr<syncd::BusObjects> objects;
-    engine = std::make_unique<syncd::Engine>(loop, *opened.preferences, options, [&] {
+    syncd::LoopTurns turns(loop);
+    syncd::SharedChoices choices(*opened.preferences);
+    syncd::LocalMusic music(loop);
+    syncd::LocalWearables wearables(loop, options.embeddedCapacity);
+    syncd::SyncThreads syncs(loop, [] { return std::make_shared<syncd::SleepInhibitor>(); });
+    syncd::LastResults results(std::filesystem::path(g_get_user_state_dir()) / "quorl");
+    syncd::BusAnnouncer announcer(loop.bus(), [&] {
         if (objects) {
             objects->publish();
         }
     });
-    objects = std::make_unique<syncd::BusObjects>(loop.bus(), *engine);
+    const syncd::EnginePorts ports{turns, choices, music, wearables, syncs, results, announcer};
+    syncd::Engine engine(ports, options.engine);
+    choicesDidChange = [&] { engine.choicesDidChange(); };
+    objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine);
     try {
         loop.bus().requestName(engine::busName);
     } catch (const sdbus::Error& error) {
         return complain(AlreadyRunning, "Another sync engine is running, which has the name " +
-                                            std::string{engine::busName} +
+                                            std::string(engine::busName) +
                                             ". End that one first. (" + error.getMessage() + ")");
     }
 
@@ -81,24 +102,24 @@ int serve(const syncd::EngineSettings& options) {
 } // namespace
 
 int main(int argc, char** argv) {
-    syncd::EngineSettings options;
-    CLI::App program{"Brings the chosen playlist to the Velora, and tells on the session bus how "
-                     "far it is."};
+    Options options;
+    CLI::App program("Brings the chosen playlist to the Velora, and tells on the session bus how "
+                     "far it is.");
     program.set_version_flag("--version", "quorl-syncd " QUORL_VERSION);
-    program.add_option("--music-folder", options.musicFolder,
+    program.add_option("--music-folder", options.engine.musicFolder,
                        "the folder with songs and playlists, instead of the user's music folder");
-    program.add_option("--wearable", options.wearableDirectory,
+    program.add_option("--wearable", options.engine.wearableDirectory,
                        "the directory of a mounted wearable, instead of the embedded one");
     program
         .add_option("--embedded-capacity", options.embeddedCapacity,
                     "what the embedded wearable holds, in bytes")
         ->check(CLI::NonNegativeNumber);
     program
-        .add_option("--rate-limit", options.rateLimit,
+        .add_option("--rate-limit", options.engine.rateLimit,
                     "bytes a second that are copied to the embedded wearable at most; 0 for no "
                     "limit")
         ->check(CLI::NonNegativeNumber);
-    std::int64_t retryDelay = options.retryDelay.count();
+    std::int64_t retryDelay = options.engine.retryDelay.count();
     program
         .add_option("--retry-after", retryDelay,
                     "seconds after which a sync that did not work is tried again, twice as many "
@@ -107,7 +128,7 @@ int main(int argc, char** argv) {
         ->check(CLI::Range(1, 3600));
     CLI11_PARSE(program, argc, argv);
 
-    options.retryDelay = std::chrono::seconds{retryDelay};
+    options.engine.retryDelay = std::chrono::seconds(retryDelay);
 
     try {
         return serve(options);

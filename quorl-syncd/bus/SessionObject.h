@@ -7,29 +7,29 @@
 
 #include <sdbus-c++/sdbus-c++.h>
 
-#include "quorl-syncd/transfer/CopyProgress.h"
+#include "quorl-syncd/engine/ports/Announcer.h"
 
 namespace quorl::syncd {
 
 /// A session and its two tasks, as bus objects from construction to destruction. Says each thing on
 /// the bus in the order that the interface promises. The bus loop's thread.
-class SessionObject {
+class SessionObject final : public SessionReport {
   public:
     /// Begins with the preparing task.
     /// @param cancel called when a client asks for the end.
     SessionObject(sdbus::IConnection& bus, std::uint64_t number, std::function<void()> cancel);
 
     /// Takes the objects off the bus.
-    ~SessionObject();
+    ~SessionObject() override;
 
     SessionObject(const SessionObject&) = delete;
     SessionObject& operator=(const SessionObject&) = delete;
 
     /// The first call ends the preparing task and begins the one that carries the songs.
-    void copied(const CopyProgress& progress);
+    void copied(const CopyProgress& progress) override;
 
     /// Ends what is still running, then the session. Once.
-    void finish(bool success, const std::string& message);
+    void finish(bool success, const std::string& message) override;
 
   private:
     class Session;

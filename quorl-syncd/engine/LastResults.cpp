@@ -18,7 +18,7 @@ constexpr auto fileName = "last-sync.json";
 
 NLOHMANN_DEFINE_TYPE_NON_INTRUSIVE(LastResult, success, message, time)
 
-LastResults::LastResults(std::filesystem::path directory) : directory_{std::move(directory)} {
+LastResults::LastResults(std::filesystem::path directory) : directory_(std::move(directory)) {
     try {
         const auto text = base::readFile(base::openRoot(directory_.c_str()).get(), fileName);
         results_ = Json::parse(text).get<std::map<std::string, LastResult>>();
@@ -31,7 +31,7 @@ LastResults::LastResults(std::filesystem::path directory) : directory_{std::move
 
 LastResult LastResults::of(const std::string& wearable) const {
     const auto found = results_.find(wearable);
-    return found == results_.end() ? LastResult{} : found->second;
+    return found == results_.end() ? LastResult() : found->second;
 }
 
 void LastResults::remember(const std::string& wearable, LastResult result) {

@@ -10,7 +10,7 @@ namespace quorl::syncd {
 /// to an hour.
 class RetryDelay {
   public:
-    explicit RetryDelay(std::chrono::seconds first) : first_{first}, next_{first} {}
+    explicit RetryDelay(std::chrono::seconds first) : first_(first), next_(first) {}
 
     /// After a failure.
     [[nodiscard]] std::chrono::seconds next() {

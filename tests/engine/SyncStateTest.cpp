@@ -1,45 +1,74 @@
-#include "quorl-syncd/engine/SyncState.h"
+// What the engine tells on the bus of the chosen playlist.
 
 #include <gtest/gtest.h>
+
+#include "quorl-syncd/engine/Policy.h"
 
 namespace {
 
 using namespace quorl::syncd;
 
-constexpr SyncFacts waiting{.isWished = true, .isLibraryRead = true, .isPlaylistThere = true};
+Situation pending() {
+    Situation now;
+    now.choices.isSyncEnabled = true;
+    now.choices.playlist = 7;
+    now.isMusicRead = true;
+    now.revision = 1;
+    return now;
+}
 
-SyncFacts with(bool SyncFacts::*fact, bool value, SyncFacts facts = waiting) {
-    facts.*fact = value;
-    return facts;
+Situation sent() {
+    auto now = pending();
+    now.choices.lastSent = SentPlaylist{7, 1};
+    return now;
+}
+
+Situation running(Situation now) {
+    now.running.emplace();
+    return now;
 }
 
 TEST(SyncState, IsPendingAsLongAsThePlaylistWasNotSent) {
-    EXPECT_STREQ(syncStateOf(waiting), "pending");
+    EXPECT_EQ(syncStateOf(pending()), "pending");
+    auto earlier = sent();
+    earlier.revision = 2;
+    EXPECT_EQ(syncStateOf(earlier), "pending");
 }
 
 TEST(SyncState, IsSyncedWhenThePlaylistWasSentAsItIsNow) {
-    EXPECT_STREQ(syncStateOf(with(&SyncFacts::isSent, true)), "synced");
+    EXPECT_EQ(syncStateOf(sent()), "synced");
+}
+
+TEST(SyncState, IsSyncedOnlyWhereTheWearableThatIsThereHasThePlaylist) {
+    auto now = sent();
+    now.usage.emplace();
+    EXPECT_EQ(syncStateOf(now), "pending");
+    now.usage->sent = quorl::wearable::Selection{7, 1, 0, 0};
+    EXPECT_EQ(syncStateOf(now), "synced");
 }
 
 TEST(SyncState, IsSyncingDuringASessionAlsoOfWhatWasSent) {
-    const auto running = with(&SyncFacts::isRunning, true);
-    EXPECT_STREQ(syncStateOf(running), "syncing");
-    EXPECT_STREQ(syncStateOf(with(&SyncFacts::isSent, true, running)), "syncing");
+    EXPECT_EQ(syncStateOf(running(pending())), "syncing");
+    EXPECT_EQ(syncStateOf(running(sent())), "syncing");
 }
 
 TEST(SyncState, IsOffWithoutAPlaylistAlsoWhileASessionEnds) {
-    EXPECT_STREQ(syncStateOf({}), "off");
-    EXPECT_STREQ(syncStateOf(with(&SyncFacts::isWished, false)), "off");
-    EXPECT_STREQ(syncStateOf(with(&SyncFacts::isPlaylistThere, false)), "off");
-    const auto running = with(&SyncFacts::isRunning, true);
-    EXPECT_STREQ(syncStateOf(with(&SyncFacts::isWished, false, running)), "off");
+    EXPECT_EQ(syncStateOf({}), "off");
+    auto now = running(pending());
+    now.revision.reset();
+    EXPECT_EQ(syncStateOf(now), "off");
+    now = running(pending());
+    now.choices.isSyncEnabled = false;
+    EXPECT_EQ(syncStateOf(now), "off");
 }
 
 TEST(SyncState, IsUnknownUntilTheMusicFolderWasReadButOnlyWhereThatMatters) {
-    const SyncFacts unread{.isWished = true};
-    EXPECT_STREQ(syncStateOf(unread), "unknown");
-    EXPECT_STREQ(syncStateOf(with(&SyncFacts::isRunning, true, unread)), "unknown");
-    EXPECT_STREQ(syncStateOf(with(&SyncFacts::isLibraryRead, false, {})), "off");
+    auto now = pending();
+    now.isMusicRead = false;
+    EXPECT_EQ(syncStateOf(now), "unknown");
+    EXPECT_EQ(syncStateOf(running(now)), "unknown");
+    now.choices.playlist.reset();
+    EXPECT_EQ(syncStateOf(now), "off");
 }
 
 } // namespace

@@ -1,0 +1,130 @@
+#include "quorl-syncd/engine/Policy.h"
+
+#include <algorithm>
+#include <array>
+#include <string_view>
+
+namespace quorl::syncd {
+
+namespace {
+
+using wearable::Selection;
+
+struct Obstacle {
+    bool (*isThere)(const Situation&);
+    std::string_view sentence;
+};
+
+/// Stands for the sentence that the situation has.
+constexpr std::string_view problemOfWearable;
+
+bool isChargerNeeded(const Situation& now) {
+    return now.running ? now.running->charger == Charger::Needed : !now.isStartRequested;
+}
+
+/// The first one that is there is told.
+constexpr std::array obstacles{
+    Obstacle{[](const Situation& now) { return !now.choices.isSyncEnabled; },
+             "Music sync is switched off."},
+    Obstacle{[](const Situation& now) { return !now.choices.playlist; }, "No playlist is chosen."},
+    Obstacle{[](const Situation& now) { return !now.isMusicRead; }, "Reading the music folder…"},
+    Obstacle{[](const Situation& now) { return !now.revision; },
+             "The chosen playlist is not in the music folder."},
+    Obstacle{[](const Situation& now) { return !now.usage; }, problemOfWearable},
+    Obstacle{[](const Situation& now) { return !now.attachment.connected; },
+             "The wearable is not connected."},
+    Obstacle{[](const Situation& now) { return !now.attachment.onCharger && isChargerNeeded(now); },
+             "The wearable is not on its charger."},
+};
+
+/// Where a playlist is chosen and in the music folder.
+Selection wantedIn(const Situation& now) {
+    return {*now.choices.playlist, *now.revision, now.choices.limitType, now.choices.limit};
+}
+
+/// A wearable that is not there does not say otherwise.
+bool isSent(const Selection& wanted, const Situation& now) {
+    return (!now.usage || now.usage->sent == wanted) &&
+           now.choices.lastSent == SentPlaylist{wanted.playlist, wanted.revision};
+}
+
+bool isDue(const Selection& wanted, const Situation& now) {
+    return now.isStartRequested ||
+           (now.now >= now.quietFrom && now.givenUp != wanted && !isSent(wanted, now));
+}
+
+/// Another revision of the playlist has its turn afterwards.
+bool isRunning(Selection wanted, const Situation& now) {
+    wanted.revision = now.running->selection.revision;
+    return now.running->selection == wanted && now.running->wearable == now.wearable;
+}
+
+} // namespace
+
+std::string obstacleIn(const Situation& situation) {
+    const auto* const found = std::ranges::find_if(
+        obstacles, [&](const Obstacle& obstacle) { return obstacle.isThere(situation); });
+    if (found == obstacles.end()) {
+        return {};
+    }
+    return found->sentence == problemOfWearable ? situation.wearableProblem
+                                                : std::string(found->sentence);
+}
+
+Decision decide(const Situation& situation) {
+    using Kind = Decision::Kind;
+    const auto obstacle = obstacleIn(situation);
+    if (!obstacle.empty()) {
+        return {situation.running ? Kind::Stop : Kind::Rest, {}, obstacle};
+    }
+    const auto wanted = wantedIn(situation);
+    if (situation.running) {
+        return isRunning(wanted, situation)
+                   ? Decision{Kind::Continue, {}, {}}
+                   : Decision{Kind::Stop, {}, "Something else was chosen."};
+    }
+    return isDue(wanted, situation) ? Decision{Kind::Begin, wanted, {}} : Decision();
+}
+
+std::string statusOf(const Situation& situation, const std::string& lastMessage) {
+    if (situation.running) {
+        return "Syncing music.";
+    }
+    const auto obstacle = obstacleIn(situation);
+    if (!obstacle.empty()) {
+        return obstacle;
+    }
+    return situation.givenUp ? lastMessage : "Everything is up to date.";
+}
+
+std::string_view syncStateOf(const Situation& situation) {
+    if (!situation.choices.isSyncEnabled || !situation.choices.playlist) {
+        return "off";
+    }
+    if (!situation.isMusicRead) {
+        return "unknown";
+    }
+    if (!situation.revision) {
+        return "off";
+    }
+    if (situation.running) {
+        return "syncing";
+    }
+    return isSent(wantedIn(situation), situation) ? "synced" : "pending";
+}
+
+Conclusion conclusionOf(const Outcome& outcome, const std::string& rememberProblem,
+                        const std::string& whyStopped) {
+    using Kind = Outcome::Kind;
+    const bool isSent = outcome.kind == Kind::Sent;
+    if (isSent && rememberProblem.empty()) {
+        return {true, outcome.message, false, false};
+    }
+    if (outcome.kind == Kind::Stopped) {
+        return {false, whyStopped, false, false};
+    }
+    return {false, isSent ? rememberProblem : outcome.message, true,
+            whyStopped.empty() && (isSent || outcome.mayPass)};
+}
+
+} // namespace quorl::syncd

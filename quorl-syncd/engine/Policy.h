@@ -1,0 +1,58 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "quorl-syncd/engine/Situation.h"
+#include "quorl-syncd/transfer/Outcome.h"
+
+/// What the engine decides, from plain values.
+namespace quorl::syncd {
+
+/// What is to be done now.
+struct Decision {
+    enum class Kind {
+        Rest,     ///< No sync is under way, and none is to begin.
+        Begin,    ///< A sync of `selection` is to begin.
+        Continue, ///< The sync that is under way goes on.
+        Stop,     ///< It is to end, because of `sentence`.
+    };
+
+    Kind kind = Kind::Rest;
+    wearable::Selection selection;
+    std::string sentence;
+
+    bool operator==(const Decision&) const = default;
+};
+
+[[nodiscard]] Decision decide(const Situation& situation);
+
+/// What stands in the way of a sync, in a sentence; empty where nothing does.
+[[nodiscard]] std::string obstacleIn(const Situation& situation);
+
+/// A sentence for the user: what the engine does, or what it waits for.
+/// @param lastMessage what became of the last sync.
+[[nodiscard]] std::string statusOf(const Situation& situation, const std::string& lastMessage);
+
+/// How far the chosen playlist has come: the value of the engine's property SyncState.
+[[nodiscard]] std::string_view syncStateOf(const Situation& situation);
+
+/// What follows from the end of a sync.
+struct Conclusion {
+    bool success = false;
+    std::string message;
+    /// Its selection is not tried again until something changes.
+    bool isGivenUp = false;
+    /// It is tried again after some time all the same.
+    bool isTriedAgain = false;
+
+    bool operator==(const Conclusion&) const = default;
+};
+
+/// @param rememberProblem why it could not be remembered that all was sent; empty where it was, or
+/// where there was nothing to remember.
+/// @param whyStopped empty where nobody has stopped the sync.
+[[nodiscard]] Conclusion conclusionOf(const Outcome& outcome, const std::string& rememberProblem,
+                                      const std::string& whyStopped);
+
+} // namespace quorl::syncd

@@ -1,0 +1,56 @@
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+
+#include "quorl-syncd/engine/Choices.h"
+#include "quorl-syncd/transfer/Clock.h"
+#include "services/wearable/Attachment.h"
+#include "services/wearable/Manifest.h"
+#include "services/wearable/Usage.h"
+#include "services/wearable/Wearable.h"
+
+namespace quorl::syncd {
+
+enum class Charger { Needed, Ignored };
+
+/// Everything that it rests on whether to sync, at one moment.
+struct Situation {
+    /// A sync that is under way.
+    struct Running {
+        wearable::Selection selection;
+        wearable::Wearable wearable;
+        Charger charger = Charger::Needed;
+
+        bool operator==(const Running&) const = default;
+    };
+
+    Choices choices;
+
+    bool isMusicRead = false;
+    /// Of the chosen playlist; nothing where it is not in the music folder.
+    std::optional<std::uint64_t> revision;
+
+    wearable::Wearable wearable;
+    wearable::Attachment attachment;
+    /// Nothing while the wearable is not there or was not looked at yet; then `wearableProblem`
+    /// says why.
+    std::optional<wearable::Usage> usage;
+    std::string wearableProblem;
+
+    std::optional<Running> running;
+    /// Somebody has asked for a sync now, whether there is a reason for one or not.
+    bool isStartRequested = false;
+    /// Did not work, or was cancelled, and is not tried again for now.
+    std::optional<wearable::Selection> givenUp;
+
+    Clock::TimePoint now;
+    /// From when on the preferences are thought to stay as they are: the app writes several for one
+    /// choice.
+    Clock::TimePoint quietFrom;
+
+    bool operator==(const Situation&) const = default;
+};
+
+} // namespace quorl::syncd

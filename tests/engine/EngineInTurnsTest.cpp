@@ -1,0 +1,382 @@
+// The engine without a bus, a device or a thread: everything that it touches is made of values, and
+// time passes only where a test lets it.
+
+#include <map>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "quorl-syncd/engine/Engine.h"
+
+namespace {
+
+using namespace quorl;
+using namespace quorl::syncd;
+using namespace std::chrono_literals;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+
+class ManualTurns final : public Turns {
+  public:
+    [[nodiscard]] TimePoint now() const override { return now_; }
+
+    void callAt(TimePoint time, Work work) override { timers_.emplace(time, std::move(work)); }
+
+    [[nodiscard]] std::uint64_t calendarTime() const override { return 17; }
+
+    /// Lets time pass, and calls what becomes due.
+    void pass(Clock::TimePoint::duration time) {
+        const auto end = now_ + time;
+        while (!timers_.empty() && timers_.begin()->first <= end) {
+            auto next = timers_.extract(timers_.begin());
+            now_ = std::max(now_, next.key());
+            next.mapped()();
+        }
+        now_ = end;
+    }
+
+  private:
+    TimePoint now_ = TimePoint(1h);
+    std::multimap<TimePoint, Work> timers_;
+};
+
+struct FixedChoices final : ChoiceStore {
+    [[nodiscard]] Choices read() override { return choices; }
+
+    [[nodiscard]] std::string rememberSent(const SentPlaylist& sent) override {
+        if (problem.empty()) {
+            choices.lastSent = sent;
+        }
+        return problem;
+    }
+
+    Choices choices;
+    std::string problem;
+};
+
+struct FixedMusic final : MusicPort {
+    struct Folder final : WatchedMusic {
+        explicit Folder(int& count) : rescans_(count) {}
+
+        void rescan() override { ++rescans_; }
+
+        int& rescans_;
+    };
+
+    [[nodiscard]] std::string usualFolder() override { return "/home/Music"; }
+
+    [[nodiscard]] std::unique_ptr<WatchedMusic> watch(const std::string& /*folder*/,
+                                                      Changed told) override {
+        changed = std::move(told);
+        return std::make_unique<Folder>(rescans);
+    }
+
+    Changed changed;
+    int rescans = 0;
+};
+
+struct FixedWearables final : WearablePort {
+    struct Watched final : WatchedWearable {
+        Watched(FixedWearables& port, wearable::Wearable what)
+            : port_(port), what_(std::move(what)) {}
+
+        [[nodiscard]] const wearable::Wearable& identity() const override { return what_; }
+
+        void look(Reply reply) override { port_.replies.push_back(std::move(reply)); }
+
+        [[nodiscard]] wearable::Attachment attachment() override { return port_.attachment; }
+
+        void save(const wearable::Attachment& saved) override {
+            if (port_.isWriteProtected) {
+                throw std::system_error(EROFS, std::generic_category());
+            }
+            port_.attachment = saved;
+        }
+
+        FixedWearables& port_;
+        const wearable::Wearable what_;
+    };
+
+    [[nodiscard]] std::unique_ptr<WatchedWearable> watch(const std::string& directory,
+                                                         Noticed told) override {
+        replies.clear();
+        noticed = std::move(told);
+        const auto capacity = directory.empty() ? std::optional(std::uint64_t{100}) : std::nullopt;
+        return std::make_unique<Watched>(
+            *this,
+            wearable::Wearable{directory.empty() ? "/embedded" : directory, capacity, isMounted});
+    }
+
+    void answer(const WatchedWearable::Answer& answer) {
+        for (const auto& reply : std::exchange(replies, {})) {
+            reply(answer);
+        }
+    }
+
+    wearable::Attachment attachment;
+    bool isWriteProtected = false;
+    bool isMounted = false;
+    std::vector<WatchedWearable::Reply> replies;
+    Noticed noticed;
+};
+
+struct ManualSyncs final : SyncRunner {
+    struct Running final : RunningSync {
+        explicit Running(bool& flag) : flag_(flag) {}
+
+        void stop() override { flag_ = true; }
+
+        bool& flag_;
+    };
+
+    [[nodiscard]] std::unique_ptr<RunningSync> begin(const Order& order, Copied /*told*/,
+                                                     Ended then) override {
+        orders.push_back(order);
+        ended = std::move(then);
+        isStopped = false;
+        return std::make_unique<Running>(isStopped);
+    }
+
+    void setRateLimit(std::uint64_t bytesPerSecond) override { rate = bytesPerSecond; }
+
+    /// The call destroys the sync, not what the test has given to it.
+    void end(const Outcome& outcome) const {
+        const auto call = ended;
+        call(outcome);
+    }
+
+    std::vector<Order> orders;
+    Ended ended;
+    bool isStopped = false;
+    std::uint64_t rate = 0;
+};
+
+struct ResultsInMemory final : ResultStore {
+    [[nodiscard]] LastResult of(const std::string& wearable) const override {
+        const auto found = results.find(wearable);
+        return found == results.end() ? LastResult() : found->second;
+    }
+
+    void remember(const std::string& wearable, LastResult result) override {
+        results[wearable] = std::move(result);
+    }
+
+    std::map<std::string, LastResult> results;
+};
+
+struct Sessions final : Announcer {
+    struct Report final : SessionReport {
+        explicit Report(std::vector<std::string>& lines) : lines_(lines) {}
+
+        void copied(const CopyProgress& /*progress*/) override {}
+
+        void finish(bool success, const std::string& message) override {
+            lines_.push_back((success ? "+ " : "- ") + message);
+        }
+
+        std::vector<std::string>& lines_;
+    };
+
+    void stateDidChange() override {}
+
+    [[nodiscard]] std::unique_ptr<SessionReport> beginSession(std::uint64_t /*number*/,
+                                                              std::function<void()> ask) override {
+        cancel = std::move(ask);
+        return std::make_unique<Report>(ends);
+    }
+
+    std::function<void()> cancel;
+    std::vector<std::string> ends;
+};
+
+const Outcome sent{Outcome::Kind::Sent, "All sent.", false, false};
+const Outcome full{Outcome::Kind::Failed, "It is full.", false, true};
+const Outcome stopped{Outcome::Kind::Stopped, "", false, false};
+const auto upToDate = "Everything is up to date.";
+
+class EngineInTurns : public ::testing::Test {
+  protected:
+    EngineInTurns() { choices_.choices = {true, 7, 1, 250, {}}; }
+
+    void start() {
+        engine_.emplace(EnginePorts{turns_, choices_, music_, wearables_, syncs_, results_, bus_},
+                        EngineSettings{{}, {}, 5, 60s});
+    }
+
+    void readMusic(std::uint64_t revision) {
+        auto inventory = std::make_shared<media::Inventory>();
+        inventory->playlists.push_back({7, revision, "List", "List.m3u8", false, {}, {}});
+        music_.changed(std::move(inventory));
+    }
+
+    /// Everything is there, and a sync of the playlist has begun.
+    void startSyncing() {
+        start();
+        readMusic(3);
+        wearables_.answer(wearable::Usage{});
+    }
+
+    [[nodiscard]] std::string status() const { return engine_->status().status; }
+
+    /// The wearable has what was ordered last.
+    void answerAsSent() {
+        wearables_.answer(wearable::Usage{100, 50, 50, syncs_.orders.back().selection});
+    }
+
+    ManualTurns turns_;
+    FixedChoices choices_;
+    FixedMusic music_;
+    FixedWearables wearables_;
+    ManualSyncs syncs_;
+    ResultsInMemory results_;
+    Sessions bus_;
+    std::optional<Engine> engine_;
+};
+
+TEST_F(EngineInTurns, BeginsOnceMusicAndWearableAreKnownAndRemembersWhatItHasSent) {
+    start();
+    EXPECT_EQ(status(), "Reading the music folder…");
+    readMusic(3);
+    EXPECT_EQ(status(), "Looking for the wearable…");
+    EXPECT_THAT(syncs_.orders, IsEmpty());
+
+    wearables_.answer(wearable::Usage{});
+    ASSERT_EQ(syncs_.orders.size(), 1);
+    EXPECT_EQ(syncs_.orders[0].selection, (wearable::Selection{7, 3, 1, 250}));
+    EXPECT_EQ(status(), "Syncing music.");
+    syncs_.end(sent);
+
+    EXPECT_EQ(choices_.choices.lastSent, (SentPlaylist{7, 3}));
+    EXPECT_THAT(bus_.ends, ElementsAre("+ All sent."));
+    EXPECT_EQ(results_.of("/embedded"), (LastResult{true, "All sent.", 17}));
+    EXPECT_EQ(status(), upToDate);
+    answerAsSent();
+    EXPECT_EQ(syncs_.orders.size(), 1);
+}
+
+TEST_F(EngineInTurns, WaitsUntilTheChoicesStayAsTheyAre) {
+    startSyncing();
+    syncs_.end(sent);
+    answerAsSent();
+    choices_.choices.limit = 100;
+    engine_->choicesDidChange();
+    turns_.pass(150ms);
+    choices_.choices.limit = 50;
+    engine_->choicesDidChange();
+
+    turns_.pass(199ms);
+    EXPECT_EQ(syncs_.orders.size(), 1);
+    turns_.pass(1ms);
+
+    ASSERT_EQ(syncs_.orders.size(), 2);
+    EXPECT_EQ(syncs_.orders[1].selection.limit, 50);
+}
+
+TEST_F(EngineInTurns, TriesAgainLaterAndLater) {
+    startSyncing();
+    syncs_.end(full);
+    EXPECT_EQ(status(), "It is full.");
+
+    turns_.pass(59s);
+    EXPECT_EQ(syncs_.orders.size(), 1);
+    turns_.pass(1s);
+    ASSERT_EQ(syncs_.orders.size(), 2);
+    syncs_.end(full);
+    turns_.pass(119s);
+    EXPECT_EQ(syncs_.orders.size(), 2);
+    turns_.pass(1s);
+
+    EXPECT_EQ(syncs_.orders.size(), 3);
+}
+
+TEST_F(EngineInTurns, DoesNotTryAgainWhatWasCancelledUntilTheWearableIsBack) {
+    startSyncing();
+    bus_.cancel();
+    EXPECT_TRUE(syncs_.isStopped);
+    syncs_.end(stopped);
+    EXPECT_THAT(bus_.ends, ElementsAre("- The sync was cancelled."));
+    turns_.pass(24h);
+    EXPECT_EQ(syncs_.orders.size(), 1);
+
+    wearables_.answer("It went away.");
+    engine_->refreshWearable();
+    wearables_.answer(wearable::Usage{});
+
+    EXPECT_EQ(syncs_.orders.size(), 2);
+}
+
+TEST_F(EngineInTurns, SendsTheNextRevisionAfterTheOneThatIsUnderWay) {
+    startSyncing();
+    readMusic(4);
+    EXPECT_FALSE(syncs_.isStopped);
+
+    syncs_.end(sent);
+
+    EXPECT_EQ(choices_.choices.lastSent, (SentPlaylist{7, 3}));
+    ASSERT_EQ(syncs_.orders.size(), 2);
+    EXPECT_EQ(syncs_.orders[1].selection.revision, 4);
+}
+
+TEST_F(EngineInTurns, TriesAgainWhereItCannotRememberThatAllWasSent) {
+    choices_.problem = "The store is gone.";
+    startSyncing();
+
+    syncs_.end(sent);
+
+    EXPECT_THAT(bus_.ends, ElementsAre("- The store is gone."));
+    turns_.pass(60s);
+    EXPECT_EQ(syncs_.orders.size(), 2);
+}
+
+TEST_F(EngineInTurns, HasTheMusicFolderReadAgainThatWasNotAsItWasThought) {
+    startSyncing();
+    syncs_.end({Outcome::Kind::Failed, "A song is gone.", true, false});
+
+    EXPECT_EQ(music_.rescans, 1);
+    turns_.pass(24h);
+    EXPECT_EQ(syncs_.orders.size(), 1);
+    readMusic(4);
+    EXPECT_EQ(syncs_.orders.size(), 2);
+}
+
+TEST_F(EngineInTurns, TakesADirectoryForAnotherWearableOnceADeviceIsMountedThere) {
+    startSyncing();
+    engine_->setWearableDirectory("/media/velora");
+    EXPECT_TRUE(syncs_.isStopped);
+    EXPECT_EQ(syncs_.rate, 0) << "only the embedded one is slowed down";
+    syncs_.end(stopped);
+    EXPECT_THAT(bus_.ends, ElementsAre("- Looking for the wearable…"));
+    wearables_.answer(wearable::Usage{});
+    ASSERT_EQ(syncs_.orders.size(), 2);
+
+    wearables_.isMounted = true;
+    const auto noticed = wearables_.noticed;
+    noticed(WearableNews::WasMounted);
+    EXPECT_TRUE(syncs_.isStopped);
+    syncs_.end(stopped);
+    wearables_.answer(wearable::Usage{});
+
+    ASSERT_EQ(syncs_.orders.size(), 3);
+    EXPECT_TRUE(syncs_.orders[2].wearable.isMountPoint);
+}
+
+TEST_F(EngineInTurns, SaysWhyItCannotStartOrAttach) {
+    start();
+    EXPECT_THROW(engine_->startNow(), NotReady);
+    wearables_.isWriteProtected = true;
+    EXPECT_THROW(engine_->attach({true, false}), NotReady);
+    EXPECT_TRUE(engine_->attachment().onCharger);
+    engine_->setWearableDirectory("/media/velora");
+    EXPECT_THROW(engine_->attach({true, false}), NotReady);
+}
+
+TEST_F(EngineInTurns, EndsTheSyncThatIsUnderWayWhenItEnds) {
+    startSyncing();
+
+    engine_.reset();
+
+    EXPECT_THAT(bus_.ends, ElementsAre("- The sync engine was ended."));
+    EXPECT_EQ(results_.of("/embedded").message, "The sync engine was ended.");
+}
+
+} // namespace
