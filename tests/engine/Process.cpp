@@ -8,6 +8,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include "services/base/FileContents.h"
+
 namespace quorl::syncd::testing {
 
 namespace {
@@ -75,14 +77,7 @@ std::string Process::nextLine() {
     return line;
 }
 
-std::string Process::rest() {
-    std::string text;
-    char byte = 0;
-    while (read(output_.get(), &byte, 1) == 1) {
-        text += byte;
-    }
-    return text;
-}
+std::string Process::rest() { return base::readAll(output_.get()); }
 
 SecondBus::SecondBus()
     : address_{newAddress()},
