@@ -18,10 +18,10 @@
 
 #include <unistd.h>
 
-#include "quorl-syncd/transfer/RateLimit.h"
-#include "quorl-syncd/transfer/SteadyClock.h"
 #include "quorl-syncd/transfer/Sync.h"
 #include "quorl-syncd/transfer/device/PosixDevice.h"
+#include "quorl-syncd/transfer/pace/RateLimit.h"
+#include "quorl-syncd/transfer/pace/SteadyClock.h"
 #include "quorl-syncd/transfer/songs/PosixSongSource.h"
 #include "services/media/MusicFolder.h"
 

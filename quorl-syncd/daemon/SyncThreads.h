@@ -4,8 +4,8 @@
 #include <memory>
 
 #include "quorl-syncd/engine/ports/SyncRunner.h"
-#include "quorl-syncd/transfer/RateLimit.h"
-#include "quorl-syncd/transfer/SteadyClock.h"
+#include "quorl-syncd/transfer/pace/RateLimit.h"
+#include "quorl-syncd/transfer/pace/SteadyClock.h"
 #include "quorl-syncd/transfer/songs/PosixSongSource.h"
 #include "services/engine/BusLoop.h"
 

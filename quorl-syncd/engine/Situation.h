@@ -5,7 +5,7 @@
 #include <string>
 
 #include "quorl-syncd/engine/Choices.h"
-#include "quorl-syncd/transfer/Clock.h"
+#include "quorl-syncd/transfer/pace/Clock.h"
 #include "services/wearable/Attachment.h"
 #include "services/wearable/Manifest.h"
 #include "services/wearable/Usage.h"

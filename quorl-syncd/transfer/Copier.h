@@ -7,10 +7,10 @@
 #include <string>
 #include <vector>
 
-#include "quorl-syncd/transfer/CommitRule.h"
 #include "quorl-syncd/transfer/CopyProgress.h"
 #include "quorl-syncd/transfer/Ledger.h"
 #include "quorl-syncd/transfer/SyncPorts.h"
+#include "quorl-syncd/transfer/pace/CommitRule.h"
 
 namespace quorl::syncd {
 

@@ -3,9 +3,9 @@
 #include <functional>
 #include <memory>
 
-#include "quorl-syncd/transfer/Clock.h"
-#include "quorl-syncd/transfer/Throttle.h"
 #include "quorl-syncd/transfer/device/Device.h"
+#include "quorl-syncd/transfer/pace/Clock.h"
+#include "quorl-syncd/transfer/pace/Throttle.h"
 #include "quorl-syncd/transfer/songs/SongSource.h"
 #include "services/wearable/Wearable.h"
 

@@ -1,6 +1,6 @@
 // When copies are brought onto the device.
 
-#include "quorl-syncd/transfer/CommitRule.h"
+#include "quorl-syncd/transfer/pace/CommitRule.h"
 
 #include <gtest/gtest.h>
 

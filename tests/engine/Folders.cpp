@@ -10,9 +10,9 @@
 #include <sys/stat.h>
 
 #include "quorl-syncd/transfer/ContentHash.h"
-#include "quorl-syncd/transfer/RateLimit.h"
-#include "quorl-syncd/transfer/SteadyClock.h"
 #include "quorl-syncd/transfer/device/PosixDevice.h"
+#include "quorl-syncd/transfer/pace/RateLimit.h"
+#include "quorl-syncd/transfer/pace/SteadyClock.h"
 #include "quorl-syncd/transfer/songs/PosixSongSource.h"
 #include "services/base/AtomicFile.h"
 #include "services/base/FileStatus.h"

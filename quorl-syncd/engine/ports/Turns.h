@@ -3,7 +3,7 @@
 #include <cstdint>
 #include <functional>
 
-#include "quorl-syncd/transfer/Clock.h"
+#include "quorl-syncd/transfer/pace/Clock.h"
 
 namespace quorl::syncd {
 

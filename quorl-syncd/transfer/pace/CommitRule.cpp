@@ -1,4 +1,4 @@
-#include "quorl-syncd/transfer/CommitRule.h"
+#include "quorl-syncd/transfer/pace/CommitRule.h"
 
 #include <algorithm>
 

@@ -1,4 +1,4 @@
-#include "quorl-syncd/transfer/RateLimit.h"
+#include "quorl-syncd/transfer/pace/RateLimit.h"
 
 #include <algorithm>
 #include <chrono>

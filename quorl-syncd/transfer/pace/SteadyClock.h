@@ -1,6 +1,6 @@
 #pragma once
 
-#include "quorl-syncd/transfer/Clock.h"
+#include "quorl-syncd/transfer/pace/Clock.h"
 
 namespace quorl::syncd {
 

@@ -5,7 +5,7 @@
 #include <mutex>
 #include <stop_token>
 
-#include "quorl-syncd/transfer/Throttle.h"
+#include "quorl-syncd/transfer/pace/Throttle.h"
 
 namespace quorl::syncd {
 
