@@ -3,6 +3,7 @@
 
 #include <gmock/gmock.h>
 
+#include "platform/InterfaceVersion.h"
 #include "tests/quorl/QuorlProcess.h"
 #include "tests/quorl/SampleMusic.h"
 
@@ -62,7 +63,8 @@ TEST_F(BrokenPlugin, missingRegistrationIsNamed) {
 }
 
 TEST_F(BrokenPlugin, otherInterfaceVersionIsTold) {
-    registerWith("\"interfaceVersion\": 1", "\"interfaceVersion\": 99");
+    registerWith("\"interfaceVersion\": " + std::to_string(QuorlInterfaceVersion),
+                 "\"interfaceVersion\": 99");
     EXPECT_THAT(page(),
                 AllOf(HasSubstr("Broken.bundle/registration.json"), HasSubstr("version 99")));
 }
