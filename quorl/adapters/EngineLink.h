@@ -9,12 +9,12 @@
 namespace quorl {
 
 /// The sync engine as panes see it: its sessions, and what it tells about itself and the wearable.
-/// Main thread, except for the listener's part, which the engine's client calls on its own thread.
-/// Observers of sessions are told on that thread too.
-class EngineLink final : public engine::Listener {
+/// What the engine's client says on its own thread is brought to the main thread, on which
+/// observers of sessions are told too. Main thread.
+class EngineLink final {
   public:
-    /// Called on the main thread whenever `state` may have changed, and with a sentence for the
-    /// user when the session bus is gone; that sentence is empty otherwise.
+    /// Called whenever `state` has changed other than by a task, and with a sentence for the user
+    /// when the session bus is gone; that sentence is empty otherwise.
     using Changed = std::function<void(const std::string& problem)>;
 
     /// What the engine is to work with while this app is there.
@@ -33,38 +33,26 @@ class EngineLink final : public engine::Listener {
     /// The sessions of a type that exist now, never null.
     [[nodiscard]] NSArray<DVSession> sessions(const std::string& type) const;
 
-    [[nodiscard]] engine::EngineState state() const { return client_.state(); }
+    [[nodiscard]] const engine::EngineState& state() const { return *state_; }
 
     void setConnected(bool connected) { client_.setConnected(connected); }
 
     void setOnCharger(bool onCharger) { client_.setOnCharger(onCharger); }
 
-    void engineDidAppear(const engine::EngineState& state) override;
-    void engineDidVanish(const std::string& reason) override;
-    void busDidVanish(const std::string& problem) override;
-    void sessionWillBegin(const engine::SessionState& session) override;
-    void taskWillBegin(const engine::SessionState& session, const engine::TaskState& task) override;
-    void taskDidBegin(const engine::SessionState& session, const engine::TaskState& task) override;
-    void taskDidUpdate(const engine::SessionState& session, const engine::TaskState& task) override;
-    void taskDidFinish(const engine::SessionState& session, const engine::TaskState& task,
-                       bool success, const std::string& message) override;
-    void sessionDidFinish(const engine::SessionState& session, bool success,
-                          const std::string& message) override;
-    void sessionDidVanish(const engine::SessionState& session) override;
-    void statusDidChange() override;
-
   private:
-    struct Shared;
-    using TaskMessage = void (DVSessionObserver::*)(DVSession&, DVSessionTask&);
+    struct Inbox;
 
+    void fetch();
+    void take(const engine::Event& event);
+    void tellObservers(const engine::Event& event) const;
     void tellPlaces();
-    void tellTask(const engine::SessionState& session, const engine::TaskState& task,
-                  TaskMessage message);
-    void replaceSessions(const std::vector<engine::SessionState>& sessions);
 
     const Places places_;
-    std::shared_ptr<Shared> shared_;
-    engine::Client client_; ///< last: its thread calls this object until it is destroyed
+    const Changed changed_;
+    std::shared_ptr<const engine::EngineState> state_ = std::make_shared<engine::EngineState>();
+    std::vector<std::shared_ptr<EngineSession>> sessions_;
+    std::shared_ptr<Inbox> inbox_;
+    engine::Client client_; ///< last: its thread fills the inbox until it is destroyed
 };
 
 } // namespace quorl

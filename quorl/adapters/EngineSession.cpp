@@ -1,64 +1,41 @@
 #include "quorl/adapters/EngineSession.h"
 
-#include <algorithm>
+#include <limits>
 
 namespace quorl {
 
-EngineTask::EngineTask(const engine::TaskState& task)
-    : groupingKey_(task.groupingKey),
-      isRunning_(task.isRunning),
-      total_(static_cast<NSUInteger>(task.totalItemCount)),
-      completed_(static_cast<NSUInteger>(task.completedItemCount)),
-      progress_(task.progress) {}
+namespace {
 
-void EngineTask::update(const engine::TaskState& task) {
-    isRunning_ = task.isRunning;
-    total_ = static_cast<NSUInteger>(task.totalItemCount);
-    completed_ = static_cast<NSUInteger>(task.completedItemCount);
-    progress_ = task.progress;
+/// On machines with shorter words, as much as they hold.
+NSUInteger countOf(std::uint64_t count) {
+    return static_cast<NSUInteger>(
+        std::min<std::uint64_t>(count, std::numeric_limits<NSUInteger>::max()));
 }
 
-EngineSession::EngineSession(const engine::SessionState& session)
-    : type_(session.typeIdentifier), isFinished_(session.isFinished) {
-    update(session);
+} // namespace
+
+NSUInteger EngineTask::totalItemCount() const { return countOf(task_->totalItemCount); }
+
+NSUInteger EngineTask::completedItemCount() const { return countOf(task_->completedItemCount); }
+
+void EngineSession::show(std::shared_ptr<const engine::SessionState> session) {
+    session_ = std::move(session);
+    showAll(tasks_, session_->tasks, session_);
 }
 
-std::shared_ptr<EngineTask> EngineSession::update(const engine::TaskState& task) {
-    const std::lock_guard lock(mutex_);
-    const auto known = std::find_if(tasks_.begin(), tasks_.end(), [&task](const auto& entry) {
-        return entry.first == task.path;
-    });
-    if (known != tasks_.end()) {
-        known->second->update(task);
-        return known->second;
-    }
-    return tasks_.emplace_back(task.path, std::make_shared<EngineTask>(task)).second;
-}
-
-void EngineSession::update(const engine::SessionState& session) {
-    for (const engine::TaskState& task : session.tasks) {
-        update(task);
-    }
-    isFinished_ = session.isFinished;
+std::shared_ptr<EngineTask> EngineSession::task(const std::string& path) const {
+    return find(tasks_, path);
 }
 
 NSArray<DVSessionTask> EngineSession::sessionTasks() const {
-    auto tasks = std::make_shared<std::vector<std::shared_ptr<DVSessionTask>>>();
-    const std::lock_guard lock(mutex_);
-    for (const auto& [path, task] : tasks_) {
-        tasks->push_back(task);
-    }
-    return tasks;
+    return std::make_shared<std::vector<std::shared_ptr<DVSessionTask>>>(tasks_.begin(),
+                                                                         tasks_.end());
 }
 
 NSArray<DVSessionTask> EngineSession::sessionTasksWithGroupingKey(const std::string& key) const {
     auto tasks = std::make_shared<std::vector<std::shared_ptr<DVSessionTask>>>();
-    const std::lock_guard lock(mutex_);
-    for (const auto& [path, task] : tasks_) {
-        if (task->sessionGroupingKey() == key) {
-            tasks->push_back(task);
-        }
-    }
+    std::copy_if(tasks_.begin(), tasks_.end(), std::back_inserter(*tasks),
+                 [&key](const auto& task) { return task->sessionGroupingKey() == key; });
     return tasks;
 }
 

@@ -1,65 +1,83 @@
 #pragma once
 
-#include <atomic>
-#include <map>
-#include <mutex>
+#include <algorithm>
+#include <memory>
+#include <vector>
 
 #include "runtime/services/ObservedSession.h"
 #include "services/engine/EngineState.h"
 
 namespace quorl {
 
-/// A task of the sync engine, with the figures that the engine gave last. Any thread.
+/// A task of the sync engine, as it was when it was last shown. Main thread.
 class EngineTask final : public DVSessionTask {
   public:
-    explicit EngineTask(const engine::TaskState& task);
+    /// From now on it has the figures of `task`, which is not null.
+    void show(std::shared_ptr<const engine::TaskState> task) { task_ = std::move(task); }
 
-    void update(const engine::TaskState& task);
+    [[nodiscard]] const std::string& path() const { return task_->path; }
 
-    [[nodiscard]] bool isRunning() const override { return isRunning_; }
+    [[nodiscard]] bool isRunning() const override { return task_->isRunning; }
 
-    [[nodiscard]] const std::string& sessionGroupingKey() const override { return groupingKey_; }
+    [[nodiscard]] const std::string& sessionGroupingKey() const override {
+        return task_->groupingKey;
+    }
 
-    [[nodiscard]] NSUInteger totalItemCount() const override { return total_; }
+    [[nodiscard]] NSUInteger totalItemCount() const override;
+    [[nodiscard]] NSUInteger completedItemCount() const override;
 
-    [[nodiscard]] NSUInteger completedItemCount() const override { return completed_; }
-
-    [[nodiscard]] double progress() const override { return progress_; }
+    [[nodiscard]] double progress() const override { return task_->progress; }
 
   private:
-    const std::string groupingKey_;
-    std::atomic<bool> isRunning_;
-    std::atomic<NSUInteger> total_;
-    std::atomic<NSUInteger> completed_;
-    std::atomic<double> progress_;
+    std::shared_ptr<const engine::TaskState> task_;
 };
 
-/// A session of the sync engine. Its tasks keep their identity from one figure to the next. Any
-/// thread.
+/// A session of the sync engine, as it was when it was last shown. Its tasks keep their identity
+/// from one time to the next. Main thread, apart from its observers.
 class EngineSession final : public ObservedSession {
   public:
-    explicit EngineSession(const engine::SessionState& session);
+    /// From now on it has the figures of `session`, which is not null.
+    void show(std::shared_ptr<const engine::SessionState> session);
 
-    /// The object that stands for `task`, with its figures taken over; made where there is none
-    /// yet.
-    std::shared_ptr<EngineTask> update(const engine::TaskState& task);
+    [[nodiscard]] const std::string& path() const { return session_->path; }
 
-    /// Takes over everything that the engine tells of the session.
-    void update(const engine::SessionState& session);
+    [[nodiscard]] const std::string& type() const { return session_->typeIdentifier; }
 
-    [[nodiscard]] const std::string& type() const { return type_; }
+    /// The object that stands for a task; null: it has none of this path.
+    [[nodiscard]] std::shared_ptr<EngineTask> task(const std::string& path) const;
 
-    [[nodiscard]] bool isFinished() const override { return isFinished_; }
+    [[nodiscard]] bool isFinished() const override { return session_->isFinished; }
 
     [[nodiscard]] NSArray<DVSessionTask> sessionTasks() const override;
     [[nodiscard]] NSArray<DVSessionTask>
     sessionTasksWithGroupingKey(const std::string& key) const override;
 
   private:
-    const std::string type_;
-    std::atomic<bool> isFinished_;
-    mutable std::mutex mutex_;
-    std::vector<std::pair<std::string, std::shared_ptr<EngineTask>>> tasks_; ///< by path, in order
+    std::shared_ptr<const engine::SessionState> session_;
+    std::vector<std::shared_ptr<EngineTask>> tasks_;
 };
+
+/// The object of this path; null: there is none.
+template <class Object>
+[[nodiscard]] std::shared_ptr<Object> find(const std::vector<std::shared_ptr<Object>>& objects,
+                                           const std::string& path) {
+    const auto found = std::find_if(objects.begin(), objects.end(),
+                                    [&path](const auto& object) { return object->path() == path; });
+    return found == objects.end() ? nullptr : *found;
+}
+
+/// An object for each of `states`, in their order; those that stay keep theirs. `owner` keeps the
+/// states alive.
+template <class Object, class State, class Owner>
+void showAll(std::vector<std::shared_ptr<Object>>& objects, const std::vector<State>& states,
+             const std::shared_ptr<Owner>& owner) {
+    std::vector<std::shared_ptr<Object>> shown;
+    for (const State& state : states) {
+        const auto known = find(objects, state.path);
+        shown.push_back(known ? known : std::make_shared<Object>());
+        shown.back()->show({owner, &state});
+    }
+    objects = std::move(shown);
+}
 
 } // namespace quorl

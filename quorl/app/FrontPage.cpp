@@ -114,14 +114,14 @@ std::optional<std::string> FrontPage::isOnCharger(const std::shared_ptr<PSSpecif
 }
 
 std::optional<std::string> FrontPage::storage(const std::shared_ptr<PSSpecifier>& /*row*/) {
-    const auto wearable = engine_->state().wearable;
+    const auto& wearable = engine_->state().wearable;
     return wearable.capacity == 0
                ? "Unknown"
                : sizeText(wearable.available) + " of " + sizeText(wearable.capacity) + " free";
 }
 
 std::optional<std::string> FrontPage::lastSync(const std::shared_ptr<PSSpecifier>& /*row*/) {
-    const auto engine = engine_->state().engine;
+    const auto& engine = engine_->state().engine;
     return engine.lastTime == 0 ? "Not yet" : timeText(engine.lastTime);
 }
 

@@ -1,12 +1,13 @@
 #include "quorl/reports/StatusReport.h"
 
+#include <algorithm>
 #include <future>
 #include <iostream>
+#include <optional>
 
 #include <nlohmann/json.hpp>
 
 #include "services/engine/Client.h"
-#include "services/media/MusicFolder.h"
 #include "services/preferences/SharedPreferences.h"
 
 namespace quorl {
@@ -15,80 +16,63 @@ namespace {
 
 using Json = nlohmann::ordered_json;
 
-/// Waits for the first word from the engine, or about it.
-class FirstWord final : public engine::Listener {
-  public:
-    struct Word {
-        engine::EngineState state;
-        std::string problem; ///< empty where there is a bus
-    };
-
-    [[nodiscard]] Word wait() { return word_.get_future().get(); }
-
-    void engineDidAppear(const engine::EngineState& state) override { say({state, {}}); }
-
-    void engineDidVanish(const std::string& /*reason*/) override { say({}); }
-
-    void busDidVanish(const std::string& problem) override { say({{}, problem}); }
-
-  private:
-    void say(Word word) {
-        if (!isSaid_) {
-            isSaid_ = true;
-            word_.set_value(std::move(word));
-        }
-    }
-
-    bool isSaid_ = false; ///< the client's thread only
-    std::promise<Word> word_;
-};
-
-/// What is chosen, and whether it is on the wearable as it is now.
+/// How far the chosen playlist is.
 struct Choice {
-    std::string name; ///< empty for no playlist
-    const char* state = "off";
+    std::string playlist; ///< empty for none, and where it is not known
+    std::string state;    ///< a word of the engine's SyncState
 };
 
-Choice choiceOf(const preferences::SharedPreferences& preferences, const media::Inventory& library,
-                bool isRunning) {
-    using namespace preferences;
-    const auto id = preferences.get(assetSyncPlaylistPersistentID);
-    const auto* playlist =
-        preferences.get(assetSyncEnabled) && id ? library.playlist(*id) : nullptr;
-    if (!playlist) {
-        return {};
-    }
-    const bool isSent =
-        preferences.get(lastFullySentAssetSyncPlaylistPersistentID) == playlist->id &&
-        preferences.get(lastFullySentAssetSyncPlaylistVersion) == playlist->revision;
-    return {playlist->name, isRunning ? "syncing" : isSent ? "synced" : "pending"};
+/// Whether an event tells all that is asked for: an engine that has just been started knows little.
+bool isAnswer(const engine::Event& event) {
+    return !event.state->isThere || event.state->engine.syncState != engine::syncUnknown;
 }
 
-/// The mean progress of the tasks that carry music in sessions that have not finished; null where
-/// none is running.
-std::optional<double> progressOf(const engine::EngineState& state) {
-    double sum = 0;
-    int count = 0;
-    for (const engine::SessionState& session : state.sessions) {
-        for (const engine::TaskState& task : session.tasks) {
-            if (!session.isFinished && task.groupingKey == engine::assetGroupingKey) {
-                sum += task.progress;
-                ++count;
-            }
+/// Waits for what the engine has to tell, or for what there is to tell about it.
+engine::Event askEngine() {
+    std::promise<engine::Event> answer;
+    bool isAnswered = false; // the client's thread only
+    const engine::Client client([&](const engine::Event& event) {
+        if (!isAnswered && isAnswer(event)) {
+            isAnswered = true;
+            answer.set_value(event);
         }
-    }
-    return count == 0 ? std::nullopt : std::optional(sum / count);
+    });
+    return answer.get_future().get();
 }
 
-bool isRunning(const engine::EngineState& state) {
-    return std::any_of(state.sessions.begin(), state.sessions.end(),
-                       [](const engine::SessionState& session) { return !session.isFinished; });
+Choice choiceOf(const engine::EngineStatus& engine) {
+    // Some other engine may not tell.
+    return {.playlist = engine.playlistName,
+            .state = engine.syncState.empty() ? engine::syncUnknown : engine.syncState};
+}
+
+/// What is known without an engine: whether there is something to sync at all. What became of it
+/// could only be told by reading the music folder. Nothing where there are no preferences either.
+std::optional<Choice> choiceWithoutEngine() {
+    const auto opened = preferences::SharedPreferences::open({});
+    if (!opened.problem.empty()) {
+        std::cerr << "quorl: " << opened.problem << '\n';
+    }
+    if (!opened.preferences) {
+        return std::nullopt;
+    }
+    const bool isWished = opened.preferences->get(preferences::assetSyncEnabled) &&
+                          opened.preferences->get(preferences::assetSyncPlaylistPersistentID);
+    return Choice{.playlist = {}, .state = isWished ? engine::syncUnknown : engine::syncOff};
+}
+
+/// Of the running session; nothing where none is running.
+std::optional<double> progressOf(const engine::EngineState& state) {
+    const auto running = std::find_if(state.sessions.begin(), state.sessions.end(),
+                                      [](const auto& session) { return !session.isFinished; });
+    return running == state.sessions.end() ? std::nullopt
+                                           : std::optional<double>(running->progress);
 }
 
 Json jsonOf(const engine::EngineState& state, const Choice& choice) {
     Json json;
     json["engine"] = state.isThere;
-    json["playlist"] = choice.name.empty() ? Json() : Json(choice.name);
+    json["playlist"] = choice.playlist.empty() ? Json() : Json(choice.playlist);
     json["state"] = choice.state;
     const auto progress = progressOf(state);
     json["progress"] = progress ? Json(*progress) : Json();
@@ -109,7 +93,12 @@ Json jsonOf(const engine::EngineState& state, const Choice& choice) {
 }
 
 void printText(const engine::EngineState& state, const Choice& choice) {
-    std::cout << "Playlist:   " << (choice.name.empty() ? "none" : choice.name) << '\n'
+    const bool isKnown = choice.state != engine::syncUnknown;
+    std::cout << "Playlist:   "
+              << (!choice.playlist.empty() ? choice.playlist
+                  : isKnown                ? "none"
+                                           : "unknown")
+              << '\n'
               << "Sync:       " << choice.state;
     if (const auto progress = progressOf(state)) {
         std::cout << ", " << static_cast<int>(*progress * 100) << "%";
@@ -132,30 +121,22 @@ void printText(const engine::EngineState& state, const Choice& choice) {
 } // namespace
 
 ExitCode printStatus(const Options& options) {
-    FirstWord listener;
-    FirstWord::Word word;
-    {
-        const engine::Client client(listener);
-        word = listener.wait();
-    }
-    if (!word.problem.empty()) {
-        std::cerr << "quorl: " << word.problem << '\n';
+    const auto answer = askEngine();
+    if (answer.kind == engine::Event::Kind::BusDidVanish) {
+        std::cerr << "quorl: " << answer.message << '\n';
         return ExitCode::Failure;
     }
-    const auto opened = preferences::SharedPreferences::open({});
-    if (!opened.problem.empty()) {
-        std::cerr << "quorl: " << opened.problem << '\n';
-    }
-    if (!opened.preferences) {
+    const auto choice = answer.state->isThere ? std::optional(choiceOf(answer.state->engine))
+                                              : choiceWithoutEngine();
+    if (!choice) {
         return ExitCode::Failure;
     }
-    const auto library = media::scan(options.places.music);
-    const Choice choice = choiceOf(*opened.preferences, *library, isRunning(word.state));
     if (options.json) {
-        std::cout << jsonOf(word.state, choice).dump(2, ' ', false, Json::error_handler_t::replace)
-                  << '\n';
+        std::cout
+            << jsonOf(*answer.state, *choice).dump(2, ' ', false, Json::error_handler_t::replace)
+            << '\n';
     } else {
-        printText(word.state, choice);
+        printText(*answer.state, *choice);
     }
     return ExitCode::Success;
 }

@@ -1,11 +1,11 @@
 #include "services/engine/Client.h"
 
-#include <algorithm>
 #include <thread>
 #include <utility>
 
 #include "services/engine/BusLoop.h"
 #include "services/engine/Interface.h"
+#include "services/engine/Reducer.h"
 
 namespace quorl::engine {
 
@@ -14,9 +14,6 @@ namespace {
 constexpr auto managerInterface = "org.freedesktop.DBus.ObjectManager";
 constexpr auto propertiesInterface = "org.freedesktop.DBus.Properties";
 constexpr auto daemonName = "org.freedesktop.DBus";
-
-using Interfaces = std::map<std::string, Properties>;
-using Objects = std::map<sdbus::ObjectPath, Interfaces>;
 
 std::unique_ptr<sdbus::IConnection> connectToSession(std::string& problem) {
     try {
@@ -39,36 +36,53 @@ sdbus::message_handler tolerant(Handler handler) {
     };
 }
 
-template <class Item>
-Item* find(std::vector<Item>& items, const std::string& path) {
-    const auto found = std::ranges::find(items, path, &Item::path);
-    return found == items.end() ? nullptr : &*found;
+BusMessage addedBy(sdbus::Message& message) {
+    sdbus::ObjectPath path;
+    Interfaces interfaces;
+    message >> path >> interfaces;
+    return ObjectAdded{path, interfaces};
 }
 
-const Properties* propertiesOf(const Interfaces& interfaces, const char* name) {
-    const auto found = interfaces.find(name);
-    return found == interfaces.end() ? nullptr : &found->second;
+BusMessage removedBy(sdbus::Message& message) {
+    sdbus::ObjectPath path;
+    std::vector<std::string> interfaces;
+    message >> path >> interfaces;
+    return ObjectRemoved{path, interfaces};
 }
 
-std::string sessionOf(const Properties& task) {
-    const auto found = task.find("Session");
-    return found != task.end() && found->second.containsValueOfType<sdbus::ObjectPath>()
-               ? found->second.get<sdbus::ObjectPath>()
-               : std::string{};
+BusMessage changedBy(sdbus::Message& message) {
+    PropertiesChanged changed{.path = message.getPath(), .interface = {}, .properties = {}};
+    message >> changed.interface >> changed.properties;
+    return changed;
+}
+
+BusMessage signalledBy(sdbus::Message& message) {
+    ObjectSignalled signalled{.path = message.getPath(),
+                              .interface = message.getInterfaceName(),
+                              .signal = message.getMemberName()};
+    if (signalled.signal == "Completed") {
+        message >> signalled.success >> signalled.message;
+    }
+    return signalled;
+}
+
+/// The plain value of a signal. Throws where it does not have what its name promises.
+BusMessage messageOf(sdbus::Message& signal) {
+    const auto interface = signal.getInterfaceName();
+    const auto member = signal.getMemberName();
+    if (interface == managerInterface) {
+        return member == "InterfacesAdded" ? addedBy(signal) : removedBy(signal);
+    }
+    return interface == propertiesInterface ? changedBy(signal) : signalledBy(signal);
 }
 
 } // namespace
 
-/// The thread and what belongs to it. Besides `state` and `request`, everything happens there.
+/// The thread and what belongs to it. Besides `request`, everything happens there.
 class Client::Connection {
   public:
-    Connection(Listener& listener, std::string name);
+    Connection(Listener listener, std::string name);
     ~Connection();
-
-    [[nodiscard]] EngineState state() const {
-        const std::scoped_lock lock{mutex_};
-        return state_;
-    }
 
     using Action = std::function<void(std::function<void(const sdbus::Error*)> done)>;
 
@@ -89,32 +103,14 @@ class Client::Connection {
     void work();
     void open();
     void fetchState();
-    void takeState(const Objects& objects);
+    void hear(const BusMessage& message);
     void noteEngineGone(const std::string& reason);
     void answer(std::uint64_t number, const std::string& problem);
     void answerAll(const std::string& problem);
 
     void onOwnerChanged(sdbus::Message& message);
-    void onSignal(sdbus::Message& message);
-    void onAdded(const std::string& path, const Interfaces& interfaces);
-    void onRemoved(const std::string& path);
-    void onChanged(const std::string& path, const std::string& interface,
-                   const Properties& properties);
-    void onTaskSignal(const std::string& path, const std::string& signal, sdbus::Message& message);
-    void onSessionCompleted(const std::string& path, sdbus::Message& message);
 
-    /// Adds what the object is to `state`; true where it was a session or a task.
-    static void add(EngineState& state, const std::string& path, const Interfaces& interfaces);
-    static std::pair<SessionState*, TaskState*> findTask(EngineState& state,
-                                                         const std::string& path);
-
-    template <class Change>
-    auto change(Change change) {
-        const std::scoped_lock lock{mutex_};
-        return change(state_);
-    }
-
-    Listener& listener_;
+    const Listener listener_;
     const std::string name_;
 
     /// Empty as long as the bus is there.
@@ -127,14 +123,13 @@ class Client::Connection {
     /// Which answer about all objects is the one that counts.
     std::uint64_t fetches_ = 0;
 
-    mutable std::mutex mutex_;
-    EngineState state_;
+    std::shared_ptr<const EngineState> state_ = std::make_shared<EngineState>();
 
     std::thread thread_;
 };
 
-Client::Connection::Connection(Listener& listener, std::string name)
-    : listener_{listener}, name_{std::move(name)}, loop_{connectToSession(busProblem_)} {
+Client::Connection::Connection(Listener listener, std::string name)
+    : listener_{std::move(listener)}, name_{std::move(name)}, loop_{connectToSession(busProblem_)} {
     thread_ = std::thread{[this] { work(); }};
 }
 
@@ -150,8 +145,8 @@ void Client::Connection::work() {
     }
     if (!busProblem_.empty()) {
         busProblem_ = "The session bus is gone (" + busProblem_ + "). Log in again.";
-        noteEngineGone(busProblem_);
-        listener_.busDidVanish(busProblem_);
+        ++fetches_;
+        hear(BusGone{busProblem_});
         answerAll(busProblem_);
         static_cast<void>(loop_.run());
     }
@@ -165,7 +160,7 @@ void Client::Connection::work() {
 void Client::Connection::open() {
     auto& bus = loop_.bus();
     const auto sender = "type='signal',sender='" + name_ + "',path_namespace='" + managerPath + "'";
-    bus.addMatch(sender, tolerant([this](sdbus::Message& message) { onSignal(message); }),
+    bus.addMatch(sender, tolerant([this](sdbus::Message& message) { hear(messageOf(message)); }),
                  sdbus::floating_slot);
     bus.addMatch("type='signal',sender='" + std::string{daemonName} +
                      "',member='NameOwnerChanged',arg0='" + name_ + "'",
@@ -187,33 +182,22 @@ void Client::Connection::fetchState() {
             if (error != nullptr) {
                 noteEngineGone(error->getMessage());
             } else {
-                takeState(objects);
+                hear(ObjectsListed{objects});
             }
         });
 }
 
-/// What was signalled before this answer is in it, and was passed over.
-void Client::Connection::takeState(const Objects& objects) {
-    EngineState state;
-    state.isThere = true;
-    for (const auto& [path, interfaces] : objects) {
-        if (propertiesOf(interfaces, taskInterface) == nullptr) {
-            add(state, path, interfaces);
-        }
+void Client::Connection::hear(const BusMessage& message) {
+    const auto reduced = reduce(state_, message);
+    state_ = reduced.state;
+    if (reduced.event) {
+        listener_(*reduced.event);
     }
-    for (const auto& [path, interfaces] : objects) {
-        if (propertiesOf(interfaces, taskInterface) != nullptr) {
-            add(state, path, interfaces);
-        }
-    }
-    change([&](EngineState& ours) { ours = state; });
-    listener_.engineDidAppear(state);
 }
 
 void Client::Connection::noteEngineGone(const std::string& reason) {
     ++fetches_;
-    change([](EngineState& state) { state = {}; });
-    listener_.engineDidVanish(reason);
+    hear(EngineGone{reason});
 }
 
 void Client::Connection::onOwnerChanged(sdbus::Message& message) {
@@ -221,165 +205,12 @@ void Client::Connection::onOwnerChanged(sdbus::Message& message) {
     std::string before;
     std::string now;
     message >> name >> before >> now;
-    if (now.empty()) {
+    if (!before.empty()) {
+        // The sessions of another engine are others, whatever their paths.
         noteEngineGone("The sync engine has ended.");
-    } else {
+    }
+    if (!now.empty()) {
         fetchState();
-    }
-}
-
-void Client::Connection::onSignal(sdbus::Message& message) {
-    if (!state().isThere) {
-        return;
-    }
-    const auto interface = message.getInterfaceName();
-    const auto member = message.getMemberName();
-    const auto path = message.getPath();
-    if (interface == managerInterface && member == "InterfacesAdded") {
-        sdbus::ObjectPath added;
-        Interfaces interfaces;
-        message >> added >> interfaces;
-        onAdded(added, interfaces);
-    } else if (interface == managerInterface && member == "InterfacesRemoved") {
-        sdbus::ObjectPath removed;
-        message >> removed;
-        onRemoved(removed);
-    } else if (interface == propertiesInterface && member == "PropertiesChanged") {
-        std::string changed;
-        Properties properties;
-        message >> changed >> properties;
-        onChanged(path, changed, properties);
-    } else if (interface == taskInterface) {
-        onTaskSignal(path, member, message);
-    } else if (interface == sessionInterface && member == "Completed") {
-        onSessionCompleted(path, message);
-    }
-}
-
-void Client::Connection::add(EngineState& state, const std::string& path,
-                             const Interfaces& interfaces) {
-    if (const auto* const properties = propertiesOf(interfaces, engineInterface)) {
-        update(state.engine, *properties);
-    }
-    if (const auto* const properties = propertiesOf(interfaces, wearableInterface)) {
-        update(state.wearable, *properties);
-    }
-    if (const auto* const properties = propertiesOf(interfaces, sessionInterface)) {
-        auto& session = state.sessions.emplace_back();
-        session.path = path;
-        update(session, *properties);
-    }
-    if (const auto* const properties = propertiesOf(interfaces, taskInterface)) {
-        if (auto* const session = find(state.sessions, sessionOf(*properties))) {
-            auto& task = session->tasks.emplace_back();
-            task.path = path;
-            update(task, *properties);
-        }
-    }
-}
-
-void Client::Connection::onAdded(const std::string& path, const Interfaces& interfaces) {
-    const auto session = change([&](EngineState& state) {
-        add(state, path, interfaces);
-        const auto* const added = find(state.sessions, path);
-        return added == nullptr ? SessionState{} : *added;
-    });
-    if (!session.path.empty()) {
-        listener_.sessionWillBegin(session);
-    }
-}
-
-void Client::Connection::onRemoved(const std::string& path) {
-    const auto session = change([&](EngineState& state) {
-        SessionState removed;
-        if (const auto* const found = find(state.sessions, path)) {
-            removed = *found;
-        }
-        std::erase_if(state.sessions, [&](const SessionState& each) { return each.path == path; });
-        for (auto& each : state.sessions) {
-            std::erase_if(each.tasks, [&](const TaskState& task) { return task.path == path; });
-        }
-        return removed;
-    });
-    if (!session.path.empty()) {
-        listener_.sessionDidVanish(session);
-    }
-}
-
-void Client::Connection::onChanged(const std::string& path, const std::string& interface,
-                                   const Properties& properties) {
-    if (interface == taskInterface) {
-        SessionState session;
-        TaskState task;
-        const bool isUpdate = change([&](EngineState& state) {
-            const auto [ofTask, changed] = findTask(state, path);
-            if (changed == nullptr) {
-                return false;
-            }
-            const bool wasRunning = changed->isRunning;
-            update(*changed, properties);
-            session = *ofTask;
-            task = *changed;
-            // Its beginning and its end are told on their own.
-            return task.isRunning == wasRunning;
-        });
-        if (isUpdate) {
-            listener_.taskDidUpdate(session, task);
-        }
-    } else if (interface == sessionInterface) {
-        change([&](EngineState& state) {
-            if (auto* const session = find(state.sessions, path)) {
-                update(*session, properties);
-            }
-        });
-    } else if (interface == engineInterface || interface == wearableInterface) {
-        change([&](EngineState& state) {
-            if (interface == engineInterface) {
-                update(state.engine, properties);
-            } else {
-                update(state.wearable, properties);
-            }
-        });
-        listener_.statusDidChange();
-    }
-}
-
-std::pair<SessionState*, TaskState*> Client::Connection::findTask(EngineState& state,
-                                                                  const std::string& path) {
-    for (auto& session : state.sessions) {
-        if (auto* const task = find(session.tasks, path)) {
-            return {&session, task};
-        }
-    }
-    return {nullptr, nullptr};
-}
-
-void Client::Connection::onTaskSignal(const std::string& path, const std::string& signal,
-                                      sdbus::Message& message) {
-    auto now = state();
-    const auto [session, task] = findTask(now, path);
-    if (task == nullptr) {
-        return;
-    }
-    if (signal == "WillBegin") {
-        listener_.taskWillBegin(*session, *task);
-    } else if (signal == "DidBegin") {
-        listener_.taskDidBegin(*session, *task);
-    } else if (signal == "Completed") {
-        bool success = false;
-        std::string text;
-        message >> success >> text;
-        listener_.taskDidFinish(*session, *task, success, text);
-    }
-}
-
-void Client::Connection::onSessionCompleted(const std::string& path, sdbus::Message& message) {
-    bool success = false;
-    std::string text;
-    message >> success >> text;
-    auto now = state();
-    if (const auto* const session = find(now.sessions, path)) {
-        listener_.sessionDidFinish(*session, success, text);
     }
 }
 
@@ -443,12 +274,10 @@ void Client::Connection::set(const char* path, const char* interface, const char
         std::move(reply));
 }
 
-Client::Client(Listener& listener, std::string name)
-    : connection_{std::make_unique<Connection>(listener, std::move(name))} {}
+Client::Client(Listener listener, std::string name)
+    : connection_(std::make_unique<Connection>(std::move(listener), std::move(name))) {}
 
 Client::~Client() = default;
-
-EngineState Client::state() const { return connection_->state(); }
 
 void Client::startNow(Reply reply) {
     connection_->callMethod(enginePath, engineInterface, "StartNow", std::move(reply));

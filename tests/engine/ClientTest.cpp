@@ -19,7 +19,7 @@ class Client : public EngineTest {};
 TEST_F(Client, IsCalmWhereThereIsNoEngine) {
     recorder_.next(Kind::EngineDidVanish);
 
-    EXPECT_FALSE(recorder_.client().state().isThere);
+    EXPECT_FALSE(recorder_.state().isThere);
     EXPECT_NE(recorder_.ask(&engine::Client::startNow), "") << "a request says why it failed";
 }
 
@@ -36,7 +36,7 @@ TEST_F(Client, StartsTheEngineWhereItCanBeStarted) {
     Recorder second;
 
     second.next(Kind::EngineDidAppear);
-    EXPECT_EQ(second.client().state().wearable.name, "Velora");
+    EXPECT_EQ(second.state().wearable.name, "Velora");
     recorder_.next(Kind::EngineDidAppear);
 }
 
@@ -45,10 +45,10 @@ TEST_F(Client, FindsTheEngineAgainAfterItWasKilledAndRestarted) {
     start({"--rate-limit", "1000000"});
     choose();
     nextOfAssets(Kind::TaskDidUpdate);
-    ASSERT_EQ(recorder_.client().state().sessions.size(), 1);
+    ASSERT_EQ(recorder_.state().sessions.size(), 1);
 
     end(SIGKILL);
-    EXPECT_TRUE(recorder_.client().state().sessions.empty());
+    EXPECT_TRUE(recorder_.state().sessions.empty());
     start();
 
     EXPECT_TRUE(sessionEnd().success);
@@ -63,7 +63,7 @@ TEST_F(Client, ThatComesInTheMiddleOfASessionSeesAllOfIt) {
     Recorder late;
     late.next(Kind::EngineDidAppear);
 
-    const auto state = late.client().state();
+    const auto state = late.state();
     ASSERT_EQ(state.sessions.size(), 1);
     ASSERT_EQ(state.sessions.front().tasks.size(), 2);
     EXPECT_EQ(state.sessions.front().tasks.back().groupingKey, engine::assetGroupingKey);

@@ -60,9 +60,9 @@ TEST_F(Engine, SyncsTheChosenPlaylistThroughAllStagesInOrder) {
                         {"2.mp3", std::string(1'000'000, '2')},
                         {"3.mp3", std::string(1'000'000, '3')},
                         {"List.m3u8", "#EXTM3U\n#PLAYLIST:List\n1.mp3\n2.mp3\n3.mp3\n"}}));
-    EXPECT_EQ(recorder_.client().state().engine.lastMessage, "3 songs synced to Velora.");
-    EXPECT_TRUE(recorder_.client().state().engine.lastSuccess);
-    EXPECT_TRUE(recorder_.client().state().sessions.empty());
+    EXPECT_EQ(recorder_.state().engine.lastMessage, "3 songs synced to Velora.");
+    EXPECT_TRUE(recorder_.state().engine.lastSuccess);
+    EXPECT_TRUE(recorder_.state().sessions.empty());
 }
 
 TEST_F(Engine, SaysThatEverythingWasSentOnlyWhenItIsThereAndBeforeTheSessionEnds) {
@@ -149,7 +149,7 @@ TEST_F(Engine, IsCalmWhenNothingIsChosen) {
     recorder_.awaitStatus("The chosen playlist is not in the music folder.");
 
     EXPECT_EQ(recorder_.count(Kind::SessionWillBegin), 0);
-    EXPECT_EQ(recorder_.client().state().engine.lastMessage, "");
+    EXPECT_EQ(recorder_.state().engine.lastMessage, "");
     EXPECT_EQ(recorder_.ask(&engine::Client::startNow),
               "The chosen playlist is not in the music folder.");
 }
@@ -363,7 +363,7 @@ TEST_F(Engine, TellsTheLastResultAlsoAfterARestartAndOfEachWearableItsOwn) {
 
     start();
 
-    const auto status = recorder_.client().state().engine;
+    const auto status = recorder_.state().engine;
     EXPECT_TRUE(status.lastSuccess);
     EXPECT_EQ(status.lastMessage, "3 songs synced to Velora.");
     EXPECT_GT(status.lastTime, 0);
@@ -371,7 +371,7 @@ TEST_F(Engine, TellsTheLastResultAlsoAfterARestartAndOfEachWearableItsOwn) {
     recorder_.awaitStatus("Music sync is switched off.");
     EXPECT_EQ(recorder_.ask(&engine::Client::setWearableDirectory, other.path().string()), "");
     recorder_.awaitState([](const auto& state) { return state.engine.lastTime == 0; });
-    EXPECT_EQ(recorder_.client().state().engine.lastMessage, "");
+    EXPECT_EQ(recorder_.state().engine.lastMessage, "");
 }
 
 TEST_F(Engine, AnswersWhileTheWearableStallsAndCompletesTheSyncAfterwards) {
@@ -389,7 +389,7 @@ TEST_F(Engine, AnswersWhileTheWearableStallsAndCompletesTheSyncAfterwards) {
     device.awaitStalled();
 
     EXPECT_EQ(recorder_.ask(&engine::Client::setRateLimit, 5), "");
-    EXPECT_EQ(recorder_.client().state().sessions.size(), 1);
+    EXPECT_EQ(recorder_.state().sessions.size(), 1);
     EXPECT_EQ(get(lastFullySentAssetSyncPlaylistVersion), std::nullopt);
     device.goOn();
     EXPECT_TRUE(sessionEnd().success);
@@ -407,7 +407,7 @@ TEST_F(Engine, SyncsToADeviceThatIsPluggedInAndNoticesWhenItGoes) {
     recorder_.awaitState([](const engine::EngineState& state) {
         return state.engine.status.find("cannot be reached") != std::string::npos;
     });
-    EXPECT_FALSE(recorder_.client().state().wearable.isConnected);
+    EXPECT_FALSE(recorder_.state().wearable.isConnected);
     EXPECT_THAT(recorder_.ask(&engine::Client::setOnCharger, true), HasSubstr("device"));
 
     std::filesystem::create_directory(device);
@@ -415,7 +415,7 @@ TEST_F(Engine, SyncsToADeviceThatIsPluggedInAndNoticesWhenItGoes) {
     EXPECT_TRUE(sessionEnd().success);
     EXPECT_EQ(contentsOf(device / "Music").size(), 4);
     recorder_.awaitState([](const auto& state) { return state.wearable.songs == 3'000'000; });
-    EXPECT_TRUE(recorder_.client().state().wearable.isConnected);
+    EXPECT_TRUE(recorder_.state().wearable.isConnected);
     std::filesystem::remove_all(device);
     recorder_.awaitState([](const auto& state) { return !state.wearable.isConnected; });
     EXPECT_TRUE(onWearable().empty()) << "the embedded one is left alone";
@@ -452,7 +452,7 @@ TEST_F(Engine, TakesAnotherMusicFolderAtRunTime) {
 
     EXPECT_TRUE(sessionEnd().success);
     EXPECT_EQ(onWearable().at("a.mp3"), "a");
-    EXPECT_EQ(recorder_.client().state().engine.musicFolder, other.path().string());
+    EXPECT_EQ(recorder_.state().engine.musicFolder, other.path().string());
 }
 
 TEST_F(Engine, LeavesInOrderWhenItIsEndedInTheMiddle) {
@@ -478,7 +478,7 @@ TEST_F(Engine, LeavesTheNameToTheEngineThatHasIt) {
 
     EXPECT_EQ(second.wait(), 3);
     EXPECT_THAT(second.rest(), HasSubstr("Another sync engine is running"));
-    EXPECT_TRUE(recorder_.client().state().isThere);
+    EXPECT_TRUE(recorder_.state().isThere);
 }
 
 TEST_F(Engine, EndsWithAMessageWhenTheBusGoesAway) {
@@ -520,6 +520,31 @@ TEST_F(Engine, TellsItsOptionsAndItsVersion) {
 
     Process wrong{{ENGINE_PROGRAM, "--no-such-option"}};
     EXPECT_NE(wrong.wait(), 0);
+}
+
+TEST_F(Engine, TellsWhichPlaylistIsToBeSyncedAndHowFarThatIs) {
+    const auto is = [](const std::string& state, const std::string& playlist) {
+        return [=](const engine::EngineState& all) {
+            return all.engine.syncState == state && all.engine.playlistName == playlist;
+        };
+    };
+    listLargeSongs();
+    start({"--rate-limit", slowly});
+    recorder_.awaitState(is("off", ""));
+
+    choose();
+
+    recorder_.awaitState(is("syncing", "List"));
+    recorder_.awaitState([](const engine::EngineState& all) {
+        return !all.sessions.empty() && all.sessions.front().isProgressValid &&
+               all.sessions.front().progress > 0;
+    });
+    recorder_.awaitState(is("synced", "List"));
+    EXPECT_EQ(recorder_.ask(&engine::Client::setOnCharger, false), "");
+    limitTo(1, LimitType::Songs);
+    recorder_.awaitState(is("pending", "List"));
+    set(assetSyncEnabled, false);
+    recorder_.awaitState(is("off", ""));
 }
 
 TEST_F(Engine, DescribesItselfOnTheBus) {

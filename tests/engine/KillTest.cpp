@@ -65,7 +65,7 @@ TEST_F(KilledEngine, LeavesNothingHalfAndNothingOfOthersTouchedAndCompletesInThe
         });
         // The moment is what this test is about; whichever it is, the same must hold.
         std::this_thread::sleep_for(longest * (random_() % 1000) / 1000);
-        kill += recorder_.client().state().sessions.empty() ? 0 : 1;
+        kill += recorder_.state().sessions.empty() ? 0 : 1;
         engine.signal(SIGKILL);
         engine.wait();
         recorder_.next(Kind::EngineDidVanish);

@@ -4,14 +4,35 @@
 
 namespace quorl::syncd::testing {
 
-Recorder::Recorder(const std::string& name) : client_{new engine::Client{*this, name}} {}
+namespace {
+
+/// The event as it was, whatever happens afterwards.
+Event copyOf(const engine::Event& event) {
+    return {.kind = event.kind,
+            .session = event.session ? *event.session : engine::SessionState(),
+            .task = event.task ? *event.task : engine::TaskState(),
+            .success = event.success,
+            .message = event.message};
+}
+
+} // namespace
+
+Recorder::Recorder(const std::string& name)
+    : client_(std::make_unique<engine::Client>([this](const engine::Event& event) { note(event); },
+                                               name)) {}
+
+engine::EngineState Recorder::state() {
+    const std::scoped_lock lock{mutex_};
+    return *state_;
+}
 
 void Recorder::onEvent(std::function<void(const Event&)> act) {
     const std::scoped_lock lock{mutex_};
     act_ = std::move(act);
 }
 
-void Recorder::note(Event event) {
+void Recorder::note(const engine::Event& told) {
+    const auto event = copyOf(told);
     std::function<void(const Event&)> act;
     {
         const std::scoped_lock lock{mutex_};
@@ -21,7 +42,8 @@ void Recorder::note(Event event) {
         act(event);
     }
     const std::scoped_lock lock{mutex_};
-    events_.push_back(std::move(event));
+    events_.push_back(event);
+    state_ = told.state;
     more_.notify_all();
 }
 
@@ -46,18 +68,7 @@ void Recorder::awaitStatus(const std::string& status) {
 
 void Recorder::awaitState(const std::function<bool(const engine::EngineState&)>& isWanted) {
     std::unique_lock lock{mutex_};
-    for (;;) {
-        // Each change of the state is followed by an event; one that comes while the state is
-        // looked at has it looked at again.
-        const auto seen = events_.size();
-        lock.unlock();
-        const bool is = isWanted(client_->state());
-        lock.lock();
-        if (is) {
-            return;
-        }
-        more_.wait(lock, [&] { return events_.size() > seen; });
-    }
+    more_.wait(lock, [&] { return isWanted(*state_); });
 }
 
 std::vector<Event> Recorder::all() {

@@ -13,19 +13,7 @@ namespace quorl::syncd::testing {
 
 /// Something that a client was told.
 struct Event {
-    enum class Kind {
-        EngineDidAppear,
-        EngineDidVanish,
-        BusDidVanish,
-        SessionWillBegin,
-        TaskWillBegin,
-        TaskDidBegin,
-        TaskDidUpdate,
-        TaskDidFinish,
-        SessionDidFinish,
-        SessionDidVanish,
-        StatusDidChange
-    };
+    using Kind = engine::Event::Kind;
 
     Kind kind;
     engine::SessionState session = {};
@@ -35,11 +23,14 @@ struct Event {
 };
 
 /// A client of the engine that remembers all that it is told, and lets a test wait for it.
-class Recorder : private engine::Listener {
+class Recorder {
   public:
     explicit Recorder(const std::string& name = engine::busName);
 
     [[nodiscard]] engine::Client& client() { return *client_; }
+
+    /// What is known since the last event.
+    [[nodiscard]] engine::EngineState state();
 
     /// Called on the client's thread with each event from now on.
     void onEvent(std::function<void(const Event&)> act);
@@ -72,59 +63,12 @@ class Recorder : private engine::Listener {
     }
 
   private:
-    using Kind = Event::Kind;
-
-    void note(Event event);
-
-    void engineDidAppear(const engine::EngineState& /*state*/) override {
-        note({Kind::EngineDidAppear});
-    }
-
-    void engineDidVanish(const std::string& reason) override {
-        note({Kind::EngineDidVanish, {}, {}, false, reason});
-    }
-
-    void busDidVanish(const std::string& problem) override {
-        note({Kind::BusDidVanish, {}, {}, false, problem});
-    }
-
-    void sessionWillBegin(const engine::SessionState& session) override {
-        note({Kind::SessionWillBegin, session});
-    }
-
-    void taskWillBegin(const engine::SessionState& session,
-                       const engine::TaskState& task) override {
-        note({Kind::TaskWillBegin, session, task});
-    }
-
-    void taskDidBegin(const engine::SessionState& session, const engine::TaskState& task) override {
-        note({Kind::TaskDidBegin, session, task});
-    }
-
-    void taskDidUpdate(const engine::SessionState& session,
-                       const engine::TaskState& task) override {
-        note({Kind::TaskDidUpdate, session, task});
-    }
-
-    void taskDidFinish(const engine::SessionState& session, const engine::TaskState& task,
-                       bool success, const std::string& message) override {
-        note({Kind::TaskDidFinish, session, task, success, message});
-    }
-
-    void sessionDidFinish(const engine::SessionState& session, bool success,
-                          const std::string& message) override {
-        note({Kind::SessionDidFinish, session, {}, success, message});
-    }
-
-    void sessionDidVanish(const engine::SessionState& session) override {
-        note({Kind::SessionDidVanish, session});
-    }
-
-    void statusDidChange() override { note({Kind::StatusDidChange}); }
+    void note(const engine::Event& event);
 
     std::mutex mutex_;
     std::condition_variable more_;
     std::vector<Event> events_;
+    std::shared_ptr<const engine::EngineState> state_ = std::make_shared<engine::EngineState>();
     std::size_t read_ = 0;
     std::function<void(const Event&)> act_;
 

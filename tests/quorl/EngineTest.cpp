@@ -67,8 +67,7 @@ TEST_F(WithSlowEngine, appThatIsKilledAndOpenedAgainShowsTheRunningSessionToItsE
     EXPECT_TRUE(window.waitForRow(QRegularExpression("✓ Road Trip: [0-9]+% Synced…")));
     EXPECT_FALSE(std::filesystem::exists(onWearable("Road Trip.m3u8")));
 
-    engine::Listener listener;
-    engine::Client client(listener);
+    engine::Client client([](const engine::Event&) {});
     client.setRateLimit(0);
 
     EXPECT_TRUE(window.waitForRow(QRegularExpression("✓ Road Trip: Synced")));
@@ -152,6 +151,21 @@ TEST_F(WithEngine, pickingNoneLeavesTheWearableAsItIs) {
     EXPECT_TRUE(std::filesystem::exists(onWearable("Road Trip.m3u8")));
 }
 
+TEST_F(WithSlowEngine, statusTellsOfTheRunningSession) {
+    Program quorl(arguments("--text"));
+    choose(quorl);
+
+    Program status({"--status", "--json"});
+    ASSERT_EQ(status.end(), 0);
+
+    const auto json = nlohmann::json::parse(status.output());
+    EXPECT_EQ(json["playlist"], "Road Trip");
+    EXPECT_EQ(json["state"], "syncing");
+    EXPECT_GE(json["progress"], 0.0);
+    EXPECT_LT(json["progress"], 1.0);
+    EXPECT_EQ(quorl.end(), 0);
+}
+
 TEST_F(WithEngine, statusIsPrintedForScripts) {
     {
         QuorlProcess quorl(arguments("--text"));
@@ -177,6 +191,33 @@ TEST(WithoutEngine, statusSaysSo) {
     QuorlProcess status({"--status", "--music", music.path()});
     EXPECT_EQ(status.end(), 0);
     EXPECT_THAT(status.output(), HasSubstr("not running; start quorl-syncd"));
+}
+
+TEST(WithoutEngine, statusDoesNotGuessWhatBecameOfAChoice) {
+    storePreference("asset-sync-playlist-persistent-id", "just uint64 1");
+    storePreference("last-fully-sent-asset-sync-playlist-persistent-id", "just uint64 1");
+    Program off({"--status"});
+    EXPECT_EQ(off.end(), 0);
+    EXPECT_THAT(off.output(), HasSubstr("Playlist:   none\nSync:       off\n"));
+    storePreference("asset-sync-enabled", "true");
+
+    Program status({"--status"});
+    EXPECT_EQ(status.end(), 0);
+    EXPECT_THAT(status.output(), HasSubstr("Playlist:   unknown\nSync:       unknown\n"));
+    Program asked({"--status", "--json"});
+    EXPECT_EQ(asked.end(), 0);
+    const auto json = nlohmann::json::parse(asked.output());
+    EXPECT_EQ(json["engine"], false);
+    EXPECT_EQ(json["playlist"], nullptr);
+    EXPECT_EQ(json["state"], "unknown");
+    EXPECT_EQ(json["progress"], nullptr);
+}
+
+TEST(WithoutBus, statusIsAFailure) {
+    Program status({"--status"}, {{"DBUS_SESSION_BUS_ADDRESS", "unix:path=/nowhere"}});
+    EXPECT_EQ(status.end(), 1);
+    EXPECT_THAT(status.errors(), HasSubstr("The session bus is gone"));
+    EXPECT_EQ(status.output(), "");
 }
 
 TEST(WithoutEngine, frontPageSaysWhatToDo) {
