@@ -10,8 +10,8 @@ namespace {
 
 using quorl::SongSizes;
 using quorl::SyncPreference;
+using quorl::tests::drain;
 using quorl::tests::PaneTest;
-using quorl::tests::runQueuedWork;
 using std::chrono::milliseconds;
 using std::chrono::seconds;
 using testing::ElementsAre;
@@ -47,7 +47,7 @@ class LimitFooter : public PaneTest {
         while (host_->wearable.openQuestions() > 0) {
             host_->wearable.reply({available, songs});
         }
-        runQueuedWork();
+        drain();
     }
 
     [[nodiscard]] std::optional<std::string> footer() { return shownFooter("Music Storage"); }
@@ -335,7 +335,7 @@ TEST_F(LimitFooter, DoesNotKnowTheSpaceBeforeTheWearableHasReplied) {
 
     host_->wearable.reply({1'000'000'000, 500'000'000});
     EXPECT_EQ(footer(), synced("2", 3)) << "the reply comes on the main queue";
-    runQueuedWork();
+    drain();
 
     EXPECT_EQ(footer(), "2 songs synced to Velora, taking up " + size(3) + " with " +
                             size(1'500'000'000) + " remaining.");
@@ -354,7 +354,7 @@ TEST_P(UsageReplies, GiveTheFreeSpaceAndThatOfTheSongsTogether) {
     showFooter();
 
     host_->wearable.reply(GetParam().figures);
-    runQueuedWork();
+    drain();
 
     EXPECT_EQ(footer(), "2 songs synced to Velora, taking up " + size(3) + " with " +
                             size(GetParam().remaining) + " remaining.")
@@ -375,7 +375,7 @@ TEST_F(LimitFooter, AsksAgainAtTheNextRefreshWhereTheWearableDidNotAnswer) {
     showFooter();
 
     host_->wearable.fail("The wearable is out of reach.");
-    runQueuedWork();
+    drain();
     EXPECT_EQ(footer(), synced("2", 3));
     EXPECT_EQ(host_->wearable.openQuestions(), 0U);
 
@@ -404,7 +404,7 @@ TEST_F(LimitFooter, TakesTheLaterOfTwoReplies) {
 
     host_->wearable.reply({100, 0});
     host_->wearable.reply({200, 0});
-    runQueuedWork();
+    drain();
 
     EXPECT_THAT(footer().value_or(""), testing::HasSubstr(size(200)));
 }
@@ -444,7 +444,7 @@ TEST_F(LimitFooter, KeepsTheFigureOfAnOldReplyWhenTheNextOneFails) {
     changeLibrary();
 
     host_->wearable.fail("gone");
-    runQueuedWork();
+    drain();
     EXPECT_EQ(footer(), synced("2", 3));
 
     host_->clock.moveBy(seconds(-481)); // the clock was set back to where it was
@@ -518,7 +518,7 @@ TEST_F(LimitFooter, ReadsTypeLimitAndPlaylistThenTheStageThenWhatIsOn) {
 TEST_F(LimitFooter, KeepsThePaneAliveUntilTheReplyHasCome) {
     syncSongs({1, 2});
     showFooter();
-    runQueuedWork();
+    drain();
     const std::weak_ptr<LMQuorlSettingsController> watched = pane_;
 
     navigation_->clear();
@@ -527,7 +527,7 @@ TEST_F(LimitFooter, KeepsThePaneAliveUntilTheReplyHasCome) {
 
     host_->journal.clear();
     host_->wearable.reply({10, 20});
-    runQueuedWork();
+    drain();
 
     EXPECT_TRUE(watched.expired());
     EXPECT_EQ(host_->journal.count("list"), 1U) << "the reply was still worked out";
@@ -541,7 +541,7 @@ TEST_F(LimitFooter, LetsThePaneGoWithAFailedReplyToo) {
     ASSERT_FALSE(watched.expired());
 
     host_->wearable.fail("gone");
-    runQueuedWork();
+    drain();
 
     EXPECT_TRUE(watched.expired());
 }

@@ -30,7 +30,7 @@ PaneTest::PaneTest() : morning_(host_->mediaLibrary().addPlaylist(7, "Morning"))
 
 void PaneTest::showPane() {
     (void)LMQuorlSyncManager::sharedManager();
-    runQueuedWork(); // the manager's first status, which would set off a refresh
+    drain(); // the manager's first status, which would set off a refresh
     pane_ = ::create<LMQuorlSettingsController>();
     navigation_->setRootPane(pane_);
     (void)pane_->specifiers();
@@ -86,10 +86,6 @@ void PaneTest::endSync() {
 void PaneTest::postStatus() {
     NSNotificationCenter::defaultCenter().postNotificationName_object(
         LMQuorlSyncStatusDidChangeNotification, LMQuorlSyncManager::sharedManager().get());
-}
-
-void PaneTest::waitFor(const std::string& line, std::size_t count) {
-    runMainQueueUntil([&] { return host_->journal.count(line) >= count; });
 }
 
 } // namespace quorl::tests

@@ -4,8 +4,8 @@
 
 #include "runtime/lists/NavigationController.h"
 #include "settings/LMQuorlSettingsController.h"
-#include "tests/support/MainQueueRun.h"
 #include "tests/support/TestHost.h"
+#include "tests/support/VirtualRun.h"
 
 namespace quorl::tests {
 
@@ -55,9 +55,6 @@ class PaneTest : public testing::Test {
     static void post(NSNotificationName name) {
         NSNotificationCenter::defaultCenter().postNotificationName_object(name, nullptr);
     }
-
-    /// Runs the main queue until this line has been noted `count` times.
-    void waitFor(const std::string& line, std::size_t count = 1);
 
     std::shared_ptr<TestHost> host_ = TestHost::installed();
     std::shared_ptr<PlaylistDouble> morning_;

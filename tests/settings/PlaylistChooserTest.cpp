@@ -11,17 +11,19 @@ namespace {
 
 using quorl::PlaylistDouble;
 using quorl::SyncPreference;
+using quorl::tests::advance;
 using quorl::tests::checked;
+using quorl::tests::drain;
 using quorl::tests::row;
-using quorl::tests::runMainQueuePast;
-using quorl::tests::runQueuedWork;
 using quorl::tests::TablePaneTest;
 using std::chrono::milliseconds;
+using std::chrono::nanoseconds;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// Well past the moment at which an update that is armed now has come.
-constexpr milliseconds pastUpdate{1900};
+constexpr milliseconds updateDelay{1500};
+constexpr milliseconds longAfter = 10 * updateDelay;
+constexpr nanoseconds instant{1};
 
 const NSIndexPath morningRow = row(0, 0);
 const NSIndexPath eveningRow = row(1, 0);
@@ -38,13 +40,24 @@ class PlaylistChooser : public TablePaneTest {
     /// Shows the chooser, with what the manager's first status sets off behind it.
     void showChooser() {
         (void)LMQuorlSyncManager::sharedManager();
-        runQueuedWork();
+        drain();
         show<LMQuorlPlaylistChooser>();
+    }
+
+    /// "Evening" was sent as it is.
+    void sendEvening() {
+        store(SyncPreference::LastFullySentAssetSyncPlaylistPersistentID, 0x1'0000'0007);
+        store(SyncPreference::LastFullySentAssetSyncPlaylistVersion, 1);
     }
 
     /// The status that a row on the screen shows.
     [[nodiscard]] std::optional<std::string> status(const NSIndexPath& path) const {
         return cell(path)->detailTextLabel().text();
+    }
+
+    /// How often the stage was asked for while nothing is running: what was sent decides then.
+    [[nodiscard]] std::size_t stageQuestions() const {
+        return host_->journal.count("read lastFullySentAssetSyncPlaylistVersion");
     }
 
     [[nodiscard]] std::size_t reloads() const { return host_->journal.count(reload); }
@@ -55,7 +68,7 @@ class PlaylistChooser : public TablePaneTest {
 // How it begins and goes.
 
 TEST_F(PlaylistChooser, BeginsWithItsTitleAndThreeObserversAndNoList) {
-    runQueuedWork();
+    drain();
     host_->journal.clear();
 
     const auto chooser = create<LMQuorlPlaylistChooser>();
@@ -401,8 +414,7 @@ TEST_F(PlaylistChooser, ShowsANewChoiceAsPendingUntilTheNextUpdateWhileASyncRuns
     draw();
     EXPECT_EQ(status(eveningRow), "Sync Pending…") << "a reload alone changes nothing";
 
-    host_->journal.clear();
-    waitFor(reload);
+    advance(updateDelay);
     draw();
     EXPECT_EQ(status(eveningRow), "50% Synced…");
 }
@@ -412,22 +424,27 @@ TEST_F(PlaylistChooser, ShowsANewChoiceAsPendingWithoutAskingForTheStage) {
     beginSync(10, 0.5);
     showChooser();
     tapRow(eveningRow);
-    runQueuedWork();
+    drain();
     endSync();
-    store(SyncPreference::LastFullySentAssetSyncPlaylistPersistentID, 0x1'0000'0007);
-    store(SyncPreference::LastFullySentAssetSyncPlaylistVersion, 1);
+    sendEvening();
 
+    host_->journal.clear();
     changeLibrary();
     draw();
 
     EXPECT_EQ(status(eveningRow), "Sync Pending…") << "though it is synced by now";
+    EXPECT_EQ(stageQuestions(), 0U);
+    advance(updateDelay);
+    draw();
+    EXPECT_EQ(status(eveningRow), "Synced");
+    EXPECT_GT(stageQuestions(), 0U);
 }
 
 TEST_F(PlaylistChooser, WaitsForAnOldPendingSyncToo) {
     chooseMorning(); // never sent
     showChooser();
     tapRow(eveningRow);
-    runQueuedWork();
+    drain();
     beginPreparation();
 
     changeLibrary();
@@ -456,9 +473,14 @@ TEST_F(PlaylistChooser, GoesOnWaitingWhenNoneIsTappedInBetween) {
     tapRow(eveningRow);
 
     tapRow(noneRow);
+    endSync();
+    sendEvening(); // nothing that the last tap finds would make it wait
     tapRow(eveningRow);
 
-    EXPECT_EQ(status(eveningRow), "Sync Pending…");
+    EXPECT_EQ(status(eveningRow), "Sync Pending…") << "though it is synced by now";
+    advance(updateDelay);
+    draw();
+    EXPECT_EQ(status(eveningRow), "Synced");
 }
 
 TEST_F(PlaylistChooser, TakesNoCurrentPlaylistForTheIdZero) {
@@ -477,14 +499,17 @@ TEST_F(PlaylistChooser, DropsAnUpdateThatWasArmedBeforeTheSwitch) {
     beginSync(10, 0.5);
     showChooser();
     postStatus();
-    runMainQueuePast(milliseconds(1000));
+    advance(updateDelay - instant);
     host_->journal.clear();
 
-    tapRow(eveningRow); // announces itself, which arms an update anew
-    runMainQueuePast(milliseconds(1000));
-    EXPECT_EQ(reloads(), 0U) << "the one that was armed first would have come by now";
+    tapRow(eveningRow);
+    EXPECT_THAT(host_->journal.lines({"timer"}), ElementsAre("timer never"));
+    drain(); // the choice announces itself, which arms an update anew
+    EXPECT_THAT(host_->journal.lines({"timer"}), ElementsAre("timer never", "timer 1500000000"));
 
-    waitFor(reload);
+    advance(updateDelay - instant);
+    EXPECT_EQ(reloads(), 0U) << "the one that was armed first would have come by now";
+    advance(instant);
     EXPECT_EQ(reloads(), 1U);
 }
 
@@ -504,32 +529,32 @@ TEST_F(PlaylistChooser, ReloadsAtOnceWhenTheLibraryChanges) {
 
 TEST_F(PlaylistChooser, ReloadsOnceForABurstOfStatusChanges) {
     showChooser();
-    runMainQueuePast(pastUpdate);
     host_->journal.clear();
 
     for (int change = 0; change < 10; ++change) {
         postStatus();
     }
-    runQueuedWork();
+    advance(updateDelay - instant);
     EXPECT_EQ(reloads(), 0U);
-    waitFor(reload);
-    runMainQueuePast(pastUpdate);
+    advance(instant);
+    EXPECT_EQ(reloads(), 1U);
 
+    advance(longAfter);
     EXPECT_EQ(reloads(), 1U);
     EXPECT_EQ(host_->journal.lines({"query"}).size(), 1U);
 }
 
 TEST_F(PlaylistChooser, DoesNotPushAnUpdateBackForLaterStatusChanges) {
     showChooser();
-    runMainQueuePast(pastUpdate);
     host_->journal.clear();
 
     postStatus();
-    runMainQueuePast(milliseconds(750));
+    advance(updateDelay / 2);
     postStatus();
-    waitFor(reload);
-    runMainQueuePast(pastUpdate);
+    advance(updateDelay / 2);
+    EXPECT_EQ(reloads(), 1U);
 
+    advance(longAfter);
     EXPECT_EQ(reloads(), 1U);
 }
 
@@ -537,21 +562,21 @@ TEST_F(PlaylistChooser, ReloadsAgainForAStatusChangeAfterTheUpdate) {
     showChooser();
     host_->journal.clear();
     postStatus();
-    waitFor(reload);
+    advance(updateDelay);
+    ASSERT_EQ(reloads(), 1U);
 
     postStatus();
-    waitFor(reload, 2);
+    advance(updateDelay);
 
     EXPECT_EQ(reloads(), 2U);
 }
 
 TEST_F(PlaylistChooser, ReloadsForTheStatusOfAnySender) {
     showChooser();
-    runMainQueuePast(pastUpdate);
     host_->journal.clear();
 
     post(LMQuorlSyncStatusDidChangeNotification);
-    waitFor(reload);
+    advance(updateDelay);
 
     EXPECT_EQ(reloads(), 1U);
 }
@@ -560,11 +585,10 @@ TEST_F(PlaylistChooser, ReloadsForTheStatusAlsoWhileItIsHidden) {
     showChooser();
     table_->viewWillDisappear(false);
     table_->viewDidDisappear(false);
-    runMainQueuePast(pastUpdate);
     host_->journal.clear();
 
     postStatus();
-    waitFor(reload);
+    advance(updateDelay);
 
     EXPECT_EQ(reloads(), 1U);
 }
@@ -612,7 +636,7 @@ TEST_F(PlaylistChooser, ThatHasGoneIsNotUpdatedAnyMore) {
     table_.reset();
     EXPECT_TRUE(watched.expired()) << "the armed timer does not hold it";
     EXPECT_EQ(host_->journal.count("leave"), 1U);
-    runMainQueuePast(pastUpdate);
+    advance(longAfter);
     changeLibrary();
 
     EXPECT_THAT(host_->journal.lines({"query", "table", "text"}), IsEmpty());
@@ -623,7 +647,7 @@ TEST_F(PlaylistChooser, GoesWithoutATimerToo) {
     const std::weak_ptr<LMQuorlPlaylistChooser> watched = chooser;
     chooser.reset();
     EXPECT_TRUE(watched.expired());
-    runQueuedWork();
+    drain();
 }
 
 TEST_F(PlaylistChooser, HandsWhatItIsAskedToShowToItsParent) {

@@ -12,17 +12,18 @@
 namespace {
 
 using quorl::SyncPreference;
+using quorl::tests::advance;
+using quorl::tests::drain;
 using quorl::tests::PaneTest;
-using quorl::tests::runMainQueuePast;
-using quorl::tests::runQueuedWork;
 using std::chrono::milliseconds;
+using std::chrono::nanoseconds;
 using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
 constexpr milliseconds refreshDelay{1500};
-/// Well past the moment at which a refresh that is scheduled now has run.
-constexpr milliseconds pastRefresh{1700};
+constexpr milliseconds longAfter = 10 * refreshDelay;
+constexpr nanoseconds instant{1};
 
 constexpr const char* playlistRow = "row Synced Playlist";
 
@@ -70,7 +71,7 @@ TEST_F(RootPane, ListensToTheSharedManagerOnly) {
         LMQuorlSyncStatusDidChangeNotification, stranger.get());
     NSNotificationCenter::defaultCenter().postNotificationName_object(
         LMQuorlSyncStatusDidChangeNotification, nullptr);
-    runMainQueuePast(pastRefresh);
+    advance(longAfter);
 
     EXPECT_EQ(refreshes(), 0U);
 }
@@ -180,7 +181,7 @@ TEST_F(RootPane, KeepsItsRowsWhateverIsChosen) {
     host_->mediaLibrary().setMediaTypes(0);
     changeLibrary();
     postStatus();
-    runMainQueuePast(pastRefresh);
+    advance(refreshDelay);
 
     EXPECT_EQ(pane_->specifiers(), before);
 }
@@ -380,7 +381,7 @@ TEST_F(RootPane, BeginsToListenToTheLibraryAndRefreshesWhenItAppears) {
     pane_ = create<LMQuorlSettingsController>();
     navigation_->setRootPane(pane_);
     (void)pane_->specifiers();
-    runQueuedWork();
+    drain();
     host_->journal.clear();
 
     navigation_->appear(false);
@@ -437,11 +438,12 @@ TEST_F(RootPane, RefreshesOnceForABurstOfStatusChanges) {
     for (int change = 0; change < 10; ++change) {
         postStatus();
     }
+    advance(refreshDelay - instant);
     EXPECT_EQ(refreshes(), 0U) << "not at once";
-    waitFor(playlistRow);
+    advance(instant);
     EXPECT_EQ(refreshes(), 1U);
 
-    runMainQueuePast(pastRefresh);
+    advance(longAfter);
     EXPECT_EQ(refreshes(), 1U);
 }
 
@@ -449,21 +451,23 @@ TEST_F(RootPane, DoesNotPushARefreshBackForLaterStatusChanges) {
     showPane();
 
     postStatus();
-    runMainQueuePast(refreshDelay / 2);
+    advance(refreshDelay / 2);
     postStatus();
-    waitFor(playlistRow);
-    runMainQueuePast(pastRefresh);
+    advance(refreshDelay / 2);
+    EXPECT_EQ(refreshes(), 1U);
 
+    advance(longAfter);
     EXPECT_EQ(refreshes(), 1U);
 }
 
 TEST_F(RootPane, RefreshesAgainForAStatusChangeAfterTheRefresh) {
     showPane();
     postStatus();
-    waitFor(playlistRow);
+    advance(refreshDelay);
+    ASSERT_EQ(refreshes(), 1U);
 
     postStatus();
-    waitFor(playlistRow, 2);
+    advance(refreshDelay);
 
     EXPECT_EQ(refreshes(), 2U);
 }
@@ -474,7 +478,7 @@ TEST_F(RootPane, RefreshesForTheStatusAlsoWhileItIsHidden) {
     host_->journal.clear();
 
     postStatus();
-    waitFor(playlistRow);
+    advance(refreshDelay);
 
     EXPECT_EQ(refreshes(), 1U);
 }
@@ -486,11 +490,11 @@ TEST_F(RootPane, RefreshesAtOnceForTheLibraryWhileARefreshIsPending) {
     changeLibrary();
     EXPECT_EQ(refreshes(), 1U);
 
-    waitFor(playlistRow, 2);
-    runMainQueuePast(pastRefresh);
+    advance(longAfter);
     EXPECT_EQ(refreshes(), 2U) << "the pending one ran too";
     postStatus();
-    waitFor(playlistRow, 3);
+    advance(refreshDelay);
+    EXPECT_EQ(refreshes(), 3U);
 }
 
 TEST_F(RootPane, TakesAStatusChangeDuringARefreshForPartOfThatRefresh) {
@@ -498,9 +502,10 @@ TEST_F(RootPane, TakesAStatusChangeDuringARefreshForPartOfThatRefresh) {
     host_->mediaLibrary().duringNextQuestion([this] { postStatus(); });
 
     postStatus();
-    waitFor(playlistRow);
-    runMainQueuePast(pastRefresh);
+    advance(refreshDelay);
+    ASSERT_EQ(refreshes(), 1U);
 
+    advance(longAfter);
     EXPECT_EQ(refreshes(), 1U);
 }
 
@@ -508,10 +513,10 @@ TEST_F(RootPane, ThatHasGoneIsNotRefreshedAnyMore) {
     showPane();
     const std::weak_ptr<LMQuorlSettingsController> watched = pane_;
     host_->wearable.fail("gone"); // so that no question holds the pane
-    runQueuedWork();
+    drain();
     while (host_->wearable.openQuestions() > 0) {
         host_->wearable.fail("gone");
-        runQueuedWork();
+        drain();
     }
     postStatus();
     host_->journal.clear();
@@ -519,7 +524,7 @@ TEST_F(RootPane, ThatHasGoneIsNotRefreshedAnyMore) {
     navigation_->clear();
     pane_.reset();
     EXPECT_TRUE(watched.expired()) << "the pending refresh does not hold it";
-    runMainQueuePast(pastRefresh);
+    advance(longAfter);
 
     EXPECT_THAT(host_->journal.lines({"row", "list", "footer", "text"}), IsEmpty());
 }
@@ -537,7 +542,7 @@ TEST_F(RootPane, ShowsAPlaylistThatWasChosenInItsDetailPane) {
     auto& chooser = dynamic_cast<LMQuorlPlaylistChooser&>(*navigation_->top());
     chooser.tableView_didSelectRowAtIndexPath(chooser.tableView(),
                                               NSIndexPath::indexPathForRow_inSection(1, 0));
-    runQueuedWork();
+    drain();
     EXPECT_THAT(host_->journal.lines({"post"}),
                 Contains("post LMQuorlSyncStatusDidChangeNotification"));
     navigation_->pop(false);

@@ -17,7 +17,7 @@ bool checked(const std::shared_ptr<UITableViewCell>& cell) {
 }
 
 void TablePaneTest::appear() {
-    runQueuedWork();
+    drain();
     host_->journal.clear();
     setRowsOnScreen(rowsOnScreen_);
     table_->viewWillAppear(false);

@@ -6,16 +6,15 @@
 
 #include "platform/UserInterface.h"
 #include "sync/LMQuorlSyncManager.h"
-#include "tests/support/MainQueueRun.h"
 #include "tests/support/TestHost.h"
+#include "tests/support/VirtualRun.h"
 
 namespace {
 
 using quorl::PlaylistDouble;
 using quorl::SyncPreference;
 using quorl::TaskFigures;
-using quorl::tests::runMainQueueUntil;
-using quorl::tests::runQueuedWork;
+using quorl::tests::drain;
 using quorl::tests::TestHost;
 using testing::ElementsAre;
 using testing::IsEmpty;
@@ -42,7 +41,7 @@ class SyncManager : public testing::Test {
     LMQuorlSyncManager& manager() {
         const auto& shared = LMQuorlSyncManager::sharedManager();
         if (!observer_) {
-            runQueuedWork();
+            drain();
             observer_ = create<StatusObserver>();
             NSNotificationCenter::defaultCenter().addObserver_selector_name_object(
                 observer_.get(),
@@ -100,7 +99,7 @@ TEST_F(SyncManager, BeginsByListeningAndAttachingAndPostsAStatusLater) {
                             "observe LMSyncPreferencesDidChangeNotification "
                             "_syncPreferencesDidChangeNotification: any",
                             "sessions DVSessionTypeDeviceSync", "session A add", "session B add"));
-    runQueuedWork();
+    drain();
     EXPECT_EQ(host_->journal.count("post LMQuorlSyncStatusDidChangeNotification"), 1U);
 }
 
@@ -389,7 +388,7 @@ TEST_P(SessionEvents, AreAnsweredWithOnePostLater) {
     session->tellObservers(
         [&](DVSessionObserver& observer) { GetParam().tell(observer, *session, *task); });
     EXPECT_EQ(posts(), 0U) << "never before the caller has gone on";
-    runQueuedWork();
+    drain();
 
     EXPECT_EQ(posts(), GetParam().posts) << GetParam().name;
 }
@@ -435,7 +434,7 @@ TEST_F(SyncManager, PostsOncePerCauseOnTheMainThreadAsTheSender) {
         session->tellObservers(
             [&](DVSessionObserver& observer) { observer.sessionWillBegin(*session); });
     }
-    runQueuedWork();
+    drain();
 
     EXPECT_EQ(posts(), 3U);
     EXPECT_EQ(observer_->sender, &manager());
@@ -461,8 +460,7 @@ TEST_F(SyncManager, PostsOnTheMainThreadWhatASessionTellsOnOthers) {
             });
         }
     }
-    runMainQueueUntil([this] { return posts() >= threads * events; });
-    runQueuedWork();
+    drain();
 
     EXPECT_EQ(posts(), threads * events);
     EXPECT_EQ(observer_->thread, std::this_thread::get_id());
@@ -473,7 +471,7 @@ TEST_F(SyncManager, AnswersAPreferencesChangeWithOnePostAndNoFetch) {
 
     post(LMSyncPreferencesDidChangeNotification);
     EXPECT_EQ(posts(), 0U);
-    runQueuedWork();
+    drain();
 
     EXPECT_EQ(posts(), 1U);
     EXPECT_THAT(host_->journal.lines({"sessions", "session"}), IsEmpty());
@@ -495,7 +493,7 @@ TEST_F(SyncManager, LeavesTheOldSessionsAndJoinsTheNewOnesWhenTheyChange) {
                 ElementsAre("session A remove", "session B remove",
                             "sessions DVSessionTypeDeviceSync", "session C add"));
     EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageSyncing);
-    runQueuedWork();
+    drain();
     EXPECT_EQ(posts(), 1U);
 }
 
@@ -518,14 +516,14 @@ TEST_F(SyncManager, LeavesItsSessionsInTheBackgroundAndJoinsTheSameOnesAgain) {
     session->tellObservers(
         [&](DVSessionObserver& observer) { observer.sessionDidFinish(*session); });
     post(UIApplicationWillEnterForegroundNotification);
-    runQueuedWork();
+    drain();
 
     EXPECT_THAT(host_->journal.lines({"sessions", "session"}),
                 ElementsAre("session A remove", "session A add"));
     EXPECT_EQ(posts(), 0U);
     session->tellObservers(
         [&](DVSessionObserver& observer) { observer.sessionDidFinish(*session); });
-    runQueuedWork();
+    drain();
     EXPECT_EQ(posts(), 1U);
 }
 
@@ -543,16 +541,16 @@ TEST_F(SyncManager, HearsOfPreferencesAndSessionsInTheBackgroundToo) {
     post(UIApplicationDidEnterBackgroundNotification);
 
     post(LMSyncPreferencesDidChangeNotification);
-    runQueuedWork();
+    drain();
     EXPECT_EQ(posts(), 1U);
 
     const auto session = host_->sessionService.add("A");
     post(DVSessionsDidChangeNotification);
-    runQueuedWork();
+    drain();
     EXPECT_EQ(posts(), 2U);
     session->tellObservers(
         [&](DVSessionObserver& observer) { observer.sessionDidFinish(*session); });
-    runQueuedWork();
+    drain();
     EXPECT_EQ(posts(), 3U);
 }
 
@@ -564,7 +562,7 @@ TEST_F(SyncManager, HearsASessionOnceHoweverOftenTheAppComesBack) {
     post(UIApplicationWillEnterForegroundNotification);
     session->tellObservers(
         [&](DVSessionObserver& observer) { observer.sessionDidFinish(*session); });
-    runQueuedWork();
+    drain();
 
     EXPECT_EQ(posts(), 1U);
 }

@@ -1,14 +1,14 @@
 #include <gmock/gmock.h>
 
 #include "sync/LMSyncDefaults+Extras.h"
-#include "tests/support/MainQueueRun.h"
 #include "tests/support/TestHost.h"
+#include "tests/support/VirtualRun.h"
 
 namespace {
 
 using quorl::PlaylistDouble;
 using quorl::SyncPreference;
-using quorl::tests::runQueuedWork;
+using quorl::tests::drain;
 using quorl::tests::TestHost;
 using testing::ElementsAre;
 using testing::IsEmpty;
@@ -242,7 +242,7 @@ TEST_F(SyncedPlaylist, IsThereForWhoeverHearsOfTheChoice) {
         LMSyncPreferencesDidChangeNotification, nullptr);
 
     store(evening_);
-    runQueuedWork();
+    drain();
 
     EXPECT_EQ(reader->seen, evening_);
     EXPECT_THAT(queries(), SizeIs(1));
