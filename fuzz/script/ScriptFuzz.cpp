@@ -1,5 +1,4 @@
 // Plays whatever comes as a script, line by line. Every reply is a line of valid JSON.
-// A good start: quorl-script-fuzz CORPUS tests/scenarios, where a file is a whole script.
 
 #include <cstdlib>
 
