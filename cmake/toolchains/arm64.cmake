@@ -1,0 +1,6 @@
+set(QUORL_TARGET arm64)
+set(QUORL_TRIPLE aarch64-linux-gnu)
+set(CMAKE_SYSTEM_PROCESSOR aarch64)
+set(CMAKE_LIBRARY_ARCHITECTURE aarch64-linux-gnu)
+set(CMAKE_CXX_FLAGS_INIT -Wno-psabi)
+include(${CMAKE_CURRENT_LIST_DIR}/debian.cmake)

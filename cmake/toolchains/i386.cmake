@@ -1,0 +1,5 @@
+set(QUORL_TARGET i386)
+set(QUORL_TRIPLE i686-linux-gnu)
+set(CMAKE_SYSTEM_PROCESSOR i686)
+set(CMAKE_LIBRARY_ARCHITECTURE i386-linux-gnu)
+include(${CMAKE_CURRENT_LIST_DIR}/debian.cmake)
