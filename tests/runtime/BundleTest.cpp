@@ -5,8 +5,8 @@
 #include <random>
 #include <utility>
 
-#include <elf.h>
 #include <gmock/gmock.h>
+#include <link.h>
 #include <nlohmann/json.hpp>
 #include <sys/stat.h>
 
@@ -325,10 +325,11 @@ TEST_F(Bundles, WhoseLibraryWasCutShortAreNotLoadedAtAnyLength) {
 TEST_F(Bundles, WhoseLibraryNamesMoreThanItHoldsAreNotLoaded) {
     makeBundle();
     std::string longer = bytesOf(builtPlugin);
-    auto* const header = reinterpret_cast<Elf64_Ehdr*>(longer.data());
-    auto* const segment = reinterpret_cast<Elf64_Phdr*>(longer.data() + header->e_phoff);
-    for (const auto field : {&Elf64_Phdr::p_offset, &Elf64_Phdr::p_filesz}) {
-        const auto sound = std::exchange(segment->*field, longer.size() + 1);
+    auto* const header = reinterpret_cast<ElfW(Ehdr)*>(longer.data());
+    auto* const segment = reinterpret_cast<ElfW(Phdr)*>(longer.data() + header->e_phoff);
+    for (const auto field : {&ElfW(Phdr)::p_offset, &ElfW(Phdr)::p_filesz}) {
+        const auto sound =
+            std::exchange(segment->*field, static_cast<ElfW(Off)>(longer.size() + 1));
         EXPECT_THAT(problemOfLibrary(longer), HasSubstr("its end is missing"));
         segment->*field = sound;
     }
@@ -376,7 +377,7 @@ TEST_F(Bundles, WhoseLibraryWasNeverRecordedAreNotLoaded) {
 TEST_F(Bundles, ForAnotherKindOfMachineAreNotLoaded) {
     makeBundle();
     std::string foreign = bytesOf(builtPlugin);
-    foreign[offsetof(Elf64_Ehdr, e_machine)] = EM_68K;
+    foreign[offsetof(ElfW(Ehdr), e_machine)] = EM_68K;
 
     EXPECT_THAT(problemOfLibrary(foreign), HasSubstr("another kind of machine"));
 }
