@@ -3,7 +3,6 @@
 #include <fstream>
 #include <functional>
 #include <random>
-#include <utility>
 
 #include <gmock/gmock.h>
 #include <link.h>
@@ -322,16 +321,25 @@ TEST_F(Bundles, WhoseLibraryWasCutShortAreNotLoadedAtAnyLength) {
     }
 }
 
+/// What stands at this place of a file's content.
+template <class T>
+T valueAt(const std::string& content, std::size_t place) {
+    T value;
+    content.copy(reinterpret_cast<char*>(&value), sizeof value, place);
+    return value;
+}
+
 TEST_F(Bundles, WhoseLibraryNamesMoreThanItHoldsAreNotLoaded) {
     makeBundle();
-    std::string longer = bytesOf(builtPlugin);
-    auto* const header = reinterpret_cast<ElfW(Ehdr)*>(longer.data());
-    auto* const segment = reinterpret_cast<ElfW(Phdr)*>(longer.data() + header->e_phoff);
+    const std::string whole = bytesOf(builtPlugin);
+    const auto place = valueAt<ElfW(Ehdr)>(whole, 0).e_phoff;
     for (const auto field : {&ElfW(Phdr)::p_offset, &ElfW(Phdr)::p_filesz}) {
-        const auto sound =
-            std::exchange(segment->*field, static_cast<ElfW(Off)>(longer.size() + 1));
+        auto segment = valueAt<ElfW(Phdr)>(whole, place);
+        segment.*field = static_cast<ElfW(Off)>(whole.size() + 1);
+        std::string longer = whole;
+        longer.replace(place, sizeof segment, reinterpret_cast<const char*>(&segment),
+                       sizeof segment);
         EXPECT_THAT(problemOfLibrary(longer), HasSubstr("its end is missing"));
-        segment->*field = sound;
     }
 }
 
