@@ -7,6 +7,7 @@
 #include "tests/engine/Process.h"
 #include "tests/quorl/QuorlProcess.h"
 #include "tests/quorl/SampleMusic.h"
+#include "tests/quorl/StoredPreferences.h"
 #include "tests/quorl/Window.h"
 
 namespace quorl::tests {
@@ -152,10 +153,10 @@ TEST_F(WithEngine, pickingNoneLeavesTheWearableAsItIs) {
 }
 
 TEST_F(WithSlowEngine, statusTellsOfTheRunningSession) {
-    Program quorl(arguments("--text"));
+    QuorlProcess quorl(arguments("--text"));
     choose(quorl);
 
-    Program status({"--status", "--json"});
+    QuorlProcess status({"--status", "--json"});
     ASSERT_EQ(status.end(), 0);
 
     const auto json = nlohmann::json::parse(status.output());
@@ -196,15 +197,15 @@ TEST(WithoutEngine, statusSaysSo) {
 TEST(WithoutEngine, statusDoesNotGuessWhatBecameOfAChoice) {
     storePreference("asset-sync-playlist-persistent-id", "just uint64 1");
     storePreference("last-fully-sent-asset-sync-playlist-persistent-id", "just uint64 1");
-    Program off({"--status"});
+    QuorlProcess off({"--status"});
     EXPECT_EQ(off.end(), 0);
     EXPECT_THAT(off.output(), HasSubstr("Playlist:   none\nSync:       off\n"));
     storePreference("asset-sync-enabled", "true");
 
-    Program status({"--status"});
+    QuorlProcess status({"--status"});
     EXPECT_EQ(status.end(), 0);
     EXPECT_THAT(status.output(), HasSubstr("Playlist:   unknown\nSync:       unknown\n"));
-    Program asked({"--status", "--json"});
+    QuorlProcess asked({"--status", "--json"});
     EXPECT_EQ(asked.end(), 0);
     const auto json = nlohmann::json::parse(asked.output());
     EXPECT_EQ(json["engine"], false);
@@ -214,7 +215,7 @@ TEST(WithoutEngine, statusDoesNotGuessWhatBecameOfAChoice) {
 }
 
 TEST(WithoutBus, statusIsAFailure) {
-    Program status({"--status"}, {{"DBUS_SESSION_BUS_ADDRESS", "unix:path=/nowhere"}});
+    QuorlProcess status({"--status"}, {{"DBUS_SESSION_BUS_ADDRESS", "unix:path=/nowhere"}});
     EXPECT_EQ(status.end(), 1);
     EXPECT_THAT(status.errors(), HasSubstr("The session bus is gone"));
     EXPECT_EQ(status.output(), "");

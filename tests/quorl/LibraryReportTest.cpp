@@ -36,9 +36,9 @@ TEST(LibraryReport, marksFoldersOfPlaylists) {
 }
 
 TEST(LibraryReport, namesSteerNoTerminal) {
-    const Music music;
+    const SampleMusic music;
     music.folder().write("\x1B[2JList\xFF.m3u", "\x1B]0;title\a.mp3\n\xC2\x9B.mp3\n");
-    Program quorl({"--library", "--music", music.path()});
+    QuorlProcess quorl({"--library", "--music", music.path()});
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_THAT(quorl.output(), HasSubstr("\uFFFD[2JList\uFFFD.m3u\n"));
     EXPECT_TRUE(std::ranges::none_of(quorl.output(), [](char byte) {

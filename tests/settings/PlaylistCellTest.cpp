@@ -13,9 +13,7 @@ class PlaylistCell : public testing::Test {
   protected:
     /// Lays a row out whose standard layout is this and whose detail text needs `needed` points.
     void layOut(const CGRect& title, const CGRect& detail, CGFloat needed) {
-        const auto labels =
-            host_->screen().tryLayout(*cell_, {title, detail, needed, scale_},
-                                      [](UITableViewCell& cell) { cell.layoutSubviews(); });
+        const auto labels = host_->screen().tryLayout(*cell_, {title, detail, needed, scale_});
         for (const UILabel* label : labels) {
             placed_.emplace_back(label == &cell_->textLabel() ? "name" : "status");
         }
