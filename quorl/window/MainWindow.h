@@ -6,7 +6,7 @@
 #include "quorl/app/Companion.h"
 #include "quorl/window/ForegroundWatch.h"
 #include "quorl/window/HeaderBar.h"
-#include "quorl/window/RowsView.h"
+#include "quorl/window/rows/RowsView.h"
 
 namespace quorl {
 

@@ -1,6 +1,6 @@
 #include <gmock/gmock.h>
 
-#include "quorl/window/RowTexts.h"
+#include "quorl/window/rows/RowTexts.h"
 
 namespace quorl::tests {
 

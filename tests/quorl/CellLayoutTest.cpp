@@ -4,8 +4,8 @@
 #include <gmock/gmock.h>
 
 #include "quorl/app/CompanionHost.h"
-#include "quorl/window/CellPainter.h"
 #include "quorl/window/WindowScreen.h"
+#include "quorl/window/rows/CellPainter.h"
 
 namespace quorl::tests {
 

@@ -5,7 +5,7 @@
 #include <gmock/gmock.h>
 
 #include "quorl/app/CompanionHost.h"
-#include "quorl/window/RowsView.h"
+#include "quorl/window/rows/RowsView.h"
 
 namespace quorl::tests {
 

@@ -1,4 +1,4 @@
-#include "quorl/window/RowsLayout.h"
+#include "quorl/window/rows/RowsLayout.h"
 
 #include <algorithm>
 #include <cmath>

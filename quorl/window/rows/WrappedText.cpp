@@ -1,4 +1,4 @@
-#include "quorl/window/WrappedText.h"
+#include "quorl/window/rows/WrappedText.h"
 
 #include <QFontMetricsF>
 #include <QTextLayout>

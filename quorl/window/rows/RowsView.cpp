@@ -1,4 +1,4 @@
-#include "quorl/window/RowsView.h"
+#include "quorl/window/rows/RowsView.h"
 
 #include <QAccessible>
 #include <QApplication>
@@ -10,9 +10,9 @@
 #include <QStyle>
 #include <cmath>
 
-#include "quorl/window/CellPainter.h"
-#include "quorl/window/RowsAccessible.h"
-#include "quorl/window/WrappedText.h"
+#include "quorl/window/rows/CellPainter.h"
+#include "quorl/window/rows/RowsAccessible.h"
+#include "quorl/window/rows/WrappedText.h"
 
 namespace quorl {
 

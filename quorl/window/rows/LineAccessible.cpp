@@ -1,4 +1,4 @@
-#include "quorl/window/LineAccessible.h"
+#include "quorl/window/rows/LineAccessible.h"
 
 namespace quorl {
 

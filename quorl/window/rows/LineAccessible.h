@@ -3,7 +3,7 @@
 #include <QAccessible>
 #include <QAccessibleActionInterface>
 
-#include "quorl/window/RowsView.h"
+#include "quorl/window/rows/RowsView.h"
 
 namespace quorl {
 

@@ -7,9 +7,9 @@
 
 #include "quorl/content/PaneContent.h"
 #include "quorl/window/PaneColors.h"
-#include "quorl/window/RowTexts.h"
-#include "quorl/window/RowsLayout.h"
 #include "quorl/window/WindowScreen.h"
+#include "quorl/window/rows/RowTexts.h"
+#include "quorl/window/rows/RowsLayout.h"
 
 namespace quorl {
 

@@ -2,7 +2,7 @@
 
 #include <QAccessibleWidget>
 
-#include "quorl/window/RowsView.h"
+#include "quorl/window/rows/RowsView.h"
 
 namespace quorl {
 

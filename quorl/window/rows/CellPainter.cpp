@@ -1,4 +1,4 @@
-#include "quorl/window/CellPainter.h"
+#include "quorl/window/rows/CellPainter.h"
 
 #include <QFontMetricsF>
 

@@ -1,6 +1,6 @@
-#include "quorl/window/RowsAccessible.h"
+#include "quorl/window/rows/RowsAccessible.h"
 
-#include "quorl/window/LineAccessible.h"
+#include "quorl/window/rows/LineAccessible.h"
 
 namespace quorl {
 
