@@ -12,7 +12,7 @@
 
 namespace quorl {
 
-/// A host without a device and without a window: what its services say can be settled, and a
+/// A host without a device and without a window: what its services say can be set, and a
 /// recorder is told what the plug-in asks of them. Main thread.
 class HostDouble : public Host {
   public:

@@ -20,7 +20,7 @@ struct Stage {
 /// is thrown and nothing has changed.
 using Command = Json (*)(Stage& stage, const Field& command);
 
-/// The command of this name, or null: of those that settle the situation, and of those that are a
+/// The command of this name, or null: of those that set the situation, and of those that are a
 /// user's or the host's doing. `batch` is neither.
 [[nodiscard]] Command situationCommand(std::string_view name);
 [[nodiscard]] Command paneCommand(std::string_view name);

@@ -79,7 +79,7 @@ std::string Interpreter::replyToTooLongLine(std::size_t limit) {
 Json Interpreter::carryOut(std::string_view line) {
     const nlohmann::json document = parse(line);
     Json results = perform(Field(&document, ""));
-    settle();
+    runAndDraw();
     return success(stage_.trace->take(), std::move(results));
 }
 
@@ -119,7 +119,7 @@ Json Interpreter::failure(const std::exception& error) {
 }
 
 /// What a command leaves to be done later is done before its reply.
-void Interpreter::settle() {
+void Interpreter::runAndDraw() {
     VirtualTime::shared().drain();
     stage_.panes.draw();
 }

@@ -29,7 +29,7 @@ class Interpreter {
     [[nodiscard]] Json performSteps(const Field& steps);
     [[nodiscard]] Json performStep(const Field& step);
     [[nodiscard]] Json failure(const std::exception& error);
-    void settle();
+    void runAndDraw();
 
     Stage stage_;
     bool hasFailed_ = false;

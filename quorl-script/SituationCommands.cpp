@@ -1,4 +1,4 @@
-// The commands that settle what the pane finds: library, preferences, sessions, wearable, clock.
+// The commands that set what the pane finds: library, preferences, sessions, wearable, clock.
 
 #include <algorithm>
 #include <thread>

@@ -31,7 +31,7 @@ class BusObjects::EngineObject final
                                       sdbus::Properties_adaptor> {
   public:
     EngineObject(sdbus::IConnection& bus, Engine& engine)
-        : AdaptorInterfaces{bus, engine::enginePath}, engine_{engine}, published_(engine.status()) {
+        : AdaptorInterfaces{bus, engine::enginePath}, engine_(engine), published_(engine.status()) {
         registerAdaptor();
     }
 
@@ -80,7 +80,7 @@ class BusObjects::WearableObject final
   public:
     WearableObject(sdbus::IConnection& bus, Engine& engine)
         : AdaptorInterfaces{bus, engine::wearablePath},
-          engine_{engine},
+          engine_(engine),
           published_(engine.wearable()) {
         registerAdaptor();
     }
@@ -129,8 +129,8 @@ class BusObjects::WearableObject final
 };
 
 BusObjects::BusObjects(sdbus::IConnection& bus, Engine& engine)
-    : engine_{std::make_unique<EngineObject>(bus, engine)},
-      wearable_{std::make_unique<WearableObject>(bus, engine)} {
+    : engine_(std::make_unique<EngineObject>(bus, engine)),
+      wearable_(std::make_unique<WearableObject>(bus, engine)) {
     bus.addObjectManager(engine::managerPath, sdbus::floating_slot);
 }
 

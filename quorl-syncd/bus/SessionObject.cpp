@@ -20,7 +20,7 @@ std::uint64_t microsecondsNow() {
 }
 
 std::string pathOf(std::uint64_t session) {
-    return std::string{engine::sessionsPath} + "/" + std::to_string(session);
+    return std::string(engine::sessionsPath) + "/" + std::to_string(session);
 }
 
 /// Below 1 until everything is done, for there is something to do after the last byte.
@@ -178,9 +178,9 @@ class SessionObject::Task final
 
 SessionObject::SessionObject(sdbus::IConnection& bus, std::uint64_t number,
                              std::function<void()> cancel)
-    : session_{std::make_unique<Session>(bus, pathOf(number), std::move(cancel))},
-      preparing_{std::make_unique<Task>(bus, pathOf(number), "1", engine::preparingGroupingKey)},
-      copying_{std::make_unique<Task>(bus, pathOf(number), "2", engine::assetGroupingKey)} {
+    : session_(std::make_unique<Session>(bus, pathOf(number), std::move(cancel))),
+      preparing_(std::make_unique<Task>(bus, pathOf(number), "1", engine::preparingGroupingKey)),
+      copying_(std::make_unique<Task>(bus, pathOf(number), "2", engine::assetGroupingKey)) {
     preparing_->begin({});
 }
 

@@ -22,7 +22,7 @@ SleepInhibitor::SleepInhibitor() {
             .onInterface("org.freedesktop.login1.Manager")
             .withTimeout(patience)
             .withArguments("sleep", "quorl-syncd",
-                           std::string{"Music is being synced to the "} + wearable::wearableName,
+                           std::string("Music is being synced to the ") + wearable::wearableName,
                            "block")
             .storeResultsTo(lock_);
     } catch (const sdbus::Error&) {

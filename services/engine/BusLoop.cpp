@@ -11,9 +11,9 @@
 namespace quorl::engine {
 
 BusLoop::BusLoop(std::unique_ptr<sdbus::IConnection> bus)
-    : bus_{std::move(bus)},
-      wake_{eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK)},
-      isBusThere_{bus_ != nullptr} {
+    : bus_(std::move(bus)),
+      wake_(eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK)),
+      isBusThere_(bus_ != nullptr) {
     if (!wake_) {
         throw std::system_error{errno, std::generic_category(), "eventfd"};
     }
@@ -25,7 +25,7 @@ BusLoop::BusLoop(std::unique_ptr<sdbus::IConnection> bus)
 
 void BusLoop::post(Work task) {
     {
-        const std::scoped_lock lock{mutex_};
+        const std::scoped_lock lock(mutex_);
         posted_.push_back(std::move(task));
     }
     static_cast<void>(eventfd_write(wake_.get(), 1));
@@ -106,7 +106,7 @@ void BusLoop::callReady(int descriptor) {
 void BusLoop::callPosted() {
     std::vector<Work> tasks;
     {
-        const std::scoped_lock lock{mutex_};
+        const std::scoped_lock lock(mutex_);
         tasks.swap(posted_);
     }
     for (const auto& task : tasks) {

@@ -129,7 +129,7 @@ class Client::Connection {
 };
 
 Client::Connection::Connection(Listener listener, std::string name)
-    : listener_{std::move(listener)}, name_{std::move(name)}, loop_{connectToSession(busProblem_)} {
+    : listener_(std::move(listener)), name_(std::move(name)), loop_(connectToSession(busProblem_)) {
     thread_ = std::thread{[this] { work(); }};
 }
 
@@ -162,7 +162,7 @@ void Client::Connection::open() {
     const auto sender = "type='signal',sender='" + name_ + "',path_namespace='" + managerPath + "'";
     bus.addMatch(sender, tolerant([this](sdbus::Message& message) { hear(messageOf(message)); }),
                  sdbus::floating_slot);
-    bus.addMatch("type='signal',sender='" + std::string{daemonName} +
+    bus.addMatch("type='signal',sender='" + std::string(daemonName) +
                      "',member='NameOwnerChanged',arg0='" + name_ + "'",
                  tolerant([this](sdbus::Message& message) { onOwnerChanged(message); }),
                  sdbus::floating_slot);
@@ -225,7 +225,7 @@ void Client::Connection::request(Action action, Reply reply) {
         }
         try {
             action([this, number](const sdbus::Error* error) {
-                answer(number, error == nullptr ? std::string{} : error->getMessage());
+                answer(number, error == nullptr ? std::string() : error->getMessage());
             });
         } catch (const sdbus::Error& error) {
             answer(number, error.getMessage());
@@ -268,7 +268,7 @@ void Client::Connection::set(const char* path, const char* interface, const char
             }
             proxy->callMethodAsync("Set")
                 .onInterface(propertiesInterface)
-                .withArguments(std::string{interface}, std::string{property}, value)
+                .withArguments(std::string(interface), std::string(property), value)
                 .uponReplyInvoke(std::move(done));
         },
         std::move(reply));

@@ -28,7 +28,7 @@ UsageReader::Answer answerOf(const UsageReader::Look& look) {
     try {
         return look();
     } catch (const std::exception& error) {
-        return std::string{error.what()};
+        return std::string(error.what());
     }
 }
 
@@ -39,7 +39,7 @@ UsageReader::Answer answerOf(const UsageReader::Look& look) {
 class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
   public:
     Questions(Look look, std::chrono::milliseconds patience)
-        : look_{std::move(look)}, patience_{patience} {}
+        : look_(std::move(look)), patience_(patience) {}
 
     void open() {
         clerk_ = std::thread{[this] { work(); }};
@@ -47,7 +47,7 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
 
     void close() {
         {
-            const std::scoped_lock lock{mutex_};
+            const std::scoped_lock lock(mutex_);
             closed_ = true;
         }
         changed_.notify_one();
@@ -56,7 +56,7 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
 
     void ask(Reply reply) {
         {
-            const std::scoped_lock lock{mutex_};
+            const std::scoped_lock lock(mutex_);
             questions_.push_back({++lastNumber_, std::move(reply), Clock::now() + patience_});
         }
         changed_.notify_one();
@@ -66,7 +66,7 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
     static constexpr int mostLookers = 4;
 
     void work() {
-        std::unique_lock lock{mutex_};
+        std::unique_lock lock(mutex_);
         while (!closed_ || !questions_.empty() || !answered_.empty()) {
             giveUpOnLateOnes();
             sendLookers();
@@ -99,7 +99,7 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
         while (!questions_.empty() && (closed_ || questions_.front().deadline <= now)) {
             answered_.push_back({std::move(questions_.front().reply),
                                  closed_ ? "The question was given up."
-                                         : "The " + std::string{wearableName} +
+                                         : "The " + std::string(wearableName) +
                                                " does not answer. Check its connection."});
             questions_.pop_front();
         }
@@ -125,7 +125,7 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
     void lookFor(std::uint64_t number) {
         const auto answer = answerOf(look_);
         {
-            const std::scoped_lock lock{mutex_};
+            const std::scoped_lock lock(mutex_);
             --lookers_;
             // Whoever asked before gets this answer too: an earlier look that ends later would tell
             // what is no longer true.
@@ -154,7 +154,7 @@ UsageReader::UsageReader(const Wearable& wearable)
     : UsageReader{[wearable] { return readUsage(wearable); }} {}
 
 UsageReader::UsageReader(Look look, std::chrono::milliseconds patience)
-    : questions_{std::make_shared<Questions>(std::move(look), patience)} {
+    : questions_(std::make_shared<Questions>(std::move(look), patience)) {
     questions_->open();
 }
 

@@ -22,12 +22,12 @@ Recorder::Recorder(const std::string& name)
                                                name)) {}
 
 engine::EngineState Recorder::state() {
-    const std::scoped_lock lock{mutex_};
+    const std::scoped_lock lock(mutex_);
     return *state_;
 }
 
 void Recorder::onEvent(std::function<void(const Event&)> act) {
-    const std::scoped_lock lock{mutex_};
+    const std::scoped_lock lock(mutex_);
     act_ = std::move(act);
 }
 
@@ -35,13 +35,13 @@ void Recorder::note(const engine::Event& told) {
     const auto event = copyOf(told);
     std::function<void(const Event&)> act;
     {
-        const std::scoped_lock lock{mutex_};
+        const std::scoped_lock lock(mutex_);
         act = act_;
     }
     if (act) {
         act(event);
     }
-    const std::scoped_lock lock{mutex_};
+    const std::scoped_lock lock(mutex_);
     events_.push_back(event);
     state_ = told.state;
     more_.notify_all();
@@ -52,7 +52,7 @@ Event Recorder::next(Event::Kind kind) {
 }
 
 Event Recorder::next(const std::function<bool(const Event&)>& isWanted) {
-    std::unique_lock lock{mutex_};
+    std::unique_lock lock(mutex_);
     for (;;) {
         more_.wait(lock, [this] { return read_ < events_.size(); });
         const auto& event = events_[read_++];
@@ -67,17 +67,17 @@ void Recorder::awaitStatus(const std::string& status) {
 }
 
 void Recorder::awaitState(const std::function<bool(const engine::EngineState&)>& isWanted) {
-    std::unique_lock lock{mutex_};
+    std::unique_lock lock(mutex_);
     more_.wait(lock, [&] { return isWanted(*state_); });
 }
 
 std::vector<Event> Recorder::all() {
-    const std::scoped_lock lock{mutex_};
+    const std::scoped_lock lock(mutex_);
     return events_;
 }
 
 std::size_t Recorder::count(Event::Kind kind) {
-    const std::scoped_lock lock{mutex_};
+    const std::scoped_lock lock(mutex_);
     return static_cast<std::size_t>(std::ranges::count(events_, kind, &Event::kind));
 }
 

@@ -53,7 +53,7 @@ TEST_P(HostileManifest, IsRejectedBecauseAFileElsewhereCouldBeRemovedByItsName) 
 
 INSTANTIATE_TEST_SUITE_P(Name, HostileManifest,
                          ::testing::Values("", ".", "..", "../state.json", "/etc/passwd", "a/b",
-                                           std::string{"a\0b", 3}));
+                                           std::string("a\0b", 3)));
 
 TEST(Manifest, ThatIsBrokenSaysWhatToDo) {
     for (const auto* text : {"{", "[]", "{\"format\":2}", "{\"format\":1,\"songs\":3}"}) {
