@@ -1,5 +1,6 @@
 """What a script can rely on of the program that plays it: lines in, lines out, whatever comes."""
 
+import hashlib
 import json
 import os
 import pathlib
@@ -139,8 +140,9 @@ class Inspection(unittest.TestCase):
         bundle = self.folder / "Other.bundle"
         bundle.mkdir()
         shutil.copy(library, bundle)
+        name, digest = pathlib.Path(library).name, hashlib.sha256(pathlib.Path(library).read_bytes()).hexdigest()
         registration = json.loads((BUNDLES / "VeloraMusic.bundle/registration.json").read_text())
-        registration.update(library=pathlib.Path(library).name, rootClass=root_class)
+        registration.update(library=name, rootClass=root_class, sha256={name: digest})
         (bundle / "registration.json").write_text(json.dumps(registration))
         script = "".join(json.dumps(command) + "\n" for command in commands)
         return replies(play(script.encode(), "--plugins", self.folder))
