@@ -29,12 +29,16 @@ def unit_that_starts(program, **others):
 ENGINE = unit_that_starts(f"{BUILD}/bin/quorl-syncd", Environment="ASAN_OPTIONS=detect_leaks=0")
 
 SYNC = f"""
+line_with() {{ grep --max-count=1 --fixed-strings "$1" < <(tail --follow --lines=+1 "$2"); }}
+touch "$HOME"/told "$HOME"/shown
 gdbus monitor --session --dest org.quorl.Velora.Sync >"$HOME/told" &
+line_with 'does not have an owner' "$HOME/told"
 {ROOT}/tools/make-demo-library "$HOME/Music" 2>&1
 systemctl --user start quorl-syncd
 grep -E '^(NoNewPrivs|Seccomp):' "/proc/$(systemctl --user show --property MainPID --value quorl-syncd)/status"
-ASAN_OPTIONS=detect_leaks=0 {BUILD}/bin/quorl --text <<<$'1\n6\n' >/dev/null
-grep --max-count=1 'Sync.Session.Completed' < <(tail --follow --lines=+1 "$HOME/told")
+{{ echo 1; line_with '6  Road Trip' "$HOME/shown" >/dev/null; echo 6; line_with 'Session.Completed' "$HOME/told" >/dev/null; }} |
+    ASAN_OPTIONS=detect_leaks=0 {BUILD}/bin/quorl --text >"$HOME/shown"
+line_with 'Session.Completed' "$HOME/told"
 ls "$HOME/.local/share/quorl/wearable/Music"
 """
 
