@@ -46,11 +46,11 @@ Address parted(std::string_view text) {
 
 /// Adds what comes after a slash to the `segments` before it. The first of a rooted path is empty.
 void addSegment(std::string_view segment, bool rooted, std::vector<std::string_view>& segments) {
-    if (segment != "..") {
-        segments.push_back(segment);
-    } else if (segments.size() > (rooted ? 1U : 0U) && segments.back() != "..") {
+    const bool isUp = segment == "..";
+    const bool canGoUp = segments.size() > (rooted ? 1U : 0U) && segments.back() != "..";
+    if (isUp && canGoUp) {
         segments.pop_back();
-    } else if (!rooted) {
+    } else if (!isUp || !rooted) {
         segments.push_back(segment);
     }
 }
