@@ -26,4 +26,11 @@ std::string SharedChoices::rememberSent(const SentPlaylist& sent) {
                : playlist.problem;
 }
 
+std::string SharedChoices::forgetSent() {
+    const auto revision = preferences_.set(lastFullySentAssetSyncPlaylistVersion, {});
+    return revision.problem.empty()
+               ? preferences_.set(lastFullySentAssetSyncPlaylistPersistentID, {}).problem
+               : revision.problem;
+}
+
 } // namespace quorl::syncd

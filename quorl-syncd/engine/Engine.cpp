@@ -135,13 +135,19 @@ Situation Engine::situation() const {
 
 /// Begins or ends a sync, where what is wished for asks for it.
 void Engine::consider() {
-    const auto decision = decide(situation());
+    const auto now = situation();
+    const auto decision = decide(now);
+    const auto problem = isClaimToBeForgotten(now, decision) ? ports_.choices.forgetSent() : "";
     switch (decision.kind) {
     case Decision::Kind::Rest:
     case Decision::Kind::Continue:
         break;
     case Decision::Kind::Begin:
-        begin(decision.selection);
+        if (problem.empty()) {
+            begin(decision.selection);
+        } else {
+            putOff(decision.selection, problem);
+        }
         break;
     case Decision::Kind::Stop:
         stop(decision.sentence);
@@ -204,15 +210,26 @@ std::string Engine::remember(const Order& order) {
 
 /// Tells the result of the sync that has ended, here and to clients.
 void Engine::conclude(bool success, const std::string& message) {
+    keepResult(ongoing_->order.wearable.root, success, message);
+    ongoing_->session->finish(success, message);
+}
+
+/// A sync cannot begin as long as it is said that everything was sent.
+void Engine::putOff(const wearable::Selection& selection, const std::string& why) {
+    isStartRequested_ = false;
+    givenUp_ = selection;
+    tryAgainLater();
+    keepResult(wearable_.identity().root, false, why);
+}
+
+void Engine::keepResult(const std::string& wearable, bool success, const std::string& message) {
     try {
-        ports_.results.remember(ongoing_->order.wearable.root,
-                                {success, message, ports_.turns.calendarTime()});
+        ports_.results.remember(wearable, {success, message, ports_.turns.calendarTime()});
     } catch (const std::system_error& error) {
         std::cerr << "quorl-syncd: What became of the sync is forgotten when the engine ends ("
                   << error.what() << ").\n";
     }
     tellLastResult();
-    ongoing_->session->finish(success, message);
 }
 
 void Engine::tellLastResult() {

@@ -81,6 +81,8 @@ class Engine {
     void finish(const Outcome& outcome);
     [[nodiscard]] std::string remember(const Order& order);
     void conclude(bool success, const std::string& message);
+    void putOff(const wearable::Selection& selection, const std::string& why);
+    void keepResult(const std::string& wearable, bool success, const std::string& message);
     void tryAgainLater();
 
     void wearableDidChange(AttachedWearable::Change change);

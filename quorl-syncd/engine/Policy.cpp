@@ -48,6 +48,12 @@ bool isSent(const Selection& wanted, const Situation& now) {
            now.choices.lastSent == SentPlaylist{wanted.playlist, wanted.revision};
 }
 
+/// Where something was claimed and a wearable is there.
+bool hasClaimed(const Situation& now) {
+    const auto& sent = now.usage->sent;
+    return sent && now.choices.lastSent == SentPlaylist{sent->playlist, sent->revision};
+}
+
 bool isDue(const Selection& wanted, const Situation& now) {
     return now.isStartRequested ||
            (now.now >= now.quietFrom && now.givenUp != wanted && !isSent(wanted, now));
@@ -84,6 +90,13 @@ Decision decide(const Situation& situation) {
                    : Decision{Kind::Stop, {}, "Something else was chosen."};
     }
     return isDue(wanted, situation) ? Decision{Kind::Begin, wanted, {}} : Decision();
+}
+
+bool isClaimToBeForgotten(const Situation& situation, const Decision& decision) {
+    if (decision.kind == Decision::Kind::Begin) {
+        return !isSent(decision.selection, situation);
+    }
+    return situation.choices.lastSent && situation.usage && !hasClaimed(situation);
 }
 
 std::string statusOf(const Situation& situation, const std::string& lastMessage) {

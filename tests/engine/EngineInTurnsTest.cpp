@@ -50,6 +50,13 @@ struct FixedChoices final : ChoiceStore {
         return problem;
     }
 
+    [[nodiscard]] std::string forgetSent() override {
+        if (problem.empty()) {
+            choices.lastSent.reset();
+        }
+        return problem;
+    }
+
     Choices choices;
     std::string problem;
 };
@@ -317,11 +324,53 @@ TEST_F(EngineInTurns, SendsTheNextRevisionAfterTheOneThatIsUnderWay) {
     EXPECT_EQ(syncs_.orders[1].selection.revision, 4);
 }
 
-TEST_F(EngineInTurns, TriesAgainWhereItCannotRememberThatAllWasSent) {
+TEST_F(EngineInTurns, ForgetsWhatWasSentBeforeASyncChangesIt) {
+    choices_.choices.lastSent = SentPlaylist{7, 2};
+    start();
+    readMusic(3);
+    EXPECT_EQ(choices_.choices.lastSent, (SentPlaylist{7, 2})) << "nothing is known yet";
+
+    wearables_.answer(wearable::Usage{100, 50, 50, wearable::Selection{7, 2, 1, 250}});
+
+    ASSERT_EQ(syncs_.orders.size(), 1);
+    EXPECT_EQ(choices_.choices.lastSent, std::nullopt);
+    syncs_.end(full);
+    EXPECT_EQ(choices_.choices.lastSent, std::nullopt);
+}
+
+TEST_F(EngineInTurns, ForgetsWhatAnotherWearableDoesNotHave) {
+    startSyncing();
+    syncs_.end(sent);
+    answerAsSent();
+    choices_.choices.isSyncEnabled = false;
+    engine_->setWearableDirectory("/media/velora");
+    EXPECT_EQ(choices_.choices.lastSent, (SentPlaylist{7, 3}));
+
+    wearables_.answer(wearable::Usage{});
+
+    EXPECT_EQ(choices_.choices.lastSent, std::nullopt);
+    EXPECT_EQ(syncs_.orders.size(), 1);
+}
+
+TEST_F(EngineInTurns, DoesNotBeginWhereItCannotForgetWhatWasSent) {
+    choices_.choices.lastSent = SentPlaylist{7, 2};
     choices_.problem = "The store is gone.";
     startSyncing();
+    EXPECT_THAT(syncs_.orders, IsEmpty());
+    EXPECT_EQ(status(), "The store is gone.");
+
+    choices_.problem.clear();
+    turns_.pass(60s);
+
+    EXPECT_EQ(syncs_.orders.size(), 1);
+}
+
+TEST_F(EngineInTurns, TriesAgainWhereItCannotRememberThatAllWasSent) {
+    startSyncing();
+    choices_.problem = "The store is gone.";
 
     syncs_.end(sent);
+    choices_.problem.clear();
 
     EXPECT_THAT(bus_.ends, ElementsAre("- The store is gone."));
     turns_.pass(60s);

@@ -209,6 +209,41 @@ INSTANTIATE_TEST_SUITE_P(
              {runAnotherPlaylist, disconnect},
              stops(disconnectedMessage)}));
 
+struct ClaimCase {
+    const char* name;
+    std::vector<void (*)(Situation&)> changes;
+    bool isForgotten;
+};
+
+void PrintTo(const ClaimCase& each, std::ostream* out) { *out << each.name; }
+
+class Claim : public ::testing::TestWithParam<ClaimCase> {};
+
+TEST_P(Claim, IsForgottenWhereTheWearableDoesNotOrWillNotHaveIt) {
+    auto now = readyToBegin();
+    for (const auto& change : GetParam().changes) {
+        change(now);
+    }
+    EXPECT_EQ(isClaimToBeForgotten(now, decide(now)), GetParam().isForgotten);
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Sent, Claim,
+    ::testing::Values(
+        ClaimCase{"a sync begins", {}, true},
+        ClaimCase{"a sync begins that changes what was sent", {sendAnotherRevision}, true},
+        ClaimCase{"a sync begins to another limit", {sendWithAnotherLimit}, true},
+        ClaimCase{"all was sent", {send}, false},
+        ClaimCase{"all was sent, and is asked for again", {send, request}, false},
+        ClaimCase{"the wearable lost it", {rememberOnly}, true},
+        ClaimCase{"the wearable lost it, and nothing is chosen", {rememberOnly, switchOff}, true},
+        ClaimCase{
+            "the wearable lost it, and preferences change", {rememberOnly, chooseJustNow}, true},
+        ClaimCase{"the wearable is away", {rememberOnly, loseWearable}, false},
+        ClaimCase{"the wearable has it, and nothing is chosen", {send, switchOff}, false},
+        ClaimCase{"nothing was sent, and nothing is chosen", {switchOff}, false},
+        ClaimCase{"a sync is under way that has all", {send, run}, false}));
+
 TEST(Status, TellsWhatIsDoneOrWhatIsWaitedFor) {
     const auto statusWith = [](const std::vector<void (*)(Situation&)>& changes) {
         auto now = readyToBegin();

@@ -19,6 +19,11 @@ class ChoiceStore {
     /// both outlive a loss of power. Gives back an empty text, or a sentence that says why it could
     /// not be done; then the playlist may have been written, the revision not.
     [[nodiscard]] virtual std::string rememberSent(const SentPlaylist& sent) = 0;
+
+    /// Has nothing be sent, first the revision, then the playlist, and returns once that outlives a
+    /// loss of power. Gives back an empty text, or a sentence that says why it could not be done;
+    /// then one or both may still be there.
+    [[nodiscard]] virtual std::string forgetSent() = 0;
 };
 
 } // namespace quorl::syncd
