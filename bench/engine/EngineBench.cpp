@@ -19,7 +19,7 @@
 #include <unistd.h>
 
 #include "quorl-syncd/transfer/Sync.h"
-#include "quorl-syncd/transfer/device/PosixDevice.h"
+#include "quorl-syncd/transfer/device/PosixVolume.h"
 #include "quorl-syncd/transfer/pace/RateLimit.h"
 #include "quorl-syncd/transfer/pace/SteadyClock.h"
 #include "quorl-syncd/transfer/songs/PosixSongSource.h"
@@ -79,7 +79,7 @@ double secondsOfSync(const std::filesystem::path& music, const std::filesystem::
     syncd::PosixSongSource songs;
     const syncd::SteadyClock clock;
     const syncd::SyncPorts ports{
-        [](const auto& wearable) { return std::make_unique<syncd::PosixDevice>(wearable); }, songs,
+        [](const auto& wearable) { return std::make_unique<syncd::PosixVolume>(wearable); }, songs,
         rate, clock};
     return secondsOf([&] {
         const auto outcome = syncd::Sync(order, ports, {}, [](const syncd::CopyProgress&) {}).run();

@@ -6,7 +6,7 @@
 
 #include "quorl-syncd/daemon/Lifeline.h"
 #include "quorl-syncd/transfer/Sync.h"
-#include "quorl-syncd/transfer/device/PosixDevice.h"
+#include "quorl-syncd/transfer/device/PosixVolume.h"
 
 namespace quorl::syncd {
 
@@ -81,7 +81,7 @@ SyncThreads::SyncThreads(engine::BusLoop& loop, KeepAwake keepAwake)
 
 std::unique_ptr<RunningSync> SyncThreads::begin(const Order& order, Copied copied, Ended ended) {
     const SyncPorts ports{
-        [](const auto& wearable) { return std::make_unique<PosixDevice>(wearable); }, songs_, rate_,
+        [](const auto& wearable) { return std::make_unique<PosixVolume>(wearable); }, songs_, rate_,
         clock_};
     return std::make_unique<SyncThread>(loop_, keepAwake_, ports, order, std::move(copied),
                                         std::move(ended));

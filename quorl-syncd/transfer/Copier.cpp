@@ -45,23 +45,30 @@ std::vector<std::string> Copier::copy(std::vector<Entry>& songs) {
 }
 
 void Copier::copySong(Entry& song) {
-    auto unfinished = std::to_string(copied_.size());
     const auto source =
         means_.ports.songs.open(means_.root, song.source, {song.size, song.modified});
-    auto destination = means_.device.createUnfinished(unfinished);
+    auto file = means_.device.createUnfinished();
     try {
-        auto hash = copyContents(*source, *destination, song.size);
-        source->requireUnchanged();
-        destination->complete(song.modified);
-        song.hash = std::move(hash);
+        fill(file, *source, song);
     } catch (const std::system_error& error) {
+        means_.device.discard(file);
         if (error.code() == std::errc::file_too_large) {
             throw SongProblem(SongTrouble::TooLarge, song.name);
         }
         throw;
+    } catch (const SongProblem&) {
+        means_.device.discard(file);
+        throw;
     }
     rule_.songWasCopied(song.size);
-    copied_.push_back({song, std::move(unfinished), std::move(destination)});
+    copied_.push_back({song, std::move(file)});
+}
+
+void Copier::fill(UnfinishedFile& destination, OpenSong& source, Entry& song) {
+    auto hash = copyContents(source, destination, song.size);
+    source.requireUnchanged();
+    destination.complete(song.modified);
+    song.hash = std::move(hash);
 }
 
 /// Gives back the hash of the contents, for which they are read in any case; a copy within the
@@ -100,20 +107,32 @@ void Copier::pieceWasCopied(std::uint64_t bytes, std::uint64_t mostBytes) {
 /// Brings the copies onto the device, under the names that they are to have.
 void Copier::commit() {
     const auto begun = means_.ports.clock.now();
-    for (const auto& [song, unfinished, file] : copied_) {
-        file->sync();
-        means_.device.finish(unfinished, song.name, Device::IfThere::Fail);
+    for (auto& copied : copied_) {
+        copied.file.sync();
     }
+    std::ranges::for_each(copied_, [this](Copied& copied) { finish(copied); });
     if (!copied_.empty()) {
-        means_.device.syncMusic();
+        means_.device.settle();
     }
     std::vector<Entry> songs;
-    std::ranges::transform(copied_, std::back_inserter(songs), &Copied::song);
+    std::ranges::transform(copied_, std::back_inserter(songs),
+                           [](const Copied& copied) { return copied.song; });
     means_.ledger.songsAreThere(songs);
     progress_.songs += copied_.size();
     copied_.clear();
     rule_.groupWasCommitted(begun, means_.ports.clock.now());
     means_.told(progress_);
+}
+
+/// On FAT a name may be taken that nobody can see: a file of a long name has a short one too.
+void Copier::finish(Copied& copied) {
+    auto& song = copied.song;
+    while (!means_.device.finish(copied.file, song.name)) {
+        means_.ledger.revoke(song.name);
+        song.name = takeName(means_.names, song);
+        means_.ledger.announce(song);
+        means_.ledger.save();
+    }
 }
 
 } // namespace quorl::syncd

@@ -2,13 +2,13 @@
 
 #include <filesystem>
 #include <functional>
-#include <memory>
 #include <stop_token>
 #include <string>
 #include <vector>
 
 #include "quorl-syncd/transfer/CopyProgress.h"
 #include "quorl-syncd/transfer/Ledger.h"
+#include "quorl-syncd/transfer/Plan.h"
 #include "quorl-syncd/transfer/SyncPorts.h"
 #include "quorl-syncd/transfer/pace/CommitRule.h"
 
@@ -26,6 +26,8 @@ class Copier {
         Ledger& ledger;
         /// The music folder.
         const std::filesystem::path& root;
+        /// All that are there, or are to be.
+        TakenNames& names;
         const std::stop_token& stop;
         const Told& told;
     };
@@ -34,7 +36,8 @@ class Copier {
     Copier(const Means& means, const CopyProgress& progress);
 
     /// Copies those of `songs` that have no hash, under the names that they have, and gives them
-    /// their hashes. Those that cannot be copied are taken out of `songs`.
+    /// their hashes; where a name turns out to be taken, under another one. Those that cannot be
+    /// copied are taken out of `songs`.
     ///
     /// Gives back a sentence for each of these. Throws `Stopped`, when all that was copied is on
     /// the device, and what the device throws.
@@ -43,16 +46,17 @@ class Copier {
   private:
     /// A song whose copy is complete, but perhaps not on the device yet.
     struct Copied {
-        wearable::Entry song;
-        std::string unfinished;
-        std::unique_ptr<UnfinishedFile> file;
+        wearable::Entry& song;
+        UnfinishedFile file;
     };
 
     void copySong(wearable::Entry& song);
+    void fill(UnfinishedFile& destination, OpenSong& source, wearable::Entry& song);
     [[nodiscard]] std::string copyContents(OpenSong& source, UnfinishedFile& destination,
                                            std::uint64_t size);
     void pieceWasCopied(std::uint64_t bytes, std::uint64_t mostBytes);
     void commit();
+    void finish(Copied& copied);
 
     const Means means_;
     CopyProgress progress_;

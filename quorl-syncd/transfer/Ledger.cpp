@@ -18,8 +18,8 @@ void eraseNamesOf(const Entries& named, std::vector<Entry>& entries) {
     std::erase_if(entries, [&](const Entry& entry) { return names.contains(entry.name); });
 }
 
-void eraseName(const Entry& named, std::vector<Entry>& entries) {
-    std::erase_if(entries, [&](const Entry& entry) { return entry.name == named.name; });
+void eraseName(const std::string& name, std::vector<Entry>& entries) {
+    std::erase_if(entries, [&](const Entry& entry) { return entry.name == name; });
 }
 
 } // namespace
@@ -37,35 +37,36 @@ void Ledger::save() {
 void Ledger::replaceByWhatIsThere(wearable::Manifest manifest) { manifest_ = std::move(manifest); }
 
 void Ledger::adopt(const Entry& song) {
-    eraseName(song, manifest_.strays);
+    eraseName(song.name, manifest_.strays);
     manifest_.songs.push_back(song);
 }
 
 void Ledger::straysAreGone() { manifest_.strays.clear(); }
 
+void Ledger::withdrawClaim() { manifest_.sent.reset(); }
+
+void Ledger::putAside(const std::vector<Entry>& songs) {
+    eraseNamesOf(songs, manifest_.songs);
+    manifest_.strays.insert(manifest_.strays.end(), songs.begin(), songs.end());
+}
+
 void Ledger::announce(const Entry& entry) {
-    eraseName(entry, manifest_.strays);
+    revoke(entry.name);
     manifest_.strays.push_back(entry);
 }
 
-void Ledger::beginChanges() {
-    if (manifest_ != saved_) {
-        manifest_.sent.reset();
-    }
-    save();
-}
+void Ledger::revoke(const std::string& name) { eraseName(name, manifest_.strays); }
 
 void Ledger::songsAreThere(std::span<const Entry> songs) {
     eraseNamesOf(songs, manifest_.strays);
     manifest_.songs.insert(manifest_.songs.end(), songs.begin(), songs.end());
 }
 
+void Ledger::playlistIsGone() { manifest_.playlist.reset(); }
+
 void Ledger::playlistIsThere(const Entry& playlist) {
-    eraseName(playlist, manifest_.strays);
-    const auto old = std::exchange(manifest_.playlist, playlist);
-    if (old && old->name != playlist.name) {
-        manifest_.strays.push_back(*old);
-    }
+    revoke(playlist.name);
+    manifest_.playlist = playlist;
 }
 
 void Ledger::keepOnly(const std::vector<Entry>& songs) {
@@ -73,9 +74,6 @@ void Ledger::keepOnly(const std::vector<Entry>& songs) {
     eraseNamesOf(songs, old);
     eraseNamesOf(songs, manifest_.strays);
     manifest_.strays.insert(manifest_.strays.end(), old.begin(), old.end());
-    if (!manifest_.strays.empty()) {
-        manifest_.sent.reset();
-    }
 }
 
 void Ledger::wasSent(const wearable::Selection& selection) { manifest_.sent = selection; }

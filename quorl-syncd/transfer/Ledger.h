@@ -19,6 +19,9 @@ class Ledger {
 
     [[nodiscard]] const wearable::Manifest& manifest() const { return manifest_; }
 
+    /// Whether the list is as the one on the device.
+    [[nodiscard]] bool isSaved() const { return manifest_ == saved_; }
+
     /// Writes the list where it differs from the one on the device.
     void save();
 
@@ -31,16 +34,25 @@ class Ledger {
     /// Files that were about to be copied or removed are not there any more.
     void straysAreGone();
 
+    /// What was sent is about to be changed.
+    void withdrawClaim();
+
+    /// These songs are to be removed.
+    void putAside(const std::vector<wearable::Entry>& songs);
+
     /// A file is about to be put on the device under a name that is free.
     void announce(const wearable::Entry& entry);
 
-    /// What is on the device is about to change, if this ledger says so; saves that.
-    void beginChanges();
+    /// What was announced under this name does not come.
+    void revoke(const std::string& name);
 
     /// Announced songs are there, complete.
     void songsAreThere(std::span<const wearable::Entry> songs);
 
-    /// The playlist is there. The one before is to be removed, if it has another name.
+    /// The playlist was removed, or is somebody else's file by now.
+    void playlistIsGone();
+
+    /// The playlist is there, and the one before is gone.
     void playlistIsThere(const wearable::Entry& playlist);
 
     /// All other songs, and what was announced and never came, are to be removed.

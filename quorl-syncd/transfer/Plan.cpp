@@ -24,22 +24,19 @@ bool isSameTime(std::int64_t first, std::int64_t second) {
     return static_cast<std::uint64_t>(later) - static_cast<std::uint64_t>(earlier) <= tolerance;
 }
 
-const base::FileState* fileOf(const Entry& entry, const Files& files) {
+std::optional<base::FileState> fileOf(const Entry& entry, const Files& files) {
     const auto found = files.find(entry.name);
-    return found == files.end() ? nullptr : &found->second;
+    return found == files.end() ? std::nullopt : std::optional(found->second);
 }
 
-bool isThere(const Entry& entry, const Files& files) {
-    const auto* const file = fileOf(entry, files);
-    return file != nullptr && file->size == entry.size;
+bool hasContentsOf(const Entry& entry, const Hashes& hashes) {
+    return !entry.hash.empty() && hashes.ofCopy(entry.name) == entry.hash;
 }
 
-/// Whether it is what we were about to put there or to remove, and not a file that somebody else
-/// has put there since.
-bool isOurs(const Entry& stray, const Files& files, const Hashes& hashes) {
-    return isThere(stray, files) &&
-           (isSameTime(fileOf(stray, files)->modified, stray.modified) ||
-            (!stray.hash.empty() && hashes.ofCopy(stray.name) == stray.hash));
+bool isComplete(const Entry& entry, const std::optional<base::FileState>& file,
+                const Hashes& hashes) {
+    return file && file->size == entry.size &&
+           (isSameTime(file->modified, entry.modified) || hasContentsOf(entry, hashes));
 }
 
 /// By source, of which there may be an old and a new copy.
@@ -113,7 +110,18 @@ class Matching {
             plan_.songs.push_back(std::move(song));
         } catch (const SongProblem& problem) {
             plan_.problems.emplace_back(problem.what());
+            troubled_.insert(song.source);
         }
+    }
+
+    /// An old copy of a song that cannot be read now is better than none.
+    [[nodiscard]] std::vector<Entry> unwantedAmong(std::vector<Entry> songs) const {
+        std::unordered_set<std::string_view> wanted;
+        std::ranges::transform(plan_.songs, std::inserter(wanted, wanted.end()), &Entry::name);
+        std::erase_if(songs, [&](const Entry& song) {
+            return wanted.contains(song.name) || troubled_.contains(song.source);
+        });
+        return songs;
     }
 
   private:
@@ -143,6 +151,7 @@ class Matching {
     const Hashes& hashes_;
     const Index songs_;
     const Index strays_;
+    std::unordered_set<std::string> troubled_;
 };
 
 std::vector<Entry> without(const std::vector<Entry>& adopted, std::vector<Entry> strays) {
@@ -167,37 +176,46 @@ TakenNames takenNames(const std::vector<std::string>& names, const std::vector<E
     return taken;
 }
 
-void choosePlaylist(Plan& plan, const Order& order, const std::optional<Entry>& there,
-                    TakenNames& names) {
+void choosePlaylist(Plan& plan, const Order& order, const std::optional<Entry>& there) {
     const auto& title = order.playlist().name;
-    plan.isPlaylistNew = !there || there->source != title;
-    if (plan.isPlaylistNew) {
-        const auto text = playlistText(order, plan.songs);
-        plan.playlist = {names.take(title + ".m3u8"), title, text.size(), 0, hashOf(text)};
-    } else {
-        plan.playlist = *there;
-    }
+    const auto text = playlistText(order, plan.songs);
+    const bool isNew = !there || there->source != title;
+    plan.playlist = {isNew ? plan.names.take(title + ".m3u8") : there->name, title, text.size(), 0,
+                     hashOf(text)};
 }
 
 } // namespace
 
+bool isOurs(const Entry& entry, const std::optional<base::FileState>& file, const Hashes& hashes) {
+    return (file && file->size == 0) || isComplete(entry, file, hashes);
+}
+
+bool isOurPlaylist(const Entry& playlist, const std::optional<base::FileState>& file,
+                   const Hashes& hashes) {
+    return file && file->size == playlist.size && hasContentsOf(playlist, hashes);
+}
+
 wearable::Manifest whatIsThere(wearable::Manifest manifest, const Files& files,
                                const Hashes& hashes) {
     std::erase_if(manifest.strays,
-                  [&](const Entry& stray) { return !isOurs(stray, files, hashes); });
-    if (std::erase_if(manifest.songs, [&](const Entry& song) { return !isThere(song, files); }) >
-        0) {
-        manifest.sent.reset();
+                  [&](const Entry& stray) { return !isOurs(stray, fileOf(stray, files), hashes); });
+    const auto lost = std::erase_if(manifest.songs, [&](const Entry& song) {
+        return !isComplete(song, fileOf(song, files), hashes);
+    });
+    const auto& playlist = manifest.playlist;
+    const bool isPlaylistLost =
+        playlist && !isOurPlaylist(*playlist, fileOf(*playlist, files), hashes);
+    if (isPlaylistLost) {
+        manifest.playlist.reset();
     }
-    if (manifest.playlist && !isThere(*manifest.playlist, files)) {
+    if (lost > 0 || isPlaylistLost) {
         manifest.sent.reset();
-        // It may have been replaced by a sync that was then interrupted.
-        manifest.playlist->hash.clear();
-        if (fileOf(*manifest.playlist, files) == nullptr) {
-            manifest.playlist.reset();
-        }
     }
     return manifest;
+}
+
+std::string takeName(TakenNames& names, const Entry& song) {
+    return names.take(std::filesystem::path(song.source).filename().native());
 }
 
 Plan planOf(const Order& order, const wearable::Manifest& there,
@@ -208,14 +226,34 @@ Plan planOf(const Order& order, const wearable::Manifest& there,
         matching.add(std::move(song));
     }
     plan.useless = without(plan.adopted, there.strays);
-    auto taken = takenNames(names, plan.useless);
+    plan.unwanted = matching.unwantedAmong(there.songs);
+    plan.names = takenNames(names, plan.useless);
     for (auto& song : plan.songs) {
         if (song.hash.empty()) {
-            song.name = taken.take(std::filesystem::path(song.source).filename().native());
+            song.name = takeName(plan.names, song);
         }
     }
-    choosePlaylist(plan, order, there.playlist, taken);
+    choosePlaylist(plan, order, there.playlist);
     return plan;
+}
+
+Room roomFor(const Plan& plan, std::uint64_t available) {
+    const auto needed = plan.progress.totalBytes;
+    if (needed <= available) {
+        return Room::Enough;
+    }
+    for (const auto& song : plan.unwanted) {
+        available = sum(available, song.size);
+    }
+    return needed <= available ? Room::EnoughWithoutUnwanted : Room::NotEnough;
+}
+
+Files removable(Files unfinished, const Files& ours) {
+    std::erase_if(unfinished, [&](const auto& file) {
+        return std::ranges::any_of(ours,
+                                   [&](const auto& other) { return other.second == file.second; });
+    });
+    return unfinished;
 }
 
 std::string playlistText(const Order& order, const std::vector<Entry>& songs) {

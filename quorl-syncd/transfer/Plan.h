@@ -2,11 +2,13 @@
 
 #include <functional>
 #include <map>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "quorl-syncd/transfer/CopyProgress.h"
 #include "quorl-syncd/transfer/Order.h"
+#include "quorl-syncd/transfer/device/DeviceNames.h"
 #include "services/base/FileStatus.h"
 #include "services/wearable/Manifest.h"
 
@@ -25,6 +27,17 @@ struct Hashes {
 /// Regular files of a music directory, by name.
 using Files = std::map<std::string, base::FileState>;
 
+/// Whether a file is the one that an entry says, and not one of somebody else that took its name:
+/// by size and time, and where the time differs, by its contents. An empty file has none: it is
+/// what a loss of power has left of ours.
+/// @param file the one of this name; nothing where there is none.
+[[nodiscard]] bool isOurs(const wearable::Entry& entry, const std::optional<base::FileState>& file,
+                          const Hashes& hashes);
+
+/// As `isOurs`, for a playlist, by its contents in any case.
+[[nodiscard]] bool isOurPlaylist(const wearable::Entry& playlist,
+                                 const std::optional<base::FileState>& file, const Hashes& hashes);
+
 /// The part of `manifest` that is true of a device.
 /// @param files those that the manifest names, where they are there.
 [[nodiscard]] wearable::Manifest whatIsThere(wearable::Manifest manifest, const Files& files,
@@ -39,10 +52,12 @@ struct Plan {
     std::vector<wearable::Entry> adopted;
     /// Files that an earlier sync has left behind and that are of no use.
     std::vector<wearable::Entry> useless;
+    /// Songs that are there and will not be, in the end.
+    std::vector<wearable::Entry> unwanted;
     /// The playlist as it will be if all songs can be copied.
     wearable::Entry playlist;
-    /// There is no such file yet.
-    bool isPlaylistNew = false;
+    /// All names that are there, or are to be.
+    TakenNames names;
     /// What there is to copy; nothing of it is done.
     CopyProgress progress;
     /// A sentence for each song that cannot be sent.
@@ -53,6 +68,21 @@ struct Plan {
 /// @param names of all that is in the device's music directory, whoever put it there.
 [[nodiscard]] Plan planOf(const Order& order, const wearable::Manifest& there,
                           const std::vector<std::string>& names, const Hashes& hashes);
+
+/// Takes a name for the copy of a song that no file on the device has.
+[[nodiscard]] std::string takeName(TakenNames& names, const wearable::Entry& song);
+
+/// Whether new songs find room beside the old ones.
+enum class Room { Enough, EnoughWithoutUnwanted, NotEnough };
+
+/// @param available in bytes, once everything useless is gone.
+[[nodiscard]] Room roomFor(const Plan& plan, std::uint64_t available);
+
+/// Which of the unfinished files that earlier syncs have left behind may be removed: on FAT, what
+/// has the size and time of a finished one may be a second name of that, and both share what one of
+/// them would give away.
+/// @param ours the files that the manifest names.
+[[nodiscard]] Files removable(Files unfinished, const Files& ours);
 
 /// The playlist file of the order, with those of its songs that are among `songs`, under the names
 /// that they have on the device.

@@ -30,21 +30,27 @@ Files filesOf(const wearable::Manifest& manifest, Device& device) {
     return files;
 }
 
-/// Writes a small file of the music directory, and waits until it is on the device.
-void write(Device& device, const std::string& name, std::string_view text,
-           Device::IfThere ifThere) {
-    constexpr auto unfinished = "small";
-    const auto file = device.createUnfinished(unfinished);
-    file->write(std::as_bytes(std::span(text)));
-    file->sync();
-    device.finish(unfinished, name, ifThere);
-    device.syncMusic();
+Files unfinishedAmong(const std::vector<std::string>& names, Device& device) {
+    Files files;
+    for (const auto& name : names) {
+        const auto file = Device::isUnfinished(name) ? device.find(name) : std::nullopt;
+        if (file) {
+            files.emplace(name, *file);
+        }
+    }
+    return files;
 }
 
-void remove(const std::vector<Entry>& entries, Device& device) {
-    for (const auto& entry : entries) {
-        device.removeMusic(entry.name);
+/// What there will be to write on once these are gone.
+std::uint64_t bytesOf(const Files& leftovers, const std::vector<Entry>& useless) {
+    std::uint64_t bytes = 0;
+    for (const auto& [name, file] : leftovers) {
+        bytes += file.size;
     }
+    for (const auto& entry : useless) {
+        bytes += entry.size;
+    }
+    return bytes;
 }
 
 } // namespace
@@ -55,12 +61,12 @@ Sync::Sync(Order order, const SyncPorts& ports, std::stop_token stop, Told told)
 Outcome Sync::run() {
     using Kind = Outcome::Kind;
     try {
-        const auto device = ports_.openDevice(order_.wearable);
+        Device device(ports_.openVolume(order_.wearable));
         try {
-            perform(*device);
+            perform(device);
             return outcome();
         } catch (...) {
-            cleanUp(*device);
+            cleanUp(device);
             throw;
         }
     } catch (const Stopped&) {
@@ -74,21 +80,23 @@ Outcome Sync::run() {
 
 void Sync::perform(Device& device) {
     takeStock(device);
-    removeUseless(device);
-    requireSpace(device);
-    announce();
-
+    requireRoom(device);
     told_(plan_.progress);
+    if (isDone()) {
+        return;
+    }
+    beginChanges(device);
+    announce();
     copySongs(device);
-
     writePlaylist(device);
     keepOnlyWhatIsWished(device);
 }
 
-/// What has been copied counts next time, if the device still can be written to.
+/// What has been copied counts next time, if the device still can be written to. What could not be
+/// made durable counts for nothing, for the system takes it for durable from then on.
 void Sync::cleanUp(Device& device) {
     try {
-        device.removeUnfinished();
+        device.discardUnsettled();
         if (ledger_) {
             ledger_->save();
         }
@@ -99,11 +107,12 @@ void Sync::cleanUp(Device& device) {
 
 void Sync::takeStock(Device& device) {
     ledger_.emplace(device);
-    device.removeUnfinished();
-    const auto& known = ledger_->manifest();
+    const auto files = filesOf(ledger_->manifest(), device);
+    const auto names = device.musicNames();
     const auto ask = hashes(device);
-    ledger_->replaceByWhatIsThere(whatIsThere(known, filesOf(known, device), ask));
-    plan_ = planOf(order_, ledger_->manifest(), device.musicNames(), ask);
+    ledger_->replaceByWhatIsThere(whatIsThere(ledger_->manifest(), files, ask));
+    plan_ = planOf(order_, ledger_->manifest(), names, ask);
+    leftovers_ = removable(unfinishedAmong(names, device), files);
     for (const auto& song : plan_.adopted) {
         ledger_->adopt(song);
     }
@@ -121,17 +130,35 @@ Hashes Sync::hashes(Device& device) const {
             }};
 }
 
-/// Before the space is looked at.
-void Sync::removeUseless(Device& device) {
-    remove(plan_.useless, device);
-    ledger_->straysAreGone();
-}
-
-void Sync::requireSpace(Device& device) {
-    const auto available = device.available();
-    if (plan_.progress.totalBytes > available) {
+void Sync::requireRoom(Device& device) {
+    const auto available = device.available() + bytesOf(leftovers_, plan_.useless);
+    room_ = roomFor(plan_, available);
+    if (room_ == Room::NotEnough) {
         throw std::runtime_error(notEnoughSpace(plan_.progress.totalBytes, available));
     }
+}
+
+bool Sync::isDone() const {
+    const wearable::Manifest wished{plan_.songs, plan_.playlist, {}, order_.selection};
+    return ledger_->isSaved() && ledger_->manifest() == wished && plan_.problems.empty() &&
+           leftovers_.empty();
+}
+
+void Sync::beginChanges(Device& device) {
+    ledger_->withdrawClaim();
+    if (room_ == Room::EnoughWithoutUnwanted) {
+        ledger_->putAside(plan_.unwanted);
+    }
+    ledger_->save();
+    for (const auto& [name, file] : leftovers_) {
+        device.removeMusic(name);
+    }
+    if (room_ == Room::EnoughWithoutUnwanted) {
+        removePlaylist(device);
+        device.settle();
+        ledger_->playlistIsGone();
+    }
+    removeStrays(device);
 }
 
 void Sync::announce() {
@@ -140,34 +167,66 @@ void Sync::announce() {
             ledger_->announce(song);
         }
     }
-    if (plan_.isPlaylistNew) {
-        ledger_->announce(plan_.playlist);
-    }
-    ledger_->beginChanges();
+    ledger_->save();
 }
 
 void Sync::copySongs(Device& device) {
-    Copier copier({ports_, device, *ledger_, order_.library->root, stop_, told_}, plan_.progress);
+    Copier copier({ports_, device, *ledger_, order_.library->root, plan_.names, stop_, told_},
+                  plan_.progress);
     const auto problems = copier.copy(plan_.songs);
     plan_.problems.insert(plan_.problems.end(), problems.begin(), problems.end());
 }
 
+/// It is never renamed over: a loss of power leaves the old one, the new one or none.
 void Sync::writePlaylist(Device& device) {
     const auto text = playlistText(order_, plan_.songs);
-    auto playlist = plan_.playlist;
-    playlist.size = text.size();
-    playlist.hash = hashOf(text);
-    const bool isChanged = playlist != plan_.playlist;
-    if (plan_.isPlaylistNew) {
-        if (isChanged) {
-            ledger_->announce(playlist);
-            ledger_->save();
-        }
-        write(device, playlist.name, text, Device::IfThere::Fail);
-    } else if (isChanged) {
-        write(device, playlist.name, text, Device::IfThere::Replace);
+    plan_.playlist.size = text.size();
+    plan_.playlist.hash = hashOf(text);
+    if (ledger_->manifest().playlist == plan_.playlist) {
+        return;
     }
-    ledger_->playlistIsThere(playlist);
+    auto file = device.createUnfinished();
+    file.write(std::as_bytes(std::span(text)));
+    file.sync();
+    removePlaylist(device);
+    putPlaylist(device, file);
+    device.settle();
+    ledger_->playlistIsThere(plan_.playlist);
+}
+
+void Sync::putPlaylist(Device& device, const UnfinishedFile& file) {
+    auto& playlist = plan_.playlist;
+    for (;;) {
+        ledger_->announce(playlist);
+        ledger_->save();
+        if (device.finish(file, playlist.name)) {
+            return;
+        }
+        ledger_->revoke(playlist.name);
+        playlist.name = plan_.names.take(playlist.source + ".m3u8");
+    }
+}
+
+void Sync::removePlaylist(Device& device) {
+    const auto& playlist = ledger_->manifest().playlist;
+    if (playlist && isOurPlaylist(*playlist, device.find(playlist->name), hashes(device))) {
+        device.removeMusic(playlist->name);
+    }
+}
+
+void Sync::removeStrays(Device& device) {
+    const auto ask = hashes(device);
+    const auto& strays = ledger_->manifest().strays;
+    if (strays.empty()) {
+        return;
+    }
+    for (const auto& stray : strays) {
+        if (isOurs(stray, device.find(stray.name), ask)) {
+            device.removeMusic(stray.name);
+        }
+    }
+    device.settle();
+    ledger_->straysAreGone();
 }
 
 /// Makes the new list valid; then, not before, removes what is no longer wished for. An old copy of
@@ -177,9 +236,7 @@ void Sync::keepOnlyWhatIsWished(Device& device) {
         ledger_->keepOnly(plan_.songs);
         if (!ledger_->manifest().strays.empty()) {
             ledger_->save();
-            remove(ledger_->manifest().strays, device);
-            ledger_->straysAreGone();
-            device.syncMusic();
+            removeStrays(device);
         }
         ledger_->wasSent(order_.selection);
     }

@@ -17,9 +17,14 @@ namespace quorl::syncd {
 /// Brings what is wished for onto a wearable.
 ///
 /// Whenever it ends, also by SIGKILL or a loss of power: the list of our files on the wearable can
-/// be read, every song that it names is complete, and no file that somebody else put there has been
-/// changed or removed. First the new songs are written, then the playlist, then the list; only then
-/// are songs removed that are no longer wished for.
+/// be read, every song that it names is complete, the playlist only names songs that are there, the
+/// list only says that all was sent where all of it is durable, and no file that somebody else put
+/// there has been changed or removed.
+///
+/// First the list no longer says that all was sent. Then the new songs are written, then the
+/// playlist; then songs are removed that are no longer wished for, and last of all the list says
+/// that all was sent. Where the new songs have no room beside the old ones, the playlist and the
+/// old ones are removed before.
 class Sync {
   public:
     /// Called first when it is known what there is to copy, then after each piece. Must not throw.
@@ -35,11 +40,15 @@ class Sync {
     void cleanUp(Device& device);
 
     void takeStock(Device& device);
-    void removeUseless(Device& device);
+    void requireRoom(Device& device);
+    [[nodiscard]] bool isDone() const;
+    void beginChanges(Device& device);
     void announce();
-    void requireSpace(Device& device);
     void copySongs(Device& device);
     void writePlaylist(Device& device);
+    void putPlaylist(Device& device, const UnfinishedFile& file);
+    void removePlaylist(Device& device);
+    void removeStrays(Device& device);
     void keepOnlyWhatIsWished(Device& device);
 
     [[nodiscard]] Hashes hashes(Device& device) const;
@@ -53,6 +62,9 @@ class Sync {
     /// Nothing before the device's list was read.
     std::optional<Ledger> ledger_;
     Plan plan_;
+    /// Unfinished files of earlier syncs, which may be removed.
+    Files leftovers_;
+    Room room_ = Room::Enough;
 };
 
 } // namespace quorl::syncd

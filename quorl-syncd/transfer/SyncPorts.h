@@ -3,7 +3,7 @@
 #include <functional>
 #include <memory>
 
-#include "quorl-syncd/transfer/device/Device.h"
+#include "quorl-syncd/transfer/device/Volume.h"
 #include "quorl-syncd/transfer/pace/Clock.h"
 #include "quorl-syncd/transfer/pace/Throttle.h"
 #include "quorl-syncd/transfer/songs/SongSource.h"
@@ -15,7 +15,7 @@ namespace quorl::syncd {
 struct SyncPorts {
     /// Throws `std::system_error` where the wearable cannot be opened, or another
     /// `std::exception` whose text is a sentence for the user.
-    std::function<std::unique_ptr<Device>(const wearable::Wearable&)> openDevice;
+    std::function<std::unique_ptr<Volume>(const wearable::Wearable&)> openVolume;
     SongSource& songs;
     Throttle& throttle;
     /// Only for how many songs are brought onto the device at once.

@@ -3,11 +3,8 @@
 #include <algorithm>
 #include <charconv>
 
-#include <fcntl.h>
 #include <nlohmann/json.hpp>
 
-#include "services/base/AtomicFile.h"
-#include "services/base/FileStatus.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
@@ -16,7 +13,6 @@ namespace {
 
 using nlohmann::json;
 
-constexpr auto fileName = "manifest.json";
 constexpr int format = 1;
 constexpr int hexadecimal = 16;
 
@@ -114,29 +110,13 @@ Manifest manifestOf(const json& value) {
     return manifest;
 }
 
-[[noreturn]] void reject(const std::string& why) {
-    throw BadManifest{"The list of the music on the " + std::string{wearableName} +
-                      " cannot be used (" + why + "). Remove the file " + ownDirectory + "/" +
-                      fileName + " from it to begin anew; the music that is on it then stays."};
-}
-
-/// The device may have been in other hands: what could be waited for without end, or would fill the
-/// memory, is not read.
-void checkFile(int root, const std::string& path) {
-    constexpr off_t maximumBytes = off_t{64} << 20;
-    base::FileStatus status{};
-    if (fstatat(root, path.c_str(), &status, AT_SYMLINK_NOFOLLOW) != 0) {
-        return; // reading it tells why, unless there is none
-    }
-    if (!S_ISREG(status.st_mode)) {
-        reject("it is not a regular file");
-    }
-    if (status.st_size > maximumBytes) {
-        reject("it is larger than 64 MiB");
-    }
-}
-
 } // namespace
+
+void rejectManifest(const std::string& why) {
+    throw BadManifest{"The list of the music on the " + std::string{wearableName} +
+                      " cannot be used (" + why + "). Remove the files " + ownDirectory +
+                      "/manifest.* from it to begin anew; the music that is on it then stays."};
+}
 
 std::string toText(const Manifest& manifest) {
     json value{
@@ -160,20 +140,10 @@ Manifest parseManifest(std::string_view text) {
     try {
         return manifestOf(json::parse(text));
     } catch (const json::exception&) {
-        reject("it is not well-formed");
+        rejectManifest("it is not well-formed");
     } catch (const BadManifest& error) {
-        reject(error.what());
+        rejectManifest(error.what());
     }
-}
-
-Manifest loadManifest(int root) {
-    const auto path = std::string{ownDirectory} + "/" + fileName;
-    checkFile(root, path);
-    return parseManifest(base::readFile(root, path));
-}
-
-void saveManifest(int root, const Manifest& manifest) {
-    base::replaceFile(base::openDirectory(root, ownDirectory).get(), fileName, toText(manifest));
 }
 
 } // namespace quorl::wearable

@@ -59,19 +59,14 @@ class BadManifest : public std::runtime_error {
     using std::runtime_error::runtime_error;
 };
 
+/// Throws `BadManifest` with a sentence that says what to do.
+[[noreturn]] void rejectManifest(const std::string& why);
+
 /// As text, to be read by `parseManifest`.
 [[nodiscard]] std::string toText(const Manifest& manifest);
 
 /// An empty text gives an empty manifest. Throws `BadManifest`, whose text says what to do. No name
 /// in the result leads out of the music directory.
 [[nodiscard]] Manifest parseManifest(std::string_view text);
-
-/// The manifest of the wearable whose top directory is open as `root`; empty where there is none.
-/// Throws `BadManifest` or `std::system_error`.
-[[nodiscard]] Manifest loadManifest(int root);
-
-/// Puts `manifest` in the place of the one that is there, and waits until it is on the device.
-/// Throws `std::system_error`.
-void saveManifest(int root, const Manifest& manifest);
 
 } // namespace quorl::wearable

@@ -5,10 +5,11 @@
 #include <system_error>
 
 #include <fcntl.h>
-#include <sys/stat.h>
 #include <sys/statvfs.h>
 
 #include "services/base/AtomicFile.h"
+#include "services/base/FileStatus.h"
+#include "services/wearable/Generations.h"
 
 namespace quorl::wearable {
 
@@ -46,19 +47,30 @@ std::uint64_t bytesBelow(const std::filesystem::path& root) {
     return bytes;
 }
 
-std::uint64_t bytesThere(int root, const std::vector<Entry>& songs) {
-    std::uint64_t bytes = 0;
-    for (const auto& song : songs) {
-        const auto path = std::string{musicDirectory} + "/" + song.name;
+/// What of a manifest is on the device, by the sizes of its files.
+struct Stock {
+    std::uint64_t songBytes = 0;
+    bool isComplete = true;
+};
 
-        struct stat status {};
-
-        if (fstatat(root, path.c_str(), &status, AT_SYMLINK_NOFOLLOW) == 0 &&
-            S_ISREG(status.st_mode)) {
-            bytes += static_cast<std::uint64_t>(status.st_size);
-        }
+Stock stockOf(int root, const Manifest& manifest) {
+    Stock stock;
+    const auto bytesOf = [root, &stock](const Entry& entry) -> std::uint64_t {
+        const auto path = std::string{musicDirectory} + "/" + entry.name;
+        base::FileStatus status{};
+        const bool isThere = fstatat(root, path.c_str(), &status, AT_SYMLINK_NOFOLLOW) == 0 &&
+                             S_ISREG(status.st_mode);
+        const auto bytes = isThere ? base::stateOf(status).size : 0;
+        stock.isComplete = stock.isComplete && isThere && bytes == entry.size;
+        return bytes;
+    };
+    for (const auto& song : manifest.songs) {
+        stock.songBytes += bytesOf(song);
     }
-    return bytes;
+    if (manifest.playlist) {
+        static_cast<void>(bytesOf(*manifest.playlist));
+    }
+    return stock;
 }
 
 FileDescriptor openWearable(const Wearable& wearable) {
@@ -86,9 +98,10 @@ Usage readUsage(const Wearable& wearable) {
     try {
         const auto root = openWearable(wearable);
         const auto manifest = loadManifest(root.get());
+        const auto stock = stockOf(root.get(), manifest);
         return {wearable.capacity.value_or(spaceOf(root.get()).total),
-                availableBytes(wearable, root.get()), bytesThere(root.get(), manifest.songs),
-                manifest.sent};
+                availableBytes(wearable, root.get()), stock.songBytes,
+                stock.isComplete ? manifest.sent : std::nullopt};
     } catch (const std::system_error& error) {
         throw std::runtime_error{"The " + std::string{wearableName} + " at " +
                                  wearable.root.string() +

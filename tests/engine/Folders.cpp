@@ -10,13 +10,14 @@
 #include <sys/stat.h>
 
 #include "quorl-syncd/transfer/ContentHash.h"
-#include "quorl-syncd/transfer/device/PosixDevice.h"
+#include "quorl-syncd/transfer/device/PosixVolume.h"
 #include "quorl-syncd/transfer/pace/RateLimit.h"
 #include "quorl-syncd/transfer/pace/SteadyClock.h"
 #include "quorl-syncd/transfer/songs/PosixSongSource.h"
 #include "services/base/AtomicFile.h"
 #include "services/base/FileStatus.h"
 #include "services/media/MusicFolder.h"
+#include "services/wearable/Generations.h"
 
 namespace quorl::syncd::testing {
 
@@ -81,13 +82,16 @@ Order wishFor(const Music& music, const Player& player, std::uint64_t limitType,
     return {std::move(library), selection, player.wearable()};
 }
 
-Outcome sync(const Order& order, const Sync::Told& told, std::stop_token stop) {
+std::unique_ptr<Volume> openPosixVolume(const wearable::Wearable& wearable) {
+    return std::make_unique<PosixVolume>(wearable);
+}
+
+Outcome sync(const Order& order, const Sync::Told& told, std::stop_token stop,
+             const OpenVolume& open) {
     RateLimit rate;
     PosixSongSource songs;
     const SteadyClock clock;
-    const SyncPorts ports{
-        [](const auto& wearable) { return std::make_unique<PosixDevice>(wearable); }, songs, rate,
-        clock};
+    const SyncPorts ports{open, songs, rate, clock};
     return Sync(
                order, ports, std::move(stop), told ? told : [](const CopyProgress&) {})
         .run();

@@ -73,9 +73,13 @@ inline constexpr std::uint64_t noLimit = 99;
                             std::uint64_t limitType = noLimit, std::uint64_t limit = 0,
                             const std::string& title = "List");
 
+using OpenVolume = decltype(SyncPorts::openVolume);
+
+[[nodiscard]] std::unique_ptr<Volume> openPosixVolume(const wearable::Wearable& wearable);
+
 /// A whole sync; `told` sees each step.
 [[nodiscard]] Outcome sync(const Order& order, const Sync::Told& told = {},
-                           std::stop_token stop = {});
+                           std::stop_token stop = {}, const OpenVolume& open = openPosixVolume);
 
 /// What is to hold on a wearable at every moment: the list of our files can be read, and each song
 /// that it names is there with the contents that it had. An empty text, or what is wrong.

@@ -7,6 +7,7 @@
 #include <thread>
 
 #include "services/base/AtomicFile.h"
+#include "services/wearable/Generations.h"
 #include "tests/engine/EngineFixture.h"
 
 namespace {

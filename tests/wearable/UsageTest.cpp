@@ -7,7 +7,7 @@
 #include <sys/mount.h>
 #include <sys/statvfs.h>
 
-#include "services/base/AtomicFile.h"
+#include "services/wearable/Generations.h"
 #include "tests/base/TemporaryDirectory.h"
 
 namespace {
@@ -47,20 +47,50 @@ TEST(Usage, NeverPromisesMoreThanTheFileSystemHas) {
     EXPECT_LE(answer.available, status.f_blocks * status.f_frsize);
 }
 
-TEST(Usage, CountsTheSongsThatWeHavePutThereAndThatAreStillThere) {
-    const TemporaryDirectory device;
-    device.write("Music/there.mp3", std::string(100, 'x'));
-    device.write("Music/foreign.mp3", std::string(50, 'x'));
-    saveManifest(quorl::base::openRoot(device.path().c_str()).get(),
-                 {.songs = {{"there.mp3", "a", 100, 0, ""}, {"gone.mp3", "b", 200, 0, ""}},
-                  .playlist = {},
-                  .strays = {},
-                  .sent = Selection{1, 2, 3, 4}});
+/// Two songs of ours and a playlist were sent to it.
+class SentTo : public ::testing::Test {
+  protected:
+    SentTo() {
+        device_.write("Music/a.mp3", std::string(100, 'x'));
+        device_.write("Music/b.mp3", std::string(200, 'x'));
+        device_.write("Music/List.m3u8", "a list");
+        device_.write("Music/foreign.mp3", std::string(50, 'x'));
+        device_.write(
+            ".quorl/manifest.1",
+            generationText(1, {.songs = {{"a.mp3", "a", 100, 0, ""}, {"b.mp3", "b", 200, 0, ""}},
+                               .playlist = Entry{"List.m3u8", "List", 6, 0, ""},
+                               .strays = {},
+                               .sent = sent_}));
+    }
 
-    const auto answer = readUsage(Wearable::mounted(device.path()));
+    [[nodiscard]] Usage usage() const { return readUsage(Wearable::mounted(device_.path())); }
 
-    EXPECT_EQ(answer.songs, 100);
-    EXPECT_EQ(answer.sent, (Selection{1, 2, 3, 4}));
+    const Selection sent_{1, 2, 3, 4};
+    const TemporaryDirectory device_;
+};
+
+TEST_F(SentTo, CountsTheSongsThatWeHavePutThereAndSaysWhatWasSent) {
+    EXPECT_EQ(usage().songs, 300);
+    EXPECT_EQ(usage().sent, sent_);
+}
+
+TEST_F(SentTo, DoesNotSayThatAllWasSentOnceASongIsGone) {
+    device_.remove("Music/b.mp3");
+
+    EXPECT_EQ(usage().songs, 100);
+    EXPECT_EQ(usage().sent, std::nullopt);
+}
+
+TEST_F(SentTo, DoesNotSayThatAllWasSentOnceASongIsCutOff) {
+    device_.write("Music/b.mp3", "x");
+
+    EXPECT_EQ(usage().sent, std::nullopt);
+}
+
+TEST_F(SentTo, DoesNotSayThatAllWasSentOnceThePlaylistIsGone) {
+    device_.remove("Music/List.m3u8");
+
+    EXPECT_EQ(usage().sent, std::nullopt);
 }
 
 TEST(Usage, OfAWearableThatIsGoneIsAnErrorInWords) {

@@ -90,7 +90,6 @@ TEST_F(Planning, CopiesEverythingToAnEmptyDevice) {
 
     EXPECT_THAT(namesOf(plan), ElementsAre("(one.mp3)", "(two.mp3)"));
     EXPECT_EQ(plan.progress, (CopyProgress{0, 2, 0, 30}));
-    EXPECT_TRUE(plan.isPlaylistNew);
     EXPECT_EQ(plan.playlist.name, "List.m3u8");
     EXPECT_EQ(plan.playlist.hash, hashOf("#EXTM3U\n#PLAYLIST:List\none.mp3\ntwo.mp3\n"));
     EXPECT_THAT(asked_, IsEmpty());
@@ -106,8 +105,8 @@ TEST_F(Planning, KeepsWhatIsThereWithoutReadingIt) {
 
     EXPECT_EQ(plan.songs, there_.songs);
     EXPECT_EQ(plan.progress, CopyProgress());
-    EXPECT_FALSE(plan.isPlaylistNew);
-    EXPECT_EQ(plan.playlist, there_.playlist);
+    EXPECT_THAT(plan.unwanted, IsEmpty());
+    EXPECT_EQ(plan.playlist.name, "List.m3u8");
     EXPECT_THAT(asked_, IsEmpty());
 }
 
@@ -193,6 +192,32 @@ TEST_F(Planning, LeavesOutASongThatCannotBeRead) {
     EXPECT_THAT(namesOf(plan), ElementsAre("(two.mp3)"));
     EXPECT_THAT(plan.problems, ElementsAre("“gone.mp3” is no longer in the music folder."));
     EXPECT_EQ(plan.progress, (CopyProgress{0, 1, 0, 20}));
+    EXPECT_THAT(plan.unwanted, IsEmpty()) << "the old copy is better than none";
+}
+
+TEST_F(Planning, FindsRoomWithoutSongsThatAreNoLongerWanted) {
+    wish("new.mp3", 30, second, "1");
+    there_.songs = {{"old.mp3", "old.mp3", 20, second, "2"}};
+    names_ = {"old.mp3"};
+
+    const auto plan = this->plan();
+
+    EXPECT_THAT(namesOf(plan.unwanted), ElementsAre("old.mp3"));
+    EXPECT_EQ(roomFor(plan, 30), Room::Enough);
+    EXPECT_EQ(roomFor(plan, 29), Room::EnoughWithoutUnwanted);
+    EXPECT_EQ(roomFor(plan, 10), Room::EnoughWithoutUnwanted);
+    EXPECT_EQ(roomFor(plan, 9), Room::NotEnough);
+}
+
+TEST_F(Planning, KeepsAnUnfinishedFileThatMayBeASecondNameOfAFinishedOne) {
+    const Files unfinished{{"QUORL001.TMP", {10, second}},
+                           {"QUORL002.TMP", {10, 2 * second}},
+                           {"QUORL003.TMP", {11, second}}};
+
+    const auto files = removable(unfinished, {{"one.mp3", {10, second}}});
+
+    EXPECT_FALSE(files.contains("QUORL001.TMP"));
+    EXPECT_EQ(files.size(), 2);
 }
 
 TEST_F(Planning, IsMadeAsAWholeOrNotAtAll) {
@@ -210,7 +235,7 @@ TEST_F(Planning, ReplacesAPlaylistOfAnotherTitle) {
 
     const auto plan = this->plan();
 
-    EXPECT_TRUE(plan.isPlaylistNew);
+    EXPECT_EQ(plan.playlist.name, "List.m3u8");
     EXPECT_EQ(plan.playlist.source, "List");
 }
 
@@ -234,6 +259,7 @@ TEST_F(Stocktaking, BelievesAListOfWhichAllIsThere) {
               Entry{"List.m3u8", "List", 30, 0, "p"},
               {},
               selection};
+    copyHashes_ = {{"List.m3u8", "p"}};
 
     EXPECT_EQ(taken({{"one.mp3", {10, 0}}, {"List.m3u8", {30, 0}}}), there_);
 }
@@ -250,17 +276,30 @@ TEST_F(Stocktaking, ForgetsSongsThatAreGoneOrCutOff) {
     EXPECT_FALSE(manifest.sent);
 }
 
-TEST_F(Stocktaking, WritesAPlaylistAgainThatIsNotAsItWas) {
+TEST_F(Stocktaking, LeavesAFileToSomebodyElseThatIsNotWhatWasPutThere) {
+    there_.songs = {{"later.mp3", "later.mp3", 10, second, "1"},
+                    {"other.mp3", "other.mp3", 10, second, "2"}};
+    there_.sent = selection;
+    copyHashes_ = {{"later.mp3", "1"}, {"other.mp3", "x"}};
+
+    const auto manifest = taken({{"later.mp3", {10, 9 * second}}, {"other.mp3", {10, 9 * second}}});
+
+    EXPECT_THAT(namesOf(manifest.songs), ElementsAre("later.mp3"));
+    EXPECT_FALSE(manifest.sent);
+}
+
+TEST_F(Stocktaking, LeavesAPlaylistToSomebodyElseThatIsNotAsItWas) {
     there_.playlist = Entry{"List.m3u8", "List", 30, 0, "p"};
     there_.sent = selection;
 
-    const auto changed = taken({{"List.m3u8", {31, 0}}});
-    const auto gone = taken({});
+    copyHashes_ = {{"List.m3u8", "x"}};
 
-    EXPECT_EQ(changed.playlist, (Entry{"List.m3u8", "List", 30, 0, ""}));
-    EXPECT_FALSE(changed.sent);
-    EXPECT_FALSE(gone.playlist);
-    EXPECT_FALSE(gone.sent);
+    for (const auto& files : {Files{{"List.m3u8", {31, 0}}}, Files{{"List.m3u8", {30, 0}}}, {}}) {
+        const auto manifest = taken(files);
+
+        EXPECT_FALSE(manifest.playlist);
+        EXPECT_FALSE(manifest.sent);
+    }
 }
 
 TEST_F(Stocktaking, TakesOnlyFilesForOursThatCanBeOurs) {
@@ -270,6 +309,7 @@ TEST_F(Stocktaking, TakesOnlyFilesForOursThatCanBeOurs) {
                      {"late but same.mp3", "", 10, second, "h"},
                      {"late and other.mp3", "", 10, second, "h"},
                      {"larger.mp3", "", 10, second, ""},
+                     {"empty.mp3", "", 10, second, ""},
                      {"gone.mp3", "", 10, second, ""}};
     copyHashes_ = {{"late but same.mp3", "h"}, {"late and other.mp3", "x"}};
 
@@ -278,10 +318,11 @@ TEST_F(Stocktaking, TakesOnlyFilesForOursThatCanBeOurs) {
                                  {"late.mp3", {10, 3 * second + 1}},
                                  {"late but same.mp3", {10, 9 * second}},
                                  {"late and other.mp3", {10, 9 * second}},
+                                 {"empty.mp3", {0, 9 * second}},
                                  {"larger.mp3", {11, second}}});
 
     EXPECT_THAT(namesOf(manifest.strays),
-                ElementsAre("same.mp3", "rounded.mp3", "late but same.mp3"));
+                ElementsAre("same.mp3", "rounded.mp3", "late but same.mp3", "empty.mp3"));
     EXPECT_THAT(asked_, ElementsAre("copy late but same.mp3", "copy late and other.mp3"));
 }
 

@@ -1,0 +1,181 @@
+#include "quorl-syncd/transfer/device/Device.h"
+
+#include <algorithm>
+#include <array>
+#include <span>
+#include <system_error>
+#include <utility>
+
+namespace quorl::syncd {
+
+namespace {
+
+using Directory = Volume::Directory;
+
+// With a number of three digits between them, a name that FAT has no second name for.
+constexpr std::string_view unfinishedBeginning = "QUORL";
+constexpr std::string_view unfinishedEnding = ".TMP";
+
+std::string unfinishedName(int number) {
+    constexpr std::size_t digits = 3;
+    auto text = std::to_string(number);
+    text.insert(0, digits - std::min(digits, text.size()), '0');
+    return std::string(unfinishedBeginning).append(text).append(unfinishedEnding);
+}
+
+char upperCase(char letter) {
+    return letter >= 'a' && letter <= 'z' ? static_cast<char>(letter - 'a' + 'A') : letter;
+}
+
+std::string readToEnd(Reader& reader) {
+    constexpr std::size_t pieceSize = 65536;
+    std::string text;
+    std::array<char, pieceSize> piece{};
+    while (const auto size = reader.read(std::as_writable_bytes(std::span(piece)))) {
+        text.append(piece.data(), size);
+    }
+    return text;
+}
+
+} // namespace
+
+Device::Device(std::unique_ptr<Volume> volume) : volume_(std::move(volume)) {
+    const bool isMusicNew = volume_->makeDirectory(Directory::Music);
+    if (volume_->makeDirectory(Directory::Own) || isMusicNew) {
+        volume_->syncDirectory(Directory::Top);
+    }
+}
+
+std::optional<std::string> Device::readOwn(const std::string& name) {
+    const auto names = volume_->names(Directory::Own);
+    if (std::ranges::find(names, name) == names.end()) {
+        return std::nullopt;
+    }
+    const auto file = volume_->find(Directory::Own, name);
+    wearable::requireReadable(file.has_value(), file ? file->size : 0);
+    return readToEnd(*volume_->open(Directory::Own, name));
+}
+
+wearable::Manifest Device::loadManifest() {
+    auto stored = wearable::newestManifest([this](const char* name) { return readOwn(name); });
+    generation_ = stored.number;
+    nextFile_ = stored.next;
+    return std::move(stored.manifest);
+}
+
+std::unique_ptr<VolumeFile> Device::openOwn(const std::string& name) {
+    return volume_->find(Directory::Own, name) ? volume_->overwrite(Directory::Own, name)
+                                               : volume_->create(Directory::Own, name);
+}
+
+void Device::writeGeneration(const std::string& name, const std::string& text) {
+    try {
+        const auto file = openOwn(name);
+        file->write(std::as_bytes(std::span(text)));
+        file->sync();
+        volume_->syncDirectory(Directory::Own);
+    } catch (const std::system_error&) {
+        // What could not be made durable must not be taken for it by the next sync either.
+        removeIfThere(Directory::Own, name);
+        throw;
+    }
+}
+
+void Device::saveManifest(const wearable::Manifest& manifest) {
+    if (!isPastDurable_) {
+        volume_->sync();
+        isPastDurable_ = true;
+    }
+    writeGeneration(wearable::generationFiles.at(nextFile_),
+                    wearable::generationText(generation_ + 1, manifest));
+    nextFile_ = 1 - nextFile_;
+    ++generation_;
+    if (generation_ == wearable::generationFiles.size()) {
+        removeIfThere(Directory::Own, wearable::formerManifestFile);
+    }
+}
+
+std::vector<std::string> Device::musicNames() { return volume_->names(Directory::Music); }
+
+std::optional<base::FileState> Device::find(const std::string& name) {
+    return volume_->find(Directory::Music, name);
+}
+
+std::unique_ptr<Reader> Device::openMusic(const std::string& name) {
+    return volume_->open(Directory::Music, name);
+}
+
+void Device::removeIfThere(Directory directory, const std::string& name) {
+    try {
+        volume_->remove(directory, name);
+    } catch (const std::system_error& error) {
+        if (error.code() != std::errc::no_such_file_or_directory) {
+            throw;
+        }
+    }
+}
+
+void Device::removeMusic(const std::string& name) { removeIfThere(Directory::Music, name); }
+
+bool Device::isUnfinished(std::string_view name) {
+    std::string upper(name);
+    std::ranges::transform(upper, upper.begin(), upperCase);
+    if (!upper.starts_with(unfinishedBeginning) || !upper.ends_with(unfinishedEnding)) {
+        return false;
+    }
+    const auto size = upper.size() - unfinishedBeginning.size() - unfinishedEnding.size();
+    const auto digits = upper.substr(unfinishedBeginning.size(), size);
+    return !digits.empty() && digits.find_first_not_of("0123456789") == std::string::npos;
+}
+
+UnfinishedFile Device::createUnfinished() {
+    for (int number = 1;; ++number) {
+        auto name = unfinishedName(number);
+        if (unsettled_.contains(name)) {
+            continue;
+        }
+        try {
+            auto file = volume_->create(Directory::Music, name);
+            unsettled_.insert(name);
+            return {std::move(name), std::move(file)};
+        } catch (const std::system_error& error) {
+            if (error.code() != std::errc::file_exists) {
+                throw;
+            }
+        }
+    }
+}
+
+bool Device::finish(const UnfinishedFile& file, const std::string& name) {
+    try {
+        volume_->rename(Directory::Music, file.name(), name);
+    } catch (const std::system_error& error) {
+        if (error.code() != std::errc::file_exists) {
+            throw;
+        }
+        return false;
+    }
+    unsettled_.erase(file.name());
+    unsettled_.insert(name);
+    return true;
+}
+
+void Device::settle() {
+    volume_->sync();
+    volume_->syncDirectory(Directory::Music);
+    std::erase_if(unsettled_, [](const std::string& name) { return !isUnfinished(name); });
+}
+
+void Device::discard(const UnfinishedFile& file) {
+    removeMusic(file.name());
+    unsettled_.erase(file.name());
+}
+
+void Device::discardUnsettled() {
+    while (!unsettled_.empty()) {
+        removeMusic(*unsettled_.begin());
+        unsettled_.erase(unsettled_.begin());
+    }
+}
+
+} // namespace quorl::syncd

@@ -1,0 +1,48 @@
+#pragma once
+
+#include "quorl-syncd/transfer/device/Volume.h"
+#include "services/base/FileDescriptor.h"
+#include "services/wearable/Wearable.h"
+
+namespace quorl::syncd {
+
+/// The directory of a wearable, by system calls. What happens to its path in the meantime makes no
+/// difference: everything goes to the directory that was there at the beginning.
+///
+/// Files, and our own directory, are for their owner alone; the music directory can be read by
+/// everybody, as far as the umask lets it.
+class PosixVolume final : public Volume {
+  public:
+    /// Opens the wearable, and makes our own directory, which nobody else can open for a sync as
+    /// long as this is there. Throws `std::runtime_error` with a sentence when another program is
+    /// syncing to it.
+    explicit PosixVolume(const wearable::Wearable& wearable);
+
+    bool makeDirectory(Directory directory) override;
+    [[nodiscard]] std::vector<std::string> names(Directory directory) override;
+    [[nodiscard]] std::optional<base::FileState> find(Directory directory,
+                                                      const std::string& name) override;
+    [[nodiscard]] std::unique_ptr<Reader> open(Directory directory,
+                                               const std::string& name) override;
+    [[nodiscard]] std::unique_ptr<VolumeFile> create(Directory directory,
+                                                     const std::string& name) override;
+    [[nodiscard]] std::unique_ptr<VolumeFile> overwrite(Directory directory,
+                                                        const std::string& name) override;
+    void rename(Directory directory, const std::string& name, const std::string& newName) override;
+    void remove(Directory directory, const std::string& name) override;
+    void syncDirectory(Directory directory) override;
+    void sync() override;
+    [[nodiscard]] std::uint64_t available() override;
+
+  private:
+    [[nodiscard]] int descriptorOf(Directory directory) const;
+
+    wearable::Wearable wearable_;
+    base::FileDescriptor root_;
+    base::FileDescriptor music_;
+    base::FileDescriptor own_;
+    /// By the constructor, and nobody was told yet.
+    bool isOwnNew_ = false;
+};
+
+} // namespace quorl::syncd

@@ -1,0 +1,156 @@
+// The manifest in its two files, of which others or a loss of power may have left anything.
+
+#include "services/wearable/Generations.h"
+
+#include <fstream>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include "services/base/AtomicFile.h"
+#include "tests/base/TemporaryDirectory.h"
+
+namespace {
+
+using namespace quorl::wearable;
+using quorl::tests::TemporaryDirectory;
+using ::testing::HasSubstr;
+
+constexpr auto first = "manifest.1";
+constexpr auto second = "manifest.2";
+
+Manifest manifestOf(const std::string& song) {
+    return {{{song, song, 10, 1, "h"}}, {}, {}, Selection{1, 2, 3, 4}};
+}
+
+class Generations : public ::testing::Test {
+  protected:
+    [[nodiscard]] StoredManifest newest() const {
+        return newestManifest([this](const char* name) {
+            const auto file = files_.find(name);
+            return file == files_.end() ? std::nullopt : std::optional(file->second);
+        });
+    }
+
+    std::map<std::string, std::string> files_;
+};
+
+TEST_F(Generations, AreNoneOnANewWearable) {
+    EXPECT_EQ(newest().manifest, Manifest());
+    EXPECT_EQ(newest().number, 0);
+    EXPECT_EQ(newest().next, 0);
+}
+
+TEST_F(Generations, CountByTheirNumbersWhicheverFileTheyAreIn) {
+    files_ = {{first, generationText(9, manifestOf("old"))},
+              {second, generationText(10, manifestOf("new"))}};
+    EXPECT_EQ(newest().manifest, manifestOf("new"));
+    EXPECT_EQ(newest().number, 10);
+    EXPECT_EQ(newest().next, 0);
+
+    files_[first] = generationText(11, manifestOf("newest"));
+    EXPECT_EQ(newest().manifest, manifestOf("newest"));
+    EXPECT_EQ(newest().next, 1);
+}
+
+TEST_F(Generations, AreNotBelievedWhereAnyByteIsAnother) {
+    const auto whole = generationText(2, manifestOf("new"));
+    for (std::size_t at = 0; at < whole.size(); ++at) {
+        auto damaged = whole;
+        damaged[at] = static_cast<char>(damaged[at] ^ 1);
+        files_ = {{first, generationText(1, manifestOf("old"))}, {second, damaged}};
+
+        EXPECT_EQ(newest().manifest, manifestOf("old")) << at;
+        EXPECT_EQ(newest().next, 1) << at;
+    }
+}
+
+TEST_F(Generations, AreNotBelievedWhereverTheyAreCutOff) {
+    const auto whole = generationText(2, manifestOf("new"));
+    for (std::size_t size = 0; size < whole.size(); ++size) {
+        files_ = {{first, whole.substr(0, size)}, {second, generationText(1, manifestOf("old"))}};
+
+        EXPECT_EQ(newest().manifest, manifestOf("old")) << size;
+        EXPECT_EQ(newest().next, 0) << size;
+    }
+}
+
+TEST_F(Generations, AreNoneWhereTheVeryFirstWasCutOffAndThatFileIsWrittenAgain) {
+    files_ = {{first, ""}};
+    EXPECT_EQ(newest().manifest, Manifest());
+    EXPECT_EQ(newest().next, 0);
+
+    files_ = {{second, "12"}};
+    EXPECT_EQ(newest().manifest, Manifest());
+    EXPECT_EQ(newest().next, 1);
+}
+
+TEST_F(Generations, SayWhatToDoWhereBothAreDamaged) {
+    files_ = {{first, ""}, {second, "damaged"}, {formerManifestFile, toText(manifestOf("old"))}};
+
+    try {
+        static_cast<void>(newest());
+        FAIL();
+    } catch (const BadManifest& error) {
+        EXPECT_THAT(error.what(), HasSubstr("both copies of it are damaged"));
+        EXPECT_THAT(error.what(), HasSubstr("Remove the files .quorl/manifest.*"));
+    }
+}
+
+TEST_F(Generations, FollowTheManifestOfTheTimeBefore) {
+    files_ = {{formerManifestFile, toText(manifestOf("former"))}};
+    EXPECT_EQ(newest().manifest, manifestOf("former"));
+    EXPECT_EQ(newest().number, 0);
+
+    files_[first] = generationText(1, manifestOf("new")).substr(0, 20);
+    EXPECT_EQ(newest().manifest, manifestOf("former")) << "the first saving was cut short";
+
+    files_[first] = generationText(1, manifestOf("new"));
+    EXPECT_EQ(newest().manifest, manifestOf("new"));
+}
+
+/// Why the manifest of `device` is rejected.
+std::string rejectionOf(const TemporaryDirectory& device) {
+    try {
+        static_cast<void>(loadManifest(quorl::base::openRoot(device.path().c_str()).get()));
+    } catch (const BadManifest& error) {
+        return error.what();
+    }
+    return {};
+}
+
+TEST(ManifestFile, IsReadFromTheWearable) {
+    const TemporaryDirectory device;
+    device.write(".quorl/manifest.2", generationText(4, manifestOf("song")));
+
+    EXPECT_EQ(loadManifest(quorl::base::openRoot(device.path().c_str()).get()), manifestOf("song"));
+}
+
+class OddManifestFile : public ::testing::TestWithParam<const char*> {};
+
+TEST_P(OddManifestFile, IsRejectedAndNotWaitedFor) {
+    const TemporaryDirectory device;
+    const auto manifest = device.path() / ".quorl" / GetParam();
+    std::filesystem::create_directory(device.path() / ".quorl");
+    ASSERT_EQ(mkfifo(manifest.c_str(), 0644), 0);
+    EXPECT_THAT(rejectionOf(device), HasSubstr("not a regular file"));
+
+    std::filesystem::remove(manifest);
+    std::filesystem::create_directory(manifest);
+    EXPECT_THAT(rejectionOf(device), HasSubstr("not a regular file"));
+
+    std::filesystem::remove(manifest);
+    std::filesystem::create_symlink("/dev/zero", manifest);
+    EXPECT_THAT(rejectionOf(device), HasSubstr("not a regular file"));
+
+    std::filesystem::remove(manifest);
+    std::ofstream{manifest}.close();
+    std::filesystem::resize_file(manifest, std::uintmax_t{1} << 30);
+    EXPECT_THAT(rejectionOf(device), HasSubstr("larger than 64 MiB"));
+}
+
+INSTANTIATE_TEST_SUITE_P(Name, OddManifestFile,
+                         ::testing::Values(first, second, formerManifestFile));
+
+} // namespace
