@@ -21,8 +21,8 @@ namespace {
 } // namespace
 
 FileDescriptor openDirectory(int parent, const char* name) {
-    constexpr mode_t forEverybodyToRead = 0755;
-    if (mkdirat(parent, name, forEverybodyToRead) != 0 && errno != EEXIST) {
+    constexpr mode_t forItsOwner = 0700;
+    if (mkdirat(parent, name, forItsOwner) != 0 && errno != EEXIST) {
         fail(name);
     }
     FileDescriptor directory(openat(parent, name, O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
@@ -48,13 +48,13 @@ void syncToDevice(int descriptor) {
 
 void replaceFile(int directory, const std::string& name, std::string_view text) {
     const auto temporary = "." + name + ".new";
-    constexpr mode_t forEverybodyToRead = 0644;
+    constexpr mode_t forItsOwner = 0600;
     // What is left of an earlier try may be anything by now, even a pipe that would be waited for.
     if (unlinkat(directory, temporary.c_str(), 0) != 0 && errno != ENOENT) {
         fail(name);
     }
-    const FileDescriptor file(openat(directory, temporary.c_str(),
-                                     O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, forEverybodyToRead));
+    const FileDescriptor file(
+        openat(directory, temporary.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, forItsOwner));
     if (!file) {
         fail(name);
     }
