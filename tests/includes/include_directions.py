@@ -94,6 +94,7 @@ RULES = {
     "quorl-syncd/bus": program("services", "quorl-syncd/transfer", "quorl-syncd/engine"),
     "quorl-syncd/daemon": program("services", "quorl-syncd/transfer", "quorl-syncd/engine"),
     "quorl-syncd/main.cpp": program("services", "quorl-syncd"),
+    "quorl-simulate": program("services", "quorl-syncd/transfer", "quorl-syncd/engine"),
 }
 
 # Folders that may include whatever they like: nothing else may include them.
