@@ -131,6 +131,21 @@ SimulatedDisk::Status SimulatedDisk::status(Node node) const {
     return {file.now.bytes.size(), file.now.modified, file.isDirectory};
 }
 
+bool SimulatedDisk::isDurable(Node directory, std::string_view name) const {
+    const auto found = entry(directory, name);
+    if (found == entries_.at(directory).end()) {
+        return false;
+    }
+    const Entries& names = durableEntries_.at(directory);
+    const auto durable = names.find(found->first);
+    const File& file = files_.at(found->second.node);
+    return durable != names.end() && durable->second.node == found->second.node &&
+           durable->second.isRecorded && file.now == file.durable &&
+           std::ranges::none_of(changes_, [&](const Change& change) {
+               return change.directory == directory && change.name == found->first;
+           });
+}
+
 const std::string& SimulatedDisk::read(Node file) const {
     begin("read", {});
     return files_.at(file).now.bytes;

@@ -66,6 +66,10 @@ class SimulatedDisk {
     [[nodiscard]] std::optional<Node> find(Node directory, std::string_view name) const;
 
     [[nodiscard]] Status status(Node node) const;
+
+    /// Whether the file has this name, and all of its contents, also after a loss of power.
+    [[nodiscard]] bool isDurable(Node directory, std::string_view name) const;
+
     [[nodiscard]] const std::string& read(Node file) const;
 
     [[nodiscard]] Node makeDirectory(Node directory, const std::string& name);

@@ -1,0 +1,342 @@
+#include <algorithm>
+#include <array>
+#include <iterator>
+
+#include "quorl-simulate/SimulatedVolume.h"
+#include "quorl-simulate/World.h"
+#include "quorl-syncd/engine/NotReady.h"
+#include "quorl-syncd/transfer/device/Device.h"
+#include "services/wearable/Generations.h"
+
+namespace quorl::simulation {
+
+namespace {
+
+using enum Happening;
+
+constexpr std::int64_t second = 1'000'000'000;
+constexpr std::uint64_t lists = 4;
+
+std::string drawBytes(Random& random, std::uint64_t size) {
+    std::string bytes;
+    while (bytes.size() < size) {
+        bytes += static_cast<char>('a' + random.below(26));
+    }
+    return bytes;
+}
+
+std::int64_t drawTime(Random& random) {
+    return 1'600'000'000 * second + static_cast<std::int64_t>(random.below(1'000'000'000'000));
+}
+
+std::string drawPath(Random& random) {
+    static constexpr std::array names{
+        "One.mp3",  "one.MP3", "A long name of a song.mp3", "A long name of a tune.mp3",
+        "Zwei.ogg", "aux.mp3", "Drei\xC3\xA4.mp3",          "List 1.m3u8",
+        "#no.mp3",  "x.mp3"};
+    return (random.onceIn(2) ? "a/" : "b/") + std::string(names.at(random.below(names.size())));
+}
+
+template <class Container>
+auto& drawFrom(Container& all, Random& random) {
+    return *std::next(all.begin(), static_cast<std::ptrdiff_t>(random.below(all.size())));
+}
+
+} // namespace
+
+void World::addSong(Random& random) {
+    const auto path = drawPath(random);
+    if (!music_.songs.contains(path)) {
+        music_.songs[path] = std::make_shared<SimulatedMusic::Song>(
+            SimulatedMusic::Song{drawBytes(random, 1 + random.below(600)), drawTime(random)});
+        music_.note(path);
+    }
+    const auto id = firstList + random.below(lists);
+    auto& list = music_.lists[id];
+    list.title = list.title.empty() ? "List " + std::to_string(id) : list.title;
+    list.songs.push_back(path);
+    if (!music_.lists.contains(firstList)) {
+        music_.lists[firstList] = {"List 1", {path}};
+    }
+}
+
+void World::happenToMusic(Happening what, Random& random) {
+    constexpr std::array mine{ChangeList, EmptyList, RenameList, DeleteList, AddSong};
+    if (std::ranges::find(mine, what) == mine.end()) {
+        return;
+    }
+    if (what == AddSong || music_.lists.empty()) {
+        addSong(random);
+        music_.didChange();
+        return;
+    }
+    auto& [id, list] = drawFrom(music_.lists, random);
+    if (what == RenameList) {
+        list.title = random.onceIn(2) ? "List 1" : "Other " + std::to_string(random.below(3));
+    } else if (what == EmptyList) {
+        list.songs.clear();
+    } else if (what == DeleteList) {
+        music_.lists.erase(id);
+    } else if (list.songs.empty() || random.onceIn(2)) {
+        list.songs.push_back(drawFrom(music_.songs, random).first);
+    } else {
+        list.songs.erase(std::next(list.songs.begin(),
+                                   static_cast<std::ptrdiff_t>(random.below(list.songs.size()))));
+    }
+    music_.didChange();
+}
+
+void World::happenToSong(Happening what, Random& random) {
+    constexpr std::array mine{ChangeSong, ReplaceSongAlike, RemoveSong,
+                              LockSong,   EmptySong,        HugeSong};
+    if (std::ranges::find(mine, what) == mine.end() || music_.songs.size() < 2) {
+        return;
+    }
+    troubles_.insert("song");
+    auto& [path, song] = drawFrom(music_.songs, random);
+    if (what == RemoveSong) {
+        music_.songs.erase(path);
+        music_.didChange();
+        return;
+    }
+    switch (what) {
+    case ChangeSong: // its time alone, in place, or as another file
+        song = random.onceIn(2) ? std::make_shared<SimulatedMusic::Song>(*song) : song;
+        song->bytes = random.onceIn(3) ? song->bytes : drawBytes(random, 1 + random.below(600));
+        break;
+    case ReplaceSongAlike:
+        song = std::make_shared<SimulatedMusic::Song>(*song);
+        song->bytes = drawBytes(random, song->bytes.size());
+        break;
+    case LockSong:
+        song->isReadable = !song->isReadable;
+        break;
+    case EmptySong:
+        song->bytes.clear();
+        break;
+    default:
+        song->bytes = drawBytes(random, largestFile + 1);
+    }
+    if (what != ReplaceSongAlike && what != LockSong) {
+        song->modified = drawTime(random);
+    }
+    music_.note(path);
+    music_.didChange();
+}
+
+void World::happenToChoices(Happening what, Random& random) {
+    auto& now = choices_.now;
+    switch (what) {
+    case Choose:
+        now.playlist =
+            random.onceIn(8) ? std::nullopt : std::optional(firstList + random.below(lists));
+        now.isSyncEnabled = true;
+        break;
+    case SetLimit:
+        now.limitType = std::array<std::uint64_t, 5>{0, 1, 1, 1, 7}.at(random.below(5));
+        now.limit = random.below(7);
+        break;
+    case ToggleSync:
+        now.isSyncEnabled = !now.isSyncEnabled;
+        break;
+    case FailPreferences:
+        choices_.writesUntilFailure = random.onceIn(3) ? -1 : static_cast<int>(random.below(3));
+        return;
+    case SetCalendar:
+        turns_.setCalendarTime(random.seed() >> 14U);
+        return;
+    default:
+        return;
+    }
+    turns_.call([this] { engine_->choicesDidChange(); });
+}
+
+void World::plug(bool isPlugged, bool isOther) {
+    device().disk.losePower(random_);
+    device().takeFilesOfOthers();
+    current_ = isOther ? 1 - current_ : current_;
+    isPlugged_ = isPlugged;
+    ++pluggings_;
+    isNotLookedAt_ = true;
+    turns_.call([this] { noticed_(syncd::WearableNews::MayHaveChanged); });
+}
+
+void World::happenToDevice(Happening what, Random& random) {
+    auto& disk = device().disk;
+    const auto attach = [this](bool connected, bool onCharger) {
+        turns_.call([this, connected, onCharger] { engine_->attach({connected, onCharger}); });
+    };
+    switch (what) {
+    case ToggleCharger:
+        if (isEmbedded_) {
+            attach(attachment_.connected, !attachment_.onCharger);
+        }
+        break;
+    case TogglePlug:
+        if (isEmbedded_) {
+            attach(!attachment_.connected, attachment_.onCharger);
+        } else {
+            plug(!isPlugged_, false);
+        }
+        break;
+    case SwapWearable:
+        if (!isEmbedded_) {
+            plug(true, true);
+        }
+        break;
+    case FillDevice:
+        disk.setSpaceOfOthers(std::uint64_t{1} << 32U);
+        break;
+    case NearlyFillDevice:
+        disk.setSpaceOfOthers(0);
+        disk.setSpaceOfOthers(disk.available() - std::min(disk.available(), random.below(4'000)));
+        break;
+    case FreeDevice:
+        disk.setSpaceOfOthers(0);
+        break;
+    case ToggleReadOnly:
+        isReadOnly_ = !isReadOnly_;
+        for (auto& wearable : wearables_) {
+            wearable.disk.setReadOnly(isReadOnly_);
+        }
+        break;
+    case ToggleSlowness:
+        isSlow_ = !isSlow_;
+        break;
+    case FailWrites:
+        writesToFail_ = 1 + random.below(3);
+        break;
+    case FailSync:
+        syncsToFail_ = 1 + random.below(2);
+        break;
+    default:
+        break;
+    }
+}
+
+/// A name that a song or a playlist has or may get on the wearable, or one of ours for the time of
+/// a copy.
+std::string World::wantedName(Random& random) const {
+    switch (random.below(4)) {
+    case 0:
+        return "List " + std::to_string(1 + random.below(lists)) + ".m3u8";
+    case 1:
+        return "QUORL00" + std::to_string(1 + random.below(3)) + ".TMP";
+    default:
+        return drawPath(random).substr(2);
+    }
+}
+
+void World::addFileOfOthers(Random& random) {
+    auto name = random.onceIn(2) ? wantedName(random) : "Own " + std::to_string(random.below(9));
+    auto& disk = device().disk;
+    if (disk.find(device().music(), name) || disk.available() < 200) {
+        return;
+    }
+    troubles_.insert("names");
+    const auto file = disk.create(device().music(), name);
+    disk.append(file, drawBytes(random, random.below(100)));
+    disk.setModified(file, drawTime(random));
+    device().filesOfOthers[name] = {disk.read(file), disk.status(file).modified};
+}
+
+std::string World::someOfOurs(Random& random) const {
+    auto names = device().disk.names(device().music());
+    std::erase_if(names,
+                  [this](const auto& name) { return device().filesOfOthers.contains(name); });
+    return names.empty() ? "" : names.at(random.below(names.size()));
+}
+
+void World::damageManifest(Random& random) {
+    auto& disk = device().disk;
+    const auto own = directoryOf(disk, syncd::Volume::Directory::Own);
+    if (!own) {
+        return;
+    }
+    const auto kind = random.below(4);
+    for (std::size_t index = 0; index < 2; ++index) {
+        const auto file = disk.find(*own, wearable::generationFiles.at(index));
+        if (!file || (kind < 2 && kind != index)) {
+            continue;
+        }
+        disk.truncate(*file);
+        disk.append(*file,
+                    drawBytes(random, std::min<std::uint64_t>(random.below(50), disk.available())));
+    }
+    const auto names = disk.names(device().music());
+    device().orphans.insert(names.begin(), names.end());
+    device().excuse();
+}
+
+void World::happenToFiles(Happening what, Random& random) {
+    constexpr std::array mine{AddFileOfOthers, RenameFileOfOthers, RemoveFileOfOthers,
+                              RemoveOurs,      ChangeOurs,         DamageManifest};
+    if (std::ranges::find(mine, what) == mine.end() || isReadOnly_) {
+        return;
+    }
+    auto& disk = device().disk;
+    auto& others = device().filesOfOthers;
+    const auto music = device().music();
+    const auto ours = someOfOurs(random);
+    if (what == AddFileOfOthers) {
+        addFileOfOthers(random);
+    } else if (what == DamageManifest) {
+        damageManifest(random);
+    } else if (what == RemoveOurs || what == ChangeOurs) {
+        // A file that is being looked at cannot be told apart from what it becomes meanwhile.
+        if (ours.empty() || syncd::Device::isUnfinished(ours) ||
+            (what == ChangeOurs && syncs_.isRunning())) {
+            return;
+        }
+        device().excuse();
+        if (what == RemoveOurs) {
+            disk.remove(music, ours);
+        } else if (const auto file = *disk.find(music, ours); disk.available() > 100) {
+            disk.append(file, "x"); // and so it is theirs
+            others[ours] = {disk.read(file), disk.status(file).modified};
+        }
+    } else if (!others.empty()) {
+        const auto [name, contents] = drawFrom(others, random);
+        const auto wanted = wantedName(random);
+        if (what == RemoveFileOfOthers) {
+            disk.remove(music, name);
+            others.erase(name);
+        } else if (!disk.find(music, wanted)) {
+            troubles_.insert("names");
+            disk.rename(music, name, music, wanted);
+            others.erase(name);
+            others[wanted] = contents;
+        }
+    }
+}
+
+void World::happenToEngine(Happening what, Random& /*random*/) {
+    switch (what) {
+    case KillEngine:
+        endEngine(End::Killed);
+        break;
+    case EndEngine:
+        endEngine(End::Orderly);
+        break;
+    case LosePower:
+        endEngine(End::PowerLost);
+        break;
+    case StartNow:
+        turns_.call([this] {
+            try {
+                engine_->startNow();
+            } catch (const syncd::NotReady&) {
+                // The client is told why.
+            }
+        });
+        break;
+    case Cancel:
+        isCancelled_ = isCancelled_ || announcer_.isSessionThere();
+        turns_.call([this] { announcer_.cancel(); });
+        break;
+    default:
+        break;
+    }
+}
+
+} // namespace quorl::simulation

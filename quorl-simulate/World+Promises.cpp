@@ -1,0 +1,360 @@
+#include <algorithm>
+#include <limits>
+#include <sstream>
+
+#include "quorl-simulate/SimulatedVolume.h"
+#include "quorl-simulate/World.h"
+
+namespace quorl::simulation {
+
+namespace {
+
+using namespace std::chrono_literals;
+
+constexpr auto upToDate = "Everything is up to date.";
+
+/// The songs of a choice: each once.
+SimulatedMusic::Selected withinLimit(const SimulatedMusic::Selected& songs,
+                                     const wearable::Selection& choice) {
+    constexpr std::uint64_t megabyte = 1 << 20;
+    const auto most = std::numeric_limits<std::uint64_t>::max();
+    const auto mostBytes = choice.limitType == 0 ? choice.limit * megabyte : most;
+    const auto mostSongs = choice.limitType == 1 ? choice.limit : most;
+    std::uint64_t bytes = 0;
+    SimulatedMusic::Selected chosen;
+    for (const auto& song : songs) {
+        bytes += std::get<1>(song);
+        if (bytes > mostBytes || chosen.size() == mostSongs) {
+            break;
+        }
+        chosen.push_back(song);
+    }
+    return chosen;
+}
+
+std::vector<std::string> linesOf(const std::string& playlist) {
+    std::istringstream text(playlist);
+    std::vector<std::string> lines;
+    for (std::string line; std::getline(text, line);) {
+        if (!line.starts_with('#')) {
+            lines.push_back(line.starts_with("./") ? line.substr(2) : line);
+        }
+    }
+    return lines;
+}
+
+bool contains(const std::string& text, std::string_view part) {
+    return text.find(part) != std::string::npos;
+}
+
+} // namespace
+
+/// The engine stops at its next operation.
+void World::breach(const std::string& what) {
+    if (!breach_) {
+        breach_ = Breach{what, wearableBefore_, device().text()};
+    }
+    isDead_ = true;
+}
+
+void World::check() {
+    if (breach_ || !isPlugged_) {
+        return;
+    }
+    const Quiet quiet(isQuiet_);
+    checkFilesOfOthers(device());
+    checkManifest(device());
+}
+
+void World::checkFilesOfOthers(const SimulatedWearable& wearable) {
+    const auto names = wearable.disk.names(wearable.music());
+    for (const auto& [name, file] : wearable.filesOfOthers) {
+        if (std::ranges::find(names, name) == names.end()) {
+            breach("a file of others is gone: " + name);
+            continue;
+        }
+        const auto node = *wearable.disk.find(wearable.music(), name);
+        if (wearable.disk.read(node) != file.first ||
+            wearable.disk.status(node).modified != file.second) {
+            breach("a file of others was changed: " + name);
+        }
+    }
+}
+
+void World::checkManifest(SimulatedWearable& wearable) {
+    const auto raw = wearable.rawManifest();
+    if (wearable.isExcused && wearable.isLookedAt && raw != wearable.excusedManifest) {
+        wearable.isExcused = false;
+    }
+    if (!wearable.isExcused) {
+        try {
+            const auto manifest = wearable.manifest();
+            if (manifest.sent) {
+                checkSent(wearable, manifest);
+            }
+            checkPlaylist(wearable, manifest);
+            checkPreferences(manifest);
+        } catch (const wearable::BadManifest& error) {
+            breach(std::string("the manifest cannot be read: ") + error.what());
+        }
+    }
+}
+
+/// Every byte of what the manifest calls sent is there, and stays there.
+void World::checkSent(const SimulatedWearable& wearable, const wearable::Manifest& manifest) {
+    const auto* const held = music_.held(manifest.sent->playlist, manifest.sent->revision);
+    if (held == nullptr) {
+        breach("something was sent that never was in the music folder");
+        return;
+    }
+    const auto music = wearable.music();
+    std::vector<std::string> names;
+    std::set<std::string> sources;
+    for (const auto& [path, size, modified] : withinLimit(*held, *manifest.sent)) {
+        const auto entry = std::ranges::find(manifest.songs, path, &wearable::Entry::source);
+        const auto file =
+            entry == manifest.songs.end() ? std::nullopt : wearable.disk.find(music, entry->name);
+        if (!file) {
+            breach("called sent, but not there: " + path);
+            return;
+        }
+        if (!music_.everWas(path, size, modified, wearable.disk.read(*file))) {
+            breach("called sent, but with other contents: " + path);
+        } else if (!wearable.disk.isDurable(music, entry->name)) {
+            breach("called sent, but not durable: " + path);
+        }
+        names.push_back(entry->name);
+        sources.insert(path);
+    }
+    const auto list =
+        manifest.playlist ? wearable.disk.find(music, manifest.playlist->name) : std::nullopt;
+    if (!list || !wearable.disk.isDurable(music, manifest.playlist->name) ||
+        linesOf(wearable.disk.read(*list)) != names) {
+        breach("called sent, but without its playlist");
+    }
+    if (manifest.songs.size() != sources.size()) {
+        breach("called sent, with songs that are not of it");
+    }
+}
+
+/// They say nothing that the wearable does not say, unless they cannot be written, or the engine
+/// has not looked at this wearable yet.
+void World::checkPreferences(const wearable::Manifest& manifest) {
+    const auto& claim = choices_.now.lastSent;
+    if (!claim || isNotLookedAt_ || choices_.writesUntilFailure == 0) {
+        return;
+    }
+    if (!manifest.sent ||
+        *claim != syncd::SentPlaylist{manifest.sent->playlist, manifest.sent->revision}) {
+        breach("the preferences say what the wearable does not");
+    }
+}
+
+void World::checkPlaylist(const SimulatedWearable& wearable, const wearable::Manifest& manifest) {
+    const auto list = manifest.playlist
+                          ? wearable.disk.find(wearable.music(), manifest.playlist->name)
+                          : std::nullopt;
+    if (!list || wearable.disk.status(*list).size != manifest.playlist->size) {
+        return;
+    }
+    for (const auto& name : linesOf(wearable.disk.read(*list))) {
+        if (!wearable.disk.find(wearable.music(), name)) {
+            breach("the playlist names a song that is not there: " + name);
+        }
+    }
+}
+
+/// When it is written to the preferences, it is true.
+void World::checkRemembered(const syncd::SentPlaylist& sent) {
+    const Quiet quiet(isQuiet_);
+    const auto& wearable = wearables_[opened_];
+    if (!wearable.isExcused) {
+        const auto manifest = wearable.manifest();
+        if (!manifest.sent ||
+            syncd::SentPlaylist{manifest.sent->playlist, manifest.sent->revision} != sent) {
+            breach("remembered as sent, but not by the wearable");
+        } else {
+            checkSent(wearable, manifest);
+        }
+    }
+}
+
+void World::checkMessage(bool success, const std::string& message) {
+    const auto happened = [this](const char* trouble) { return troubles_.contains(trouble); };
+    const bool isTrue =
+        contains(message, "is full") || contains(message, "not enough space") ? happened("full")
+        : contains(message, "write-protected") ? happened("protected")
+        : contains(message, "went away")       ? happened("away")
+        : contains(message, "could not be synced") || contains(message, "name") ? happened("names")
+        : contains(message, "cannot be used")                                   ? device().isExcused
+                                                                                : true;
+    if (isDead_) {
+        return;
+    }
+    if (success && choices_.now.lastSent == std::nullopt) {
+        breach("a success that was not remembered");
+    }
+    if (!isTrue) {
+        breach("told, but not true: " + message);
+    }
+}
+
+/// What is in the way of a sync, from the first to the last.
+std::string World::obstacle() {
+    const auto& now = choices_.now;
+    if (!now.isSyncEnabled) {
+        return "Music sync is switched off.";
+    }
+    if (!now.playlist) {
+        return "No playlist is chosen.";
+    }
+    if (!music_.lists.contains(*now.playlist)) {
+        return "The chosen playlist is not in the music folder.";
+    }
+    const auto answer = look();
+    if (const auto* const problem = std::get_if<std::string>(&answer)) {
+        return *problem;
+    }
+    if (!attachment_.connected) {
+        return "The wearable is not connected.";
+    }
+    return attachment_.onCharger ? "" : "The wearable is not on its charger.";
+}
+
+/// Only when everybody has heard of everything.
+void World::checkStatus() {
+    if (breach_ || isDead_ || announcer_.isSessionThere() || device().isExcused ||
+        turns_.isDueWithin(1s)) {
+        return;
+    }
+    const auto expected = obstacle();
+    const auto& status = engine_->status().status;
+    if (!expected.empty() && status != expected) {
+        breach("says “" + status + "” instead of “" + expected + "”");
+    }
+    if (expected.empty() && status == upToDate && !isSent()) {
+        breach("says “" + status + "”, which is not so");
+    }
+}
+
+/// By the wearable and by the preferences.
+bool World::isSent() {
+    const Quiet quiet(isQuiet_);
+    const auto& now = choices_.now;
+    const auto inventory = music_.inventory();
+    const auto* const list = now.playlist ? inventory->playlist(*now.playlist) : nullptr;
+    const auto sent = device().usage().sent;
+    return list != nullptr && now.lastSent == syncd::SentPlaylist{list->id, list->revision} &&
+           sent == wearable::Selection{list->id, list->revision, now.limitType, now.limit};
+}
+
+/// Takes away whatever is in the way; then the engine is left alone. What it does not hear of, it
+/// has to find out by itself.
+void World::bringPeace() {
+    if (trace_) {
+        trace_("-- peace");
+    }
+    isPeace_ = true;
+    wearableBefore_ = device().text();
+    const Quiet quiet(isQuiet_);
+    mendDevices();
+    mendMusic();
+    mendChoices();
+    turns_.call([this] { engine_->refreshWearable(); });
+}
+
+void World::mendDevices() {
+    for (auto& wearable : wearables_) {
+        wearable.disk.setReadOnly(false);
+        wearable.disk.setSpaceOfOthers(0);
+    }
+    isReadOnly_ = isSlow_ = false;
+    writesToFail_ = syncsToFail_ = 0;
+    if (!isPlugged_) {
+        plug(true, false);
+    }
+    if (attachment_ != wearable::Attachment()) {
+        turns_.call([this] { engine_->attach({}); });
+    }
+    removeBadManifest();
+}
+
+/// As its sentence asks for.
+void World::removeBadManifest() {
+    try {
+        static_cast<void>(device().manifest());
+    } catch (const wearable::BadManifest&) {
+        auto& disk = device().disk;
+        const auto own = *directoryOf(disk, syncd::Volume::Directory::Own);
+        for (const auto& name : disk.names(own)) {
+            disk.remove(own, name);
+        }
+        device().excuse();
+    }
+}
+
+void World::mendMusic() {
+    for (const auto& [path, song] : music_.songs) {
+        song->isReadable = true;
+        if (song->bytes.size() > largestFile) {
+            song->bytes.resize(largestFile / 2);
+            song->modified += 1;
+        }
+        music_.note(path);
+    }
+    music_.lists.try_emplace(firstList, SimulatedMusic::List{"List 1", {}});
+    music_.didChange();
+}
+
+void World::mendChoices() {
+    auto& now = choices_.now;
+    const auto before = now;
+    choices_.writesUntilFailure = -1;
+    now.isSyncEnabled = true;
+    if (!now.playlist || !music_.lists.contains(*now.playlist)) {
+        now.playlist = firstList;
+    }
+    if (now != before || isCancelled_) {
+        turns_.call([this] { engine_->choicesDidChange(); });
+    }
+}
+
+bool World::isAtRest() {
+    return !announcer_.isSessionThere() && !turns_.isDueWithin(1s) &&
+           engine_->status().status == upToDate && engine_->status().syncState == "synced" &&
+           isSent();
+}
+
+void World::checkEnd() {
+    const Quiet quiet(isQuiet_);
+    device().isExcused = false;
+    check();
+    checkNothingElse(device().manifest());
+}
+
+void World::checkNothingElse(const wearable::Manifest& manifest) {
+    const auto& disk = device().disk;
+    const auto music = device().music();
+    std::set<SimulatedDisk::Node> wanted;
+    const auto want = [&](const std::string& name) { wanted.insert(*disk.find(music, name)); };
+    for (const auto& song : manifest.songs) {
+        want(song.name);
+    }
+    want(manifest.playlist->name);
+    if (!manifest.strays.empty()) {
+        breach("strays are left at the end: " + manifest.strays.front().name);
+    }
+    for (const auto& name : disk.names(music)) {
+        const bool isTwin =
+            life_.rules == DiskRules::Fat && wanted.contains(*disk.find(music, name));
+        const bool isOurs = isTwin ||
+                            std::ranges::find(manifest.songs, name, &wearable::Entry::name) !=
+                                manifest.songs.end() ||
+                            manifest.playlist->name == name;
+        if (!isOurs && !device().filesOfOthers.contains(name) && !device().orphans.contains(name)) {
+            breach("is left at the end: " + name);
+        }
+    }
+}
+
+} // namespace quorl::simulation
