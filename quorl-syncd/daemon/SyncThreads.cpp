@@ -33,11 +33,11 @@ class ProgressFilter {
 
 class SyncThread final : public RunningSync {
   public:
-    SyncThread(engine::BusLoop& loop, SyncThreads::KeepAwake keepAwake, const SyncPorts& ports,
+    SyncThread(engine::BusLoop& loop, SyncThreads::KeepAwake keepAwake, SyncPorts ports,
                Order order, SyncRunner::Copied copied, SyncRunner::Ended ended)
         : loop_(loop),
           keepAwake_(std::move(keepAwake)),
-          ports_(ports),
+          ports_(std::move(ports)),
           order_(std::move(order)),
           copied_(std::move(copied)),
           ended_(std::move(ended)),

@@ -79,7 +79,7 @@ std::string obstacleIn(const Situation& situation) {
 
 Decision decide(const Situation& situation) {
     using Kind = Decision::Kind;
-    const auto obstacle = obstacleIn(situation);
+    auto obstacle = obstacleIn(situation);
     if (!obstacle.empty()) {
         return {situation.running ? Kind::Stop : Kind::Rest, {}, obstacle};
     }
@@ -103,7 +103,7 @@ std::string statusOf(const Situation& situation, const std::string& lastMessage)
     if (situation.running) {
         return "Syncing music.";
     }
-    const auto obstacle = obstacleIn(situation);
+    auto obstacle = obstacleIn(situation);
     if (!obstacle.empty()) {
         return obstacle;
     }

@@ -55,8 +55,11 @@ std::uint64_t bytesOf(const Files& leftovers, const std::vector<Entry>& useless)
 
 } // namespace
 
-Sync::Sync(Order order, const SyncPorts& ports, std::stop_token stop, Told told)
-    : order_(std::move(order)), ports_(ports), stop_(std::move(stop)), told_(std::move(told)) {}
+Sync::Sync(Order order, SyncPorts ports, std::stop_token stop, Told told)
+    : order_(std::move(order)),
+      ports_(std::move(ports)),
+      stop_(std::move(stop)),
+      told_(std::move(told)) {}
 
 Outcome Sync::run() {
     using Kind = Outcome::Kind;

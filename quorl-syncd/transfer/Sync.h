@@ -30,7 +30,7 @@ class Sync {
     /// Called first when it is known what there is to copy, then after each piece. Must not throw.
     using Told = Copier::Told;
 
-    Sync(Order order, const SyncPorts& ports, std::stop_token stop, Told told);
+    Sync(Order order, SyncPorts ports, std::stop_token stop, Told told);
 
     /// Does all of it, on the calling thread; once. Never throws.
     [[nodiscard]] Outcome run();
