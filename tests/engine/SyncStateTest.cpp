@@ -24,7 +24,7 @@ Situation sent() {
 }
 
 Situation running(Situation now) {
-    now.running.emplace();
+    now.running = Situation::Running();
     return now;
 }
 
