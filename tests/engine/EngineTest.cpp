@@ -7,6 +7,7 @@
 #include <sys/file.h>
 #include <sys/mount.h>
 
+#include "quorl-syncd/transfer/device/Device.h"
 #include "services/base/AtomicFile.h"
 #include "services/engine/Names.h"
 #include "services/wearable/Generations.h"
