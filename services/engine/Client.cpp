@@ -90,11 +90,11 @@ class Client::Connection {
     void callMethod(const char* path, const char* interface, const char* method, Reply reply);
 
     template <class State, PropertyName name, class T>
-    void setProperty(const char* path, const T& value, const Reply& reply) {
+    void setProperty(const char* path, const T& value, Reply&& reply) {
         constexpr auto property = propertyOf<State, name>();
         static_assert(property.access == Access::ReadWrite);
         static_assert(std::is_same_v<T, std::decay_t<decltype(valueOf<name>(State()))>>);
-        set(path, Interface<State>::name, property.name, sdbus::Variant(value), reply);
+        set(path, Interface<State>::name, property.name, sdbus::Variant(value), std::move(reply));
     }
 
   private:
