@@ -12,8 +12,8 @@ inline constexpr const char* wearableName = "Velora";
 /// The directory of a wearable that the songs and the playlist are in.
 inline constexpr const char* musicDirectory = "Music";
 
-/// The directory of a wearable in which we keep what we need to know about it, and unfinished
-/// copies. Nobody else's files are in it.
+/// The directory of a wearable in which we keep what we need to know about it. Nobody else's files
+/// are in it.
 inline constexpr const char* ownDirectory = ".quorl";
 
 inline constexpr std::uint64_t embeddedCapacity = std::uint64_t{4} << 30;

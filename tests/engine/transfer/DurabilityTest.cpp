@@ -249,10 +249,13 @@ TEST_F(Durability, NamesThatOnceCouldNotBeMadeDurableAreGivenAnew) {
 
 TEST_F(Durability, AListThatOnceCouldNotBeMadeDurableIsWrittenToTheSameFileAgain) {
     std::vector<std::string> written;
+    std::string removed;
     bool hasFailed = false;
     const auto outcome = observedSync(wishFor(music_, player_), [&](const Step& step) {
         if (isListWritten(step)) {
             written.push_back(step.file);
+        } else if (step.operation == "remove" && removed.empty()) {
+            removed = step.file;
         } else if (step.operation == "fsync" && step.file == ".quorl/" &&
                    !std::exchange(hasFailed, true)) {
             fail(EIO);
@@ -262,6 +265,7 @@ TEST_F(Durability, AListThatOnceCouldNotBeMadeDurableIsWrittenToTheSameFileAgain
     EXPECT_EQ(outcome.kind, Kind::Failed);
     ASSERT_GE(written.size(), 2);
     EXPECT_EQ(written[0], written[1]);
+    EXPECT_EQ(written[0], removed) << "the next sync must not take it for durable either";
     EXPECT_EQ(copiedBySync(), 2);
 }
 
