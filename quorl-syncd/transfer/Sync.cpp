@@ -86,6 +86,7 @@ void Sync::perform(Device& device) {
     requireRoom(device);
     told_(plan_.progress);
     if (isDone()) {
+        device.settle(); // an earlier sync may have been killed before it was durable
         return;
     }
     beginChanges(device);

@@ -40,9 +40,23 @@ std::string readToEnd(Reader& reader) {
 } // namespace
 
 Device::Device(std::unique_ptr<Volume> volume) : volume_(std::move(volume)) {
-    const bool isMusicNew = volume_->makeDirectory(Directory::Music);
-    if (volume_->makeDirectory(Directory::Own) || isMusicNew) {
+    std::vector<Directory> made;
+    for (const auto directory : {Directory::Music, Directory::Own}) {
+        if (volume_->makeDirectory(directory)) {
+            made.push_back(directory);
+        }
+    }
+    if (made.empty()) {
+        return;
+    }
+    try {
         volume_->syncDirectory(Directory::Top);
+    } catch (const std::system_error&) {
+        // The next sync would take them for durable, as the system does.
+        for (const auto directory : made) {
+            volume_->removeDirectory(directory);
+        }
+        throw;
     }
 }
 

@@ -182,6 +182,12 @@ bool PosixVolume::makeDirectory(Directory directory) {
     return isNew;
 }
 
+void PosixVolume::removeDirectory(Directory directory) {
+    if (unlinkat(root_.get(), nameOf(directory), AT_REMOVEDIR) != 0) {
+        fail(nameOf(directory));
+    }
+}
+
 std::vector<std::string> PosixVolume::names(Directory directory) {
     return namesIn(descriptorOf(directory));
 }

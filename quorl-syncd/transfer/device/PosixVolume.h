@@ -19,6 +19,7 @@ class PosixVolume final : public Volume {
     explicit PosixVolume(const wearable::Wearable& wearable);
 
     bool makeDirectory(Directory directory) override;
+    void removeDirectory(Directory directory) override;
     [[nodiscard]] std::vector<std::string> names(Directory directory) override;
     [[nodiscard]] std::optional<base::FileState> find(Directory directory,
                                                       const std::string& name) override;

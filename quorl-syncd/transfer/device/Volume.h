@@ -52,6 +52,9 @@ class Volume {
     /// Makes `Music` or `Own` where it is not there. True: it was made.
     virtual bool makeDirectory(Directory directory) = 0;
 
+    /// Removes a directory that was made just now and is empty. To be opened anew after that.
+    virtual void removeDirectory(Directory directory) = 0;
+
     /// Of everything in the directory, whoever put it there.
     [[nodiscard]] virtual std::vector<std::string> names(Directory directory) = 0;
 

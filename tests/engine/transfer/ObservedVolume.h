@@ -34,6 +34,11 @@ class ObservedVolume final : public Volume {
         return volume_.makeDirectory(directory);
     }
 
+    void removeDirectory(Directory directory) override {
+        before_({"remove", path(directory, ""), ""});
+        volume_.removeDirectory(directory);
+    }
+
     [[nodiscard]] std::vector<std::string> names(Directory directory) override {
         before_({"list", path(directory, ""), ""});
         return volume_.names(directory);
