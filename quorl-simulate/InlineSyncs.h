@@ -14,9 +14,12 @@ class InlineSyncs final : public syncd::SyncRunner {
   public:
     /// @param ended called when a sync has ended, before the engine hears of it.
     /// @param isTooEarly has syncs be called sent before they are.
-    InlineSyncs(VirtualTurns& turns, const syncd::SyncPorts& ports, std::function<void()> ended,
+    InlineSyncs(VirtualTurns& turns, syncd::SyncPorts ports, std::function<void()> ended,
                 bool isTooEarly)
-        : turns_(turns), ports_(ports), ended_(std::move(ended)), isTooEarly_(isTooEarly) {}
+        : turns_(turns),
+          ports_(std::move(ports)),
+          ended_(std::move(ended)),
+          isTooEarly_(isTooEarly) {}
 
     [[nodiscard]] std::unique_ptr<syncd::RunningSync> begin(const syncd::Order& order,
                                                             Copied copied, Ended ended) override;

@@ -15,6 +15,8 @@ class HonestVolume : public syncd::Volume {
 
     bool makeDirectory(Directory directory) override { return volume_->makeDirectory(directory); }
 
+    void removeDirectory(Directory directory) override { volume_->removeDirectory(directory); }
+
     [[nodiscard]] std::vector<std::string> names(Directory directory) override {
         return volume_->names(directory);
     }

@@ -101,6 +101,10 @@ bool SimulatedVolume::makeDirectory(Directory directory) {
     return true;
 }
 
+void SimulatedVolume::removeDirectory(Directory directory) {
+    disk_.remove(SimulatedDisk::top, nameOf(directory));
+}
+
 std::vector<std::string> SimulatedVolume::names(Directory directory) {
     return disk_.names(node(directory));
 }

@@ -22,6 +22,7 @@ class SimulatedVolume final : public syncd::Volume {
         : disk_(disk), failsSync_(std::move(failsSync)) {}
 
     bool makeDirectory(Directory directory) override;
+    void removeDirectory(Directory directory) override;
     [[nodiscard]] std::vector<std::string> names(Directory directory) override;
     [[nodiscard]] std::optional<base::FileState> find(Directory directory,
                                                       const std::string& name) override;

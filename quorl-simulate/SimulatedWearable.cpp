@@ -17,23 +17,38 @@ std::optional<std::string> readOwn(const SimulatedDisk& disk, const char* name) 
     return file ? std::optional(disk.read(*file)) : std::nullopt;
 }
 
+bool isListed(const wearable::Manifest& list, const std::string& name, std::uint64_t size) {
+    const auto isIt = [&](const wearable::Entry& entry) {
+        return entry.name == name && entry.size == size;
+    };
+    return std::ranges::any_of(list.songs, isIt) || std::ranges::any_of(list.strays, isIt) ||
+           (list.playlist && isIt(*list.playlist));
+}
+
 } // namespace
 
 SimulatedDisk::Node SimulatedWearable::music() const {
     return directoryOf(disk, Directory::Music).value();
 }
 
-std::string SimulatedWearable::rawManifest() const {
-    std::string raw;
-    for (const auto* name : wearable::generationFiles) {
-        raw += readOwn(disk, name).value_or("-");
-    }
-    return raw;
-}
-
 wearable::Manifest SimulatedWearable::manifest() const {
     return wearable::newestManifest([this](const char* name) { return readOwn(disk, name); })
         .manifest;
+}
+
+bool SimulatedWearable::isManifestDurable() const {
+    const auto own = directoryOf(disk, Directory::Own);
+    return own && std::ranges::all_of(wearable::generationFiles, [&](const char* name) {
+               return !disk.find(*own, name) || disk.isDurable(*own, name);
+           });
+}
+
+std::optional<wearable::Manifest> SimulatedWearable::readableManifest() const {
+    try {
+        return manifest();
+    } catch (const wearable::BadManifest&) {
+        return std::nullopt;
+    }
 }
 
 wearable::Usage SimulatedWearable::usage() const {
@@ -58,18 +73,43 @@ wearable::Usage SimulatedWearable::usage() const {
 
 void SimulatedWearable::excuse() {
     isExcused = true;
+    isClaimExcused = true;
     isLookedAt = false;
-    excusedManifest = rawManifest();
+    rememberExcused();
 }
 
+void SimulatedWearable::engineLooks() {
+    isLookedAt = true;
+    if (isExcused) {
+        rememberExcused();
+    }
+}
+
+/// As it is, it is not the engine's.
+void SimulatedWearable::rememberExcused() {
+    excusedManifest = readableManifest();
+    excusedPlaylist = excusedManifest ? excusedManifest->playlist : std::nullopt;
+}
+
+void SimulatedWearable::removeFileOfOthers(const std::string& name) {
+    formerFilesOfOthers.insert(name);
+    filesOfOthers.erase(name);
+}
+
+/// What was ours before somebody changed it can be as it was.
 void SimulatedWearable::takeFilesOfOthers() {
-    Files left;
+    auto names = formerFilesOfOthers;
     for (const auto& [name, file] : filesOfOthers) {
-        if (const auto found = disk.find(music(), name)) {
-            left[name] = {disk.read(*found), disk.status(*found).modified};
+        names.insert(name);
+    }
+    filesOfOthers.clear();
+    const auto list = readableManifest().value_or(wearable::Manifest());
+    for (const auto& name : disk.names(music())) {
+        const auto file = *disk.find(music(), name);
+        if (names.contains(name) && !isListed(list, name, disk.status(file).size)) {
+            filesOfOthers[name] = {disk.read(file), disk.status(file).modified};
         }
     }
-    filesOfOthers = left;
 }
 
 std::string SimulatedWearable::text() const {

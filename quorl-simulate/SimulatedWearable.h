@@ -1,6 +1,7 @@
 #pragma once
 
 #include <map>
+#include <optional>
 #include <set>
 #include <string>
 #include <utility>
@@ -17,26 +18,37 @@ struct SimulatedWearable {
     SimulatedDisk disk;
     /// Files of others in the music directory: contents and time.
     Files filesOfOthers = {};
+    /// What they have removed or renamed, which a loss of power can bring back.
+    std::set<std::string> formerFilesOfOthers = {};
     /// Names of files that were ours until somebody damaged the list of them.
     std::set<std::string> orphans = {};
 
     /// Somebody has removed or changed what is ours, and the engine has not looked since.
     bool isExcused = false;
+    /// Then the preferences are, too, until a look after the sync that has noticed.
+    bool isClaimExcused = false;
     bool isLookedAt = false;
-    std::string excusedManifest = {};
+    /// Ever.
+    bool isDamaged = false;
+    std::optional<wearable::Manifest> excusedManifest = {};
+    std::optional<wearable::Entry> excusedPlaylist = {};
 
     [[nodiscard]] SimulatedDisk::Node music() const;
 
-    /// Both copies of the manifest as they are, for comparison.
-    [[nodiscard]] std::string rawManifest() const;
-
     /// As the engine reads it. Throws `wearable::BadManifest`.
     [[nodiscard]] wearable::Manifest manifest() const;
+    [[nodiscard]] bool isManifestDurable() const;
+    /// Nothing where it cannot be read.
+    [[nodiscard]] std::optional<wearable::Manifest> readableManifest() const;
 
     [[nodiscard]] wearable::Usage usage() const;
 
     /// A hand has been on what is ours.
     void excuse();
+    void engineLooks();
+    void rememberExcused();
+
+    void removeFileOfOthers(const std::string& name);
 
     /// What the others have is what there is now.
     void takeFilesOfOthers();

@@ -110,6 +110,7 @@ void World::happenToSong(Happening what, Random& random) {
         break;
     case LockSong:
         song->isReadable = !song->isReadable;
+        isSongUnlocked_ = true;
         break;
     case EmptySong:
         song->bytes.clear();
@@ -140,6 +141,7 @@ void World::happenToChoices(Happening what, Random& random) {
         now.isSyncEnabled = !now.isSyncEnabled;
         break;
     case FailPreferences:
+        isNotLookedAt_ = isNotLookedAt_ || choices_.writesUntilFailure == 0;
         choices_.writesUntilFailure = random.onceIn(3) ? -1 : static_cast<int>(random.below(3));
         return;
     case SetCalendar:
@@ -214,17 +216,11 @@ void World::happenToDevice(Happening what, Random& random) {
     }
 }
 
-/// A name that a song or a playlist has or may get on the wearable, or one of ours for the time of
-/// a copy.
+/// A name that a song or a playlist has or may get on the wearable. Names of unfinished files are
+/// the engine's alone.
 std::string World::wantedName(Random& random) const {
-    switch (random.below(4)) {
-    case 0:
-        return "List " + std::to_string(1 + random.below(lists)) + ".m3u8";
-    case 1:
-        return "QUORL00" + std::to_string(1 + random.below(3)) + ".TMP";
-    default:
-        return drawPath(random).substr(2);
-    }
+    return random.onceIn(4) ? "List " + std::to_string(1 + random.below(lists)) + ".m3u8"
+                            : drawPath(random).substr(2);
 }
 
 void World::addFileOfOthers(Random& random) {
@@ -235,7 +231,7 @@ void World::addFileOfOthers(Random& random) {
     }
     troubles_.insert("names");
     const auto file = disk.create(device().music(), name);
-    disk.append(file, drawBytes(random, random.below(100)));
+    disk.append(file, drawBytes(random, 1 + random.below(100)));
     disk.setModified(file, drawTime(random));
     device().filesOfOthers[name] = {disk.read(file), disk.status(file).modified};
 }
@@ -254,6 +250,7 @@ void World::damageManifest(Random& random) {
         return;
     }
     const auto kind = random.below(4);
+    device().isDamaged = true;
     for (std::size_t index = 0; index < 2; ++index) {
         const auto file = disk.find(*own, wearable::generationFiles.at(index));
         if (!file || (kind < 2 && kind != index)) {
@@ -289,22 +286,25 @@ void World::happenToFiles(Happening what, Random& random) {
             return;
         }
         device().excuse();
+        device().orphans.insert(ours); // a loss of power may bring it back
         if (what == RemoveOurs) {
             disk.remove(music, ours);
         } else if (const auto file = *disk.find(music, ours); disk.available() > 100) {
             disk.append(file, "x"); // and so it is theirs
+            disk.sync(file);
             others[ours] = {disk.read(file), disk.status(file).modified};
         }
     } else if (!others.empty()) {
-        const auto [name, contents] = drawFrom(others, random);
+        const auto [name, contents] =
+            *std::next(others.begin(), static_cast<std::ptrdiff_t>(random.below(others.size())));
         const auto wanted = wantedName(random);
         if (what == RemoveFileOfOthers) {
             disk.remove(music, name);
-            others.erase(name);
+            device().removeFileOfOthers(name);
         } else if (!disk.find(music, wanted)) {
             troubles_.insert("names");
             disk.rename(music, name, music, wanted);
-            others.erase(name);
+            device().removeFileOfOthers(name);
             others[wanted] = contents;
         }
     }
@@ -331,7 +331,7 @@ void World::happenToEngine(Happening what, Random& /*random*/) {
         });
         break;
     case Cancel:
-        isCancelled_ = isCancelled_ || announcer_.isSessionThere();
+        isCancelled_ = true;
         turns_.call([this] { announcer_.cancel(); });
         break;
     default:

@@ -51,6 +51,7 @@ bool contains(const std::string& text, std::string_view part) {
 
 /// The engine stops at its next operation.
 void World::breach(const std::string& what) {
+    const Quiet quiet(isQuiet_);
     if (!breach_) {
         breach_ = Breach{what, wearableBefore_, device().text()};
     }
@@ -82,9 +83,9 @@ void World::checkFilesOfOthers(const SimulatedWearable& wearable) {
 }
 
 void World::checkManifest(SimulatedWearable& wearable) {
-    const auto raw = wearable.rawManifest();
-    if (wearable.isExcused && wearable.isLookedAt && raw != wearable.excusedManifest) {
-        wearable.isExcused = false;
+    if (wearable.isExcused && wearable.isLookedAt) {
+        wearable.isExcused = wearable.readableManifest() == wearable.excusedManifest ||
+                             !wearable.isManifestDurable();
     }
     if (!wearable.isExcused) {
         try {
@@ -93,9 +94,13 @@ void World::checkManifest(SimulatedWearable& wearable) {
                 checkSent(wearable, manifest);
             }
             checkPlaylist(wearable, manifest);
-            checkPreferences(manifest);
+            if (!wearable.isClaimExcused) {
+                checkPreferences(manifest);
+            }
         } catch (const wearable::BadManifest& error) {
-            breach(std::string("the manifest cannot be read: ") + error.what());
+            if (!wearable.isDamaged) {
+                breach(std::string("the manifest cannot be read: ") + error.what());
+            }
         }
     }
 }
@@ -154,7 +159,8 @@ void World::checkPlaylist(const SimulatedWearable& wearable, const wearable::Man
     const auto list = manifest.playlist
                           ? wearable.disk.find(wearable.music(), manifest.playlist->name)
                           : std::nullopt;
-    if (!list || wearable.disk.status(*list).size != manifest.playlist->size) {
+    if (!list || manifest.playlist == wearable.excusedPlaylist ||
+        wearable.disk.status(*list).size != manifest.playlist->size) {
         return;
     }
     for (const auto& name : linesOf(wearable.disk.read(*list))) {
@@ -181,13 +187,13 @@ void World::checkRemembered(const syncd::SentPlaylist& sent) {
 
 void World::checkMessage(bool success, const std::string& message) {
     const auto happened = [this](const char* trouble) { return troubles_.contains(trouble); };
-    const bool isTrue =
-        contains(message, "is full") || contains(message, "not enough space") ? happened("full")
-        : contains(message, "write-protected") ? happened("protected")
-        : contains(message, "went away")       ? happened("away")
-        : contains(message, "could not be synced") || contains(message, "name") ? happened("names")
-        : contains(message, "cannot be used")                                   ? device().isExcused
-                                                                                : true;
+    const bool isTrue = contains(message, "is full") || contains(message, "not enough space")
+                            ? happened("full")
+                        : contains(message, "write-protected")     ? happened("protected")
+                        : contains(message, "went away")           ? happened("away")
+                        : contains(message, "could not be synced") ? happened("names")
+                        : contains(message, "cannot be used")      ? device().isExcused
+                                                                   : true;
     if (isDead_) {
         return;
     }
@@ -254,9 +260,8 @@ void World::bringPeace() {
     if (trace_) {
         trace_("-- peace");
     }
-    isPeace_ = true;
-    wearableBefore_ = device().text();
     const Quiet quiet(isQuiet_);
+    wearableBefore_ = device().text();
     mendDevices();
     mendMusic();
     mendChoices();
@@ -273,9 +278,11 @@ void World::mendDevices() {
     if (!isPlugged_) {
         plug(true, false);
     }
-    if (attachment_ != wearable::Attachment()) {
-        turns_.call([this] { engine_->attach({}); });
-    }
+    turns_.call([this] {
+        if (attachment_ != wearable::Attachment()) {
+            engine_->attach({});
+        }
+    });
     removeBadManifest();
 }
 
@@ -295,6 +302,7 @@ void World::removeBadManifest() {
 
 void World::mendMusic() {
     for (const auto& [path, song] : music_.songs) {
+        isSongUnlocked_ = isSongUnlocked_ || !song->isReadable;
         song->isReadable = true;
         if (song->bytes.size() > largestFile) {
             song->bytes.resize(largestFile / 2);
@@ -309,12 +317,13 @@ void World::mendMusic() {
 void World::mendChoices() {
     auto& now = choices_.now;
     const auto before = now;
+    isNotLookedAt_ = isNotLookedAt_ || choices_.writesUntilFailure == 0;
     choices_.writesUntilFailure = -1;
     now.isSyncEnabled = true;
     if (!now.playlist || !music_.lists.contains(*now.playlist)) {
         now.playlist = firstList;
     }
-    if (now != before || isCancelled_) {
+    if (now != before || isCancelled_ || isSongUnlocked_) {
         turns_.call([this] { engine_->choicesDidChange(); });
     }
 }

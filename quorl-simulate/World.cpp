@@ -133,6 +133,7 @@ void World::performDueEvents() {
 
 void World::perform(const Event& event) {
     if (trace_) {
+        const Quiet quiet(isQuiet_);
         trace_("-- " + std::string(nameOf(event.what)) + " " + std::to_string(event.seed));
         wearableBefore_ = device().text();
     }
@@ -182,10 +183,14 @@ void World::beforeOperation(std::size_t wearable, std::string_view operation,
         --writesToFail_;
         fail("away", EIO);
     }
+    noteTroubles();
+}
+
+void World::noteTroubles() {
     if (isReadOnly_) {
         troubles_.insert("protected");
     }
-    if (device().disk.available() < capacity / 10) {
+    if (device().disk.available() < capacity / 4) {
         troubles_.insert("full");
     }
 }
@@ -222,6 +227,7 @@ void World::revive() {
     isDead_ = false;
     ++pluggings_;
     if (end == End::PowerLost) {
+        const Quiet quiet(isQuiet_);
         for (auto& wearable : wearables_) {
             wearable.disk.losePower(random_);
             wearable.takeFilesOfOthers();
@@ -242,7 +248,7 @@ struct World::Looked final : syncd::WatchedWearable {
     void look(Reply reply) override {
         world_.turns_.callAt(world_.turns_.now() + noticedAfter, [this, reply = std::move(reply)] {
             reply(world_.look());
-            world_.isNotLookedAt_ = !world_.isPlugged_;
+            world_.wasLookedAt();
         });
     }
 
@@ -260,6 +266,12 @@ std::unique_ptr<syncd::WatchedWearable> World::watch(const std::string& director
     return std::make_unique<Looked>(*this, directory.empty()
                                                ? wearable::Wearable{"/embedded", capacity, false}
                                                : wearable::Wearable{directory, std::nullopt, true});
+}
+
+void World::wasLookedAt() {
+    isNotLookedAt_ = !isPlugged_;
+    device().isClaimExcused =
+        device().isClaimExcused && (device().isExcused || announcer_.isSessionThere());
 }
 
 syncd::WatchedWearable::Answer World::look() {
@@ -281,7 +293,11 @@ std::unique_ptr<syncd::Volume> World::openVolume() {
     }
     openedAt_ = pluggings_;
     opened_ = current_;
-    device().isLookedAt = true;
+    {
+        const Quiet quiet(isQuiet_);
+        device().engineLooks();
+    }
+    noteTroubles();
     auto volume = std::make_unique<SimulatedVolume>(device().disk, [this] {
         const bool fails = syncsToFail_ > 0;
         syncsToFail_ -= fails ? 1 : 0;

@@ -76,6 +76,7 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     void perform(const Event& event);
     void performDueEvents();
     void beforeOperation(std::size_t wearable, std::string_view operation, std::string_view name);
+    void noteTroubles();
     void endEngine(End end);
     void startEngine();
     void revive();
@@ -122,6 +123,7 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     [[nodiscard]] std::unique_ptr<syncd::WatchedWearable> watch(const std::string& directory,
                                                                 Noticed noticed) override;
     [[nodiscard]] syncd::WatchedWearable::Answer look();
+    void wasLookedAt();
     [[nodiscard]] syncd::LastResult of(const std::string& wearable) const override;
     void remember(const std::string& wearable, syncd::LastResult result) override;
     [[nodiscard]] std::unique_ptr<syncd::Volume> openVolume();
@@ -154,7 +156,10 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     bool isNotLookedAt_ = true;
     bool isReadOnly_ = false;
     bool isSlow_ = false;
+    /// Until something is changed, neither a sync that was cancelled nor a song that could not be
+    /// read is tried again.
     bool isCancelled_ = false;
+    bool isSongUnlocked_ = false;
     std::uint64_t writesToFail_ = 0;
     std::uint64_t syncsToFail_ = 0;
     syncd::LastResult lastResult_;
@@ -170,7 +175,6 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     std::uint64_t sessions_ = 0;
     bool isQuiet_ = false;
     bool isDead_ = false;
-    bool isPeace_ = false;
     std::optional<End> end_;
     std::string wearableBefore_;
     std::optional<Breach> breach_;
