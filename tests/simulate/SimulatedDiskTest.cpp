@@ -16,8 +16,6 @@ using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Not;
-using testing::SizeIs;
-using testing::StartsWith;
 
 constexpr auto top = SimulatedDisk::top;
 constexpr std::uint64_t lives = 400;
