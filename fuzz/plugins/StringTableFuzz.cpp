@@ -1,24 +1,32 @@
-// Any bytes in the place of a string table that a bundle was made with: no text comes of them.
+// Any bytes as a string table of a bundle, which was made with them: it is refused, or its texts
+// are UTF-8.
 
+#include <algorithm>
 #include <bit>
 #include <cstddef>
 #include <cstdint>
 
+#include <glib.h>
+
 #include "fuzz/Demand.h"
-#include "fuzz/InputFile.h"
-#include "runtime/plugins/StringTable.h"
+#include "runtime/plugins/BundleError.h"
+#include "runtime/plugins/Catalogue.h"
 
 namespace {
 
-constexpr const char* name = "locale/de/LC_MESSAGES/default.mo";
+bool isText(const quorl::Texts::value_type& entry) {
+    return g_utf8_validate(entry.second.c_str(), -1, nullptr) != FALSE;
+}
 
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    static const quorl::fuzz::InputFile file(name);
-    static const quorl::BundleFiles files(file.directory(), {{name, quorl::sha256("recorded")}});
-    file.write({std::bit_cast<const char*>(data), size});
-    const quorl::StringTable table(files);
-    quorl::fuzz::demand(!table.text({"de"}, quorl::StringTable::defaultDomain, "MUSIC"));
+    const std::filesystem::path file("default.mo");
+    try {
+        const auto texts = quorl::readCatalogue({std::bit_cast<const char*>(data), size}, file);
+        quorl::fuzz::demand(std::ranges::all_of(texts, isText));
+    } catch (const quorl::BundleError& error) {
+        quorl::fuzz::demand(error.file() == file);
+    }
     return 0;
 }

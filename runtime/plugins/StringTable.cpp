@@ -3,10 +3,6 @@
 #include <algorithm>
 #include <cstdlib>
 #include <iostream>
-#include <stdexcept>
-
-#include <boost/locale/gnu_gettext.hpp>
-#include <boost/locale/message.hpp>
 
 #include "runtime/plugins/BundleError.h"
 
@@ -39,25 +35,6 @@ std::string languageName(std::string_view tag) {
     return isPath || name == "C" || name == "POSIX" ? std::string() : name;
 }
 
-using Messages = boost::locale::message_format<char>;
-
-/// The catalogue in the `bytes` of `file`, whose language makes no difference.
-std::locale localeWith(const std::string& bytes, const std::filesystem::path& file) {
-    boost::locale::gnu_gettext::messages_info info;
-    info.encoding = "UTF-8";
-    info.domains.emplace_back("default");
-    info.paths.emplace_back();
-    info.callback = [&bytes](const std::string& /*file*/, const std::string& /*encoding*/) {
-        return std::vector<char>(bytes.begin(), bytes.end());
-    };
-    try {
-        return {std::locale::classic(),
-                boost::locale::gnu_gettext::create_messages_facet<char>(info)};
-    } catch (const std::runtime_error& error) {
-        throw BundleError(file, std::string(error.what()) + "; install the plug-in again");
-    }
-}
-
 const char* environmentValue(std::initializer_list<const char*> names) {
     for (const char* name : names) {
         if (const char* value = std::getenv(name); value && *value) {
@@ -85,13 +62,12 @@ std::vector<std::string> environmentLanguages() {
     return languages;
 }
 
-const std::locale* StringTable::catalogue(const std::string& language,
-                                          const std::string& domain) const {
+const Texts* StringTable::catalogue(const std::string& language, const std::string& domain) const {
     auto [entry, isNew] = catalogues_.try_emplace({language, domain});
     const auto file = "locale/" + language + "/LC_MESSAGES/" + domain + ".mo";
     if (isNew && files_.has(file)) {
         try {
-            entry->second = localeWith(files_.read(file), files_.path(file));
+            entry->second = readCatalogue(files_.read(file), files_.path(file));
         } catch (const BundleError& error) {
             std::clog << error.what() << std::endl;
         }
@@ -107,9 +83,9 @@ std::optional<std::string> StringTable::text(const std::vector<std::string>& lan
     }
     for (const std::string& language : languages) {
         for (const std::string& name : namesFor(languageName(language))) {
-            if (const std::locale* locale = catalogue(name, domain)) {
-                const char* text = std::use_facet<Messages>(*locale).get(0, nullptr, key.c_str());
-                return text ? std::optional<std::string>(text) : std::nullopt;
+            if (const Texts* texts = catalogue(name, domain)) {
+                const auto text = texts->find(key);
+                return text == texts->end() ? std::nullopt : std::optional(text->second);
             }
             if (name == "en") {
                 return std::nullopt; // the default texts are English

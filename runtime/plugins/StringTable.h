@@ -1,12 +1,12 @@
 #pragma once
 
-#include <locale>
 #include <map>
 #include <optional>
 #include <string>
 #include <vector>
 
 #include "runtime/plugins/BundleFiles.h"
+#include "runtime/plugins/Catalogue.h"
 
 namespace quorl {
 
@@ -29,11 +29,11 @@ class StringTable {
                                                   const std::string& key) const;
 
   private:
-    [[nodiscard]] const std::locale* catalogue(const std::string& language,
-                                               const std::string& domain) const;
+    [[nodiscard]] const Texts* catalogue(const std::string& language,
+                                         const std::string& domain) const;
 
     const BundleFiles& files_;
-    mutable std::map<std::pair<std::string, std::string>, std::optional<std::locale>> catalogues_;
+    mutable std::map<std::pair<std::string, std::string>, std::optional<Texts>> catalogues_;
 };
 
 /// The user's languages as the environment names them: `LANGUAGE`, else `LC_ALL`, `LC_MESSAGES` or

@@ -154,7 +154,7 @@ TEST_F(DamagedStringTables, CountAsNoneWhereTheyWereNoCatalogueFromTheStart) {
                 HasSubstr("default.mo: "));
 }
 
-TEST_F(DamagedStringTables, NeverCrashWhateverTheDamage) {
+TEST_F(DamagedStringTables, CountAsNoneWhateverTheDamage) {
     const Digests digests = digestsOfTexts(bundle_.path());
     const std::string whole = bytesOf(bundle_.path() / germanTable);
     quorl::tests::Damage damage;
@@ -165,6 +165,22 @@ TEST_F(DamagedStringTables, NeverCrashWhateverTheDamage) {
             ASSERT_EQ(title(digests), std::nullopt) << count;
         }
     }));
+}
+
+TEST_F(DamagedStringTables, ThatABundleWasMadeWithGiveATextOrNone) {
+    const std::string whole = bytesOf(bundle_.path() / germanTable);
+    quorl::tests::Damage damage;
+    int found = 0;
+
+    static_cast<void>(told([&] {
+        for (int count = 0; count < 1000; ++count) {
+            write(damage.of(whole));
+            found += title(digestsOfTexts(bundle_.path())) ? 1 : 0;
+        }
+    }));
+
+    EXPECT_GT(found, 0) << "the digests keep the reader from seeing any damage";
+    EXPECT_LT(found, 1000);
 }
 
 class EnvironmentLanguages : public testing::Test {
