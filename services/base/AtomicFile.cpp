@@ -66,7 +66,7 @@ void replaceFile(int directory, const std::string& name, std::string_view text) 
     syncToDevice(directory);
 }
 
-std::string readFile(int directory, const std::string& name) {
+std::string readFile(int directory, const std::string& name, std::size_t most) {
     const FileDescriptor file(
         openat(directory, name.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC));
     if (!file) {
@@ -75,7 +75,7 @@ std::string readFile(int directory, const std::string& name) {
         }
         fail(name);
     }
-    return readAll(file.get());
+    return readAll(file.get(), most);
 }
 
 } // namespace quorl::base

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <cstddef>
+#include <limits>
 #include <string>
 #include <string_view>
 
@@ -25,7 +27,8 @@ void syncToDevice(int descriptor);
 /// Puts `text` in the place of the file `name`, and waits until it is on the device.
 void replaceFile(int directory, const std::string& name, std::string_view text);
 
-/// The contents of the file; empty where there is none.
-[[nodiscard]] std::string readFile(int directory, const std::string& name);
+/// The contents of the file, or the first `most` bytes of them; empty where there is none.
+[[nodiscard]] std::string readFile(int directory, const std::string& name,
+                                   std::size_t most = std::numeric_limits<std::size_t>::max());
 
 } // namespace quorl::base

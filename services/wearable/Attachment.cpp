@@ -13,11 +13,16 @@ namespace {
 
 constexpr auto fileName = "state.json";
 
+/// Far more than is ever saved. The device may have been in other hands, and what would fill the
+/// memory must not be read.
+constexpr std::size_t mostBytes = 4096;
+
 } // namespace
 
 Attachment loadAttachment(int root) {
     try {
-        const auto text = base::readFile(root, std::string{ownDirectory} + "/" + fileName);
+        const auto text =
+            base::readFile(root, std::string{ownDirectory} + "/" + fileName, mostBytes);
         const auto value = nlohmann::json::parse(text);
         return {value.at("connected").get<bool>(), value.at("onCharger").get<bool>()};
     } catch (const nlohmann::json::exception&) {

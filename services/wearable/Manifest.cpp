@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <charconv>
+#include <utility>
 
 #include <nlohmann/json.hpp>
 
@@ -81,10 +82,30 @@ std::string checkedName(std::string name) {
     return name;
 }
 
+template <class Number>
+Number numberOf(const json& value) {
+    const bool fits =
+        value.is_number_unsigned()
+            ? std::in_range<Number>(value.get<std::uint64_t>())
+            : value.is_number_integer() && std::in_range<Number>(value.get<std::int64_t>());
+    if (!fits) {
+        throw BadManifest{"a number in it is not a whole one, or out of range"};
+    }
+    return value.get<Number>();
+}
+
 Entry entryOf(const json& value) {
     return {checkedName(value.at("name").get<std::string>()),
-            decoded(value.at("source").get<std::string>()), value.at("size").get<std::uint64_t>(),
-            value.at("modified").get<std::int64_t>(), value.at("hash").get<std::string>()};
+            decoded(value.at("source").get<std::string>()),
+            numberOf<std::uint64_t>(value.at("size")), numberOf<std::int64_t>(value.at("modified")),
+            value.at("hash").get<std::string>()};
+}
+
+Selection selectionOf(const json& value) {
+    return {numberOf<std::uint64_t>(value.at("playlist")),
+            numberOf<std::uint64_t>(value.at("revision")),
+            numberOf<std::uint64_t>(value.at("limitType")),
+            numberOf<std::uint64_t>(value.at("limit"))};
 }
 
 std::vector<Entry> entriesOf(const json& list) {
@@ -102,12 +123,20 @@ Manifest manifestOf(const json& value) {
         manifest.playlist = entryOf(value.at("playlist"));
     }
     if (value.contains("sent")) {
-        const auto& sent = value.at("sent");
-        manifest.sent = Selection{
-            sent.at("playlist").get<std::uint64_t>(), sent.at("revision").get<std::uint64_t>(),
-            sent.at("limitType").get<std::uint64_t>(), sent.at("limit").get<std::uint64_t>()};
+        manifest.sent = selectionOf(value.at("sent"));
     }
     return manifest;
+}
+
+/// Each level costs memory many times its length.
+json parsed(std::string_view text) {
+    constexpr int deepest = 8;
+    return json::parse(text, [](int depth, json::parse_event_t /*event*/, const json& /*value*/) {
+        if (depth > deepest) {
+            throw BadManifest{"it is nested too deeply"};
+        }
+        return true;
+    });
 }
 
 } // namespace
@@ -138,7 +167,7 @@ Manifest parseManifest(std::string_view text) {
         return {};
     }
     try {
-        return manifestOf(json::parse(text));
+        return manifestOf(parsed(text));
     } catch (const json::exception&) {
         rejectManifest("it is not well-formed");
     } catch (const BadManifest& error) {

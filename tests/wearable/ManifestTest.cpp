@@ -9,6 +9,7 @@
 
 #include "services/base/AtomicFile.h"
 #include "services/wearable/Attachment.h"
+#include "services/wearable/Wearable.h"
 #include "tests/base/TemporaryDirectory.h"
 
 namespace {
@@ -53,6 +54,31 @@ TEST(Manifest, ThatIsBrokenSaysWhatToDo) {
     }
 }
 
+TEST(Manifest, WithNumbersThatWeHaveNeverWrittenIsRejected) {
+    const std::string text = toText(everything());
+    for (const std::string number :
+         {"-1", "0.5", "18446744073709551616", "1e300", "\"7\"", "null"}) {
+        auto changed = text;
+        const std::string field = "\"size\": 7";
+        changed.replace(changed.find(field), field.size(), "\"size\": " + number);
+        EXPECT_THROW(static_cast<void>(parseManifest(changed)), BadManifest) << number;
+    }
+    auto late = text;
+    const std::string field = "\"modified\": -1";
+    late.replace(late.find(field), field.size(), "\"modified\": 9223372036854775808");
+    EXPECT_THROW(static_cast<void>(parseManifest(late)), BadManifest);
+}
+
+TEST(Manifest, ThatIsNestedAsDeeplyAsItIsLongIsReadNoFurtherThanItsFirstLevels) {
+    const std::string text = R"({"format":1,"strays":[],"songs":)" + std::string(1'000'000, '[');
+    try {
+        static_cast<void>(parseManifest(text));
+        FAIL();
+    } catch (const BadManifest& error) {
+        EXPECT_THAT(error.what(), HasSubstr("nested too deeply"));
+    }
+}
+
 TEST(Manifest, KeepsTheEarliestAndTheLatestTime) {
     auto manifest = everything();
     manifest.strays.front().modified = std::numeric_limits<std::int64_t>::min();
@@ -69,6 +95,21 @@ TEST(Attachment, IsConnectedAndOnTheChargerUntilTheUserSaysOtherwise) {
     saveAttachment(root.get(), {true, false});
 
     EXPECT_EQ(loadAttachment(root.get()), (Attachment{true, false}));
+}
+
+TEST(Attachment, ThatWouldFillTheMemoryIsNotRead) {
+    const TemporaryDirectory device;
+    const auto root = quorl::base::openRoot(device.path().c_str());
+    saveAttachment(root.get(), {false, false});
+    const auto file = std::filesystem::path(ownDirectory) / "state.json";
+
+    device.write(file.native(),
+                 std::string(5000, ' ') + R"({"connected":false,"onCharger":false})");
+    EXPECT_EQ(loadAttachment(root.get()), (Attachment{true, true}));
+
+    std::filesystem::resize_file(device.path() / file, std::uintmax_t{1} << 40);
+
+    EXPECT_EQ(loadAttachment(root.get()), (Attachment{true, true}));
 }
 
 } // namespace
