@@ -69,6 +69,16 @@ TEST_P(WideText, IsReadInEveryFormat) {
     EXPECT_EQ(playlistAt(*inventory, "a.m3u").name, "Füße");
 }
 
+TEST_P(WideText, OfXmlIsReadWhateverItDeclares) {
+    for (const char* const declared : {"UTF-8", "ISO-8859-1", "windows-1251", "none-known", ""}) {
+        const auto content = parsePlaylist(Format::Xspf, written(xspf(declared, "Füße 東京.mp3")));
+
+        ASSERT_TRUE(content.has_value()) << declared;
+        ASSERT_EQ(content->entries.size(), 1U) << declared;
+        EXPECT_EQ(content->entries[0], "Füße 東京.mp3") << declared;
+    }
+}
+
 TEST_P(WideText, ThatWasCutWithinACharacterIsLeftOut) {
     const TemporaryDirectory folder;
     const std::string text = written(pls);
@@ -111,6 +121,34 @@ TEST(EncodingTest, ADeclarationOfUtf16ThatReadsAsAsciiWasLeftBehindByAConversion
     folder.write("List.xspf", xspf("utf-16", "Füße.mp3"));
 
     EXPECT_THAT(songsOf(*scan(folder.path()), "List.xspf"), ElementsAre("Füße.mp3"));
+}
+
+TEST(EncodingTest, AnEmptyDeclarationAndOneBehindAByteOrderMarkSayNothing) {
+    const TemporaryDirectory folder;
+    folder.writeSongs({"Füße.mp3"});
+    folder.write("empty.xspf", xspf("", "Füße.mp3"));
+    folder.write("latin.xspf", xspf("", "F\xFC\xDF"
+                                        "e.mp3"));
+    folder.write("marked.xspf", "\uFEFF" + xspf("ISO-8859-1", "Füße.mp3"));
+
+    const auto inventory = scan(folder.path());
+
+    for (const char* const playlist : {"empty.xspf", "latin.xspf", "marked.xspf"}) {
+        EXPECT_THAT(songsOf(*inventory, playlist), ElementsAre("Füße.mp3")) << playlist;
+    }
+}
+
+TEST(EncodingTest, SongsThatAWrongDeclarationRenamesAreToldAsMissing) {
+    const TemporaryDirectory folder;
+    folder.writeSongs({"Füße.mp3", "one.mp3"});
+    folder.write("List.xspf", xspf("windows-1252", "Füße.mp3</location></track>"
+                                                   "<track><location>one.mp3"));
+
+    const auto inventory = scan(folder.path());
+
+    EXPECT_THAT(songsOf(*inventory, "List.xspf"), ElementsAre("one.mp3"));
+    EXPECT_THAT(inventory->leftOut,
+                ElementsAre(LeftOut{"List.xspf", "FÃ¼ÃŸe.mp3", Reason::Missing}));
 }
 
 TEST(EncodingTest, XmlInAnUnknownEncodingOrNotInTheOneThatItDeclaresIsLeftOut) {
