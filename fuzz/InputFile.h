@@ -34,8 +34,11 @@ class InputFile {
 
     [[nodiscard]] const std::filesystem::path& path() const { return path_; }
 
+    /// Makes the file anew, for a file system may see to it that what replaces the contents of one
+    /// is on the disk at once.
     void write(std::string_view bytes) const {
-        std::ofstream(path_, std::ios::binary | std::ios::trunc) << bytes;
+        std::filesystem::remove(path_);
+        std::ofstream(path_, std::ios::binary) << bytes;
     }
 
   private:

@@ -6,6 +6,7 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <string>
 #include <vector>
 
 #include <fcntl.h>
@@ -22,16 +23,11 @@ namespace {
 constexpr std::uint32_t parts = 4;
 
 std::vector<std::string> readSeeds() {
-    std::vector<std::filesystem::path> files;
-    for (const auto& entry : std::filesystem::recursive_directory_iterator(SEEDS)) {
-        if (entry.is_regular_file()) {
-            files.push_back(entry.path());
-        }
-    }
-    std::ranges::sort(files);
+    std::ifstream list(SEEDS);
     std::vector<std::string> seeds;
-    for (const auto& file : files) {
+    for (std::string file; std::getline(list, file, ',');) {
         std::ifstream stream(file, std::ios::binary);
+        EXPECT_TRUE(stream.is_open()) << file;
         seeds.emplace_back(std::istreambuf_iterator<char>(stream),
                            std::istreambuf_iterator<char>());
     }
