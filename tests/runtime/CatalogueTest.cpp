@@ -122,6 +122,14 @@ TEST(Catalogues, WithTextsThatAreNotUtf8AreRefused) {
     EXPECT_TRUE(isRefused(catalogueOf("KEY", "one\0\xFF"s)));
 }
 
+TEST(Catalogues, ThatDoNotBeginAsCataloguesDoAreRefused) {
+    std::string bytes = catalogueOf("KEY", "text");
+    bytes.front() = '\0';
+
+    EXPECT_TRUE(isRefused(bytes));
+    EXPECT_TRUE(isRefused("this is no catalogue of texts"));
+}
+
 TEST(Catalogues, WhoseStringsDoNotEndInANulAreRefused) {
     std::string bytes = catalogueOf("KEY", "text");
     bytes.back() = '.';
