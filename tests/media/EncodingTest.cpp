@@ -170,6 +170,7 @@ TEST(EncodingTest, WhatIsNoTextOrOfAnotherFormatIsNotAnEmptyPlaylist) {
     for (const char* const name : {"song.m3u", "song.pls"}) {
         folder.write(name, "ID3\x04\0\0\0\0\x01\x02"sv);
     }
+    folder.write("east.m3u", "\x71\x67.\0m\0p\0003\0"sv); // UTF-16 that does not plainly begin so
     folder.write("nothing.pls", "");
     folder.write("other.pls", "[Desktop Entry]\nName=Music\n");
     folder.write("page.m3u", "\uFEFF\n<!DOCTYPE html><title>404</title>\n");
@@ -179,7 +180,7 @@ TEST(EncodingTest, WhatIsNoTextOrOfAnotherFormatIsNotAnEmptyPlaylist) {
     const auto inventory = scan(folder.path());
 
     EXPECT_THAT(inventory->playlists, IsEmpty());
-    EXPECT_EQ(inventory->leftOut.size(), 7U);
+    EXPECT_EQ(inventory->leftOut.size(), 8U);
     EXPECT_THAT(inventory->leftOut,
                 testing::Each(testing::Field(&LeftOut::reason, Reason::PlaylistBroken)));
 }

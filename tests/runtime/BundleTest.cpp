@@ -32,7 +32,10 @@ using testing::StartsWith;
 const path builtPlugin = TEST_PLUGIN;
 const path builtTexts = TEST_TEXTS;
 
+/// Makes the file anew: replaced contents, which some file systems bring to the disk at once, take
+/// much longer.
 void write(const path& file, const std::string& content) {
+    std::filesystem::remove(file);
     std::ofstream(file, std::ios::binary) << content;
 }
 
