@@ -2,15 +2,18 @@
 
 #include <filesystem>
 #include <fstream>
-#include <iterator>
+#include <sstream>
+#include <string>
+#include <utility>
 
 #include "runtime/plugins/BundleFiles.h"
 
 namespace quorl::tests {
 
 [[nodiscard]] inline std::string bytesOf(const std::filesystem::path& file) {
-    std::ifstream stream(file, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
+    std::ostringstream bytes;
+    bytes << std::ifstream(file, std::ios::binary).rdbuf();
+    return std::move(bytes).str();
 }
 
 /// The digests of the string tables in the directory of a bundle as they are now.
