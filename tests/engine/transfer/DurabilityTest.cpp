@@ -23,12 +23,11 @@ using ::testing::HasSubstr;
 using ::testing::Key;
 using ::testing::Not;
 using Kind = Outcome::Kind;
-using Steps = std::vector<Step>;
 
 Outcome observedSync(const Order& order, const ObservedVolume::Before& before,
                      const Sync::Told& told = {}) {
     return sync(order, told, {}, [&](const auto& wearable) {
-        return std::make_unique<ObservedVolume>(wearable, before);
+        return std::make_unique<ObservedVolume>(openPosixVolume(wearable), before);
     });
 }
 

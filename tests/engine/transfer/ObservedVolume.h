@@ -5,77 +5,68 @@
 #include <string>
 #include <utility>
 
-#include "quorl-syncd/transfer/device/PosixVolume.h"
+#include "quorl-syncd/transfer/device/Volume.h"
+#include "tests/engine/transfer/Step.h"
 
 namespace quorl::syncd::testing {
 
-/// What a volume is about to do.
-struct Step {
-    /// As "rename", "fsync" or "write".
-    std::string operation;
-    /// With its directory, as "Music/one.mp3"; empty for the whole volume.
-    std::string file;
-    /// Of a rename, the new name; of a write, what is written.
-    std::string detail;
-};
-
-/// A volume of real files that tells of each step before it takes it. Nothing is ever waited for,
-/// as no power is lost in a test.
+/// A volume that tells of each step of another one before that takes it. Nothing is ever waited
+/// for, as no power is lost in a test.
 class ObservedVolume final : public Volume {
   public:
     /// What it throws is what happens instead of the step.
     using Before = std::function<void(const Step&)>;
 
-    ObservedVolume(const wearable::Wearable& wearable, Before before)
-        : volume_(wearable), before_(std::move(before)) {}
+    ObservedVolume(std::unique_ptr<Volume> volume, Before before)
+        : volume_(std::move(volume)), before_(std::move(before)) {}
 
     bool makeDirectory(Directory directory) override {
         before_({"make", path(directory, ""), ""});
-        return volume_.makeDirectory(directory);
+        return volume_->makeDirectory(directory);
     }
 
     void removeDirectory(Directory directory) override {
         before_({"remove", path(directory, ""), ""});
-        volume_.removeDirectory(directory);
+        volume_->removeDirectory(directory);
     }
 
     [[nodiscard]] std::vector<std::string> names(Directory directory) override {
         before_({"list", path(directory, ""), ""});
-        return volume_.names(directory);
+        return volume_->names(directory);
     }
 
     [[nodiscard]] std::optional<base::FileState> find(Directory directory,
                                                       const std::string& name) override {
         before_({"find", path(directory, name), ""});
-        return volume_.find(directory, name);
+        return volume_->find(directory, name);
     }
 
     [[nodiscard]] std::unique_ptr<Reader> open(Directory directory,
                                                const std::string& name) override {
         before_({"open", path(directory, name), ""});
-        return volume_.open(directory, name);
+        return volume_->open(directory, name);
     }
 
     [[nodiscard]] std::unique_ptr<VolumeFile> create(Directory directory,
                                                      const std::string& name) override {
         before_({"create", path(directory, name), ""});
-        return observed(path(directory, name), volume_.create(directory, name));
+        return observed(path(directory, name), volume_->create(directory, name));
     }
 
     [[nodiscard]] std::unique_ptr<VolumeFile> overwrite(Directory directory,
                                                         const std::string& name) override {
         before_({"overwrite", path(directory, name), ""});
-        return observed(path(directory, name), volume_.overwrite(directory, name));
+        return observed(path(directory, name), volume_->overwrite(directory, name));
     }
 
     void rename(Directory directory, const std::string& name, const std::string& newName) override {
         before_({"rename", path(directory, name), newName});
-        volume_.rename(directory, name, newName);
+        volume_->rename(directory, name, newName);
     }
 
     void remove(Directory directory, const std::string& name) override {
         before_({"remove", path(directory, name), ""});
-        volume_.remove(directory, name);
+        volume_->remove(directory, name);
     }
 
     void syncDirectory(Directory directory) override {
@@ -86,7 +77,7 @@ class ObservedVolume final : public Volume {
 
     [[nodiscard]] std::uint64_t available() override {
         before_({"available", "", ""});
-        return volume_.available();
+        return volume_->available();
     }
 
   private:
@@ -135,7 +126,7 @@ class ObservedVolume final : public Volume {
         return std::make_unique<File>(std::move(path), std::move(file), before_);
     }
 
-    PosixVolume volume_;
+    const std::unique_ptr<Volume> volume_;
     const Before before_;
 };
 
