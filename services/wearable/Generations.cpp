@@ -77,8 +77,14 @@ StoredManifest newestManifest(const ReadOwnFile& read) {
     return {parseManifest(newest.text), newest.number, isSecond ? 0U : 1U};
 }
 
-std::string generationText(std::uint64_t number, const Manifest& manifest) {
-    return withHeader(number, toText(manifest));
+std::string generationText(std::uint64_t number, const Manifest& manifest, std::uint64_t size) {
+    auto text = toText(manifest);
+    auto whole = withHeader(number, text);
+    while (whole.size() < size) { // again where the new checksum is shorter
+        text.append(size - whole.size(), '\n');
+        whole = withHeader(number, text);
+    }
+    return whole;
 }
 
 void requireReadable(bool isRegularFile, std::uint64_t size) {

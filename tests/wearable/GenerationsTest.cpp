@@ -54,6 +54,17 @@ TEST_F(Generations, CountByTheirNumbersWhicheverFileTheyAreIn) {
     EXPECT_EQ(newest().next, 1);
 }
 
+TEST_F(Generations, FillTheFileThatTheyAreWrittenOver) {
+    for (std::uint64_t size = 0; size < 600; ++size) {
+        files_[first] = generationText(3, manifestOf("new"), size);
+
+        ASSERT_GE(files_[first].size(), size);
+        ASSERT_LE(files_[first].size(),
+                  std::max(size, generationText(3, manifestOf("new")).size()) + 1);
+        ASSERT_EQ(newest().manifest, manifestOf("new")) << size;
+    }
+}
+
 TEST_F(Generations, AreNotBelievedWhereAnyByteIsAnother) {
     const auto whole = generationText(2, manifestOf("new"));
     for (std::size_t at = 0; at < whole.size(); ++at) {

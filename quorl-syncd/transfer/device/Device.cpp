@@ -37,9 +37,21 @@ std::string readToEnd(Reader& reader) {
     return text;
 }
 
+/// While another failure is under way, which says more.
+template <class Act>
+void tryTo(Act act) {
+    try {
+        act();
+    } catch (const std::system_error&) {
+        return;
+    }
+}
+
 } // namespace
 
-Device::Device(std::unique_ptr<Volume> volume) : volume_(std::move(volume)) {
+Device::Device(std::unique_ptr<Volume> volume) : volume_(std::move(volume)) { makeDirectories(); }
+
+void Device::makeDirectories() {
     std::vector<Directory> made;
     for (const auto directory : {Directory::Music, Directory::Own}) {
         if (volume_->makeDirectory(directory)) {
@@ -53,9 +65,9 @@ Device::Device(std::unique_ptr<Volume> volume) : volume_(std::move(volume)) {
         volume_->syncDirectory(Directory::Top);
     } catch (const std::system_error&) {
         // The next sync would take them for durable, as the system does.
-        for (const auto directory : made) {
-            volume_->removeDirectory(directory);
-        }
+        std::ranges::for_each(made, [this](Directory directory) {
+            tryTo([&] { volume_->removeDirectory(directory); });
+        });
         throw;
     }
 }
@@ -77,20 +89,19 @@ wearable::Manifest Device::loadManifest() {
     return std::move(stored.manifest);
 }
 
-std::unique_ptr<VolumeFile> Device::openOwn(const std::string& name) {
-    return volume_->find(Directory::Own, name) ? volume_->overwrite(Directory::Own, name)
-                                               : volume_->create(Directory::Own, name);
-}
-
-void Device::writeGeneration(const std::string& name, const std::string& text) {
+void Device::writeGeneration(const std::string& name, const wearable::Manifest& manifest) {
+    const auto old = volume_->find(Directory::Own, name);
+    const auto text =
+        wearable::generationText(generation_ + 1, manifest, old.value_or(base::FileState()).size);
     try {
-        const auto file = openOwn(name);
+        const auto file =
+            old ? volume_->overwrite(Directory::Own, name) : volume_->create(Directory::Own, name);
         file->write(std::as_bytes(std::span(text)));
         file->sync();
         volume_->syncDirectory(Directory::Own);
     } catch (const std::system_error&) {
         // What could not be made durable must not be taken for it by the next sync either.
-        removeIfThere(Directory::Own, name);
+        tryTo([&] { removeIfThere(Directory::Own, name); });
         throw;
     }
 }
@@ -100,8 +111,7 @@ void Device::saveManifest(const wearable::Manifest& manifest) {
         volume_->sync();
         isPastDurable_ = true;
     }
-    writeGeneration(wearable::generationFiles.at(nextFile_),
-                    wearable::generationText(generation_ + 1, manifest));
+    writeGeneration(wearable::generationFiles.at(nextFile_), manifest);
     nextFile_ = 1 - nextFile_;
     ++generation_;
     if (generation_ == wearable::generationFiles.size()) {

@@ -78,8 +78,8 @@ class Device {
 
   private:
     [[nodiscard]] std::optional<std::string> readOwn(const std::string& name);
-    [[nodiscard]] std::unique_ptr<VolumeFile> openOwn(const std::string& name);
-    void writeGeneration(const std::string& name, const std::string& text);
+    void makeDirectories();
+    void writeGeneration(const std::string& name, const wearable::Manifest& manifest);
     void removeIfThere(Volume::Directory directory, const std::string& name);
 
     const std::unique_ptr<Volume> volume_;

@@ -1,5 +1,6 @@
 #include "quorl-syncd/transfer/device/PosixVolume.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
 #include <system_error>
@@ -8,9 +9,12 @@
 #include <dirent.h>
 #include <fcntl.h>
 #include <linux/fs.h>
+#include <linux/magic.h>
+#include <strings.h>
 #include <sys/file.h>
 #include <sys/ioctl.h>
 #include <sys/stat.h>
+#include <sys/vfs.h>
 #include <unistd.h>
 
 #include "quorl-syncd/transfer/Sentences.h"
@@ -34,6 +38,21 @@ FileDescriptor openWearable(const wearable::Wearable& wearable) {
         fail(wearable.root);
     }
     return base::openRoot(wearable.root.c_str());
+}
+
+bool isFat(int root) {
+    struct statfs status {};
+
+    if (fstatfs(root, &status) != 0) {
+        fail("statfs");
+    }
+    return status.f_type == MSDOS_SUPER_MAGIC || status.f_type == EXFAT_SUPER_MAGIC;
+}
+
+void syncVolumeOf(int descriptor) {
+    if (syncfs(descriptor) != 0) {
+        fail("syncfs");
+    }
 }
 
 std::vector<std::string> namesIn(int directory) {
@@ -72,7 +91,8 @@ class PosixReader final : public Reader {
 
 class PosixVolumeFile final : public VolumeFile {
   public:
-    explicit PosixVolumeFile(FileDescriptor file) : file_(std::move(file)) {}
+    PosixVolumeFile(FileDescriptor file, bool isOnFat)
+        : file_(std::move(file)), isOnFat_(isOnFat) {}
 
     [[nodiscard]] bool share(int descriptor) override {
         return descriptor >= 0 && ioctl(file_.get(), FICLONE, descriptor) == 0;
@@ -92,10 +112,16 @@ class PosixVolumeFile final : public VolumeFile {
         static_cast<void>(sync_file_range(file_.get(), 0, 0, SYNC_FILE_RANGE_WRITE));
     }
 
-    void sync() override { base::syncToDevice(file_.get()); }
+    void sync() override {
+        if (isOnFat_) {
+            syncVolumeOf(file_.get());
+        }
+        base::syncToDevice(file_.get());
+    }
 
   private:
     FileDescriptor file_;
+    const bool isOnFat_;
 };
 
 const char* nameOf(Volume::Directory directory) {
@@ -110,18 +136,67 @@ const char* nameOf(Volume::Directory directory) {
     return ".";
 }
 
-/// False: it is there already.
-bool make(int root, Volume::Directory directory) {
-    constexpr mode_t forEverybodyToRead = 0755;
-    constexpr mode_t forItsOwner = 0700;
-    const bool isOwn = directory == Volume::Directory::Own;
-    if (mkdirat(root, nameOf(directory), isOwn ? forItsOwner : forEverybodyToRead) == 0) {
+void renameUnlessTaken(int directory, const char* name, const char* newName) {
+    if (renameat2(directory, name, directory, newName, RENAME_NOREPLACE) == 0) {
+        return;
+    }
+    if (errno != EINVAL && errno != ENOSYS) {
+        fail(newName);
+    }
+    // A file system that cannot rename without replacing.
+    if (faccessat(directory, newName, F_OK, AT_SYMLINK_NOFOLLOW) == 0) {
+        errno = EEXIST;
+        fail(newName);
+    }
+    if (renameat(directory, name, directory, newName) != 0) {
+        fail(newName);
+    }
+}
+
+/// False: there is something of that name already.
+bool make(int root, const std::string& name, mode_t mode) {
+    if (mkdirat(root, name.c_str(), mode) == 0) {
         return true;
     }
     if (errno != EEXIST) {
-        fail(nameOf(directory));
+        fail(name);
     }
     return false;
+}
+
+/// For a directory that does not have its name yet. What an earlier try has left may be broken, so
+/// that even to look for it would be an error.
+std::string freeNameOnFat(int root) {
+    const auto names = namesIn(root);
+    for (int number = 1;; ++number) {
+        const auto name = "QUORL" + std::to_string(number) + ".NEW";
+        const auto isSame = [&](const std::string& other) {
+            return strcasecmp(name.c_str(), other.c_str()) == 0;
+        };
+        if (std::ranges::none_of(names, isSame)) {
+            return name;
+        }
+    }
+}
+
+bool makeOnFat(int root, const char* name, mode_t mode) {
+    if (faccessat(root, name, F_OK, AT_SYMLINK_NOFOLLOW) == 0) {
+        return false;
+    }
+    const auto unfinished = freeNameOnFat(root);
+    static_cast<void>(make(root, unfinished, mode));
+    syncVolumeOf(root);
+    renameUnlessTaken(root, unfinished.c_str(), name);
+    syncVolumeOf(root);
+    return true;
+}
+
+/// False: it is there already.
+bool make(int root, Volume::Directory directory, bool isOnFat) {
+    constexpr mode_t forEverybodyToRead = 0755;
+    constexpr mode_t forItsOwner = 0700;
+    const auto mode = directory == Volume::Directory::Own ? forItsOwner : forEverybodyToRead;
+    return isOnFat ? makeOnFat(root, nameOf(directory), mode) : make(root, nameOf(directory), mode);
 }
 
 /// Never follows a symbolic link out of the wearable.
@@ -154,7 +229,8 @@ FileDescriptor openFile(int directory, const std::string& name, int access) {
 PosixVolume::PosixVolume(const wearable::Wearable& wearable)
     : wearable_(wearable),
       root_(openWearable(wearable)),
-      isOwnNew_(make(root_.get(), Directory::Own)) {
+      isFat_(isFat(root_.get())),
+      isOwnNew_(make(root_.get(), Directory::Own, isFat_)) {
     own_ = openDirectory(root_.get(), Directory::Own);
     if (flock(own_.get(), LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK) {
         throw std::runtime_error(anotherProgramIsSyncing());
@@ -177,7 +253,7 @@ bool PosixVolume::makeDirectory(Directory directory) {
     if (directory == Directory::Own) {
         return std::exchange(isOwnNew_, false);
     }
-    const bool isNew = make(root_.get(), directory);
+    const bool isNew = make(root_.get(), directory, isFat_);
     music_ = openDirectory(root_.get(), directory);
     return isNew;
 }
@@ -214,38 +290,26 @@ std::unique_ptr<VolumeFile> PosixVolume::create(Directory directory, const std::
     if (!file) {
         fail(name);
     }
-    return std::make_unique<PosixVolumeFile>(std::move(file));
+    return std::make_unique<PosixVolumeFile>(std::move(file), isFat_);
 }
 
 std::unique_ptr<VolumeFile> PosixVolume::overwrite(Directory directory, const std::string& name) {
-    auto file = openFile(descriptorOf(directory), name, O_WRONLY);
-    if (ftruncate(file.get(), 0) != 0) {
-        fail(name);
-    }
-    return std::make_unique<PosixVolumeFile>(std::move(file));
+    return std::make_unique<PosixVolumeFile>(openFile(descriptorOf(directory), name, O_WRONLY),
+                                             isFat_);
 }
 
 void PosixVolume::rename(Directory directory, const std::string& name, const std::string& newName) {
-    const int in = descriptorOf(directory);
-    if (renameat2(in, name.c_str(), in, newName.c_str(), RENAME_NOREPLACE) == 0) {
-        return;
-    }
-    if (errno != EINVAL && errno != ENOSYS) {
-        fail(newName);
-    }
-    // A file system that cannot rename without replacing.
-    if (faccessat(in, newName.c_str(), F_OK, AT_SYMLINK_NOFOLLOW) == 0) {
-        errno = EEXIST;
-        fail(newName);
-    }
-    if (renameat(in, name.c_str(), in, newName.c_str()) != 0) {
-        fail(newName);
-    }
+    renameUnlessTaken(descriptorOf(directory), name.c_str(), newName.c_str());
 }
 
 void PosixVolume::remove(Directory directory, const std::string& name) {
-    if (unlinkat(descriptorOf(directory), name.c_str(), 0) != 0) {
+    const int in = descriptorOf(directory);
+    if (unlinkat(in, name.c_str(), 0) != 0) {
         fail(name);
+    }
+    if (isFat_) {
+        // Only for the order; `syncDirectory` tells what went wrong.
+        static_cast<void>(fsync(in));
     }
 }
 
@@ -253,11 +317,7 @@ void PosixVolume::syncDirectory(Directory directory) {
     base::syncToDevice(descriptorOf(directory));
 }
 
-void PosixVolume::sync() {
-    if (syncfs(root_.get()) != 0) {
-        fail("syncfs");
-    }
-}
+void PosixVolume::sync() { syncVolumeOf(root_.get()); }
 
 std::uint64_t PosixVolume::available() { return wearable::availableBytes(wearable_, root_.get()); }
 

@@ -11,6 +11,12 @@ namespace quorl::syncd {
 ///
 /// Files, and our own directory, are for their owner alone; the music directory can be read by
 /// everybody, as far as the umask lets it.
+///
+/// On FAT an `fsync` writes the name of a file or directory before the table that says where the
+/// rest of it is. A loss of power between the two would leave a name that can be neither read nor
+/// removed: the system takes the volume for broken. So there all is written in one go before, which
+/// goes through the disk from the beginning, where the table is; a directory gets its name when it
+/// is there; and a name is gone before its space is given anew.
 class PosixVolume final : public Volume {
   public:
     /// Opens the wearable, and makes our own directory, which nobody else can open for a sync as
@@ -40,6 +46,7 @@ class PosixVolume final : public Volume {
 
     wearable::Wearable wearable_;
     base::FileDescriptor root_;
+    bool isFat_ = false;
     base::FileDescriptor music_;
     base::FileDescriptor own_;
     /// By the constructor, and nobody was told yet.

@@ -72,7 +72,9 @@ class Volume {
     [[nodiscard]] virtual std::unique_ptr<VolumeFile> create(Directory directory,
                                                              const std::string& name) = 0;
 
-    /// Opens a regular file that is there, empties it and lets it be written.
+    /// Opens a regular file that is there, to be written over from its beginning. It keeps its
+    /// size where less is written: on FAT a file that a loss of power has left with the space that
+    /// it gave back cannot be used any more.
     [[nodiscard]] virtual std::unique_ptr<VolumeFile> overwrite(Directory directory,
                                                                 const std::string& name) = 0;
 

@@ -143,9 +143,8 @@ class Translator {
 
     [[nodiscard]] static std::optional<Step> named(const Call& call, const std::string& file) {
         static const std::map<std::string, std::string> names{
-            {"mkdirat", "make"},       {"unlinkat", "remove"}, {"fsync", "fsync"},
-            {"utimensat", "time"},     {"write", "write"},     {"sync_file_range", "flush"},
-            {"ftruncate", "overwrite"}};
+            {"mkdirat", "make"},   {"unlinkat", "remove"}, {"fsync", "fsync"},
+            {"utimensat", "time"}, {"write", "write"},     {"sync_file_range", "flush"}};
         if (call.name == "syncfs") {
             return Step{"sync", "", ""};
         }
@@ -169,7 +168,7 @@ class Translator {
         if (says("O_CREAT") || says("O_TRUNC")) {
             return Step{"openat", file, how};
         }
-        return std::nullopt;
+        return says("O_WRONLY") ? std::optional(Step{"overwrite", file, ""}) : std::nullopt;
     }
 
     const std::filesystem::path wearable_;
