@@ -60,7 +60,7 @@ TEST_F(Generations, FillTheFileThatTheyAreWrittenOver) {
 
         ASSERT_GE(files_[first].size(), size);
         ASSERT_LE(files_[first].size(),
-                  std::max(size, generationText(3, manifestOf("new")).size()) + 1);
+                  std::max(size, generationText(3, manifestOf("new")).size()) + 8);
         ASSERT_EQ(newest().manifest, manifestOf("new")) << size;
     }
 }
