@@ -36,6 +36,11 @@ class Music {
 
     void remove(const std::string& name) const;
 
+    /// Makes a link to a song or to anything else.
+    void link(const std::string& name, const std::filesystem::path& target) const {
+        folder_.link(name, target);
+    }
+
     /// Writes the playlist `title`, which lists the songs in this order.
     void list(const std::vector<std::string>& songs, const std::string& title = "List");
 

@@ -9,17 +9,35 @@
 
 #include "services/base/FileContents.h"
 #include "services/base/FileDescriptor.h"
+#include "services/base/Paths.h"
 
 namespace quorl::syncd {
 
 namespace {
 
+base::FileDescriptor openFile(const std::filesystem::path& file) {
+    return base::FileDescriptor(
+        ::open(file.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC));
+}
+
+/// A link in the folder stands for the file that it leads to, as long as that is in the folder too.
+base::FileDescriptor openSong(const std::filesystem::path& root, const std::string& path) {
+    auto file = openFile(root / path);
+    if (file || errno != ELOOP) {
+        return file;
+    }
+    std::error_code error;
+    const auto target = std::filesystem::canonical(root / path, error);
+    const auto folder = error ? std::filesystem::path() : std::filesystem::canonical(root, error);
+    const bool isInside = !error && base::isWithin(target.native(), folder.native());
+    errno = error ? error.value() : ELOOP;
+    return isInside ? openFile(target) : base::FileDescriptor();
+}
+
 class PosixSong final : public OpenSong {
   public:
-    PosixSong(const std::filesystem::path& file, std::string path, const base::FileState& expected)
-        : path_(std::move(path)),
-          expected_(expected),
-          file_(::open(file.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC)) {
+    PosixSong(const std::filesystem::path& root, std::string path, const base::FileState& expected)
+        : path_(std::move(path)), expected_(expected), file_(openSong(root, path_)) {
         if (!file_) {
             throw SongProblem(errno == ENOENT ? SongTrouble::Gone : SongTrouble::Unreadable, path_,
                               std::strerror(errno));
@@ -59,7 +77,7 @@ class PosixSong final : public OpenSong {
 std::unique_ptr<OpenSong> PosixSongSource::open(const std::filesystem::path& root,
                                                 const std::string& path,
                                                 const base::FileState& expected) {
-    return std::make_unique<PosixSong>(root / path, path, expected);
+    return std::make_unique<PosixSong>(root, path, expected);
 }
 
 } // namespace quorl::syncd

@@ -186,6 +186,30 @@ TEST_F(SyncedWearable, PlaysASongWhoseNameWouldBeACommentInAPlaylist) {
     EXPECT_EQ(player_.music().at("#1 hit.mp3"), "hit");
 }
 
+TEST_F(SyncedWearable, GetsTheSongsThatLinksInTheFolderLeadTo) {
+    music_.link("relative.mp3", "Album/one.mp3");
+    music_.link("absolute.ogg", music_.path() / "Album/two.ogg");
+    music_.list({"relative.mp3", "absolute.ogg"});
+
+    const auto outcome = syncAll();
+
+    EXPECT_EQ(outcome.kind, Kind::Sent) << outcome.message;
+    EXPECT_EQ(player_.music().at("relative.mp3"), "one");
+    EXPECT_EQ(player_.music().at("absolute.ogg"), "two two");
+}
+
+TEST_F(SyncedWearable, DoesNotGetWhatALinkThatCameMeanwhileLeadsToElsewhere) {
+    const TemporaryDirectory elsewhere;
+    elsewhere.write("secret.mp3", "one");
+    const auto order = wishFor(music_, player_);
+    music_.remove("Album/one.mp3");
+    music_.link("Album/one.mp3", elsewhere.path() / "secret.mp3");
+
+    EXPECT_EQ(sync(order).kind, Kind::Failed);
+
+    EXPECT_EQ(player_.music().count("one.mp3"), 0);
+}
+
 TEST_F(SyncedWearable, ReplacesThePlaylistByAnotherOne) {
     ASSERT_EQ(syncAll().kind, Kind::Sent);
     music_.list({"Album/one.mp3"}, "Other");
