@@ -51,11 +51,11 @@ void Copier::copySong(Entry& song) {
     try {
         fill(file, *source, song);
     } catch (const std::system_error& error) {
-        means_.device.discard(file);
-        if (error.code() == std::errc::file_too_large) {
-            throw SongProblem(SongTrouble::TooLarge, song.name);
+        if (error.code() != std::errc::file_too_large) {
+            throw; // whoever opened the device takes back what was begun
         }
-        throw;
+        means_.device.discard(file);
+        throw SongProblem(SongTrouble::TooLarge, song.name);
     } catch (const SongProblem&) {
         means_.device.discard(file);
         throw;
@@ -130,7 +130,7 @@ void Copier::finish(Copied& copied) {
     while (!means_.device.finish(copied.file, song.name)) {
         means_.ledger.revoke(song.name);
         song.name = takeName(means_.names, song);
-        means_.ledger.announce(song);
+        means_.ledger.announce(std::span(&song, 1));
         means_.ledger.save();
     }
 }

@@ -36,11 +36,6 @@ void Ledger::save() {
 
 void Ledger::replaceByWhatIsThere(wearable::Manifest manifest) { manifest_ = std::move(manifest); }
 
-void Ledger::adopt(const Entry& song) {
-    eraseName(song.name, manifest_.strays);
-    manifest_.songs.push_back(song);
-}
-
 void Ledger::straysAreGone() { manifest_.strays.clear(); }
 
 void Ledger::withdrawClaim() { manifest_.sent.reset(); }
@@ -50,9 +45,9 @@ void Ledger::putAside(const std::vector<Entry>& songs) {
     manifest_.strays.insert(manifest_.strays.end(), songs.begin(), songs.end());
 }
 
-void Ledger::announce(const Entry& entry) {
-    revoke(entry.name);
-    manifest_.strays.push_back(entry);
+void Ledger::announce(std::span<const Entry> entries) {
+    eraseNamesOf(entries, manifest_.strays);
+    manifest_.strays.insert(manifest_.strays.end(), entries.begin(), entries.end());
 }
 
 void Ledger::revoke(const std::string& name) { eraseName(name, manifest_.strays); }

@@ -28,8 +28,8 @@ class Ledger {
     /// The device was looked through: what is not in `manifest` is not there.
     void replaceByWhatIsThere(wearable::Manifest manifest);
 
-    /// A file that an earlier sync has left behind is a complete song.
-    void adopt(const wearable::Entry& song);
+    /// Files that an earlier sync has left behind are complete songs.
+    void adopt(std::span<const wearable::Entry> songs) { songsAreThere(songs); }
 
     /// Files that were about to be copied or removed are not there any more.
     void straysAreGone();
@@ -40,8 +40,8 @@ class Ledger {
     /// These songs are to be removed.
     void putAside(const std::vector<wearable::Entry>& songs);
 
-    /// A file is about to be put on the device under a name that is free.
-    void announce(const wearable::Entry& entry);
+    /// Files are about to be put on the device under names that are free.
+    void announce(std::span<const wearable::Entry> entries);
 
     /// What was announced under this name does not come.
     void revoke(const std::string& name);

@@ -1,6 +1,7 @@
 #include "quorl-syncd/transfer/Sync.h"
 
 #include <algorithm>
+#include <iterator>
 #include <span>
 #include <system_error>
 #include <utility>
@@ -117,9 +118,7 @@ void Sync::takeStock(Device& device) {
     ledger_->replaceByWhatIsThere(whatIsThere(ledger_->manifest(), files, ask));
     plan_ = planOf(order_, ledger_->manifest(), names, ask);
     leftovers_ = removable(unfinishedAmong(names, device), files);
-    for (const auto& song : plan_.adopted) {
-        ledger_->adopt(song);
-    }
+    ledger_->adopt(plan_.adopted);
 }
 
 Hashes Sync::hashes(Device& device) const {
@@ -166,11 +165,10 @@ void Sync::beginChanges(Device& device) {
 }
 
 void Sync::announce() {
-    for (const auto& song : plan_.songs) {
-        if (song.hash.empty()) {
-            ledger_->announce(song);
-        }
-    }
+    std::vector<Entry> coming;
+    std::ranges::copy_if(plan_.songs, std::back_inserter(coming), &std::string::empty,
+                         &Entry::hash);
+    ledger_->announce(coming);
     ledger_->save();
 }
 
@@ -201,7 +199,7 @@ void Sync::writePlaylist(Device& device) {
 void Sync::putPlaylist(Device& device, const UnfinishedFile& file) {
     auto& playlist = plan_.playlist;
     for (;;) {
-        ledger_->announce(playlist);
+        ledger_->announce(std::span(&playlist, 1));
         ledger_->save();
         if (device.finish(file, playlist.name)) {
             return;

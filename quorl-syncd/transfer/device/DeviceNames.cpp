@@ -97,13 +97,24 @@ std::string deviceName(std::string_view name) {
 
 void TakenNames::add(std::string_view name) { folded_.insert(folded(name)); }
 
+bool TakenNames::insert(std::string_view name) {
+    ++lookUps_;
+    return folded_.insert(folded(name)).second;
+}
+
 std::string TakenNames::take(std::string_view name) {
+    constexpr int firstNumber = 2;
     const auto wanted = deviceName(name);
-    auto free = wanted;
-    for (int number = 2; !folded_.insert(folded(free)).second; ++number) {
-        free = withSuffix(wanted, " (" + std::to_string(number) + ")");
+    if (insert(wanted)) {
+        return wanted;
     }
-    return free;
+    auto& number = numbers_.try_emplace(folded(wanted), firstNumber).first->second;
+    for (;;) {
+        auto free = withSuffix(wanted, " (" + std::to_string(number++) + ")");
+        if (insert(free)) {
+            return free;
+        }
+    }
 }
 
 } // namespace quorl::syncd

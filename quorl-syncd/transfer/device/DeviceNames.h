@@ -1,7 +1,9 @@
 #pragma once
 
+#include <cstddef>
 #include <string>
 #include <string_view>
+#include <unordered_map>
 #include <unordered_set>
 
 namespace quorl::syncd {
@@ -20,8 +22,16 @@ class TakenNames {
     /// "Song.mp3", "Song (2).mp3", ….
     [[nodiscard]] std::string take(std::string_view name);
 
+    /// How often it was looked whether a name is taken.
+    [[nodiscard]] std::size_t lookUps() const { return lookUps_; }
+
   private:
+    [[nodiscard]] bool insert(std::string_view name);
+
     std::unordered_set<std::string> folded_;
+    /// For names that were wished for before, the number to go on with.
+    std::unordered_map<std::string, int> numbers_;
+    std::size_t lookUps_ = 0;
 };
 
 } // namespace quorl::syncd

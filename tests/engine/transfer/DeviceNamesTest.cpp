@@ -2,6 +2,8 @@
 
 #include "quorl-syncd/transfer/device/DeviceNames.h"
 
+#include <set>
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <unicode/unistr.h>
@@ -63,6 +65,18 @@ TEST(DeviceNames, ThatFoldToOneAreToldApart) {
     EXPECT_EQ(names.take("a\u0308RGER.mp3"), "äRGER (2).mp3");
     EXPECT_EQ(names.take("a?.mp3"), "a_.mp3");
     EXPECT_EQ(names.take("a*.mp3"), "a_ (2).mp3");
+}
+
+TEST(DeviceNames, AreFoundForManySongsOfOneNameWithoutTryingAllNumbersEachTime) {
+    constexpr std::size_t songs = 20'000;
+    TakenNames names;
+    std::set<std::string> taken;
+    for (std::size_t song = 0; song < songs; ++song) {
+        taken.insert(names.take("Intro.mp3"));
+    }
+
+    EXPECT_EQ(taken.size(), songs);
+    EXPECT_LE(names.lookUps(), 2 * songs);
 }
 
 TEST(DeviceNames, ThatAreTooLongStayToldApart) {
