@@ -6,7 +6,8 @@ namespace quorl::syncd {
 
 namespace {
 
-constexpr std::size_t mostSongs = 64;
+/// All copies of a group are open at a time.
+constexpr std::size_t mostSongs = 16;
 constexpr std::uint64_t smallestLimit = std::uint64_t{16} << 20;
 constexpr std::uint64_t largestLimit = std::uint64_t{512} << 20;
 constexpr std::chrono::seconds longest{1};
