@@ -238,8 +238,11 @@ Plan planOf(const Order& order, const wearable::Manifest& there,
 }
 
 Room roomFor(const Plan& plan, std::uint64_t available) {
+    // For the playlist and the list of our files, which are written before anything is removed.
+    constexpr std::uint64_t beside = 16384;
     const auto needed = plan.progress.totalBytes;
-    if (needed <= available) {
+    const auto comfortable = sum(needed, sum(plan.playlist.size, beside));
+    if (comfortable <= available || (plan.unwanted.empty() && needed <= available)) {
         return Room::Enough;
     }
     for (const auto& song : plan.unwanted) {

@@ -200,13 +200,17 @@ TEST_F(Planning, FindsRoomWithoutSongsThatAreNoLongerWanted) {
     there_.songs = {{"old.mp3", "old.mp3", 20, second, "2"}};
     names_ = {"old.mp3"};
 
-    const auto plan = this->plan();
+    auto plan = this->plan();
 
     EXPECT_THAT(namesOf(plan.unwanted), ElementsAre("old.mp3"));
-    EXPECT_EQ(roomFor(plan, 30), Room::Enough);
-    EXPECT_EQ(roomFor(plan, 29), Room::EnoughWithoutUnwanted);
+    const auto beside = plan.playlist.size + 16384;
+    EXPECT_EQ(roomFor(plan, 30 + beside), Room::Enough);
+    EXPECT_EQ(roomFor(plan, 29 + beside), Room::EnoughWithoutUnwanted);
     EXPECT_EQ(roomFor(plan, 10), Room::EnoughWithoutUnwanted);
     EXPECT_EQ(roomFor(plan, 9), Room::NotEnough);
+    plan.unwanted.clear();
+    EXPECT_EQ(roomFor(plan, 30), Room::Enough);
+    EXPECT_EQ(roomFor(plan, 29), Room::NotEnough);
 }
 
 TEST_F(Planning, KeepsAnUnfinishedFileThatMayBeASecondNameOfAFinishedOne) {

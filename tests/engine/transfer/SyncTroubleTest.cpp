@@ -212,6 +212,29 @@ TEST_F(Trouble, AWearableThatFillsUpInTheMiddleSaysSoAndKeepsNothingHalf) {
     ASSERT_EQ(umount(player.path().c_str()), 0);
 }
 
+TEST_F(Trouble, AWearableWithoutAByteLeftTakesASmallerChoice) {
+    Player player{std::nullopt};
+    if (mount("tmpfs", player.path().c_str(), "tmpfs", 0, "size=4m") != 0) {
+        GTEST_SKIP() << "only root may mount";
+    }
+    ASSERT_EQ(sync(wishFor(music_, player)).kind, Kind::Sent);
+    std::ofstream film(player.path() / "somebody's film");
+    while (film << std::string(4096, 'f') << std::flush) {
+    }
+    ASSERT_EQ(std::filesystem::space(player.path()).available, 0);
+    music_.list({"second.mp3", "third.mp3"});
+
+    const auto outcome = sync(wishFor(music_, player));
+
+    EXPECT_EQ(outcome.kind, Kind::Sent) << outcome.message;
+    EXPECT_EQ(player.music(),
+              (Contents{{"second.mp3", "second"},
+                        {"third.mp3", "third"},
+                        {"List.m3u8", "#EXTM3U\n#PLAYLIST:List\nsecond.mp3\nthird.mp3\n"}}));
+    film.close();
+    ASSERT_EQ(umount(player.path().c_str()), 0);
+}
+
 TEST_F(Trouble, AWriteProtectedWearableSaysSo) {
     Player player{std::nullopt};
     if (mount("tmpfs", player.path().c_str(), "tmpfs", MS_RDONLY, "size=4m") != 0) {
