@@ -107,7 +107,11 @@ std::string statusOf(const Situation& situation, const std::string& lastMessage)
     if (!obstacle.empty()) {
         return obstacle;
     }
-    return situation.givenUp ? lastMessage : "Everything is up to date.";
+    const auto wanted = wantedIn(situation);
+    if (isSent(wanted, situation)) {
+        return "Everything is up to date.";
+    }
+    return situation.givenUp == wanted ? lastMessage : "About to sync music.";
 }
 
 std::string_view syncStateOf(const Situation& situation) {

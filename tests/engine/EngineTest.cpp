@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <csignal>
+#include <set>
 
 #include <sdbus-c++/sdbus-c++.h>
 #include <sys/file.h>
@@ -108,6 +109,30 @@ TEST_F(Engine, DoesNothingWhenEverythingWasSentBefore) {
     recorder_.awaitStatus(upToDate);
 
     EXPECT_EQ(recorder_.count(Kind::SessionWillBegin), 1);
+}
+
+TEST_F(Engine, NeverSaysThatEverythingIsUpToDateBetweenAChoiceAndItsSync) {
+    listLargeSongs();
+    start();
+    choose();
+    sessionEnd();
+    recorder_.awaitStatus(upToDate);
+    const auto before = recorder_.all().size();
+
+    limitTo(2, LimitType::Songs);
+    sessionEnd();
+    recorder_.awaitStatus(upToDate);
+
+    std::set<std::string> said;
+    const auto all = recorder_.all();
+    for (auto event = all.begin() + static_cast<std::ptrdiff_t>(before); event != all.end();
+         ++event) {
+        said.insert(event->state->engine.syncState + ": " + event->state->engine.status);
+    }
+    EXPECT_THAT(said,
+                ::testing::IsSupersetOf({"pending: About to sync music.", "syncing: Syncing music.",
+                                         "synced: Everything is up to date."}));
+    EXPECT_FALSE(said.contains("pending: Everything is up to date."));
 }
 
 TEST_F(Engine, BringsOnlyTheNewSongWhenThePlaylistIsEdited) {

@@ -253,8 +253,12 @@ TEST(Status, TellsWhatIsDoneOrWhatIsWaitedFor) {
         return statusOf(now, "The last message.");
     };
 
-    EXPECT_EQ(statusWith({}), "Everything is up to date.");
+    EXPECT_EQ(statusWith({send}), "Everything is up to date.");
+    EXPECT_EQ(statusWith({send, giveUp}), "Everything is up to date.");
     EXPECT_EQ(statusWith({giveUp}), "The last message.");
+    EXPECT_EQ(statusWith({giveUpOlder}), "About to sync music.");
+    EXPECT_EQ(statusWith({chooseJustNow}), "About to sync music.");
+    EXPECT_EQ(statusWith({sendWithAnotherLimit, chooseJustNow}), "About to sync music.");
     EXPECT_EQ(statusWith({disconnect}), disconnectedMessage);
     EXPECT_EQ(statusWith({giveUp, disconnect}), disconnectedMessage);
     EXPECT_EQ(statusWith({run}), "Syncing music.");

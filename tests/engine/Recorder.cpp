@@ -9,6 +9,7 @@ namespace {
 /// The event as it was, whatever happens afterwards.
 Event copyOf(const engine::Event& event) {
     return {.kind = event.kind,
+            .state = event.state,
             .session = event.session ? *event.session : engine::SessionState(),
             .task = event.task ? *event.task : engine::TaskState(),
             .success = event.success,

@@ -3,6 +3,7 @@
 #include <condition_variable>
 #include <functional>
 #include <future>
+#include <memory>
 #include <mutex>
 #include <string>
 #include <vector>
@@ -16,6 +17,8 @@ struct Event {
     using Kind = engine::Event::Kind;
 
     Kind kind;
+    /// What is known since; not null.
+    std::shared_ptr<const engine::EngineState> state;
     engine::SessionState session = {};
     engine::TaskState task = {};
     bool success = false;
