@@ -20,6 +20,7 @@
 #include "quorl-syncd/daemon/SyncThreads.h"
 #include "quorl-syncd/engine/Engine.h"
 #include "quorl-syncd/engine/LastResults.h"
+#include "services/base/Utf8.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Names.h"
 #include "services/preferences/SharedPreferences.h"
@@ -31,7 +32,7 @@ using namespace quorl;
 enum ExitCode { Ended = 0, CannotStart = 1, BusLost = 2, AlreadyRunning = 3 };
 
 int complain(ExitCode code, const std::string& problem) {
-    std::cerr << "quorl-syncd: " << problem << '\n';
+    std::cerr << "quorl-syncd: " << base::printable(problem) << '\n';
     return code;
 }
 

@@ -7,6 +7,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "services/base/Utf8.h"
 #include "services/engine/Client.h"
 #include "services/preferences/SharedPreferences.h"
 
@@ -95,11 +96,11 @@ Json jsonOf(const engine::EngineState& state, const Choice& choice) {
 void printText(const engine::EngineState& state, const Choice& choice) {
     const bool isKnown = choice.state != engine::syncUnknown;
     std::cout << "Playlist:   "
-              << (!choice.playlist.empty() ? choice.playlist
+              << (!choice.playlist.empty() ? base::printable(choice.playlist)
                   : isKnown                ? "none"
                                            : "unknown")
               << '\n'
-              << "Sync:       " << choice.state;
+              << "Sync:       " << base::printable(choice.state);
     if (const auto progress = progressOf(state)) {
         std::cout << ", " << static_cast<int>(*progress * 100) << "%";
     }
@@ -108,14 +109,16 @@ void printText(const engine::EngineState& state, const Choice& choice) {
         std::cout << "Engine:     not running; start quorl-syncd, or log in again\n";
         return;
     }
-    std::cout << "Engine:     " << state.engine.status << '\n'
-              << "Wearable:   " << state.wearable.name
+    std::cout << "Engine:     " << base::printable(state.engine.status) << '\n'
+              << "Wearable:   " << base::printable(state.wearable.name)
               << (state.wearable.isConnected ? ", connected" : ", not connected")
               << (state.wearable.isOnCharger ? ", on its charger" : ", not on its charger") << '\n'
               << "Storage:    " << state.wearable.available << " of " << state.wearable.capacity
               << " bytes free, " << state.wearable.songs << " in songs\n"
               << "Last sync:  "
-              << (state.engine.lastTime == 0 ? "not yet" : state.engine.lastMessage) << '\n';
+              << (state.engine.lastTime == 0 ? "not yet"
+                                             : base::printable(state.engine.lastMessage))
+              << '\n';
 }
 
 } // namespace
@@ -123,7 +126,7 @@ void printText(const engine::EngineState& state, const Choice& choice) {
 ExitCode printStatus(const Options& options) {
     const auto answer = askEngine();
     if (answer.kind == engine::Event::Kind::BusDidVanish) {
-        std::cerr << "quorl: " << answer.message << '\n';
+        std::cerr << "quorl: " << base::printable(answer.message) << '\n';
         return ExitCode::Failure;
     }
     const auto choice = answer.state->isThere ? std::optional(choiceOf(answer.state->engine))
@@ -132,9 +135,10 @@ ExitCode printStatus(const Options& options) {
         return ExitCode::Failure;
     }
     if (options.json) {
-        std::cout
-            << jsonOf(*answer.state, *choice).dump(2, ' ', false, Json::error_handler_t::replace)
-            << '\n';
+        constexpr bool asciiOnly = true; // names of others must not steer a terminal
+        std::cout << jsonOf(*answer.state, *choice)
+                         .dump(2, ' ', asciiOnly, Json::error_handler_t::replace)
+                  << '\n';
     } else {
         printText(*answer.state, *choice);
     }

@@ -43,6 +43,10 @@ std::string textOfProblem(const std::string& problem, int width) {
     return text;
 }
 
+void complain(const std::string& text) {
+    std::cerr << "quorl: " << base::printable(text) << std::endl;
+}
+
 } // namespace
 
 TextSession::TextSession(Companion& companion, int input, std::ostream& output)
@@ -53,10 +57,9 @@ TextSession::TextSession(Companion& companion, int input, std::ostream& output)
     notifier_.setEnabled(false);
     connect(&companion, &Companion::libraryRead, this, &TextSession::readOnceDrawn,
             Qt::SingleShotConnection);
-    connect(&companion.notices(), &Notices::added, this,
-            [](const std::string& text) { std::cerr << "quorl: " << text << std::endl; });
+    connect(&companion.notices(), &Notices::added, this, &complain);
     for (const std::string& text : companion.notices().texts()) {
-        std::cerr << "quorl: " << text << std::endl;
+        complain(text);
     }
     connect(&companion.screen(), &PaneScreen::drawing, this, &TextSession::show);
     connect(&notifier_, &QSocketNotifier::activated, this, &TextSession::readInput);

@@ -36,6 +36,18 @@ void append(std::string& text, gunichar character) {
     text.append(bytes.data(), static_cast<std::size_t>(length));
 }
 
+/// Whether a terminal that is shown the character may do something else than to draw it: move,
+/// clear, or show what follows in another order.
+bool isSteering(gunichar character) {
+    constexpr gunichar lineSeparator = 0x2028;
+    constexpr gunichar lastOverride = 0x202E;
+    constexpr gunichar firstIsolate = 0x2066;
+    constexpr gunichar lastIsolate = 0x2069;
+    return g_unichar_iscntrl(character) ||
+           (character >= lineSeparator && character <= lastOverride) ||
+           (character >= firstIsolate && character <= lastIsolate);
+}
+
 std::string normalised(std::string_view text, GNormalizeMode mode) {
     if (!g_utf8_validate_len(text.data(), text.size(), nullptr)) {
         return std::string(text);
@@ -89,7 +101,7 @@ std::string printable(std::string_view text) {
     const char* const end = valid.data() + valid.size();
     for (const char* at = valid.data(); at != end; at = g_utf8_next_char(at)) {
         const gunichar character = g_utf8_get_char(at);
-        append(result, g_unichar_iscntrl(character) ? gunichar{0xFFFD} : character);
+        append(result, isSteering(character) ? gunichar{0xFFFD} : character);
     }
     return result;
 }

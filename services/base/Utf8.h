@@ -16,7 +16,8 @@ namespace quorl::base {
 /// `text` with every byte that is not part of valid UTF-8 replaced by U+FFFD.
 [[nodiscard]] std::string validUtf8(std::string_view text);
 
-/// `validUtf8` with the control characters replaced too: safe to print on a terminal.
+/// `validUtf8` with everything replaced too that steers a terminal: control characters, separators
+/// of lines, and what changes the direction of all that follows.
 [[nodiscard]] std::string printable(std::string_view text);
 
 /// `text` in Unicode normalisation form C (composed) or D (decomposed). Text that is not valid

@@ -187,6 +187,25 @@ TEST_F(WithEngine, statusIsPrintedForScripts) {
     EXPECT_EQ(json["lastSync"]["success"], true);
 }
 
+TEST_F(WithEngine, titlesSteerNoTerminalWhenTheStatusIsPrinted) {
+    music_.folder().write("Evil.m3u8",
+                          "#PLAYLIST:Evil\x1b[2J\u009B1m\u202Ekcab\u2066in\u2028line\none.flac\n");
+    {
+        QuorlProcess quorl(arguments("--text"));
+        quorl.say("1");
+        quorl.say("1");
+        quorl.readUntil("line: Synced\n");
+        EXPECT_EQ(quorl.end(), 0);
+    }
+    QuorlProcess status({"--status"});
+    ASSERT_EQ(status.end(), 0);
+    EXPECT_THAT(status.output(), HasSubstr("Playlist:   Evil\uFFFD[2J\uFFFD1m\uFFFDkcab\uFFFDin"
+                                           "\uFFFDline\n"));
+    QuorlProcess json({"--status", "--json"});
+    ASSERT_EQ(json.end(), 0);
+    EXPECT_THAT(json.output(), HasSubstr(R"("Evil\u001b[2J\u009b1m\u202ekcab\u2066in\u2028line")"));
+}
+
 TEST(WithoutEngine, statusSaysSo) {
     const SampleMusic music;
     QuorlProcess status({"--status", "--music", music.path()});
