@@ -36,7 +36,7 @@ LastResult LastResults::of(const std::string& wearable) const {
 
 void LastResults::remember(const std::string& wearable, LastResult result) {
     results_[wearable] = std::move(result);
-    std::filesystem::create_directories(directory_);
+    base::makeDirectories(directory_);
     const auto text = Json(results_).dump(2, ' ', false, Json::error_handler_t::replace);
     base::replaceFile(base::openRoot(directory_.c_str()).get(), fileName, text + "\n");
 }

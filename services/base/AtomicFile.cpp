@@ -14,6 +14,8 @@ namespace quorl::base {
 
 namespace {
 
+constexpr mode_t forItsOwner = 0700;
+
 [[noreturn]] void fail(const std::string& what) {
     throw std::system_error(errno, std::generic_category(), what);
 }
@@ -21,7 +23,6 @@ namespace {
 } // namespace
 
 FileDescriptor openDirectory(int parent, const char* name) {
-    constexpr mode_t forItsOwner = 0700;
     if (mkdirat(parent, name, forItsOwner) != 0 && errno != EEXIST) {
         fail(name);
     }
@@ -30,6 +31,17 @@ FileDescriptor openDirectory(int parent, const char* name) {
         fail(name);
     }
     return directory;
+}
+
+void makeDirectories(const std::filesystem::path& path) {
+    std::filesystem::path directory = path.root_path();
+    for (const auto& name : path.relative_path()) {
+        directory /= name;
+        const int error = mkdir(directory.c_str(), forItsOwner) == 0 ? 0 : errno;
+        if (error != 0 && !std::filesystem::is_directory(directory)) {
+            throw std::system_error(error, std::generic_category(), directory);
+        }
+    }
 }
 
 FileDescriptor openRoot(const char* path) {
@@ -48,13 +60,13 @@ void syncToDevice(int descriptor) {
 
 void replaceFile(int directory, const std::string& name, std::string_view text) {
     const auto temporary = "." + name + ".new";
-    constexpr mode_t forItsOwner = 0600;
+    constexpr mode_t forItsOwnerToWrite = 0600;
     // What is left of an earlier try may be anything by now, even a pipe that would be waited for.
     if (unlinkat(directory, temporary.c_str(), 0) != 0 && errno != ENOENT) {
         fail(name);
     }
-    const FileDescriptor file(
-        openat(directory, temporary.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, forItsOwner));
+    const FileDescriptor file(openat(directory, temporary.c_str(),
+                                     O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, forItsOwnerToWrite));
     if (!file) {
         fail(name);
     }

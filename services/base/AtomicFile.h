@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <filesystem>
 #include <limits>
 #include <string>
 #include <string_view>
@@ -16,6 +17,10 @@ namespace quorl::base {
 /// Opens the directory `name` in the directory `parent`, or makes it. Never follows a symbolic
 /// link out of the wearable.
 [[nodiscard]] FileDescriptor openDirectory(int parent, const char* name);
+
+/// Makes the directory at `path` and those above it where they are not there, for their owner
+/// alone.
+void makeDirectories(const std::filesystem::path& path);
 
 /// Opens the directory at the top of a wearable.
 [[nodiscard]] FileDescriptor openRoot(const char* path);

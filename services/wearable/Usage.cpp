@@ -75,7 +75,7 @@ Stock stockOf(int root, const Manifest& manifest) {
 
 FileDescriptor openWearable(const Wearable& wearable) {
     if (wearable.isEmbedded()) {
-        std::filesystem::create_directories(wearable.root);
+        base::makeDirectories(wearable.root);
     }
     if (wearable.isMountPoint && !isMountPoint(wearable.root)) {
         throw std::system_error{ENODEV, std::generic_category()};

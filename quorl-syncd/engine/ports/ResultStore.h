@@ -26,9 +26,8 @@ class ResultStore {
     /// Of the wearable with this top directory.
     [[nodiscard]] virtual LastResult of(const std::string& wearable) const = 0;
 
-    /// Also outlives a loss of power. Throws `std::system_error` or
-    /// `std::filesystem::filesystem_error` where that is not possible; then it is remembered as
-    /// long as this object is there.
+    /// Also outlives a loss of power. Throws `std::system_error` where that is not possible; then
+    /// it is remembered as long as this object is there.
     virtual void remember(const std::string& wearable, LastResult result) = 0;
 };
 
