@@ -7,7 +7,7 @@
 #include <optional>
 #include <stop_token>
 #include <system_error>
-#include <thread>
+#include <type_traits>
 #include <utility>
 #include <vector>
 
@@ -33,6 +33,9 @@ using Clock = std::chrono::steady_clock;
 // been quiet for a moment; a copy that never rests is shown in steps all the same.
 constexpr std::chrono::milliseconds quietTime{50};
 constexpr std::chrono::milliseconds longestWait{500};
+
+/// For the thread of a folder that is no longer wanted.
+constexpr std::chrono::seconds patience{1};
 
 std::filesystem::path absoluteRoot(const std::filesystem::path& root) {
     std::filesystem::path path = std::filesystem::absolute(root).lexically_normal();
@@ -65,9 +68,23 @@ std::shared_ptr<const Inventory> scan(const std::filesystem::path& root) {
 class MusicFolder::Worker {
   public:
     Worker(const std::filesystem::path& root, Changed changed)
-        : changed_(std::move(changed)),
-          tree_(root, &directoryWatch_),
-          thread_([this](const std::stop_token& stop) { run(stop); }) {}
+        : changed_(std::move(changed)), tree_(root, &directoryWatch_) {}
+
+    /// On the folder's own thread, once; returns when it was stopped.
+    void run(const std::stop_token& stop) {
+        const std::stop_callback wakeForStop(stop, [this] { wakeUp(); });
+        rootWatch_.emplace(tree_.root());
+        mountWatch_.emplace(tree_.root());
+        while (!stop.stop_requested()) {
+            work(stop);
+        }
+    }
+
+    /// Waits for a call that is under way; none is made afterwards.
+    void close() {
+        const std::lock_guard lock(telling_);
+        isClosed_ = true;
+    }
 
     std::shared_ptr<const Inventory> inventory() const {
         const std::lock_guard lock(mutex_);
@@ -85,27 +102,29 @@ class MusicFolder::Worker {
   private:
     using Rescans = std::vector<std::function<void()>>;
 
-    void run(const std::stop_token& stop) {
-        const std::stop_callback wakeForStop(stop, [this] { wakeUp(); });
-        rootWatch_.emplace(tree_.root());
-        mountWatch_.emplace(tree_.root());
-        while (!stop.stop_requested()) {
-            const Rescans rescans = takeRescans();
-            if (!rescans.empty()) {
-                tree_.markAll();
+    /// Reads what is to be read, and waits for more.
+    void work(const std::stop_token& stop) {
+        const Rescans rescans = takeRescans();
+        if (!rescans.empty()) {
+            tree_.markAll();
+        }
+        if (tree_.isDirty()) {
+            if (!update(stop)) {
+                return;
             }
-            if (tree_.isDirty()) {
-                if (!update(stop)) {
-                    return;
-                }
-                giveBackMemory();
-            }
-            for (const auto& done : rescans) {
-                if (done) {
-                    done();
-                }
-            }
-            waitForChanges(stop);
+            giveBackMemory();
+        }
+        for (const auto& done : rescans) {
+            tell(done);
+        }
+        waitForChanges(stop);
+    }
+
+    template <class... Given>
+    void tell(const std::function<void(Given...)>& call, std::type_identity_t<Given>... given) {
+        const std::lock_guard lock(telling_);
+        if (call && !isClosed_) {
+            call(std::move(given)...);
         }
     }
 
@@ -125,9 +144,7 @@ class MusicFolder::Worker {
             const std::lock_guard lock(mutex_);
             snapshot_ = next;
         }
-        if (changed_) {
-            changed_(std::move(next));
-        }
+        tell(changed_, std::move(next));
         return true;
     }
 
@@ -188,19 +205,24 @@ class MusicFolder::Worker {
     base::DirectoryWatch directoryWatch_;
     FolderTree tree_;
 
+    /// Held during each call to outside.
+    std::mutex telling_;
+    bool isClosed_ = false;
+
     mutable std::mutex mutex_;
     /// Written by the folder's own thread only.
     std::shared_ptr<const Inventory> snapshot_;
     Rescans rescans_;
-
-    /// Last, so that everything is there while it runs.
-    std::jthread thread_;
 };
 
 MusicFolder::MusicFolder(const std::filesystem::path& root, Changed changed)
-    : worker_(std::make_unique<Worker>(absoluteRoot(root), std::move(changed))) {}
+    : worker_(std::make_shared<Worker>(absoluteRoot(root), std::move(changed))),
+      errand_([worker = worker_](const std::stop_token& stop) { worker->run(stop); }, patience) {}
 
-MusicFolder::~MusicFolder() = default;
+MusicFolder::~MusicFolder() {
+    errand_.stop();
+    worker_->close();
+}
 
 std::shared_ptr<const Inventory> MusicFolder::inventory() const { return worker_->inventory(); }
 

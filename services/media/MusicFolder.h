@@ -4,6 +4,7 @@
 #include <functional>
 #include <memory>
 
+#include "services/base/Errand.h"
 #include "services/media/Inventory.h"
 
 namespace quorl::media {
@@ -27,7 +28,8 @@ class MusicFolder {
     /// files or start no more threads.
     MusicFolder(const std::filesystem::path& root, Changed changed);
 
-    /// Ends the thread and waits for it, also in the midst of reading; no call is made afterwards.
+    /// Ends the thread, also in the midst of reading; no call is made afterwards. Where the device
+    /// does not answer, the thread is waited for a second and then left behind.
     ~MusicFolder();
 
     MusicFolder(const MusicFolder&) = delete;
@@ -47,7 +49,8 @@ class MusicFolder {
   private:
     class Worker;
 
-    std::unique_ptr<Worker> worker_;
+    const std::shared_ptr<Worker> worker_;
+    base::Errand errand_;
 };
 
 } // namespace quorl::media

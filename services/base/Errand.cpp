@@ -1,0 +1,76 @@
+#include "services/base/Errand.h"
+
+#include <atomic>
+#include <condition_variable>
+#include <cstdio>
+#include <iostream>
+#include <mutex>
+#include <utility>
+
+#include <unistd.h>
+
+namespace quorl::base {
+
+namespace {
+
+std::atomic<bool> isAnyLeftBehind = false;
+
+} // namespace
+
+/// Of the errand and its thread.
+struct Errand::Shared {
+    std::stop_source stop;
+    std::mutex mutex;
+    std::condition_variable ended;
+    bool isAtEnd = false;
+
+    void end() {
+        const std::scoped_lock lock(mutex);
+        isAtEnd = true;
+        ended.notify_all();
+    }
+
+    [[nodiscard]] bool endsUntil(std::chrono::steady_clock::time_point deadline) {
+        std::unique_lock lock(mutex);
+        return ended.wait_until(lock, deadline, [this] { return isAtEnd; });
+    }
+};
+
+Errand::Errand(Work work, std::chrono::milliseconds patience)
+    : shared_(std::make_shared<Shared>()),
+      patience_(patience),
+      thread_([shared = shared_, work = std::move(work)]() mutable {
+          work(shared->stop.get_token());
+          work = {};
+          shared->end();
+      }) {}
+
+Errand::~Errand() {
+    stop();
+    if (shared_->endsUntil(deadline_)) {
+        thread_.join();
+    } else {
+        thread_.detach();
+        noteThreadLeftBehind();
+    }
+}
+
+void Errand::stop() {
+    if (!shared_->stop.stop_requested()) {
+        deadline_ = std::chrono::steady_clock::now() + patience_;
+        shared_->stop.request_stop();
+    }
+}
+
+void noteThreadLeftBehind() { isAnyLeftBehind = true; }
+
+int endOfProgram(int code) {
+    if (isAnyLeftBehind) {
+        std::cout.flush();
+        std::fflush(nullptr);
+        _exit(code);
+    }
+    return code;
+}
+
+} // namespace quorl::base
