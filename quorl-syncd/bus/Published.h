@@ -10,7 +10,7 @@ namespace quorl::syncd {
 template <class State>
 class Published {
   public:
-    explicit Published(State state) : state_(std::move(state)) {}
+    explicit Published(const State& state) : state_(engine::speakable(state)) {}
 
     [[nodiscard]] const State& operator*() const { return state_; }
 
@@ -18,7 +18,8 @@ class Published {
 
     /// Has `object` tell which of the properties have changed, if any.
     template <class Object>
-    void change(Object& object, State now) {
+    void change(Object& object, const State& state) {
+        auto now = engine::speakable(state);
         const auto names = engine::changedProperties(state_, now);
         state_ = std::move(now);
         if (!names.empty()) {

@@ -6,6 +6,7 @@
 #include <Task-adaptor.h>
 
 #include "quorl-syncd/bus/Published.h"
+#include "services/base/Utf8.h"
 
 namespace quorl::syncd {
 
@@ -81,7 +82,7 @@ class SessionObject::Session final
         now.isCancelable = false;
         now.progress = success ? engine::Fraction(1) : now.progress;
         published_.change(*this, now);
-        emitCompleted(success, message);
+        emitCompleted(success, base::validUtf8(message));
     }
 
   private:
@@ -145,7 +146,7 @@ class SessionObject::Task final
         now.isRunning = false;
         now.progress = success ? engine::Fraction(1) : now.progress;
         published_.change(*this, now);
-        emitCompleted(success, message);
+        emitCompleted(success, base::validUtf8(message));
     }
 
   private:

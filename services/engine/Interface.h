@@ -4,6 +4,7 @@
 #include <string_view>
 #include <tuple>
 
+#include "services/base/Utf8.h"
 #include "services/engine/EngineState.h"
 #include "services/engine/Names.h"
 
@@ -123,6 +124,18 @@ std::vector<std::string> changedProperties(const State& before, const State& now
         }
     });
     return names;
+}
+
+/// `state` as the bus can carry it, which breaks off with whoever says what is not UTF-8: paths may
+/// have any bytes.
+template <class State>
+[[nodiscard]] State speakable(State state) {
+    forEachProperty<State>([&state]<class T>(const Property<State, T>& property) {
+        if constexpr (std::is_same_v<T, std::string>) {
+            state.*property.member = base::validUtf8(state.*property.member);
+        }
+    });
+    return state;
 }
 
 /// The name of a property as an argument of a template.
