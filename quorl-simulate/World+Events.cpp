@@ -160,7 +160,7 @@ void World::plug(bool isPlugged, bool isOther) {
     isPlugged_ = isPlugged;
     ++pluggings_;
     isNotLookedAt_ = true;
-    turns_.call([this] { noticed_(syncd::WearableNews::MayHaveChanged); });
+    turns_.call([this] { noticed_(syncd::WearableNews::MayBeAnother); });
 }
 
 void World::happenToDevice(Happening what, Random& random) {

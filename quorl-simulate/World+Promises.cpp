@@ -218,8 +218,8 @@ std::string World::obstacle() {
         return "The chosen playlist is not in the music folder.";
     }
     const auto answer = look();
-    if (const auto* const problem = std::get_if<std::string>(&answer)) {
-        return *problem;
+    if (const auto* const unseen = std::get_if<wearable::Unseen>(&answer)) {
+        return unseen->sentence;
     }
     if (!attachment_.connected) {
         return "The wearable is not connected.";
@@ -280,7 +280,7 @@ void World::mendDevices() {
     }
     turns_.call([this] {
         if (attachment_ != wearable::Attachment()) {
-            engine_->attach({});
+            engine_->attach({true, true});
         }
     });
     removeBadManifest();

@@ -240,10 +240,9 @@ void World::revive() {
 
 /// Keeps nothing up to date while it is not looked at.
 struct World::Looked final : syncd::WatchedWearable {
-    Looked(World& world, wearable::Wearable identity)
-        : world_(world), identity_(std::move(identity)) {}
+    explicit Looked(World& world) : world_(world) {}
 
-    [[nodiscard]] const wearable::Wearable& identity() const override { return identity_; }
+    [[nodiscard]] wearable::Wearable identity() const override { return world_.identity(); }
 
     void look(Reply reply) override {
         world_.turns_.callAt(world_.turns_.now() + noticedAfter, [this, reply = std::move(reply)] {
@@ -252,20 +251,23 @@ struct World::Looked final : syncd::WatchedWearable {
         });
     }
 
-    [[nodiscard]] wearable::Attachment attachment() override { return world_.attachment_; }
-
-    void save(const wearable::Attachment& attachment) override { world_.attachment_ = attachment; }
+    void save(const wearable::Attachment& attachment, Saved saved) override {
+        world_.attachment_ = attachment;
+        world_.turns_.call([saved = std::move(saved)] { saved({}); });
+    }
 
     World& world_;
-    const wearable::Wearable identity_;
 };
 
-std::unique_ptr<syncd::WatchedWearable> World::watch(const std::string& directory,
+wearable::Wearable World::identity() const {
+    return isEmbedded_ ? wearable::Wearable{"/embedded", capacity, false}
+                       : wearable::Wearable{"/device", std::nullopt, true};
+}
+
+std::unique_ptr<syncd::WatchedWearable> World::watch(const std::string& /*directory*/,
                                                      Noticed noticed) {
     noticed_ = std::move(noticed);
-    return std::make_unique<Looked>(*this, directory.empty()
-                                               ? wearable::Wearable{"/embedded", capacity, false}
-                                               : wearable::Wearable{directory, std::nullopt, true});
+    return std::make_unique<Looked>(*this);
 }
 
 void World::wasLookedAt() {
@@ -277,12 +279,12 @@ void World::wasLookedAt() {
 syncd::WatchedWearable::Answer World::look() {
     const Quiet quiet(isQuiet_);
     if (!isPlugged_) {
-        return "The Velora at /device cannot be reached: No such device.";
+        return wearable::Unseen{"The Velora at /device cannot be reached: No such device.", false};
     }
     try {
-        return device().usage();
+        return syncd::Sight{identity(), device().usage(), attachment_};
     } catch (const wearable::BadManifest& error) {
-        return error.what();
+        return wearable::Unseen{error.what(), false};
     }
 }
 

@@ -122,6 +122,7 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     // Ports.
     [[nodiscard]] std::unique_ptr<syncd::WatchedWearable> watch(const std::string& directory,
                                                                 Noticed noticed) override;
+    [[nodiscard]] wearable::Wearable identity() const;
     [[nodiscard]] syncd::WatchedWearable::Answer look();
     void wasLookedAt();
     [[nodiscard]] syncd::LastResult of(const std::string& wearable) const override;

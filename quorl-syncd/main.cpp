@@ -13,6 +13,7 @@
 #include "quorl-syncd/bus/BusAnnouncer.h"
 #include "quorl-syncd/bus/BusObjects.h"
 #include "quorl-syncd/bus/SleepInhibitor.h"
+#include "quorl-syncd/daemon/DirectoryCheck.h"
 #include "quorl-syncd/daemon/LocalMusic.h"
 #include "quorl-syncd/daemon/LocalWearables.h"
 #include "quorl-syncd/daemon/LoopTurns.h"
@@ -20,6 +21,8 @@
 #include "quorl-syncd/daemon/SyncThreads.h"
 #include "quorl-syncd/engine/Engine.h"
 #include "quorl-syncd/engine/LastResults.h"
+#include "quorl-syncd/engine/NotReady.h"
+#include "services/base/Errand.h"
 #include "services/base/Utf8.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Names.h"
@@ -44,6 +47,11 @@ base::FileDescriptor blockSignals() {
     sigaddset(&signals, SIGINT);
     pthread_sigmask(SIG_BLOCK, &signals, nullptr);
     return base::FileDescriptor(signalfd(-1, &signals, SFD_CLOEXEC));
+}
+
+/// A relative path counts from where the daemon is started. Empty where the text is.
+std::string fullPath(const std::string& path) {
+    return path.empty() ? path : std::filesystem::absolute(path).string();
 }
 
 /// What the daemon is started with.
@@ -84,7 +92,11 @@ int serve(const Options& options) {
     const syncd::EnginePorts ports{turns, choices, music, wearables, syncs, results, announcer};
     syncd::Engine engine(ports, options.engine);
     choicesDidChange = [&] { engine.choicesDidChange(); };
-    objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine);
+    syncd::DirectoryCheck check;
+    const syncd::BusObjects::ObjectionTo objectionTo = [&](const std::string& directory) {
+        return check.objectionTo(directory);
+    };
+    objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine, objectionTo);
     try {
         loop.bus().requestName(engine::busName);
     } catch (const sdbus::Error& error) {
@@ -130,13 +142,18 @@ int main(int argc, char** argv) {
     CLI11_PARSE(program, argc, argv);
 
     options.engine.retryDelay = std::chrono::seconds(retryDelay);
+    options.engine.musicFolder = fullPath(options.engine.musicFolder);
+    options.engine.wearableDirectory = fullPath(options.engine.wearableDirectory);
 
     try {
-        return serve(options);
+        return base::endOfProgram(serve(options));
     } catch (const sdbus::Error& error) {
         return complain(CannotStart, "There is no session bus (" + error.getMessage() +
                                          "). Log in, or start one with dbus-run-session.");
-    } catch (const std::exception& error) {
+    } catch (const syncd::NotReady& error) {
         return complain(CannotStart, error.what());
+    } catch (const std::exception& error) {
+        return complain(CannotStart, std::string("The sync engine cannot go on: ") + error.what() +
+                                         ". Close some programs, then start it again.");
     }
 }

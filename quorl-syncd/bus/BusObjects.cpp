@@ -7,6 +7,7 @@
 
 #include "quorl-syncd/bus/Published.h"
 #include "quorl-syncd/engine/Engine.h"
+#include "quorl-syncd/engine/NotReady.h"
 
 namespace quorl::syncd {
 
@@ -24,14 +25,24 @@ void answering(const char* errorName, Act act) {
     }
 }
 
+void requireUsable(const BusObjects::ObjectionTo& objectionTo, const std::string& directory) {
+    const auto objection = objectionTo(directory);
+    if (!objection.empty()) {
+        throw NotReady(objection);
+    }
+}
+
 } // namespace
 
 class BusObjects::EngineObject final
     : public sdbus::AdaptorInterfaces<org::quorl::Velora::Sync::Engine_adaptor,
                                       sdbus::Properties_adaptor> {
   public:
-    EngineObject(sdbus::IConnection& bus, Engine& engine)
-        : AdaptorInterfaces{bus, engine::enginePath}, engine_(engine), published_(engine.status()) {
+    EngineObject(sdbus::IConnection& bus, Engine& engine, const ObjectionTo& objectionTo)
+        : AdaptorInterfaces{bus, engine::enginePath},
+          engine_(engine),
+          objectionTo_(objectionTo),
+          published_(engine.status()) {
         registerAdaptor();
     }
 
@@ -49,7 +60,10 @@ class BusObjects::EngineObject final
     std::string MusicFolder() override { return engine::valueOf<"MusicFolder">(*published_); }
 
     void MusicFolder(const std::string& path) override {
-        answering(engine::notReadyError, [&] { engine_.setMusicFolder(path); });
+        answering(engine::notReadyError, [&] {
+            requireUsable(objectionTo_, path);
+            engine_.setMusicFolder(path);
+        });
     }
 
     std::uint64_t RateLimit() override { return engine::valueOf<"RateLimit">(*published_); }
@@ -71,6 +85,7 @@ class BusObjects::EngineObject final
     std::uint64_t LastTime() override { return engine::valueOf<"LastTime">(*published_); }
 
     Engine& engine_;
+    const ObjectionTo& objectionTo_;
     Published<engine::EngineStatus> published_;
 };
 
@@ -78,9 +93,10 @@ class BusObjects::WearableObject final
     : public sdbus::AdaptorInterfaces<org::quorl::Velora::Sync::Wearable_adaptor,
                                       sdbus::Properties_adaptor> {
   public:
-    WearableObject(sdbus::IConnection& bus, Engine& engine)
+    WearableObject(sdbus::IConnection& bus, Engine& engine, const ObjectionTo& objectionTo)
         : AdaptorInterfaces{bus, engine::wearablePath},
           engine_(engine),
+          objectionTo_(objectionTo),
           published_(engine.wearable()) {
         registerAdaptor();
     }
@@ -93,7 +109,10 @@ class BusObjects::WearableObject final
     std::string Directory() override { return engine::valueOf<"Directory">(*published_); }
 
     void Directory(const std::string& path) override {
-        answering(engine::notReadyError, [&] { engine_.setWearableDirectory(path); });
+        answering(engine::notReadyError, [&] {
+            requireUsable(objectionTo_, path);
+            engine_.setWearableDirectory(path);
+        });
     }
 
     std::string Name() override { return engine::valueOf<"Name">(*published_); }
@@ -103,17 +122,15 @@ class BusObjects::WearableObject final
     bool Connected() override { return engine::valueOf<"Connected">(*published_); }
 
     void Connected(const bool& connected) override {
-        answering(engine::readOnlyError, [&] {
-            engine_.attach({.connected = connected, .onCharger = engine_.attachment().onCharger});
-        });
+        answering(engine::readOnlyError,
+                  [&] { engine_.attach({.connected = connected, .onCharger = {}}); });
     }
 
     bool OnCharger() override { return engine::valueOf<"OnCharger">(*published_); }
 
     void OnCharger(const bool& onCharger) override {
-        answering(engine::readOnlyError, [&] {
-            engine_.attach({.connected = engine_.attachment().connected, .onCharger = onCharger});
-        });
+        answering(engine::readOnlyError,
+                  [&] { engine_.attach({.connected = {}, .onCharger = onCharger}); });
     }
 
     std::uint64_t Capacity() override { return engine::valueOf<"Capacity">(*published_); }
@@ -125,12 +142,13 @@ class BusObjects::WearableObject final
     void Refresh() override { engine_.refreshWearable(); }
 
     Engine& engine_;
+    const ObjectionTo& objectionTo_;
     Published<engine::WearableStatus> published_;
 };
 
-BusObjects::BusObjects(sdbus::IConnection& bus, Engine& engine)
-    : engine_(std::make_unique<EngineObject>(bus, engine)),
-      wearable_(std::make_unique<WearableObject>(bus, engine)) {
+BusObjects::BusObjects(sdbus::IConnection& bus, Engine& engine, const ObjectionTo& objectionTo)
+    : engine_(std::make_unique<EngineObject>(bus, engine, objectionTo)),
+      wearable_(std::make_unique<WearableObject>(bus, engine, objectionTo)) {
     bus.addObjectManager(engine::managerPath, sdbus::floating_slot);
 }
 

@@ -1,6 +1,8 @@
 #pragma once
 
+#include <functional>
 #include <memory>
+#include <string>
 
 #include <sdbus-c++/sdbus-c++.h>
 
@@ -12,8 +14,11 @@ class Engine;
 /// bus loop's thread.
 class BusObjects {
   public:
-    /// Both outlive the objects.
-    BusObjects(sdbus::IConnection& bus, Engine& engine);
+    /// Says why the engine cannot work with a directory; an empty text where it can.
+    using ObjectionTo = std::function<std::string(const std::string& directory)>;
+
+    /// All of these outlive the objects.
+    BusObjects(sdbus::IConnection& bus, Engine& engine, const ObjectionTo& objectionTo);
     ~BusObjects();
 
     BusObjects(const BusObjects&) = delete;

@@ -1,118 +1,144 @@
 #include "quorl-syncd/daemon/LocalWearables.h"
 
 #include <filesystem>
+#include <mutex>
 #include <optional>
+#include <system_error>
 #include <utility>
 
-#include <poll.h>
-
 #include "quorl-syncd/daemon/Lifeline.h"
+#include "quorl-syncd/daemon/WearableWatch.h"
 #include "services/base/AtomicFile.h"
-#include "services/base/MountWatch.h"
-#include "services/base/RootWatch.h"
+#include "services/base/Errand.h"
 #include "services/wearable/UsageReader.h"
 
 namespace quorl::syncd {
 
 namespace {
 
-class LocalWearable : public WatchedWearable {
+/// What is known of a wearable. Shared with the threads that look at it.
+class Known {
   public:
-    LocalWearable(engine::BusLoop& loop, wearable::Wearable identity)
-        : loop_(loop), identity_(std::move(identity)), reader_(identity_) {}
+    explicit Known(wearable::Wearable identity) : identity_(std::move(identity)) {}
 
-    [[nodiscard]] const wearable::Wearable& identity() const override { return identity_; }
+    /// Once something was mounted there, a mere directory is not the wearable any more.
+    [[nodiscard]] wearable::Usage look() {
+        if (!identity().isEmbedded() && wearable::isMountPoint(identity().root)) {
+            noteMountPoint();
+        }
+        const auto now = identity();
+        const auto usage = readUsage(now);
+        if (now.isEmbedded()) {
+            noteAttachment(wearable::loadAttachment(open(now).get()));
+        }
+        return usage;
+    }
+
+    [[nodiscard]] wearable::Wearable identity() const {
+        const std::scoped_lock lock(mutex_);
+        return identity_;
+    }
+
+    [[nodiscard]] WatchedWearable::Answer
+    answerWith(const wearable::UsageReader::Answer& answer) const {
+        if (const auto* const unseen = std::get_if<wearable::Unseen>(&answer)) {
+            return *unseen;
+        }
+        const std::scoped_lock lock(mutex_);
+        return Sight{identity_, std::get<wearable::Usage>(answer), attachment_};
+    }
+
+    /// Gives back an empty text, or a sentence.
+    [[nodiscard]] std::string save(const wearable::Attachment& attachment) const {
+        try {
+            saveAttachment(open(identity()).get(), attachment);
+            return {};
+        } catch (const std::system_error& error) {
+            return "The wearable could not remember how it is attached: " + error.code().message() +
+                   ".";
+        }
+    }
+
+  private:
+    void noteMountPoint() {
+        const std::scoped_lock lock(mutex_);
+        identity_.isMountPoint = true;
+    }
+
+    void noteAttachment(const wearable::Attachment& attachment) {
+        const std::scoped_lock lock(mutex_);
+        attachment_ = attachment;
+    }
+
+    [[nodiscard]] static base::FileDescriptor open(const wearable::Wearable& wearable) {
+        return base::openRoot(wearable.root.c_str());
+    }
+
+    mutable std::mutex mutex_;
+    wearable::Wearable identity_;
+    wearable::Attachment attachment_;
+};
+
+class LocalWearable final : public WatchedWearable {
+  public:
+    LocalWearable(engine::BusLoop& loop, const wearable::Wearable& wearable,
+                  const WearablePort::Noticed& noticed)
+        : loop_(loop),
+          known_(std::make_shared<Known>(wearable)),
+          watch_(wearable.root,
+                 [mailbox = loop.mailbox(), tell = lifeline_.whileThere(noticed)](
+                     WearableNews news) { mailbox->post([tell, news] { tell(news); }); }),
+          reader_([known = known_] { return known->look(); }) {}
+
+    [[nodiscard]] wearable::Wearable identity() const override { return known_->identity(); }
 
     void look(Reply reply) override {
-        reader_.ask([&loop = loop_, reply = lifeline_.whileThere(std::move(reply))](
-                        const Answer& answer) { loop.post([reply, answer] { reply(answer); }); });
+        reader_.ask([this, reply = lifeline_.whileThere(std::move(reply))](
+                        const wearable::UsageReader::Answer& answer) {
+            loop_.post([reply, answer = known_->answerWith(answer)] { reply(answer); });
+        });
     }
 
-  protected:
-    [[nodiscard]] engine::BusLoop& loop() { return loop_; }
-
-    [[nodiscard]] base::FileDescriptor open() const {
-        return base::openRoot(identity_.root.c_str());
+    void save(const wearable::Attachment& attachment, Saved saved) override {
+        const auto tell = lifeline_.whileThere(std::move(saved));
+        try {
+            saving_.emplace(
+                [known = known_, attachment, tell,
+                 mailbox = loop_.mailbox()](const std::stop_token&) {
+                    mailbox->post([tell, problem = known->save(attachment)] { tell(problem); });
+                },
+                patience);
+        } catch (const std::system_error& error) {
+            const auto problem =
+                "The wearable could not remember how it is attached: " + error.code().message() +
+                ".";
+            loop_.post([tell, problem] { tell(problem); });
+        }
     }
 
   private:
+    static constexpr std::chrono::seconds patience{1};
+
     engine::BusLoop& loop_;
-    const wearable::Wearable identity_;
-    Lifeline lifeline_;
+    const Lifeline lifeline_;
+    const std::shared_ptr<Known> known_;
+    WearableWatch watch_;
     wearable::UsageReader reader_;
+    std::optional<base::Errand> saving_;
 };
 
-/// It cannot be plugged in or out, so there is nothing to notice.
-class EmbeddedWearable final : public LocalWearable {
-  public:
-    EmbeddedWearable(engine::BusLoop& loop, std::uint64_t capacity)
-        : LocalWearable(loop, wearable::Wearable::embedded(capacity)) {
-        std::filesystem::create_directories(identity().root);
-    }
-
-    [[nodiscard]] wearable::Attachment attachment() override {
-        return wearable::loadAttachment(open().get());
-    }
-
-    void save(const wearable::Attachment& attachment) override {
-        wearable::saveAttachment(open().get(), attachment);
-    }
-};
-
-class MountedWearable final : public LocalWearable {
-  public:
-    MountedWearable(engine::BusLoop& loop, const std::string& directory,
-                    WearablePort::Noticed noticed)
-        : LocalWearable(loop, wearable::Wearable::mounted(directory)),
-          noticed_(std::move(noticed)),
-          rootWatch_(identity().root),
-          mountWatch_(identity().root) {
-        loop.watch(rootWatch_.descriptor(), POLLIN, [this] {
-            if (rootWatch_.take()) {
-                tell(WearableNews::MayHaveChanged);
-            }
-        });
-        loop.watch(mountWatch_.descriptor(), POLLPRI, [this] {
-            if (mountWatch_.take()) {
-                tell(wasMounted() ? WearableNews::WasMounted : WearableNews::MayHaveChanged);
-            }
-        });
-    }
-
-    ~MountedWearable() override {
-        loop().unwatch(rootWatch_.descriptor());
-        loop().unwatch(mountWatch_.descriptor());
-    }
-
-    [[nodiscard]] wearable::Attachment attachment() override { return {}; }
-
-    void save(const wearable::Attachment& /*attachment*/) override {}
-
-  private:
-    /// A directory that once was a mounted wearable is none without it.
-    [[nodiscard]] bool wasMounted() const {
-        return !identity().isMountPoint && wearable::isMountPoint(identity().root);
-    }
-
-    /// May destroy this object.
-    void tell(WearableNews news) const {
-        const auto noticed = noticed_;
-        noticed(news);
-    }
-
-    const WearablePort::Noticed noticed_;
-    base::RootWatch rootWatch_;
-    base::MountWatch mountWatch_;
-};
+std::filesystem::path normal(const std::filesystem::path& directory) {
+    const auto path = directory.lexically_normal();
+    return path.has_filename() ? path : path.parent_path();
+}
 
 } // namespace
 
 std::unique_ptr<WatchedWearable> LocalWearables::watch(const std::string& directory,
                                                        Noticed noticed) {
-    if (directory.empty()) {
-        return std::make_unique<EmbeddedWearable>(loop_, embeddedCapacity_);
-    }
-    return std::make_unique<MountedWearable>(loop_, directory, std::move(noticed));
+    const auto wearable = directory.empty() ? wearable::Wearable::embedded(embeddedCapacity_)
+                                            : wearable::Wearable{normal(directory), {}, false};
+    return std::make_unique<LocalWearable>(loop_, wearable, noticed);
 }
 
 } // namespace quorl::syncd

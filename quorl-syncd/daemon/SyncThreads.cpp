@@ -1,12 +1,17 @@
 #include "quorl-syncd/daemon/SyncThreads.h"
 
 #include <optional>
-#include <thread>
+#include <system_error>
 #include <utility>
 
 #include "quorl-syncd/daemon/Lifeline.h"
+#include "quorl-syncd/transfer/Sentences.h"
 #include "quorl-syncd/transfer/Sync.h"
 #include "quorl-syncd/transfer/device/PosixVolume.h"
+#include "quorl-syncd/transfer/pace/RateLimit.h"
+#include "quorl-syncd/transfer/pace/SteadyClock.h"
+#include "quorl-syncd/transfer/songs/PosixSongSource.h"
+#include "services/base/Errand.h"
 
 namespace quorl::syncd {
 
@@ -31,60 +36,108 @@ class ProgressFilter {
     std::optional<Clock::TimePoint> told_;
 };
 
-class SyncThread final : public RunningSync {
+/// Where a sync tells of itself, also when nobody listens any more.
+class Told {
   public:
-    SyncThread(engine::BusLoop& loop, SyncThreads::KeepAwake keepAwake, SyncPorts ports,
-               Order order, SyncRunner::Copied copied, SyncRunner::Ended ended)
-        : loop_(loop),
-          keepAwake_(std::move(keepAwake)),
-          ports_(std::move(ports)),
-          order_(std::move(order)),
-          copied_(std::move(copied)),
-          ended_(std::move(ended)),
-          thread_([this](const std::stop_token& stop) { run(stop); }) {}
+    Told(std::shared_ptr<engine::Mailbox> mailbox, SyncRunner::Copied copied,
+         SyncRunner::Ended ended)
+        : mailbox_(std::move(mailbox)), copied_(std::move(copied)), ended_(std::move(ended)) {}
 
-    void stop() override { thread_.request_stop(); }
+    void copied(const CopyProgress& progress) const {
+        mailbox_->post([copied = copied_, progress] { copied(progress); });
+    }
+
+    void ended(const Outcome& outcome) const {
+        mailbox_->post([ended = ended_, outcome] { ended(outcome); });
+    }
 
   private:
-    void run(const std::stop_token& stop) {
-        const auto awake = keepAwake_();
+    std::shared_ptr<engine::Mailbox> mailbox_;
+    SyncRunner::Copied copied_;
+    SyncRunner::Ended ended_;
+};
+
+} // namespace
+
+/// Shared with the threads of syncs that were left behind.
+struct SyncThreads::Means {
+    KeepAwake keepAwake;
+    PosixSongSource songs;
+    RateLimit rate;
+    const SteadyClock clock;
+
+    [[nodiscard]] SyncPorts ports() {
+        return {[](const auto& wearable) { return std::make_unique<PosixVolume>(wearable); }, songs,
+                rate, clock};
+    }
+
+    /// On the thread of a sync.
+    void run(const Order& order, const std::stop_token& stop, const Told& told) {
+        const auto awake = keepAwake();
         ProgressFilter filter;
-        Sync sync(order_, ports_, stop, [this, &filter](const CopyProgress& progress) {
-            if (filter.isWorthTelling(progress, ports_.clock.now())) {
-                post(copied_, progress);
+        Sync sync(order, ports(), stop, [&](const CopyProgress& progress) {
+            if (filter.isWorthTelling(progress, clock.now())) {
+                told.copied(progress);
             }
         });
-        post(ended_, sync.run());
+        told.ended(sync.run());
     }
+};
 
-    template <class Call, class Value>
-    void post(const Call& call, const Value& value) {
-        loop_.post([call = lifeline_.whileThere(call), value] { call(value); });
-    }
+namespace {
 
-    engine::BusLoop& loop_;
-    const SyncThreads::KeepAwake keepAwake_;
-    const SyncPorts ports_;
-    const Order order_;
-    const SyncRunner::Copied copied_;
-    const SyncRunner::Ended ended_;
+class SyncThread final : public RunningSync {
+  public:
+    /// Throws `std::system_error` where no thread can be started.
+    SyncThread(const std::function<void(const std::stop_token&, const Told&)>& run,
+               const std::shared_ptr<engine::Mailbox>& mailbox, const SyncRunner::Copied& copied,
+               const SyncRunner::Ended& ended)
+        : errand_([run,
+                   told = Told(mailbox, lifeline_.whileThere(copied), lifeline_.whileThere(ended))](
+                      const std::stop_token& stop) { run(stop, told); },
+                  patience) {}
+
+    void stop() override { errand_.stop(); }
+
+  private:
+    static constexpr std::chrono::seconds patience{2};
+
     const Lifeline lifeline_;
+    base::Errand errand_;
+};
 
-    // The last member, for it uses the others.
-    std::jthread thread_;
+class NoSync final : public RunningSync {
+  public:
+    NoSync(engine::BusLoop& loop, const SyncRunner::Ended& ended, const std::error_code& why) {
+        const Outcome outcome{Outcome::Kind::Failed, sentence(DeviceTrouble::Other, why), false,
+                              true};
+        loop.post([ended = lifeline_.whileThere(ended), outcome] { ended(outcome); });
+    }
+
+    void stop() override {}
+
+  private:
+    const Lifeline lifeline_;
 };
 
 } // namespace
 
 SyncThreads::SyncThreads(engine::BusLoop& loop, KeepAwake keepAwake)
-    : loop_(loop), keepAwake_(std::move(keepAwake)) {}
+    : loop_(loop), means_(std::make_shared<Means>(std::move(keepAwake))) {}
+
+SyncThreads::~SyncThreads() = default;
 
 std::unique_ptr<RunningSync> SyncThreads::begin(const Order& order, Copied copied, Ended ended) {
-    const SyncPorts ports{
-        [](const auto& wearable) { return std::make_unique<PosixVolume>(wearable); }, songs_, rate_,
-        clock_};
-    return std::make_unique<SyncThread>(loop_, keepAwake_, ports, order, std::move(copied),
-                                        std::move(ended));
+    const auto run = [means = means_, order](const std::stop_token& stop, const Told& told) {
+        means->run(order, stop, told);
+    };
+    try {
+        return std::make_unique<SyncThread>(run, loop_.mailbox(), copied, ended);
+    } catch (const std::system_error& error) {
+        return std::make_unique<NoSync>(loop_, ended, error.code());
+    }
 }
+
+void SyncThreads::setRateLimit(std::uint64_t bytesPerSecond) { means_->rate.set(bytesPerSecond); }
 
 } // namespace quorl::syncd

@@ -4,9 +4,6 @@
 #include <memory>
 
 #include "quorl-syncd/engine/ports/SyncRunner.h"
-#include "quorl-syncd/transfer/pace/RateLimit.h"
-#include "quorl-syncd/transfer/pace/SteadyClock.h"
-#include "quorl-syncd/transfer/songs/PosixSongSource.h"
 #include "services/engine/BusLoop.h"
 
 namespace quorl::syncd {
@@ -19,18 +16,18 @@ class SyncThreads final : public SyncRunner {
     using KeepAwake = std::function<std::shared_ptr<void>()>;
 
     SyncThreads(engine::BusLoop& loop, KeepAwake keepAwake);
+    ~SyncThreads() override;
 
     [[nodiscard]] std::unique_ptr<RunningSync> begin(const Order& order, Copied copied,
                                                      Ended ended) override;
 
-    void setRateLimit(std::uint64_t bytesPerSecond) override { rate_.set(bytesPerSecond); }
+    void setRateLimit(std::uint64_t bytesPerSecond) override;
 
   private:
+    struct Means;
+
     engine::BusLoop& loop_;
-    const KeepAwake keepAwake_;
-    PosixSongSource songs_;
-    RateLimit rate_;
-    const SteadyClock clock_;
+    const std::shared_ptr<Means> means_;
 };
 
 } // namespace quorl::syncd

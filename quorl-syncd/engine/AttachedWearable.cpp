@@ -1,10 +1,11 @@
 #include "quorl-syncd/engine/AttachedWearable.h"
 
-#include <system_error>
+#include <iostream>
 #include <utility>
 #include <variant>
 
 #include "quorl-syncd/engine/NotReady.h"
+#include "services/base/Utf8.h"
 
 namespace quorl::syncd {
 
@@ -12,31 +13,65 @@ AttachedWearable::AttachedWearable(WearablePort& port, Changed changed)
     : port_(port), changed_(std::move(changed)) {}
 
 void AttachedWearable::choose(const std::string& directory) {
-    auto watched = port_.watch(directory, [this](WearableNews news) { notice(news); });
-    attachment_ = watched->attachment();
-    watched_ = std::move(watched);
-    usage_.reset();
-    problem_ = "Looking for the wearable…";
+    watched_ = port_.watch(directory, [this](WearableNews news) { notice(news); });
+    identity_ = watched_->identity();
+    saved_.reset();
+    wished_ = {};
+    isSaving_ = false;
+    wasThere_ = false;
+    forget();
     refresh();
 }
 
 void AttachedWearable::refresh() {
-    watched_->look([this](const WatchedWearable::Answer& answer) { take(answer); });
+    watched_->look([this, asked = changes_](const WatchedWearable::Answer& answer) {
+        if (asked == changes_) {
+            take(answer);
+        }
+    });
 }
 
-void AttachedWearable::attach(const wearable::Attachment& attachment) {
-    if (!identity().isEmbedded()) {
+void AttachedWearable::attach(const AttachmentChange& change) {
+    if (!identity_.isEmbedded()) {
         throw NotReady("This wearable is a device; plug it in or out instead.");
     }
-    try {
-        watched_->save(attachment);
-    } catch (const std::system_error& error) {
-        throw NotReady("The wearable could not remember it: " + error.code().message() + ".");
+    wished_.connected = change.connected ? change.connected : wished_.connected;
+    wished_.onCharger = change.onCharger ? change.onCharger : wished_.onCharger;
+    save();
+}
+
+wearable::Attachment AttachedWearable::attachment() const {
+    const auto saved = saved_.value_or(wearable::Attachment());
+    return {wished_.connected.value_or(saved.connected),
+            wished_.onCharger.value_or(saved.onCharger)};
+}
+
+/// One at a time, so that of many wishes in a row only the last one is saved.
+void AttachedWearable::save() {
+    if (!saved_ || isSaving_ || *saved_ == attachment()) {
+        return;
     }
-    attachment_ = attachment;
+    isSaving_ = true;
+    watched_->save(attachment(), [this, saving = attachment()](const std::string& problem) {
+        wasSaved(saving, problem);
+    });
+}
+
+void AttachedWearable::wasSaved(const wearable::Attachment& attachment,
+                                const std::string& problem) {
+    isSaving_ = false;
+    if (problem.empty()) {
+        saved_ = attachment;
+        save();
+        return;
+    }
+    std::cerr << "quorl-syncd: " << base::printable(problem) << '\n';
+    wished_ = {};
+    changed_(Change::Figures);
 }
 
 void AttachedWearable::wasSent(const wearable::Selection& selection) {
+    ++changes_;
     if (usage_) {
         usage_->sent = selection;
     }
@@ -44,36 +79,56 @@ void AttachedWearable::wasSent(const wearable::Selection& selection) {
 
 engine::WearableStatus AttachedWearable::status() const {
     const auto usage = usage_.value_or(wearable::Usage());
-    return {identity().root,
+    const auto attached = attachment();
+    return {identity_.root,
             wearable::wearableName,
-            identity().isEmbedded(),
-            usage_ && attachment_.connected,
-            usage_ && attachment_.onCharger,
+            identity_.isEmbedded(),
+            usage_ && attached.connected,
+            usage_ && attached.onCharger,
             usage.capacity,
             usage.available,
             usage.songs};
 }
 
+void AttachedWearable::forget() {
+    ++changes_;
+    usage_.reset();
+    problem_ = {"Looking for the wearable…", false};
+    isLookedFor_ = true;
+}
+
 void AttachedWearable::notice(WearableNews news) {
-    switch (news) {
-    case WearableNews::MayHaveChanged:
-        refresh();
-        break;
-    case WearableNews::WasMounted:
-        changed_(Change::BecameAnother);
-        break;
+    if (news == WearableNews::MayHaveChanged) {
+        changed_(Change::Contents);
+        return;
     }
+    forget();
+    refresh();
+    changed_(Change::Figures);
 }
 
 void AttachedWearable::take(const WatchedWearable::Answer& answer) {
-    const bool wasThere = usage_.has_value();
-    if (const auto* const usage = std::get_if<wearable::Usage>(&answer)) {
-        usage_ = *usage;
-    } else {
-        usage_.reset();
-        problem_ = std::get<std::string>(answer);
+    isLookedFor_ = false;
+    if (const auto* const sight = std::get_if<Sight>(&answer)) {
+        changed_(takeSight(*sight));
+        return;
     }
-    changed_(usage_ && !wasThere ? Change::IsThereAgain : Change::Figures);
+    wasThere_ = false;
+    usage_.reset();
+    problem_ = std::get<wearable::Unseen>(answer);
+    changed_(Change::Figures);
+}
+
+AttachedWearable::Change AttachedWearable::takeSight(const Sight& sight) {
+    const bool isSame = std::exchange(wasThere_, true) && identity_ == sight.identity;
+    identity_ = sight.identity;
+    usage_ = sight.usage;
+    problem_ = {};
+    if (!saved_) {
+        saved_ = sight.attachment;
+        save();
+    }
+    return isSame ? Change::Figures : Change::IsThereAgain;
 }
 
 } // namespace quorl::syncd

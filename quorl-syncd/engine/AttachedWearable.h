@@ -10,14 +10,20 @@
 
 namespace quorl::syncd {
 
+/// What of an attachment is to become another one.
+struct AttachmentChange {
+    std::optional<bool> connected;
+    std::optional<bool> onCharger;
+};
+
 /// The wearable that the engine syncs to: what it is, how it is attached, and how it stood when it
 /// was last looked at.
 class AttachedWearable {
   public:
     enum class Change {
-        Figures,       ///< It was looked at.
-        IsThereAgain,  ///< It was looked at, and was not there before.
-        BecameAnother, ///< `choose` it anew, by its directory.
+        Figures,      ///< It was looked at, or is to be.
+        Contents,     ///< Somebody has changed what is on it, perhaps we: it may be refreshed.
+        IsThereAgain, ///< It was looked at, and was not there before, or was another one.
     };
 
     using Changed = std::function<void(Change)>;
@@ -33,32 +39,51 @@ class AttachedWearable {
     /// Has it looked at again.
     void refresh();
 
-    /// Throws `NotReady` for a mounted wearable, and where it cannot be remembered.
-    void attach(const wearable::Attachment& attachment);
+    /// Counts at once, and is saved on the wearable some time later; where that fails, what was
+    /// saved before counts again. Throws `NotReady` for a mounted wearable.
+    void attach(const AttachmentChange& change);
 
-    /// All songs of the selection are on it; known before it is looked at again.
+    /// All songs of the selection are on it; known before it is looked at again, which is due.
     void wasSent(const wearable::Selection& selection);
 
-    [[nodiscard]] const wearable::Wearable& identity() const { return watched_->identity(); }
+    [[nodiscard]] const wearable::Wearable& identity() const { return identity_; }
 
-    [[nodiscard]] const wearable::Attachment& attachment() const { return attachment_; }
+    [[nodiscard]] wearable::Attachment attachment() const;
 
     /// Nothing while it is not there or was not looked at yet; then the problem says why.
     [[nodiscard]] const std::optional<wearable::Usage>& usage() const { return usage_; }
 
-    [[nodiscard]] const std::string& problem() const { return problem_; }
+    [[nodiscard]] const wearable::Unseen& problem() const { return problem_; }
+
+    /// Whether there was no answer yet since it may have become another one.
+    [[nodiscard]] bool isLookedFor() const { return isLookedFor_; }
 
     [[nodiscard]] engine::WearableStatus status() const;
 
   private:
+    void forget();
     void notice(WearableNews news);
     void take(const WatchedWearable::Answer& answer);
+    [[nodiscard]] Change takeSight(const Sight& sight);
+    void save();
+    void wasSaved(const wearable::Attachment& attachment, const std::string& problem);
 
     WearablePort& port_;
     const Changed changed_;
-    wearable::Attachment attachment_;
+    wearable::Wearable identity_;
+
+    /// As it is on the wearable; nothing as long as that is not known.
+    std::optional<wearable::Attachment> saved_;
+    AttachmentChange wished_;
+    bool isSaving_ = false;
+
     std::optional<wearable::Usage> usage_;
-    std::string problem_;
+    wearable::Unseen problem_;
+    bool isLookedFor_ = false;
+    /// What was seen before the last change of it does not count.
+    unsigned changes_ = 0;
+    /// By the last answer.
+    bool wasThere_ = false;
 
     // The last member, for it calls this object.
     std::unique_ptr<WatchedWearable> watched_;

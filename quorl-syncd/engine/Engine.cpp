@@ -13,13 +13,28 @@ using namespace std::chrono_literals;
 /// The app writes several values for one choice.
 constexpr auto quietTime = 200ms;
 
+/// A sync that has not moved for so long may be waiting for a device that hangs.
+constexpr auto stallTime = 10s;
+
+/// Does what takes a thread or a file of this process.
+template <class Act>
+void requireMeans(const char* what, Act act) {
+    try {
+        act();
+    } catch (const std::system_error& error) {
+        throw NotReady(std::string(what) + " cannot be watched: " + error.code().message() +
+                       ". Close some programs, then try again.");
+    }
+}
+
 } // namespace
 
 Engine::Engine(const EnginePorts& ports, const EngineSettings& settings)
     : ports_(ports),
       wearable_(ports.wearables,
                 [this](AttachedWearable::Change change) { wearableDidChange(change); }),
-      retry_(settings.retryDelay) {
+      retry_(settings.retryDelay),
+      lookDelay_(settings.retryDelay) {
     status_.rateLimit = settings.rateLimit;
     setWearableDirectory(settings.wearableDirectory);
     setMusicFolder(settings.musicFolder);
@@ -42,6 +57,7 @@ void Engine::choicesDidChange() {
     givenUp_.reset();
     quietFrom_ = ports_.turns.now() + quietTime;
     ports_.turns.callAt(quietFrom_, [this] { consider(); });
+    refreshWearable();
     consider();
 }
 
@@ -68,9 +84,11 @@ void Engine::cancel() {
 
 void Engine::setMusicFolder(const std::string& path) {
     const auto folder = path.empty() ? ports_.music.usualFolder() : path;
-    music_ = ports_.music.watch(folder, [this](auto inventory) {
-        inventory_ = std::move(inventory);
-        consider();
+    requireMeans("The music folder", [&] {
+        music_ = ports_.music.watch(folder, [this](auto inventory) {
+            inventory_ = std::move(inventory);
+            consider();
+        });
     });
     status_.musicFolder = folder;
     inventory_.reset();
@@ -84,29 +102,35 @@ void Engine::setRateLimit(std::uint64_t bytesPerSecond) {
 }
 
 void Engine::setWearableDirectory(const std::string& path) {
-    wearable_.choose(path);
+    requireMeans("The wearable", [&] { wearable_.choose(path); });
     givenUp_.reset();
     tellLastResult();
     applyRateLimit();
     consider();
 }
 
-void Engine::attach(const wearable::Attachment& attachment) {
-    wearable_.attach(attachment);
+void Engine::attach(const AttachmentChange& change) {
+    wearable_.attach(change);
     givenUp_.reset();
     consider();
 }
 
 void Engine::wearableDidChange(AttachedWearable::Change change) {
     switch (change) {
-    case AttachedWearable::Change::BecameAnother:
-        setWearableDirectory(wearable_.identity().root);
+    case AttachedWearable::Change::Contents:
+        // It is looked at after a sync anyway, which changes much by itself.
+        if (!ongoing_) {
+            refreshWearable();
+        }
         return;
     case AttachedWearable::Change::IsThereAgain:
         givenUp_.reset();
         break;
     case AttachedWearable::Change::Figures:
         break;
+    }
+    if (!wearable_.usage() && !wearable_.isLookedFor()) {
+        lookAgainLater();
     }
     consider();
 }
@@ -122,7 +146,8 @@ Situation Engine::situation() const {
     now.wearable = wearable_.identity();
     now.attachment = wearable_.attachment();
     now.usage = wearable_.usage();
-    now.wearableProblem = wearable_.problem();
+    now.wearableProblem = wearable_.problem().sentence;
+    now.isWearableLookedFor = wearable_.isLookedFor();
     if (ongoing_) {
         now.running = {ongoing_->order.selection, ongoing_->order.wearable, ongoing_->charger};
     }
@@ -162,13 +187,44 @@ void Engine::begin(const wearable::Selection& selection) {
     const Order order{inventory_, selection, wearable_.identity()};
     auto session = ports_.announcer.beginSession(++sessions_, [this] { cancel(); });
     auto sync = ports_.syncs.begin(
-        order, [this](const CopyProgress& progress) { ongoing_->session->copied(progress); },
+        order,
+        [this](const CopyProgress& progress) {
+            ongoing_->hasMoved = true;
+            ongoing_->session->copied(progress);
+        },
         [this](const Outcome& outcome) { finish(outcome); });
     ongoing_ = Ongoing{order,
                        isRequested ? Charger::Ignored : Charger::Needed,
                        {},
+                       false,
                        std::move(session),
                        std::move(sync)};
+    noteStall(sessions_);
+}
+
+/// What hangs with its device cannot say so itself.
+void Engine::noteStall(std::uint64_t session) {
+    ports_.turns.callAt(ports_.turns.now() + stallTime, [this, session] {
+        if (!ongoing_ || session != sessions_) {
+            return;
+        }
+        const bool isStalled = !std::exchange(ongoing_->hasMoved, false);
+        if (isStalled && isHopeless()) {
+            abandon();
+            return;
+        }
+        if (isStalled) {
+            refreshWearable();
+        }
+        noteStall(session);
+    });
+}
+
+/// Whether nobody waits any more for the sync, which was asked to end.
+bool Engine::isHopeless() const {
+    return !ongoing_->whyStopped.empty() &&
+           (wearable_.problem().isSilence ||
+            ongoing_->order.wearable.root != wearable_.identity().root);
 }
 
 void Engine::stop(const std::string& why) {
@@ -176,6 +232,12 @@ void Engine::stop(const std::string& why) {
         ongoing_->whyStopped = why;
     }
     ongoing_->sync->stop();
+}
+
+void Engine::abandon() {
+    conclude(false, ongoing_->whyStopped);
+    ongoing_.reset();
+    consider();
 }
 
 void Engine::finish(const Outcome& outcome) {
@@ -245,6 +307,19 @@ void Engine::tryAgainLater() {
         if (failed == sessions_) {
             givenUp_.reset();
             consider();
+        }
+    });
+}
+
+/// Not everything that is in the way tells when it is gone.
+void Engine::lookAgainLater() {
+    if (std::exchange(isLookDue_, true)) {
+        return;
+    }
+    ports_.turns.callAt(ports_.turns.now() + lookDelay_, [this] {
+        isLookDue_ = false;
+        if (!wearable_.usage()) {
+            refreshWearable();
         }
     });
 }

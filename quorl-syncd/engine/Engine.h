@@ -35,7 +35,7 @@ class Engine {
     /// `choicesDidChange`.
     Engine(const EnginePorts& ports, const EngineSettings& settings);
 
-    /// Ends a running sync in order, and waits for that.
+    /// Ends a running sync in order, and waits for that as long as its device answers.
     ~Engine();
 
     Engine(const Engine&) = delete;
@@ -51,16 +51,15 @@ class Engine {
     void startNow();
     void cancel();
 
-    /// Throws `std::system_error` where no more folders can be watched.
+    /// The next two take a directory that need not be there. They throw `NotReady` where the
+    /// process has no more threads or files for it; then all is as it was.
     void setMusicFolder(const std::string& path);
     void setRateLimit(std::uint64_t bytesPerSecond);
-    /// Throws `std::filesystem::filesystem_error` or `std::system_error` where the embedded one
-    /// cannot be made.
     void setWearableDirectory(const std::string& path);
-    /// Throws `NotReady` for a mounted wearable, and where it cannot be remembered.
-    void attach(const wearable::Attachment& attachment);
+    /// Throws `NotReady` for a mounted wearable.
+    void attach(const AttachmentChange& change);
 
-    [[nodiscard]] const wearable::Attachment& attachment() const { return wearable_.attachment(); }
+    [[nodiscard]] wearable::Attachment attachment() const { return wearable_.attachment(); }
 
     void refreshWearable() { wearable_.refresh(); }
 
@@ -70,6 +69,8 @@ class Engine {
         Order order;
         Charger charger;
         std::string whyStopped;
+        /// Since that was last looked at.
+        bool hasMoved = false;
         std::unique_ptr<SessionReport> session;
         std::unique_ptr<RunningSync> sync;
     };
@@ -77,13 +78,17 @@ class Engine {
     [[nodiscard]] Situation situation() const;
     void consider();
     void begin(const wearable::Selection& selection);
+    void noteStall(std::uint64_t session);
     void stop(const std::string& why);
+    [[nodiscard]] bool isHopeless() const;
+    void abandon();
     void finish(const Outcome& outcome);
     [[nodiscard]] std::string remember(const Order& order);
     void conclude(bool success, const std::string& message);
     void putOff(const wearable::Selection& selection, const std::string& why);
     void keepResult(const std::string& wearable, bool success, const std::string& message);
     void tryAgainLater();
+    void lookAgainLater();
 
     void wearableDidChange(AttachedWearable::Change change);
     void applyRateLimit();
@@ -98,6 +103,8 @@ class Engine {
     bool isStartRequested_ = false;
     std::optional<wearable::Selection> givenUp_;
     RetryDelay retry_;
+    const std::chrono::seconds lookDelay_;
+    bool isLookDue_ = false;
     Clock::TimePoint quietFrom_;
     std::uint64_t sessions_ = 0;
 

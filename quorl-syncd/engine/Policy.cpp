@@ -22,6 +22,9 @@ bool isChargerNeeded(const Situation& now) {
     return now.running ? now.running->charger == Charger::Needed : !now.isStartRequested;
 }
 
+/// A sync that is under way finds out by itself whether its wearable is still there.
+bool isWaitingForAnswer(const Situation& now) { return now.running && now.isWearableLookedFor; }
+
 /// The first one that is there is told.
 constexpr std::array obstacles{
     Obstacle{[](const Situation& now) { return !now.choices.isSyncEnabled; },
@@ -30,7 +33,8 @@ constexpr std::array obstacles{
     Obstacle{[](const Situation& now) { return !now.isMusicRead; }, "Reading the music folder…"},
     Obstacle{[](const Situation& now) { return !now.revision; },
              "The chosen playlist is not in the music folder."},
-    Obstacle{[](const Situation& now) { return !now.usage; }, problemOfWearable},
+    Obstacle{[](const Situation& now) { return !now.usage && !isWaitingForAnswer(now); },
+             problemOfWearable},
     Obstacle{[](const Situation& now) { return !now.attachment.connected; },
              "The wearable is not connected."},
     Obstacle{[](const Situation& now) { return !now.attachment.onCharger && isChargerNeeded(now); },
@@ -100,12 +104,12 @@ bool isClaimToBeForgotten(const Situation& situation, const Decision& decision) 
 }
 
 std::string statusOf(const Situation& situation, const std::string& lastMessage) {
-    if (situation.running) {
-        return "Syncing music.";
-    }
     auto obstacle = obstacleIn(situation);
     if (!obstacle.empty()) {
         return obstacle;
+    }
+    if (situation.running) {
+        return "Syncing music.";
     }
     const auto wanted = wantedIn(situation);
     if (isSent(wanted, situation)) {
@@ -126,6 +130,9 @@ std::string_view syncStateOf(const Situation& situation) {
     }
     if (situation.running) {
         return "syncing";
+    }
+    if (situation.isWearableLookedFor) {
+        return "unknown";
     }
     return isSent(wantedIn(situation), situation) ? "synced" : "pending";
 }

@@ -38,6 +38,8 @@ struct Situation {
     /// says why.
     std::optional<wearable::Usage> usage;
     std::string wearableProblem;
+    /// It may have become another one, and there was no answer since.
+    bool isWearableLookedFor = false;
 
     std::optional<Running> running;
     /// Somebody has asked for a sync now, whether there is a reason for one or not.

@@ -19,7 +19,7 @@ void pass(const wearable::UsageReader::Answer& answer, const LSSManager::UsageHa
     if (const auto* usage = std::get_if<wearable::Usage>(&answer)) {
         reply(usageOf(*usage), nullptr);
     } else {
-        reply(nullptr, std::make_shared<NSError>(std::get<std::string>(answer)));
+        reply(nullptr, std::make_shared<NSError>(std::get<wearable::Unseen>(answer).sentence));
     }
 }
 

@@ -6,29 +6,13 @@
 #include <utility>
 
 #include <poll.h>
-#include <sys/eventfd.h>
 
 namespace quorl::engine {
 
 BusLoop::BusLoop(std::unique_ptr<sdbus::IConnection> bus)
-    : bus_(std::move(bus)),
-      wake_(eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK)),
-      isBusThere_(bus_ != nullptr) {
-    if (!wake_) {
-        throw std::system_error{errno, std::generic_category(), "eventfd"};
-    }
-    watch(wake_.get(), POLLIN, [this] {
-        eventfd_t count = 0;
-        static_cast<void>(eventfd_read(wake_.get(), &count));
-    });
-}
-
-void BusLoop::post(Work task) {
-    {
-        const std::scoped_lock lock(mutex_);
-        posted_.push_back(std::move(task));
-    }
-    static_cast<void>(eventfd_write(wake_.get(), 1));
+    : bus_(std::move(bus)), mailbox_(std::make_shared<Mailbox>()), isBusThere_(bus_ != nullptr) {
+    // What it is readable for is taken in each turn anyway.
+    watch(mailbox_->descriptor(), POLLIN, [] {});
 }
 
 void BusLoop::watch(int descriptor, short events, Work ready) {
@@ -104,12 +88,7 @@ void BusLoop::callReady(int descriptor) {
 }
 
 void BusLoop::callPosted() {
-    std::vector<Work> tasks;
-    {
-        const std::scoped_lock lock(mutex_);
-        tasks.swap(posted_);
-    }
-    for (const auto& task : tasks) {
+    for (const auto& task : mailbox_->take()) {
         task();
     }
 }

@@ -4,13 +4,12 @@
 #include <functional>
 #include <map>
 #include <memory>
-#include <mutex>
 #include <string>
-#include <vector>
+#include <utility>
 
 #include <sdbus-c++/sdbus-c++.h>
 
-#include "services/base/FileDescriptor.h"
+#include "services/engine/Mailbox.h"
 
 namespace quorl::engine {
 
@@ -18,7 +17,7 @@ namespace quorl::engine {
 /// threads hand over. All of them are served on the thread that is in `run`, one at a time.
 class BusLoop {
   public:
-    using Work = std::function<void()>;
+    using Work = Mailbox::Work;
     using Clock = std::chrono::steady_clock;
 
     /// @param bus nobody else runs a loop on it. Null: the loop serves everything else.
@@ -32,7 +31,10 @@ class BusLoop {
 
     /// Has `task` called by `run`, after those that were handed over before. Any thread; never
     /// waits. What was not called when the loop ended is destroyed with it.
-    void post(Work task);
+    void post(Work task) { mailbox_->post(std::move(task)); }
+
+    /// Where threads post that may outlive the loop.
+    [[nodiscard]] const std::shared_ptr<Mailbox>& mailbox() const { return mailbox_; }
 
     /// Has `ready` called while the descriptor shows one of these events of poll(2). `ready` may
     /// call `unwatch`.
@@ -64,12 +66,10 @@ class BusLoop {
     void callDue();
 
     const std::unique_ptr<sdbus::IConnection> bus_;
-    const base::FileDescriptor wake_;
+    const std::shared_ptr<Mailbox> mailbox_;
     std::map<int, Watched> watched_;
     std::multimap<Clock::time_point, Work> timers_;
 
-    std::mutex mutex_;
-    std::vector<Work> posted_;
     bool stopped_ = false;
     bool isBusThere_;
 };

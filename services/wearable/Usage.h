@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <optional>
+#include <string>
 
 #include "services/wearable/Manifest.h"
 #include "services/wearable/Wearable.h"
@@ -21,6 +22,16 @@ struct Usage {
     std::optional<Selection> sent;
 
     bool operator==(const Usage&) const = default;
+};
+
+/// Why a wearable could not be looked at.
+struct Unseen {
+    /// For the user.
+    std::string sentence;
+    /// It has not answered in time; it may be there all the same.
+    bool isSilence = false;
+
+    bool operator==(const Unseen&) const = default;
 };
 
 /// Looks at the wearable. Takes as long as the device takes; see UsageReader for callers that

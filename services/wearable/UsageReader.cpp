@@ -4,7 +4,11 @@
 #include <cstdint>
 #include <deque>
 #include <mutex>
+#include <system_error>
 #include <thread>
+#include <utility>
+
+#include "services/base/Errand.h"
 
 namespace quorl::wearable {
 
@@ -28,8 +32,18 @@ UsageReader::Answer answerOf(const UsageReader::Look& look) {
     try {
         return look();
     } catch (const std::exception& error) {
-        return std::string(error.what());
+        return Unseen{error.what(), false};
     }
+}
+
+std::string velora() { return std::string("The ") + wearableName; }
+
+Unseen silence() { return {velora() + " does not answer. Check its connection.", true}; }
+
+Unseen noThreadLeft() {
+    return {velora() + " cannot be looked at, for no more threads can be started. Close some "
+                       "programs.",
+            false};
 }
 
 } // namespace
@@ -52,6 +66,10 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
         }
         changed_.notify_one();
         clerk_.join();
+        const std::scoped_lock lock(mutex_);
+        if (lookers_ > 0) {
+            base::noteThreadLeftBehind();
+        }
     }
 
     void ask(Reply reply) {
@@ -89,7 +107,9 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
         if (questions_.empty()) {
             changed_.wait(lock);
         } else {
-            changed_.wait_until(lock, questions_.front().deadline);
+            // A copy: the question may be answered, and gone, before the wait is over.
+            const auto deadline = questions_.front().deadline;
+            changed_.wait_until(lock, deadline);
         }
     }
 
@@ -97,10 +117,9 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
     void giveUpOnLateOnes() {
         const auto now = Clock::now();
         while (!questions_.empty() && (closed_ || questions_.front().deadline <= now)) {
-            answered_.push_back({std::move(questions_.front().reply),
-                                 closed_ ? "The question was given up."
-                                         : "The " + std::string(wearableName) +
-                                               " does not answer. Check its connection."});
+            answered_.push_back(
+                {std::move(questions_.front().reply),
+                 closed_ ? Unseen{"The question was given up.", false} : silence()});
             questions_.pop_front();
         }
     }
@@ -110,15 +129,23 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
             if (lookers_ == mostLookers) {
                 return;
             }
-            if (!question.isLookedAt) {
-                question.isLookedAt = true;
-                ++lookers_;
-                // The thread keeps the questions, and with it `look_`, for as long as the device
-                // hangs.
-                std::thread{[questions = shared_from_this(), number = question.number] {
-                    questions->lookFor(number);
-                }}.detach();
+            if (!std::exchange(question.isLookedAt, true) && !sendLooker(question.number)) {
+                answerUpTo(question.number, noThreadLeft());
+                return;
             }
+        }
+    }
+
+    /// The thread keeps the questions, and with it `look_`, for as long as the device hangs.
+    [[nodiscard]] bool sendLooker(std::uint64_t number) {
+        try {
+            std::thread([questions = shared_from_this(), number] {
+                questions->lookFor(number);
+            }).detach();
+            ++lookers_;
+            return true;
+        } catch (const std::system_error&) {
+            return false;
         }
     }
 
@@ -127,14 +154,18 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
         {
             const std::scoped_lock lock(mutex_);
             --lookers_;
-            // Whoever asked before gets this answer too: an earlier look that ends later would tell
-            // what is no longer true.
-            while (!questions_.empty() && questions_.front().number <= number) {
-                answered_.push_back({std::move(questions_.front().reply), answer});
-                questions_.pop_front();
-            }
+            answerUpTo(number, answer);
         }
         changed_.notify_one();
+    }
+
+    /// Whoever asked before gets this answer too: an earlier look that ends later would tell what
+    /// is no longer true.
+    void answerUpTo(std::uint64_t number, const Answer& answer) {
+        while (!questions_.empty() && questions_.front().number <= number) {
+            answered_.push_back({std::move(questions_.front().reply), answer});
+            questions_.pop_front();
+        }
     }
 
     const Look look_;

@@ -17,8 +17,7 @@ namespace quorl::wearable {
 /// the device comes back. Any thread.
 class UsageReader {
   public:
-    /// The figures, or a sentence for the user that says why there are none.
-    using Answer = std::variant<Usage, std::string>;
+    using Answer = std::variant<Usage, Unseen>;
 
     /// Called exactly once, on a thread of the reader's own, one call at a time and in the order
     /// of the questions. Must not throw, nor destroy the reader.

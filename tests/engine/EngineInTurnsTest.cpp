@@ -76,10 +76,14 @@ struct FixedMusic final : MusicPort {
 
     [[nodiscard]] std::unique_ptr<WatchedMusic> watch(const std::string& /*folder*/,
                                                       Changed told) override {
+        if (isExhausted) {
+            throw std::system_error(EMFILE, std::generic_category());
+        }
         changed = std::move(told);
         return std::make_unique<Folder>(rescans);
     }
 
+    bool isExhausted = false;
     Changed changed;
     int rescans = 0;
 };
@@ -89,17 +93,12 @@ struct FixedWearables final : WearablePort {
         Watched(FixedWearables& port, wearable::Wearable what)
             : port_(port), what_(std::move(what)) {}
 
-        [[nodiscard]] const wearable::Wearable& identity() const override { return what_; }
+        [[nodiscard]] wearable::Wearable identity() const override { return what_; }
 
         void look(Reply reply) override { port_.replies.push_back(std::move(reply)); }
 
-        [[nodiscard]] wearable::Attachment attachment() override { return port_.attachment; }
-
-        void save(const wearable::Attachment& saved) override {
-            if (port_.isWriteProtected) {
-                throw std::system_error(EROFS, std::generic_category());
-            }
-            port_.attachment = saved;
+        void save(const wearable::Attachment& attachment, Saved saved) override {
+            port_.saves.push_back({attachment, std::move(saved)});
         }
 
         FixedWearables& port_;
@@ -108,12 +107,14 @@ struct FixedWearables final : WearablePort {
 
     [[nodiscard]] std::unique_ptr<WatchedWearable> watch(const std::string& directory,
                                                          Noticed told) override {
+        if (isExhausted) {
+            throw std::system_error(EAGAIN, std::generic_category());
+        }
         replies.clear();
         noticed = std::move(told);
         const auto capacity = directory.empty() ? std::optional(std::uint64_t{100}) : std::nullopt;
-        return std::make_unique<Watched>(
-            *this,
-            wearable::Wearable{directory.empty() ? "/embedded" : directory, capacity, isMounted});
+        identity = {directory.empty() ? "/embedded" : directory, capacity, false};
+        return std::make_unique<Watched>(*this, identity);
     }
 
     void answer(const WatchedWearable::Answer& answer) {
@@ -122,9 +123,35 @@ struct FixedWearables final : WearablePort {
         }
     }
 
+    void answer(const wearable::Usage& usage) { answer(Sight{identity, usage, attachment}); }
+
+    void answer(const char* problem) { answer(wearable::Unseen{problem, false}); }
+
+    /// It hangs.
+    void beSilent() { answer(wearable::Unseen{"It does not answer.", true}); }
+
+    void notice(WearableNews news) const {
+        const auto call = noticed;
+        call(news);
+    }
+
+    /// The oldest save has ended.
+    void saveOne(const std::string& problem = {}) {
+        const auto save = saves.front();
+        saves.erase(saves.begin());
+        attachment = problem.empty() ? save.attachment : attachment;
+        save.saved(problem);
+    }
+
+    struct Save {
+        wearable::Attachment attachment;
+        WatchedWearable::Saved saved;
+    };
+
+    wearable::Wearable identity;
+    bool isExhausted = false;
     wearable::Attachment attachment;
-    bool isWriteProtected = false;
-    bool isMounted = false;
+    std::vector<Save> saves;
     std::vector<WatchedWearable::Reply> replies;
     Noticed noticed;
 };
@@ -138,9 +165,10 @@ struct ManualSyncs final : SyncRunner {
         bool& flag_;
     };
 
-    [[nodiscard]] std::unique_ptr<RunningSync> begin(const Order& order, Copied /*told*/,
+    [[nodiscard]] std::unique_ptr<RunningSync> begin(const Order& order, Copied told,
                                                      Ended then) override {
         orders.push_back(order);
+        copied = std::move(told);
         ended = std::move(then);
         isStopped = false;
         return std::make_unique<Running>(isStopped);
@@ -155,6 +183,7 @@ struct ManualSyncs final : SyncRunner {
     }
 
     std::vector<Order> orders;
+    Copied copied;
     Ended ended;
     bool isStopped = false;
     std::uint64_t rate = 0;
@@ -397,13 +426,14 @@ TEST_F(EngineInTurns, TakesADirectoryForAnotherWearableOnceADeviceIsMountedThere
     EXPECT_TRUE(syncs_.isStopped);
     EXPECT_EQ(syncs_.rate, 0) << "only the embedded one is slowed down";
     syncs_.end(stopped);
-    EXPECT_THAT(bus_.ends, ElementsAre("- Looking for the wearable…"));
+    EXPECT_THAT(bus_.ends, ElementsAre("- Something else was chosen."));
     wearables_.answer(wearable::Usage{});
     ASSERT_EQ(syncs_.orders.size(), 2);
 
-    wearables_.isMounted = true;
-    const auto noticed = wearables_.noticed;
-    noticed(WearableNews::WasMounted);
+    wearables_.identity.isMountPoint = true;
+    wearables_.notice(WearableNews::MayBeAnother);
+    EXPECT_FALSE(syncs_.isStopped) << "it is not known yet";
+    wearables_.answer(wearable::Usage{});
     EXPECT_TRUE(syncs_.isStopped);
     syncs_.end(stopped);
     wearables_.answer(wearable::Usage{});
@@ -412,14 +442,153 @@ TEST_F(EngineInTurns, TakesADirectoryForAnotherWearableOnceADeviceIsMountedThere
     EXPECT_TRUE(syncs_.orders[2].wearable.isMountPoint);
 }
 
+TEST_F(EngineInTurns, KnowsNothingOfAWearableThatMayBeAnother) {
+    startSyncing();
+    syncs_.end(sent);
+    answerAsSent();
+    EXPECT_EQ(engine_->status().syncState, "synced");
+
+    engine_->refreshWearable();
+    const auto before = std::exchange(wearables_.replies, {});
+    wearables_.notice(WearableNews::MayBeAnother);
+    EXPECT_EQ(engine_->status().syncState, "unknown");
+    before.front()(Sight{
+        wearables_.identity, wearable::Usage{100, 50, 50, syncs_.orders.back().selection}, {}});
+    EXPECT_EQ(engine_->status().syncState, "unknown") << "it was seen before";
+    wearables_.answer(wearable::Usage{});
+
+    EXPECT_EQ(choices_.choices.lastSent, std::nullopt);
+    EXPECT_EQ(syncs_.orders.size(), 2);
+}
+
+TEST_F(EngineInTurns, DoesNotBeginAgainForWhatWasSeenBeforeTheEnd) {
+    startSyncing();
+    engine_->refreshWearable();
+    const auto before = std::exchange(wearables_.replies, {});
+    syncs_.end(sent);
+
+    before.front()(Sight{wearables_.identity, {}, {}});
+
+    EXPECT_EQ(syncs_.orders.size(), 1);
+    EXPECT_EQ(choices_.choices.lastSent, (SentPlaylist{7, 3}));
+}
+
+TEST_F(EngineInTurns, NoticesSongsThatSomebodyHasRemovedFromTheWearable) {
+    startSyncing();
+    wearables_.notice(WearableNews::MayHaveChanged);
+    EXPECT_THAT(wearables_.replies, IsEmpty()) << "the sync itself changes much";
+    syncs_.end(sent);
+    answerAsSent();
+
+    wearables_.notice(WearableNews::MayHaveChanged);
+    wearables_.answer(wearable::Usage{100, 60, 40, {}});
+
+    EXPECT_EQ(choices_.choices.lastSent, std::nullopt);
+    EXPECT_EQ(syncs_.orders.size(), 2);
+}
+
+TEST_F(EngineInTurns, LooksAgainWhenAChoiceIsMade) {
+    startSyncing();
+    syncs_.end(sent);
+    answerAsSent();
+
+    engine_->choicesDidChange();
+
+    EXPECT_EQ(wearables_.replies.size(), 1);
+}
+
+TEST_F(EngineInTurns, SaysThatTheWearableDoesNotAnswerAndGivesUpASyncThatHangs) {
+    startSyncing();
+    turns_.pass(10s);
+    wearables_.beSilent();
+    EXPECT_EQ(status(), "It does not answer.");
+    EXPECT_TRUE(syncs_.isStopped);
+    EXPECT_THAT(bus_.ends, IsEmpty()) << "it may still end in order";
+
+    turns_.pass(10s);
+
+    EXPECT_THAT(bus_.ends, ElementsAre("- It does not answer."));
+    EXPECT_EQ(status(), "It does not answer.");
+    turns_.pass(60s);
+    wearables_.answer(wearable::Usage{});
+    EXPECT_EQ(syncs_.orders.size(), 2) << "it is back";
+}
+
+TEST_F(EngineInTurns, LeavesASyncThatMovesAlone) {
+    startSyncing();
+    wearables_.replies.clear();
+    for (int seconds = 0; seconds < 100; ++seconds) {
+        turns_.pass(1s);
+        syncs_.copied({});
+    }
+    EXPECT_THAT(wearables_.replies, IsEmpty());
+}
+
+TEST_F(EngineInTurns, SyncsToAnotherWearableThoughTheOneBeforeHangs) {
+    startSyncing();
+    engine_->setWearableDirectory("/media/velora");
+    wearables_.answer(wearable::Usage{});
+    EXPECT_EQ(syncs_.orders.size(), 1);
+
+    turns_.pass(10s);
+
+    ASSERT_EQ(syncs_.orders.size(), 2);
+    EXPECT_EQ(syncs_.orders[1].wearable.root, "/media/velora");
+}
+
+TEST_F(EngineInTurns, SavesTheLastOfManySwitchesAndNoneThatIsAsItWas) {
+    start();
+    engine_->attach({.connected = {}, .onCharger = false});
+    EXPECT_FALSE(engine_->attachment().onCharger) << "though it was not looked at yet";
+    wearables_.attachment.connected = false;
+    wearables_.answer(wearable::Usage{});
+    EXPECT_EQ(engine_->attachment(), (wearable::Attachment{false, false}));
+    ASSERT_EQ(wearables_.saves.size(), 1);
+
+    for (int times = 0; times < 100; ++times) {
+        engine_->attach({.connected = times % 2 == 0, .onCharger = {}});
+    }
+    EXPECT_EQ(wearables_.saves.size(), 1) << "one at a time";
+    wearables_.saveOne();
+
+    EXPECT_THAT(wearables_.saves, IsEmpty()) << "it is as it was";
+    engine_->attach({.connected = true, .onCharger = true});
+    engine_->attach({.connected = true, .onCharger = true});
+    ASSERT_EQ(wearables_.saves.size(), 1);
+    wearables_.saveOne();
+    EXPECT_EQ(wearables_.attachment, wearable::Attachment());
+    EXPECT_THAT(wearables_.saves, IsEmpty());
+}
+
+TEST_F(EngineInTurns, TakesASwitchBackThatCannotBeSaved) {
+    startSyncing();
+    engine_->attach({.connected = {}, .onCharger = false});
+    EXPECT_FALSE(engine_->wearable().isOnCharger);
+
+    wearables_.saveOne("It is write-protected.");
+
+    EXPECT_TRUE(engine_->wearable().isOnCharger);
+    EXPECT_THAT(wearables_.saves, IsEmpty());
+}
+
 TEST_F(EngineInTurns, SaysWhyItCannotStartOrAttach) {
     start();
     EXPECT_THROW(engine_->startNow(), NotReady);
-    wearables_.isWriteProtected = true;
-    EXPECT_THROW(engine_->attach({true, false}), NotReady);
-    EXPECT_TRUE(engine_->attachment().onCharger);
     engine_->setWearableDirectory("/media/velora");
     EXPECT_THROW(engine_->attach({true, false}), NotReady);
+}
+
+TEST_F(EngineInTurns, KeepsTheFoldersThatItHasWhereOthersCannotBeWatched) {
+    startSyncing();
+    wearables_.isExhausted = true;
+    music_.isExhausted = true;
+
+    EXPECT_THROW(engine_->setWearableDirectory("/media/velora"), NotReady);
+    EXPECT_THROW(engine_->setMusicFolder("/srv/music"), NotReady);
+
+    EXPECT_EQ(engine_->wearable().directory, "/embedded");
+    EXPECT_EQ(engine_->status().musicFolder, "/home/Music");
+    EXPECT_FALSE(syncs_.isStopped);
 }
 
 TEST_F(EngineInTurns, EndsTheSyncThatIsUnderWayWhenItEnds) {

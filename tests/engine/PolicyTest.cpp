@@ -65,6 +65,11 @@ void losePlaylist(Situation& now) { now.revision.reset(); }
 
 void loseWearable(Situation& now) { now.usage.reset(); }
 
+void lookForWearable(Situation& now) {
+    now.usage.reset();
+    now.isWearableLookedFor = true;
+}
+
 void disconnect(Situation& now) { now.attachment.connected = false; }
 
 void takeOffCharger(Situation& now) { now.attachment.onCharger = false; }
@@ -152,6 +157,7 @@ INSTANTIATE_TEST_SUITE_P(
         Case{"music not read", {read, losePlaylist}, waits(readingMessage)},
         Case{"playlist gone", {losePlaylist}, waits(goneMessage)},
         Case{"wearable away", {loseWearable}, waits(awayMessage)},
+        Case{"wearable perhaps another one", {lookForWearable}, waits(awayMessage)},
         Case{"not connected", {disconnect}, waits(disconnectedMessage)},
         Case{"not on charger", {takeOffCharger}, waits(chargerMessage)}));
 
@@ -196,6 +202,7 @@ INSTANTIATE_TEST_SUITE_P(
         Case{"switched off", {run, switchOff}, stops(offMessage)},
         Case{"playlist gone", {run, losePlaylist}, stops(goneMessage)},
         Case{"wearable away", {run, loseWearable}, stops(awayMessage)},
+        Case{"wearable perhaps another one", {run, lookForWearable}, continues},
         Case{"not connected", {run, disconnect}, stops(disconnectedMessage)},
         Case{"taken off the charger", {run, takeOffCharger}, stops(chargerMessage)},
         Case{"begun without a charger", {runIgnoringCharger, takeOffCharger}, continues},
@@ -262,7 +269,8 @@ TEST(Status, TellsWhatIsDoneOrWhatIsWaitedFor) {
     EXPECT_EQ(statusWith({disconnect}), disconnectedMessage);
     EXPECT_EQ(statusWith({giveUp, disconnect}), disconnectedMessage);
     EXPECT_EQ(statusWith({run}), "Syncing music.");
-    EXPECT_EQ(statusWith({run, disconnect}), "Syncing music.");
+    EXPECT_EQ(statusWith({run, disconnect}), disconnectedMessage) << "it is being stopped";
+    EXPECT_EQ(statusWith({run, lookForWearable}), "Syncing music.");
 }
 
 TEST(Conclusions, FollowFromHowASyncEndedAndWhetherThatCouldBeRemembered) {

@@ -70,11 +70,18 @@ TEST(UsageReader, AnswersOnAThreadThatIsNotTheCallers) {
     EXPECT_NE(asked.thread(), std::this_thread::get_id());
 }
 
+TEST(UsageReader, AnswersQuestionAfterQuestion) {
+    UsageReader reader{[] { return Usage{7, 6, 5, {}}; }, forever};
+    for (int questions = 0; questions < 200; ++questions) {
+        EXPECT_EQ(std::get<Usage>(Asked{reader}.answer()).songs, 5);
+    }
+}
+
 TEST(UsageReader, AnswersWithASentenceWhenTheDeviceIsGone) {
     const TemporaryDirectory device;
     UsageReader reader{Wearable{device.path() / "gone", {}, false}};
 
-    EXPECT_THAT(std::get<std::string>(Asked{reader}.answer()),
+    EXPECT_THAT(std::get<Unseen>(Asked{reader}.answer()).sentence,
                 ::testing::HasSubstr("cannot be reached"));
 }
 
@@ -95,7 +102,8 @@ TEST(UsageReader, AnswersWithASentenceWhenTheDeviceGoesInTheMiddleOfTheQuestion)
     device.reset();
     removed.count_down();
 
-    EXPECT_THAT(std::get<std::string>(asked.answer()), ::testing::HasSubstr("cannot be reached"));
+    EXPECT_THAT(std::get<Unseen>(asked.answer()).sentence,
+                ::testing::HasSubstr("cannot be reached"));
 }
 
 TEST(UsageReader, NeverAnswersWithAnEarlierLookAfterALaterOne) {
@@ -134,7 +142,7 @@ TEST(UsageReader, AnswersEveryQuestionInTimeThoughTheDeviceHangs) {
     }
 
     for (const auto& asked : many) {
-        EXPECT_THAT(std::get<std::string>(asked->answer()),
+        EXPECT_THAT(std::get<Unseen>(asked->answer()).sentence,
                     ::testing::HasSubstr("does not answer"));
         EXPECT_EQ(asked->times(), 1);
     }
@@ -168,7 +176,7 @@ TEST(UsageReader, ThatIsDestroyedWhileTheDeviceHangsAnswersExactlyOnceAndDoesNot
 
     reader.reset();
 
-    EXPECT_TRUE(std::holds_alternative<std::string>(asked.answer()));
+    EXPECT_TRUE(std::holds_alternative<Unseen>(asked.answer()));
     device->release.release();
     EXPECT_EQ(asked.times(), 1);
 }

@@ -13,7 +13,8 @@ namespace quorl::syncd {
 /// A sync that is under way.
 class RunningSync {
   public:
-    /// Stops the sync where it has not ended, and waits for its end. No call comes any more.
+    /// Stops the sync where it has not ended, and waits for its end for some seconds from the first
+    /// call of `stop` on; one whose device hangs is left to itself. No call comes any more.
     virtual ~RunningSync() = default;
 
     /// Has it end soon, in order. Returns at once.
@@ -30,7 +31,8 @@ class SyncRunner {
 
     /// Begins a sync. `copied` is called in a later turn when it is known what there is to copy,
     /// then now and then, at the latest with each further song; `ended` is called once, as the
-    /// last, and may destroy the running sync. Neither comes before this has returned.
+    /// last, and may destroy the running sync. Neither comes before this has returned. A sync that
+    /// cannot be begun ends so, too.
     [[nodiscard]] virtual std::unique_ptr<RunningSync> begin(const Order& order, Copied copied,
                                                              Ended ended) = 0;
 

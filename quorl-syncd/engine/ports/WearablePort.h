@@ -11,34 +11,41 @@
 
 namespace quorl::syncd {
 
+/// How a wearable stood at one moment.
+struct Sight {
+    wearable::Wearable identity;
+    wearable::Usage usage;
+    /// What was last saved; the default where nothing was, and for a mounted device.
+    wearable::Attachment attachment;
+};
+
 /// A wearable that is being looked after, from construction to destruction.
 class WatchedWearable {
   public:
-    /// The figures, or a sentence for the user that says why there are none.
-    using Answer = std::variant<wearable::Usage, std::string>;
+    using Answer = std::variant<Sight, wearable::Unseen>;
     using Reply = std::function<void(const Answer&)>;
+    /// Is given an empty text, or a sentence that says why it could not be done.
+    using Saved = std::function<void(const std::string& problem)>;
 
     /// No call comes any more.
     virtual ~WatchedWearable() = default;
 
-    [[nodiscard]] virtual const wearable::Wearable& identity() const = 0;
+    /// As far as it is known without looking: whether something is mounted there is not.
+    [[nodiscard]] virtual wearable::Wearable identity() const = 0;
 
     /// Looks at the device. Returns at once; `reply` comes in a later turn, replies in the order of
     /// the questions. The figures are of a moment after the call.
     virtual void look(Reply reply) = 0;
 
-    /// What was last saved; the default where nothing was, and for a mounted device.
-    [[nodiscard]] virtual wearable::Attachment attachment() = 0;
-
-    /// Of the embedded wearable only. Returns once it outlives a loss of power. Throws
-    /// `std::system_error`.
-    virtual void save(const wearable::Attachment& attachment) = 0;
+    /// Of the embedded wearable only. Returns at once; `saved` comes in a later turn, once it
+    /// outlives a loss of power. Not to be called again before that.
+    virtual void save(const wearable::Attachment& attachment, Saved saved) = 0;
 };
 
 /// What was noticed of a wearable.
 enum class WearableNews {
-    MayHaveChanged, ///< It is to be looked at again.
-    WasMounted,     ///< What was a mere directory is a device: it is another wearable now.
+    MayHaveChanged, ///< Somebody has changed what is on it.
+    MayBeAnother,   ///< It was plugged in or out: nothing is known of it any more.
 };
 
 /// Wearables that can be reached from this machine.
@@ -49,9 +56,8 @@ class WearablePort {
     virtual ~WearablePort() = default;
 
     /// Begins to look after the wearable in this directory, which need not be there; empty for the
-    /// embedded one, which is made where it does not exist. `noticed` is called in turns of its
-    /// own, and may destroy the wearable. Throws `std::filesystem::filesystem_error` or
-    /// `std::system_error` where the embedded one cannot be made.
+    /// embedded one, which is made where it does not exist. Returns at once. `noticed` is called in
+    /// turns of its own. Throws `std::system_error` where no more threads can be started.
     [[nodiscard]] virtual std::unique_ptr<WatchedWearable> watch(const std::string& directory,
                                                                  Noticed noticed) = 0;
 };
