@@ -32,10 +32,12 @@ DeviceTrouble troubleOf(const std::error_code& error) {
         return DeviceTrouble::WriteProtected;
     case ENOENT:
     case ENODEV:
-    case ENOTDIR:
     case EIO:
     case ESTALE:
         return DeviceTrouble::Away;
+    case ENOTDIR:
+    case ELOOP:
+        return DeviceTrouble::Obstructed;
     default:
         return DeviceTrouble::Other;
     }
@@ -50,6 +52,10 @@ std::string sentence(DeviceTrouble trouble, const std::error_code& error) {
                ". Check that it is not write-protected.";
     case DeviceTrouble::Away:
         return velora() + " went away: " + error.message() + ". Connect it again.";
+    case DeviceTrouble::Obstructed:
+        return std::string("On the ") + wearable::wearableName + ", “" + wearable::musicDirectory +
+               "” or “" + wearable::ownDirectory +
+               "” is not a directory. Give it another name, or remove it.";
     case DeviceTrouble::Other:
         break;
     }
@@ -59,6 +65,10 @@ std::string sentence(DeviceTrouble trouble, const std::error_code& error) {
 std::string anotherProgramIsSyncing() {
     return std::string("Another program is syncing to this ") + wearable::wearableName +
            ". Wait until it is done, or end it.";
+}
+
+std::string notEnoughMemory() {
+    return velora() + " could not be synced, for there is not enough memory. Close some programs.";
 }
 
 std::string notEnoughSpace(std::uint64_t needed, std::uint64_t available) {

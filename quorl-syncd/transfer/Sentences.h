@@ -10,13 +10,15 @@
 namespace quorl::syncd {
 
 /// What is wrong with a device when an operation on it fails.
-enum class DeviceTrouble { Full, WriteProtected, Away, Other };
+enum class DeviceTrouble { Full, WriteProtected, Away, Obstructed, Other };
 
 [[nodiscard]] DeviceTrouble troubleOf(const std::error_code& error);
 
 [[nodiscard]] std::string sentence(DeviceTrouble trouble, const std::error_code& error);
 
 [[nodiscard]] std::string anotherProgramIsSyncing();
+
+[[nodiscard]] std::string notEnoughMemory();
 
 /// Both in bytes.
 [[nodiscard]] std::string notEnoughSpace(std::uint64_t needed, std::uint64_t available);

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <new>
 #include <span>
 #include <system_error>
 #include <utility>
@@ -77,6 +78,8 @@ Outcome Sync::run() {
         return {Kind::Stopped, "The sync was stopped.", false, false};
     } catch (const std::system_error& error) {
         return {Kind::Failed, sentence(troubleOf(error.code()), error.code()), false, true};
+    } catch (const std::bad_alloc&) {
+        return {Kind::Failed, notEnoughMemory(), false, true};
     } catch (const std::exception& error) {
         return {Kind::Failed, error.what(), false, true};
     }
@@ -249,7 +252,8 @@ Outcome Sync::outcome() const {
     if (plan_.problems.empty()) {
         return {Outcome::Kind::Sent, synced(plan_.songs.size()), false, false};
     }
-    return {Outcome::Kind::Failed, notAllSent(plan_.problems), true, false};
+    // A song that can be read again, or stays as it is, tells nobody.
+    return {Outcome::Kind::Failed, notAllSent(plan_.problems), true, true};
 }
 
 } // namespace quorl::syncd

@@ -3,6 +3,7 @@
 #include <thread>
 #include <utility>
 
+#include "services/base/Utf8.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Interface.h"
 #include "services/engine/Reducer.h"
@@ -87,6 +88,19 @@ class Client::Connection {
     using Action = std::function<void(std::function<void(const sdbus::Error*)> done)>;
 
     void request(Action action, Reply reply);
+
+    template <class State, PropertyName name>
+    void setPath(const char* object, const std::string& path, Reply&& reply) {
+        if (base::validUtf8(path) == path) {
+            setProperty<State, name>(object, path, std::move(reply));
+        } else {
+            refuse(base::printable(path) + " cannot be told to the sync engine, for its name is "
+                                           "not in UTF-8. Rename it.",
+                   std::move(reply));
+        }
+    }
+
+    void refuse(const std::string& why, Reply reply);
     void callMethod(const char* path, const char* interface, const char* method, Reply reply);
 
     template <class State, PropertyName name, class T>
@@ -233,6 +247,12 @@ void Client::Connection::request(Action action, Reply reply) {
     });
 }
 
+void Client::Connection::refuse(const std::string& why, Reply reply) {
+    request(
+        [why](const auto&) { throw sdbus::Error("org.freedesktop.DBus.Error.InvalidArgs", why); },
+        std::move(reply));
+}
+
 void Client::Connection::answer(std::uint64_t number, const std::string& problem) {
     if (const auto found = replies_.extract(number)) {
         found.mapped()(problem);
@@ -288,7 +308,7 @@ void Client::cancel(Reply reply) {
 }
 
 void Client::setMusicFolder(const std::string& path, Reply reply) {
-    connection_->setProperty<EngineStatus, "MusicFolder">(enginePath, path, std::move(reply));
+    connection_->setPath<EngineStatus, "MusicFolder">(enginePath, path, std::move(reply));
 }
 
 void Client::setRateLimit(std::uint64_t bytesPerSecond, Reply reply) {
@@ -297,7 +317,7 @@ void Client::setRateLimit(std::uint64_t bytesPerSecond, Reply reply) {
 }
 
 void Client::setWearableDirectory(const std::string& path, Reply reply) {
-    connection_->setProperty<WearableStatus, "Directory">(wearablePath, path, std::move(reply));
+    connection_->setPath<WearableStatus, "Directory">(wearablePath, path, std::move(reply));
 }
 
 void Client::setConnected(bool connected, Reply reply) {

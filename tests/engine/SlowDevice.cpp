@@ -15,8 +15,8 @@ SlowDevice::SlowDevice() {
     isMounted_ = mount("tmpfs", folder_.path().c_str(), "tmpfs", 0, "size=16m") == 0;
     watch_ = base::FileDescriptor{fanotify_init(FAN_CLASS_CONTENT | FAN_CLOEXEC, O_CLOEXEC)};
     if (!isMounted_ || !watch_ ||
-        fanotify_mark(watch_.get(), FAN_MARK_ADD | FAN_MARK_MOUNT, FAN_OPEN_PERM, AT_FDCWD,
-                      folder_.path().c_str()) != 0) {
+        fanotify_mark(watch_.get(), FAN_MARK_ADD | FAN_MARK_MOUNT, FAN_OPEN_PERM | FAN_ONDIR,
+                      AT_FDCWD, folder_.path().c_str()) != 0) {
         return;
     }
     end_ = base::FileDescriptor{eventfd(0, EFD_CLOEXEC)};

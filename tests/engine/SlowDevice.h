@@ -9,8 +9,8 @@
 
 namespace quorl::syncd::testing {
 
-/// A mounted file system on which every opening of a file can be held up. Wants the rights to mount
-/// and to watch; all that is held up goes on when it is destroyed.
+/// A mounted file system on which every opening of a file or a directory can be held up. Wants the
+/// rights to mount and to watch; all that is held up goes on when it is destroyed.
 class SlowDevice {
   public:
     SlowDevice();

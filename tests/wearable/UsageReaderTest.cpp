@@ -4,6 +4,7 @@
 
 #include <atomic>
 #include <future>
+#include <iostream>
 #include <latch>
 #include <semaphore>
 #include <thread>
@@ -11,6 +12,8 @@
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <unistd.h>
 
 #include "tests/base/TemporaryDirectory.h"
 
@@ -75,6 +78,24 @@ TEST(UsageReader, AnswersQuestionAfterQuestion) {
     for (int questions = 0; questions < 200; ++questions) {
         EXPECT_EQ(std::get<Usage>(Asked{reader}.answer()).songs, 5);
     }
+}
+
+/// In a process of its own, of an ordinary user, for whom alone threads run out.
+[[noreturn]] void askWithoutThreads() {
+    UsageReader reader{[] { return Usage{7, 6, 5, {}}; }, forever};
+    constexpr uid_t nobody = 65534;
+    const rlimit none{1, 1};
+    if ((geteuid() == 0 && setresuid(nobody, nobody, nobody) != 0) ||
+        setrlimit(RLIMIT_NPROC, &none) != 0) {
+        _exit(1);
+    }
+    std::cerr << std::get<Unseen>(Asked{reader}.answer()).sentence;
+    _exit(0);
+}
+
+TEST(UsageReader, AnswersWithASentenceWhenNoThreadIsLeft) {
+    EXPECT_EXIT(askWithoutThreads(), ::testing::ExitedWithCode(0),
+                "no more threads can be started");
 }
 
 TEST(UsageReader, AnswersWithASentenceWhenTheDeviceIsGone) {

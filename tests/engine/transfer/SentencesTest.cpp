@@ -30,10 +30,15 @@ TEST(Sentences, SayWhatIsWrongWithADeviceAndWhatToDo) {
                     AllOf(StartsWith("The Velora cannot be written to: "),
                           HasSubstr(std::strerror(number)), HasSubstr("write-protected")));
     }
-    for (const auto number : {ENOENT, ENODEV, ENOTDIR, EIO, ESTALE}) {
+    for (const auto number : {ENOENT, ENODEV, EIO, ESTALE}) {
         EXPECT_THAT(sentenceFor(number),
                     AllOf(StartsWith("The Velora went away: "), HasSubstr(std::strerror(number)),
                           HasSubstr("Connect it again.")));
+    }
+    for (const auto number : {ENOTDIR, ELOOP}) {
+        EXPECT_EQ(sentenceFor(number),
+                  "On the Velora, “Music” or “.quorl” is not a directory. Give "
+                  "it another name, or remove it.");
     }
     EXPECT_EQ(sentenceFor(EEXIST), "The Velora could not be synced: File exists.");
 }
