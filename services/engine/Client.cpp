@@ -1,5 +1,6 @@
 #include "services/engine/Client.h"
 
+#include <optional>
 #include <thread>
 #include <utility>
 
@@ -112,8 +113,23 @@ class Client::Connection {
     }
 
   private:
+    /// What a property is to become. Of many values in a row only the last one is sent, once the
+    /// engine has answered to the one before.
+    struct Setting {
+        const char* path;
+        const char* interface;
+        const char* property;
+        bool isUnderWay = false;
+        std::optional<sdbus::Variant> value = {};
+        /// Of all who want the value, or one that it has replaced.
+        std::vector<Reply> replies = {};
+    };
+
     void set(const char* path, const char* interface, const char* property, sdbus::Variant value,
              Reply reply);
+    void send(Setting& setting);
+    void wasSent(Setting& setting, const std::vector<Reply>& replies, const std::string& problem);
+    void perform(const Action& action, Reply reply);
     void work();
     void open();
     void fetchState();
@@ -133,7 +149,10 @@ class Client::Connection {
     std::unique_ptr<sdbus::IProxy> manager_;
     std::map<std::string, std::unique_ptr<sdbus::IProxy>> proxies_;
     std::map<std::uint64_t, Reply> replies_;
+    /// By the name of the property.
+    std::map<std::string, Setting> settings_;
     std::uint64_t lastRequest_ = 0;
+    bool isClosed_ = false;
     /// Which answer about all objects is the one that counts.
     std::uint64_t fetches_ = 0;
 
@@ -164,6 +183,7 @@ void Client::Connection::work() {
         answerAll(busProblem_);
         static_cast<void>(loop_.run());
     }
+    isClosed_ = true;
     answerAll("The connection to the sync engine was closed.");
     // Before the bus that they belong to.
     proxies_.clear();
@@ -230,21 +250,25 @@ void Client::Connection::onOwnerChanged(sdbus::Message& message) {
 
 void Client::Connection::request(Action action, Reply reply) {
     loop_.post([this, action = std::move(action), reply = std::move(reply)]() mutable {
-        const auto number = ++lastRequest_;
-        replies_.emplace(
-            number, reply ? std::move(reply) : [](const std::string&) {});
-        if (!busProblem_.empty()) {
-            answer(number, busProblem_);
-            return;
-        }
-        try {
-            action([this, number](const sdbus::Error* error) {
-                answer(number, error == nullptr ? std::string() : error->getMessage());
-            });
-        } catch (const sdbus::Error& error) {
-            answer(number, error.getMessage());
-        }
+        perform(action, std::move(reply));
     });
+}
+
+void Client::Connection::perform(const Action& action, Reply reply) {
+    const auto number = ++lastRequest_;
+    replies_.emplace(
+        number, reply ? std::move(reply) : [](const std::string&) {});
+    if (!busProblem_.empty()) {
+        answer(number, busProblem_);
+        return;
+    }
+    try {
+        action([this, number](const sdbus::Error* error) {
+            answer(number, error == nullptr ? std::string() : error->getMessage());
+        });
+    } catch (const sdbus::Error& error) {
+        answer(number, error.getMessage());
+    }
 }
 
 void Client::Connection::refuse(const std::string& why, Reply reply) {
@@ -280,18 +304,50 @@ void Client::Connection::callMethod(const char* path, const char* interface, con
 
 void Client::Connection::set(const char* path, const char* interface, const char* property,
                              sdbus::Variant value, Reply reply) {
-    request(
-        [this, path, interface, property, value = std::move(value)](auto done) {
-            auto& proxy = proxies_[path];
+    loop_.post([this, path, interface, property, value = std::move(value),
+                reply = std::move(reply)]() mutable {
+        auto& setting =
+            settings_.try_emplace(property, Setting{path, interface, property}).first->second;
+        setting.value = std::move(value);
+        setting.replies.push_back(std::move(reply));
+        if (!setting.isUnderWay) {
+            send(setting);
+        }
+    });
+}
+
+void Client::Connection::send(Setting& setting) {
+    setting.isUnderWay = true;
+    perform(
+        [this, &setting, value = *std::exchange(setting.value, std::nullopt)](auto done) {
+            auto& proxy = proxies_[setting.path];
             if (!proxy) {
-                proxy = sdbus::createProxy(loop_.bus(), name_, path);
+                proxy = sdbus::createProxy(loop_.bus(), name_, setting.path);
             }
             proxy->callMethodAsync("Set")
                 .onInterface(propertiesInterface)
-                .withArguments(std::string(interface), std::string(property), value)
+                .withArguments(std::string(setting.interface), std::string(setting.property), value)
                 .uponReplyInvoke(std::move(done));
         },
-        std::move(reply));
+        [this, &setting, replies = std::exchange(setting.replies, {})](const std::string& problem) {
+            wasSent(setting, replies, problem);
+        });
+}
+
+void Client::Connection::wasSent(Setting& setting, const std::vector<Reply>& replies,
+                                 const std::string& problem) {
+    setting.isUnderWay = false;
+    for (const auto& reply : replies) {
+        if (reply) {
+            reply(problem);
+        }
+    }
+    if (isClosed_ && setting.value) {
+        setting.value.reset();
+        wasSent(setting, std::exchange(setting.replies, {}), problem);
+    } else if (setting.value) {
+        send(setting);
+    }
 }
 
 Client::Client(Listener listener, std::string name)

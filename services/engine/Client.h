@@ -17,8 +17,10 @@ class Client {
     /// which it happened. Must not throw, nor destroy the client.
     using Listener = std::function<void(const Event&)>;
 
-    /// Called exactly once on the client's own thread: with an empty text, or with a sentence that
-    /// says why it was not done. Must not throw, nor destroy the client.
+    /// Of many settings of one property in a row only the last one reaches the engine, and its
+    /// reply is made to all of them. Called exactly once on the client's own thread: with an empty
+    /// text, or with a sentence that says why it was not done. Must not throw, nor destroy the
+    /// client.
     using Reply = std::function<void(const std::string& problem)>;
 
     /// Connects in the background.

@@ -2,6 +2,8 @@
 
 #include <csignal>
 #include <fstream>
+#include <set>
+#include <thread>
 
 #include <sdbus-c++/sdbus-c++.h>
 
@@ -82,6 +84,57 @@ TEST_F(Client, MakesEveryReplyExactlyOnceAlsoWhenItIsDestroyedBefore) {
         }
     }
     EXPECT_EQ(replies, 50);
+}
+
+TEST_F(Client, SendsTheLastOfManySettingsAndAnswersThemAllAlsoWhenItIsDestroyed) {
+    start();
+    std::atomic<int> replies = 0;
+    {
+        Recorder brief;
+        for (int request = 1; request <= 500; ++request) {
+            brief.client().setRateLimit(static_cast<std::uint64_t>(request),
+                                        [&](const std::string&) { ++replies; });
+        }
+    }
+    EXPECT_EQ(replies, 500);
+    for (int request = 0; request < 500; ++request) {
+        recorder_.client().setRateLimit(static_cast<std::uint64_t>(request));
+    }
+    EXPECT_EQ(recorder_.ask(&engine::Client::setRateLimit, 7), "");
+    recorder_.awaitState([](const auto& state) { return state.engine.rateLimit == 7; });
+    std::set<std::uint64_t> seen;
+    for (const auto& event : recorder_.all()) {
+        seen.insert(event.state->engine.rateLimit);
+    }
+    EXPECT_LT(seen.size(), 100) << "a value for each turn of the bus, not for each wish";
+}
+
+/// An engine that does not stop talking.
+class TalkativeEngine {
+  public:
+    TalkativeEngine() {
+        bus_->requestName(engine::busName);
+        thread_ = std::jthread([this](const std::stop_token& stop) {
+            while (!stop.stop_requested()) {
+                object_->emitSignal("Noise").onInterface("org.quorl.Velora.Sync.Engine");
+            }
+        });
+    }
+
+  private:
+    std::unique_ptr<sdbus::IConnection> bus_ = sdbus::createSessionBusConnection();
+    std::unique_ptr<sdbus::IObject> object_ = sdbus::createObject(*bus_, engine::enginePath);
+    std::jthread thread_;
+};
+
+TEST_F(Client, LeavesAnEngineThatDoesNotStopTalking) {
+    const TalkativeEngine engine;
+    std::atomic<int> replies = 0;
+    {
+        Recorder brief;
+        brief.client().setRateLimit(1, [&](const std::string&) { ++replies; });
+    }
+    EXPECT_EQ(replies, 1);
 }
 
 TEST_F(Client, SaysThatTheBusIsGoneAndStillAnswers) {
