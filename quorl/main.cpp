@@ -6,6 +6,7 @@
 #include "quorl/reports/StatusReport.h"
 #include "quorl/terminal/TerminalMode.h"
 #include "quorl/window/WindowMode.h"
+#include "services/base/Errand.h"
 
 namespace quorl {
 
@@ -37,7 +38,8 @@ int main(int argc, char** argv) {
         return static_cast<int>(*code);
     }
     try {
-        return static_cast<int>(quorl::run(argv[0], std::get<quorl::Options>(parsed)));
+        const auto code = quorl::run(argv[0], std::get<quorl::Options>(parsed));
+        return quorl::base::endOfProgram(static_cast<int>(code));
     } catch (const std::exception& error) {
         std::cerr << "quorl: " << error.what() << ". Close some programs, then try again.\n";
         return static_cast<int>(quorl::ExitCode::Failure);

@@ -10,6 +10,7 @@
 #include "quorl-syncd/daemon/WearableWatch.h"
 #include "services/base/AtomicFile.h"
 #include "services/base/Errand.h"
+#include "services/wearable/Lookout.h"
 #include "services/wearable/UsageReader.h"
 
 namespace quorl::syncd {
@@ -19,25 +20,19 @@ namespace {
 /// What is known of a wearable. Shared with the threads that look at it.
 class Known {
   public:
-    explicit Known(wearable::Wearable identity) : identity_(std::move(identity)) {}
+    explicit Known(const wearable::Wearable& wearable) : lookout_(wearable) {}
 
-    /// Once something was mounted there, a mere directory is not the wearable any more.
     [[nodiscard]] wearable::Usage look() {
-        if (!identity().isEmbedded() && wearable::isMountPoint(identity().root)) {
-            noteMountPoint();
-        }
-        const auto now = identity();
-        const auto usage = readUsage(now);
-        if (now.isEmbedded()) {
-            noteAttachment(wearable::loadAttachment(open(now).get()));
+        const auto usage = lookout_.look();
+        if (identity().isEmbedded()) {
+            const auto attachment = wearable::loadAttachment(open(identity()).get());
+            const std::scoped_lock lock(mutex_);
+            attachment_ = attachment;
         }
         return usage;
     }
 
-    [[nodiscard]] wearable::Wearable identity() const {
-        const std::scoped_lock lock(mutex_);
-        return identity_;
-    }
+    [[nodiscard]] wearable::Wearable identity() const { return lookout_.wearable(); }
 
     [[nodiscard]] WatchedWearable::Answer
     answerWith(const wearable::UsageReader::Answer& answer) const {
@@ -45,7 +40,7 @@ class Known {
             return *unseen;
         }
         const std::scoped_lock lock(mutex_);
-        return Sight{identity_, std::get<wearable::Usage>(answer), attachment_};
+        return Sight{identity(), std::get<wearable::Usage>(answer), attachment_};
     }
 
     /// Gives back an empty text, or a sentence.
@@ -60,22 +55,12 @@ class Known {
     }
 
   private:
-    void noteMountPoint() {
-        const std::scoped_lock lock(mutex_);
-        identity_.isMountPoint = true;
-    }
-
-    void noteAttachment(const wearable::Attachment& attachment) {
-        const std::scoped_lock lock(mutex_);
-        attachment_ = attachment;
-    }
-
     [[nodiscard]] static base::FileDescriptor open(const wearable::Wearable& wearable) {
         return base::openRoot(wearable.root.c_str());
     }
 
+    wearable::Lookout lookout_;
     mutable std::mutex mutex_;
-    wearable::Wearable identity_;
     wearable::Attachment attachment_;
 };
 

@@ -8,7 +8,7 @@ namespace {
 
 wearable::Wearable wearableOf(const Places& places) {
     return places.wearable.empty() ? wearable::Wearable::embedded()
-                                   : wearable::Wearable::mounted(places.wearable);
+                                   : wearable::Wearable{places.wearable, {}, false};
 }
 
 } // namespace

@@ -1,8 +1,10 @@
 #include "quorl/reports/StatusReport.h"
 
 #include <algorithm>
-#include <future>
+#include <chrono>
+#include <condition_variable>
 #include <iostream>
+#include <mutex>
 #include <optional>
 
 #include <nlohmann/json.hpp>
@@ -28,17 +30,23 @@ bool isAnswer(const engine::Event& event) {
     return !event.state->isThere || event.state->engine.syncState != engine::syncUnknown;
 }
 
-/// Waits for what the engine has to tell, or for what there is to tell about it.
-engine::Event askEngine() {
-    std::promise<engine::Event> answer;
-    bool isAnswered = false; // the client's thread only
+/// Waits for what the engine has to tell, or for what there is to tell about it; where it does not
+/// know more after a while, for what it has told. Nothing where it does not answer.
+std::optional<engine::Event> askEngine() {
+    constexpr std::chrono::seconds patience{15};
+    std::mutex mutex;
+    std::condition_variable answered;
+    std::optional<engine::Event> answer;
     const engine::Client client([&](const engine::Event& event) {
-        if (!isAnswered && isAnswer(event)) {
-            isAnswered = true;
-            answer.set_value(event);
+        const std::scoped_lock lock(mutex);
+        if (!answer || !isAnswer(*answer)) {
+            answer = event;
+            answered.notify_one();
         }
     });
-    return answer.get_future().get();
+    std::unique_lock lock(mutex);
+    answered.wait_for(lock, patience, [&answer] { return answer && isAnswer(*answer); });
+    return answer;
 }
 
 Choice choiceOf(const engine::EngineStatus& engine) {
@@ -124,7 +132,13 @@ void printText(const engine::EngineState& state, const Choice& choice) {
 } // namespace
 
 ExitCode printStatus(const Options& options) {
-    const auto answer = askEngine();
+    const auto asked = askEngine();
+    if (!asked) {
+        std::cerr
+            << "quorl: The sync engine does not answer. End quorl-syncd, then start it again.\n";
+        return ExitCode::Failure;
+    }
+    const auto& answer = *asked;
     if (answer.kind == engine::Event::Kind::BusDidVanish) {
         std::cerr << "quorl: " << base::printable(answer.message) << '\n';
         return ExitCode::Failure;

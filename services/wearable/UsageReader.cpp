@@ -9,6 +9,7 @@
 #include <utility>
 
 #include "services/base/Errand.h"
+#include "services/wearable/Lookout.h"
 
 namespace quorl::wearable {
 
@@ -182,7 +183,7 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
 };
 
 UsageReader::UsageReader(const Wearable& wearable)
-    : UsageReader{[wearable] { return readUsage(wearable); }} {}
+    : UsageReader{[lookout = std::make_shared<Lookout>(wearable)] { return lookout->look(); }} {}
 
 UsageReader::UsageReader(Look look, std::chrono::milliseconds patience)
     : questions_(std::make_shared<Questions>(std::move(look), patience)) {

@@ -29,6 +29,7 @@ class UsageReader {
 
     static constexpr std::chrono::seconds usualPatience{10};
 
+    /// @param wearable whether something is mounted there is found out.
     explicit UsageReader(const Wearable& wearable);
 
     /// @param patience how long a question waits for `look` until it is answered with an error.
