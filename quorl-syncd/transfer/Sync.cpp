@@ -159,12 +159,19 @@ void Sync::beginChanges(Device& device) {
     for (const auto& [name, file] : leftovers_) {
         device.removeMusic(name);
     }
-    if (room_ == Room::EnoughWithoutUnwanted) {
+    if (removesSongsFirst()) {
         removePlaylist(device);
         device.settle();
         ledger_->playlistIsGone();
     }
     removeStrays(device);
+}
+
+/// Whether what is removed at the beginning may be named by the playlist. What has a hash was
+/// there, complete; an earlier sync may have ended when it was about to remove it.
+bool Sync::removesSongsFirst() const {
+    const auto wasThere = [](const Entry& entry) { return !entry.hash.empty(); };
+    return room_ == Room::EnoughWithoutUnwanted || std::ranges::any_of(plan_.useless, wasThere);
 }
 
 void Sync::announce() {

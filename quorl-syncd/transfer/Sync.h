@@ -43,6 +43,7 @@ class Sync {
     void requireRoom(Device& device);
     [[nodiscard]] bool isDone() const;
     void beginChanges(Device& device);
+    [[nodiscard]] bool removesSongsFirst() const;
     void announce();
     void copySongs(Device& device);
     void writePlaylist(Device& device);
