@@ -9,14 +9,16 @@ namespace {
 using namespace preferences;
 
 /// Calls `use` with the stored preference that stands for `preference`: both are in the order of
-/// the schema.
+/// the schema, which comes before all others.
 template <class Use>
 auto with(SyncPreference preference, Use use) {
     std::optional<decltype(use(assetSyncEnabled))> result;
     auto place = static_cast<int>(preference);
-    forEachPreference([&](const auto& stored) {
-        if (place-- == 0) {
-            result.emplace(use(stored));
+    forEachPreference([&]<class T>(const Preference<T>& stored) {
+        if constexpr (!std::is_same_v<T, std::string>) {
+            if (place-- == 0) {
+                result.emplace(use(stored));
+            }
         }
     });
     return std::move(result).value();

@@ -7,8 +7,6 @@
 
 #include <gio/gsettingsbackend.h>
 
-#include "services/preferences/Preference.h"
-
 namespace quorl::preferences {
 
 namespace {
@@ -35,7 +33,8 @@ std::string noSessionBus(const std::string& reason) {
 
 } // namespace
 
-Backend::Backend(GSettingsSchema& schema) : backend_(g_settings_backend_get_default()) {
+Backend::Backend(const std::vector<SchemaPointer>& schemas)
+    : backend_(g_settings_backend_get_default()) {
     const char* const name = G_OBJECT_TYPE_NAME(backend_.get());
     if (name != dconf) {
         problem_ = notDconf(name);
@@ -43,20 +42,23 @@ Backend::Backend(GSettingsSchema& schema) : backend_(g_settings_backend_get_defa
         problem_ = "The settings are not shared with the sync engine, and changes last only until "
                    "the program ends. " +
                    missing;
-        keepInMemory(schema);
+        keepInMemory(schemas);
     }
 }
 
-void Backend::keepInMemory(GSettingsSchema& schema) {
+void Backend::keepInMemory(const std::vector<SchemaPointer>& schemas) {
     BackendPointer memory(g_memory_settings_backend_new());
-    const SettingsPointer source(g_settings_new_full(&schema, backend_.get(), nullptr));
-    const SettingsPointer target(g_settings_new_full(&schema, memory.get(), nullptr));
-    forEachPreference([&](const auto& preference) {
-        const VariantPointer value(g_settings_get_user_value(source.get(), preference.key));
-        if (value) {
-            g_settings_set_value(target.get(), preference.key, value.get());
+    for (const auto& schema : schemas) {
+        const SettingsPointer source(g_settings_new_full(schema.get(), backend_.get(), nullptr));
+        const SettingsPointer target(g_settings_new_full(schema.get(), memory.get(), nullptr));
+        const std::unique_ptr<char*, FreedWith<g_strfreev>> keys(
+            g_settings_schema_list_keys(schema.get()));
+        for (char** key = keys.get(); *key != nullptr; ++key) {
+            if (const VariantPointer value(g_settings_get_user_value(source.get(), *key)); value) {
+                g_settings_set_value(target.get(), *key, value.get());
+            }
         }
-    });
+    }
     backend_ = std::move(memory);
 }
 

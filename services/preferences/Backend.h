@@ -1,6 +1,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "services/preferences/Pointers.h"
 
@@ -14,7 +15,7 @@ class Backend {
   public:
     /// Make it in the GLib context that hears of the loss of the session bus; that context must be
     /// iterated for as long as this object lives.
-    explicit Backend(GSettingsSchema& schema);
+    explicit Backend(const std::vector<SchemaPointer>& schemas);
 
     /// To make a GSettings with.
     [[nodiscard]] GSettingsBackend* get() const { return backend_.get(); }
@@ -32,7 +33,7 @@ class Backend {
     [[nodiscard]] std::string storingProblem();
 
   private:
-    void keepInMemory(GSettingsSchema& schema);
+    void keepInMemory(const std::vector<SchemaPointer>& schemas);
 
     BackendPointer backend_;
 

@@ -1,8 +1,8 @@
 #include "services/preferences/Schema.h"
 
 #include <filesystem>
+#include <string_view>
 #include <system_error>
-#include <vector>
 
 #include "services/preferences/Preference.h"
 #include "services/preferences/Variant.h"
@@ -11,7 +11,8 @@ namespace quorl::preferences {
 
 namespace {
 
-constexpr auto schemaID = "org.quorl.Velora.AssetSync";
+constexpr auto prefix = "org.quorl.Velora.";
+constexpr auto trialPrefix = "org.quorl.Velora.Trial.";
 constexpr auto schemaFolder = "glib-2.0/schemas";
 
 std::filesystem::path directoryBesideProgram() {
@@ -35,13 +36,13 @@ std::string searchedDirectories() {
     return text;
 }
 
-SchemaPointer lookUp() {
+SchemaPointer lookUp(const char* id) {
     GSettingsSchemaSource* const usual = g_settings_schema_source_get_default();
     const SourcePointer besideProgram(g_settings_schema_source_new_from_directory(
         directoryBesideProgram().c_str(), usual, FALSE, nullptr));
     GSettingsSchemaSource* const source = besideProgram ? besideProgram.get() : usual;
-    return SchemaPointer(
-        source == nullptr ? nullptr : g_settings_schema_source_lookup(source, schemaID, TRUE));
+    return SchemaPointer(source == nullptr ? nullptr
+                                           : g_settings_schema_source_lookup(source, id, TRUE));
 }
 
 bool hasValue(GSettingsSchema& schema, const char* key, const char* type) {
@@ -55,37 +56,46 @@ bool hasValue(GSettingsSchema& schema, const char* key, const char* type) {
 }
 
 /// The keys that the schema lacks, or has with another type, separated by commas.
-std::string misfits(GSettingsSchema& schema) {
+/// @param name that the table has for it.
+std::string misfits(GSettingsSchema& schema, std::string_view name) {
     std::string text;
     forEachPreference([&]<class T>(const Preference<T>& preference) {
-        if (!hasValue(schema, preference.key, Stored<T>::type)) {
+        if (preference.schema == name && !hasValue(schema, preference.key, Stored<T>::type)) {
             text += (text.empty() ? "" : ", ") + std::string(preference.key);
         }
     });
     return text;
 }
 
+/// Empty where the schema can be used.
+std::string problemOf(const SchemaPointer& schema, std::string_view name, const std::string& id) {
+    const auto cannotOpen = "The settings cannot be opened, because their schema " + id;
+    if (!schema) {
+        return cannotOpen + " is in none of these directories: " + searchedDirectories() +
+               ". Install the program again; or run glib-compile-schemas on the one that holds " +
+               id + ".gschema.xml.";
+    }
+    const auto wrong = misfits(*schema, name);
+    return wrong.empty() ? ""
+                         : cannotOpen + " is of another version: it does not have " + wrong +
+                               " as this program knows it. These directories were searched, the "
+                               "first that has the schema counts: " +
+                               searchedDirectories() + ". Install the program again.";
+}
+
 } // namespace
 
-FoundSchema findSchema() {
-    auto schema = lookUp();
-    if (!schema) {
-        return {nullptr, std::string("The settings cannot be opened, because their schema ") +
-                             schemaID +
-                             " is in none of these directories: " + searchedDirectories() +
-                             ". Install the program again; or run glib-compile-schemas on the one "
-                             "that holds " +
-                             schemaID + ".gschema.xml."};
+FoundSchemas findSchemas(Purpose purpose) {
+    FoundSchemas found;
+    for (const auto name : schemaNames) {
+        const auto id = (purpose == Purpose::Trial ? trialPrefix : prefix) + std::string(name);
+        auto schema = lookUp(id.c_str());
+        if (auto problem = problemOf(schema, name, id); !problem.empty()) {
+            return {{}, std::move(problem)};
+        }
+        found.schemas.push_back(std::move(schema));
     }
-    if (const auto wrong = misfits(*schema); !wrong.empty()) {
-        return {nullptr,
-                std::string("The settings cannot be opened, because their schema ") + schemaID +
-                    " is of another version: it does not have " + wrong +
-                    " as this program knows it. These directories were searched, the first "
-                    "that has the schema counts: " +
-                    searchedDirectories() + ". Install the program again."};
-    }
-    return {std::move(schema), {}};
+    return found;
 }
 
 } // namespace quorl::preferences

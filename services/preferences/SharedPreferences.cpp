@@ -1,5 +1,6 @@
 #include "services/preferences/SharedPreferences.h"
 
+#include <algorithm>
 #include <deque>
 #include <map>
 #include <mutex>
@@ -7,6 +8,7 @@
 #include <stop_token>
 #include <thread>
 #include <utility>
+#include <vector>
 
 #include "services/preferences/Backend.h"
 #include "services/preferences/Schema.h"
@@ -24,6 +26,12 @@ struct Known {
     unsigned echoes = 0;
 };
 
+/// Of the schema in `schemaNames`.
+std::size_t placeOf(std::string_view schema) {
+    const auto* const found = std::find(schemaNames.begin(), schemaNames.end(), schema);
+    return static_cast<std::size_t>(found - schemaNames.begin());
+}
+
 bool equal(const VariantPointer& left, const VariantPointer& right) {
     return g_variant_equal(left.get(), right.get()) != FALSE;
 }
@@ -34,7 +42,7 @@ class SharedPreferences::Store {
   public:
     using Listener = std::function<void(const KeySet& keys)>;
 
-    explicit Store(GSettingsSchema& schema);
+    explicit Store(const std::vector<SchemaPointer>& schemas);
     Store(const Store&) = delete;
     Store& operator=(const Store&) = delete;
     ~Store();
@@ -69,7 +77,8 @@ class SharedPreferences::Store {
 
     // Constant after construction.
     const ContextPointer context_;
-    SettingsPointer settings_;
+    std::vector<SettingsPointer> settings_;             ///< in the order of `schemaNames`
+    std::map<std::string_view, GSettings*> settingsOf_; ///< each key
 
     // Held while a value is read or written: GLib's memory backend has no lock of its own.
     mutable std::mutex touching_;
@@ -87,17 +96,23 @@ class SharedPreferences::Store {
     std::jthread thread_;
 };
 
-SharedPreferences::Store::Store(GSettingsSchema& schema) : context_(g_main_context_new()) {
+SharedPreferences::Store::Store(const std::vector<SchemaPointer>& schemas)
+    : context_(g_main_context_new()) {
     // GIO announces changes in the context that is the thread's default when the settings are made.
     g_main_context_push_thread_default(context_.get());
-    backend_.emplace(schema);
-    settings_.reset(g_settings_new_full(&schema, backend_->get(), nullptr));
+    backend_.emplace(schemas);
+    for (const auto& schema : schemas) {
+        settings_.emplace_back(g_settings_new_full(schema.get(), backend_->get(), nullptr));
+    }
     g_main_context_pop_thread_default(context_.get());
 
     forEachPreference([this](const auto& preference) {
+        settingsOf_.emplace(preference.key, settings_.at(placeOf(preference.schema)).get());
         known_.emplace(preference.key, Known{read(preference.key), 0});
     });
-    g_signal_connect(settings_.get(), "change-event", G_CALLBACK(onChange), this);
+    for (const auto& settings : settings_) {
+        g_signal_connect(settings.get(), "change-event", G_CALLBACK(onChange), this);
+    }
 }
 
 void SharedPreferences::Store::listen(Listener listener) {
@@ -113,15 +128,17 @@ SharedPreferences::Store::~Store() {
     }
 
     // Announcements that are still queued hold a reference to the settings until they have run.
-    g_signal_handlers_disconnect_by_data(settings_.get(), this);
-    settings_.reset();
+    for (const auto& settings : settings_) {
+        g_signal_handlers_disconnect_by_data(settings.get(), this);
+    }
+    settings_.clear();
     while (g_main_context_iteration(context_.get(), FALSE)) {
     }
 }
 
 VariantPointer SharedPreferences::Store::read(const char* key) const {
     const std::scoped_lock lock(touching_);
-    return VariantPointer(g_settings_get_value(settings_.get(), key));
+    return VariantPointer(g_settings_get_value(settingsOf_.at(key), key));
 }
 
 WriteResult SharedPreferences::Store::write(const char* key, VariantPointer value) {
@@ -137,7 +154,7 @@ WriteResult SharedPreferences::Store::write(const char* key, VariantPointer valu
 }
 
 std::string SharedPreferences::Store::store(const char* key, const VariantPointer& value) {
-    if (g_settings_is_writable(settings_.get(), key) == FALSE) {
+    if (g_settings_is_writable(settingsOf_.at(key), key) == FALSE) {
         return "The administrator of this machine has locked it.";
     }
     // The second try is for a dconf service that ended in the middle of the first; dconf starts it
@@ -160,7 +177,7 @@ bool SharedPreferences::Store::tryToStore(const char* key, const VariantPointer&
     ++known.echoes;
     {
         const std::scoped_lock lock(touching_);
-        g_settings_set_value(settings_.get(), key, value.get());
+        g_settings_set_value(settingsOf_.at(key), key, value.get());
     }
     // Waits for dconf's answer. Without it, dconf would gather the writes that follow into one.
     g_settings_sync();
@@ -231,13 +248,13 @@ SharedPreferences::SharedPreferences(std::unique_ptr<Store> store) : store_(std:
 
 SharedPreferences::~SharedPreferences() = default;
 
-SharedPreferences::Opened SharedPreferences::open(Changed changed) {
-    auto [schema, schemaProblem] = findSchema();
-    if (!schema) {
-        return {nullptr, std::move(schemaProblem)};
+SharedPreferences::Opened SharedPreferences::open(Changed changed, Purpose purpose) {
+    auto found = findSchemas(purpose);
+    if (!found.problem.empty()) {
+        return {nullptr, std::move(found.problem)};
     }
     std::unique_ptr<SharedPreferences> preferences(
-        new SharedPreferences(std::make_unique<Store>(*schema)));
+        new SharedPreferences(std::make_unique<Store>(found.schemas)));
     auto& store = *preferences->store_;
     store.listen([&self = *preferences, changed = std::move(changed)](const KeySet& keys) {
         if (changed) {
@@ -262,9 +279,11 @@ using OptionalNumber = std::optional<std::uint64_t>;
 template bool SharedPreferences::get(const Preference<bool>&) const;
 template std::uint64_t SharedPreferences::get(const Preference<std::uint64_t>&) const;
 template OptionalNumber SharedPreferences::get(const Preference<OptionalNumber>&) const;
+template std::string SharedPreferences::get(const Preference<std::string>&) const;
 template WriteResult SharedPreferences::set(const Preference<bool>&, const bool&);
 template WriteResult SharedPreferences::set(const Preference<std::uint64_t>&, const std::uint64_t&);
 template WriteResult SharedPreferences::set(const Preference<OptionalNumber>&,
                                             const OptionalNumber&);
+template WriteResult SharedPreferences::set(const Preference<std::string>&, const std::string&);
 
 } // namespace quorl::preferences

@@ -8,6 +8,7 @@
 #include <type_traits>
 
 #include "services/preferences/Preference.h"
+#include "services/preferences/Purpose.h"
 
 namespace quorl::preferences {
 
@@ -27,7 +28,7 @@ struct [[nodiscard]] WriteResult {
 };
 
 /// The preferences that the app and the sync engine share. They live in GSettings (dconf), so every
-/// program of the user that opens them sees the same values.
+/// program of the user that opens them for the same purpose sees the same values.
 ///
 /// All methods may be called on any thread, also within the `Changed` call.
 class SharedPreferences {
@@ -65,7 +66,7 @@ class SharedPreferences {
     /// which is what GIO does by default with the bus connection that a process has in common.
     ///
     /// @param changed may be empty.
-    static Opened open(Changed changed);
+    static Opened open(Changed changed, Purpose purpose = Purpose::Use);
 
     SharedPreferences(const SharedPreferences&) = delete;
     SharedPreferences& operator=(const SharedPreferences&) = delete;

@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <optional>
+#include <string>
 
 #include "services/preferences/Pointers.h"
 
@@ -32,6 +33,20 @@ struct Stored<std::uint64_t> {
     }
 
     static std::uint64_t unwrap(GVariant& variant) { return g_variant_get_uint64(&variant); }
+};
+
+/// What is not UTF-8 cannot be stored; it becomes the empty text.
+template <>
+struct Stored<std::string> {
+    static constexpr const char* type = "s";
+
+    static VariantPointer wrap(const std::string& value) {
+        const bool isText = g_utf8_validate_len(value.data(), value.size(), nullptr) != FALSE;
+        return VariantPointer(
+            g_variant_ref_sink(g_variant_new_string(isText ? value.c_str() : "")));
+    }
+
+    static std::string unwrap(GVariant& variant) { return g_variant_get_string(&variant, nullptr); }
 };
 
 template <>

@@ -53,7 +53,8 @@ class Program {
 class Peer {
   public:
     explicit Peer(const Environment& environment = {},
-                  const std::filesystem::path& program = PEER_PROGRAM);
+                  const std::filesystem::path& program = PEER_PROGRAM,
+                  Purpose purpose = Purpose::Use);
 
     /// The line with which it began.
     [[nodiscard]] const std::string& greeting() const { return greeting_; }

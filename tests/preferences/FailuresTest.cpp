@@ -161,10 +161,12 @@ class Installation : public Failures {
 
     ~Installation() override { std::filesystem::remove_all(prefix_); }
 
-    /// Installs the schema as this command of sed changes it.
-    void installSchema(const std::string& change) {
-        std::ofstream(schemas_ / "org.quorl.Velora.AssetSync.gschema.xml")
-            << run({"sed", change, SCHEMA_FILE});
+    /// Installs the schemas as this command of sed changes them.
+    void installSchemas(const std::string& change) {
+        for (const auto& source : std::filesystem::directory_iterator(SCHEMA_SOURCES)) {
+            std::ofstream(schemas_ / source.path().filename())
+                << run({"sed", change, source.path().string()});
+        }
         run({"glib-compile-schemas", "--strict", schemas_.string()});
     }
 
@@ -178,8 +180,8 @@ class Installation : public Failures {
     const std::filesystem::path schemas_ = prefix_ / "share" / "glib-2.0" / "schemas";
 };
 
-TEST_F(Installation, FindsItsSchemaBesideTheProgram) {
-    installSchema("");
+TEST_F(Installation, FindsItsSchemasBesideTheProgram) {
+    installSchemas("");
 
     EXPECT_EQ(greeting(), "ready");
 }
@@ -191,14 +193,14 @@ TEST_F(Installation, WithoutASchemaSaysWhereItSearchedAndWhatToDo) {
 }
 
 TEST_F(Installation, WithASchemaThatLacksAValueSaysWhichOne) {
-    installSchema("s/asset-sync-enabled/asset-sync-on/");
+    installSchemas("s/asset-sync-enabled/asset-sync-on/");
 
     EXPECT_THAT(greeting(), AllOf(StartsWith("failed: "), HasSubstr("another version"),
                                   HasSubstr("asset-sync-enabled")));
 }
 
 TEST_F(Installation, WithASchemaThatHasAValueOfAnotherTypeSaysWhichOne) {
-    installSchema(R"(s/limit-type" type="t"/limit-type" type="u"/)");
+    installSchemas(R"(s/limit-type" type="t"/limit-type" type="u"/)");
 
     EXPECT_THAT(greeting(), AllOf(StartsWith("failed: "), HasSubstr("another version"),
                                   HasSubstr("asset-sync-limit-type")));

@@ -1,4 +1,5 @@
-// Another program that uses the shared preferences. It obeys lines on its standard input:
+// Another program that uses the shared preferences, those in the file that is its argument where it
+// has one. It obeys lines on its standard input:
 //
 //   get KEY            says the value
 //   set KEY VALUE      says "stored", "same", or "failed: " and why
@@ -90,7 +91,7 @@ class Peer {
 
     void count(const std::string& key, std::uint64_t first) {
         withPreference(key, [&]<class T>(const Preference<T>& preference) {
-            if constexpr (!std::is_same_v<T, bool>) {
+            if constexpr (std::is_constructible_v<T, std::uint64_t> && !std::is_same_v<T, bool>) {
                 for (auto number = first;; ++number) {
                     const auto result = preferences_.set(preference, number);
                     speaker_.say(result.changed ? std::to_string(number) : outcome(result));
@@ -131,10 +132,11 @@ std::string told(const KeySet& keys) {
 
 } // namespace
 
-int main() {
+int main(int argc, char** /*argv*/) {
     Speaker speaker;
     const auto opened = SharedPreferences::open(
-        [&speaker](SharedPreferences&, const KeySet& keys) { speaker.say(told(keys)); });
+        [&speaker](SharedPreferences&, const KeySet& keys) { speaker.say(told(keys)); },
+        argc > 1 ? Purpose::Trial : Purpose::Use);
     if (!opened.preferences) {
         speaker.say("failed: " + opened.problem);
         return 1;

@@ -16,6 +16,8 @@ inline std::string textOf(std::optional<std::uint64_t> value) {
     return value ? std::to_string(*value) : "nothing";
 }
 
+inline std::string textOf(const std::string& value) { return value; }
+
 inline std::uint64_t numberIn(const std::string& text) {
     std::uint64_t number = 0;
     const auto [end, failure] = std::from_chars(text.data(), text.data() + text.size(), number);
@@ -32,3 +34,5 @@ inline void readText(const std::string& text, std::uint64_t& value) { value = nu
 inline void readText(const std::string& text, std::optional<std::uint64_t>& value) {
     value = text == "nothing" ? std::nullopt : std::optional(numberIn(text));
 }
+
+inline void readText(const std::string& text, std::string& value) { value = text; }
