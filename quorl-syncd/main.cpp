@@ -1,5 +1,6 @@
 // quorl-syncd: brings the chosen playlist to the wearable.
 
+#include <array>
 #include <csignal>
 #include <functional>
 #include <iostream>
@@ -9,6 +10,7 @@
 #include <glib.h>
 #include <poll.h>
 #include <sys/signalfd.h>
+#include <unistd.h>
 
 #include "quorl-syncd/bus/BusAnnouncer.h"
 #include "quorl-syncd/bus/BusObjects.h"
@@ -56,20 +58,48 @@ std::string fullPath(const std::string& path) {
 
 /// What the daemon is started with.
 struct Options {
+    base::Purpose purpose = base::Purpose::Use;
     syncd::EngineSettings engine;
     std::uint64_t embeddedCapacity = wearable::embeddedCapacity;
 };
+
+/// Ends the loop when the standard input ends: its other end is with the app.
+void endWithInput(engine::BusLoop& loop) {
+    loop.watch(STDIN_FILENO, POLLIN, [&loop] {
+        std::array<char, 64> ignored{};
+        if (read(STDIN_FILENO, ignored.data(), ignored.size()) <= 0) {
+            loop.stop();
+        }
+    });
+}
+
+/// The settings that were not given on the command line are those that were chosen.
+syncd::EngineSettings complete(syncd::EngineSettings settings,
+                               const preferences::SharedPreferences& preferences) {
+    if (settings.musicFolder.empty()) {
+        settings.musicFolder = preferences.get(preferences::musicFolder);
+    }
+    if (settings.wearableDirectory.empty()) {
+        settings.wearableDirectory = preferences.get(preferences::wearableDirectory);
+    }
+    return settings;
+}
 
 int serve(const Options& options) {
     const auto signals = blockSignals();
     engine::BusLoop loop(sdbus::createSessionBusConnection());
     loop.watch(signals.get(), POLLIN, [&] { loop.stop(); });
+    const bool isTrial = options.purpose == base::Purpose::Trial;
+    if (isTrial) {
+        endWithInput(loop);
+    }
 
-    std::function<void()> choicesDidChange;
+    std::function<void(const preferences::KeySet&)> preferencesDidChange;
     auto opened = preferences::SharedPreferences::open(
-        [&](const auto& /*preferences*/, const auto& /*keys*/) {
-            loop.post([&] { choicesDidChange(); });
-        });
+        [&](const auto& /*preferences*/, const preferences::KeySet& keys) {
+            loop.post([&, keys] { preferencesDidChange(keys); });
+        },
+        options.purpose);
     if (!opened.preferences) {
         return complain(CannotStart, opened.problem);
     }
@@ -81,28 +111,38 @@ int serve(const Options& options) {
     syncd::LoopTurns turns(loop);
     syncd::SharedChoices choices(*opened.preferences);
     syncd::LocalMusic music(loop);
-    syncd::LocalWearables wearables(loop, options.embeddedCapacity);
+    syncd::LocalWearables wearables(loop, options.purpose, options.embeddedCapacity);
     syncd::SyncThreads syncs(loop, [] { return std::make_shared<syncd::SleepInhibitor>(); });
-    syncd::LastResults results(std::filesystem::path(g_get_user_state_dir()) / "quorl");
+    syncd::LastResults results(std::filesystem::path(g_get_user_state_dir()) / "quorl" /
+                               (isTrial ? "trial" : ""));
     syncd::BusAnnouncer announcer(loop.bus(), [&] {
         if (objects) {
             objects->publish();
         }
     });
     const syncd::EnginePorts ports{turns, choices, music, wearables, syncs, results, announcer};
-    syncd::Engine engine(ports, options.engine);
-    choicesDidChange = [&] { engine.choicesDidChange(); };
+    syncd::Engine engine(ports, complete(options.engine, *opened.preferences));
+    preferencesDidChange = [&](const preferences::KeySet& keys) {
+        if (keys.contains(preferences::musicFolder.key)) {
+            engine.setMusicFolder(opened.preferences->get(preferences::musicFolder));
+        }
+        if (keys.contains(preferences::wearableDirectory.key)) {
+            engine.setWearableDirectory(opened.preferences->get(preferences::wearableDirectory));
+        }
+        engine.choicesDidChange();
+    };
     syncd::DirectoryCheck check;
     const syncd::BusObjects::ObjectionTo objectionTo = [&](const std::string& directory) {
         return check.objectionTo(directory);
     };
     objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine, objectionTo);
     try {
-        loop.bus().requestName(engine::busName);
+        loop.bus().requestName(engine::busNameFor(options.purpose));
     } catch (const sdbus::Error& error) {
-        return complain(AlreadyRunning, "Another sync engine is running, which has the name " +
-                                            std::string(engine::busName) +
-                                            ". End that one first. (" + error.getMessage() + ")");
+        return complain(AlreadyRunning,
+                        std::string("Another sync engine is running, which has the name ") +
+                            engine::busNameFor(options.purpose) + ". End that one first. (" +
+                            error.getMessage() + ")");
     }
 
     const auto problem = loop.run();
@@ -119,10 +159,14 @@ int main(int argc, char** argv) {
     CLI::App program("Brings the chosen playlist to the Velora, and tells on the session bus how "
                      "far it is.");
     program.set_version_flag("--version", "quorl-syncd " QUORL_VERSION);
+    program.add_flag_callback(
+        "--trial", [&options] { options.purpose = base::Purpose::Trial; },
+        "for a trial, beside another engine: settings and an embedded wearable of its own; ends "
+        "when its standard input ends");
     program.add_option("--music-folder", options.engine.musicFolder,
-                       "the folder with songs and playlists, instead of the user's music folder");
+                       "the folder with songs and playlists, instead of the one that was chosen");
     program.add_option("--wearable", options.engine.wearableDirectory,
-                       "the directory of a mounted wearable, instead of the embedded one");
+                       "the directory of a mounted wearable, instead of the one that was chosen");
     program
         .add_option("--embedded-capacity", options.embeddedCapacity,
                     "what the embedded wearable holds, in bytes")

@@ -2,10 +2,9 @@
 
 #include <utility>
 
-#include <glib.h>
-
 #include "quorl-syncd/daemon/Lifeline.h"
 #include "services/media/MusicFolder.h"
+#include "services/preferences/ChosenFolder.h"
 
 namespace quorl::syncd {
 
@@ -28,10 +27,7 @@ class LocalFolder final : public WatchedMusic {
 
 } // namespace
 
-std::string LocalMusic::usualFolder() {
-    const char* const folder = g_get_user_special_dir(G_USER_DIRECTORY_MUSIC);
-    return folder != nullptr ? folder : std::string(g_get_home_dir()) + "/Music";
-}
+std::string LocalMusic::usualFolder() { return preferences::usualMusicFolder(); }
 
 std::unique_ptr<WatchedMusic> LocalMusic::watch(const std::string& folder, Changed changed) {
     return std::make_unique<LocalFolder>(loop_, folder, std::move(changed));

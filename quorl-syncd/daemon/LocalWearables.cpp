@@ -121,8 +121,9 @@ std::filesystem::path normal(const std::filesystem::path& directory) {
 
 std::unique_ptr<WatchedWearable> LocalWearables::watch(const std::string& directory,
                                                        Noticed noticed) {
-    const auto wearable = directory.empty() ? wearable::Wearable::embedded(embeddedCapacity_)
-                                            : wearable::Wearable{normal(directory), {}, false};
+    const auto wearable = directory.empty()
+                              ? wearable::Wearable::embedded(purpose_, embeddedCapacity_)
+                              : wearable::Wearable{normal(directory), {}, false};
     return std::make_unique<LocalWearable>(loop_, wearable, noticed);
 }
 

@@ -3,6 +3,7 @@
 #include <cstdint>
 
 #include "quorl-syncd/engine/ports/WearablePort.h"
+#include "services/base/Purpose.h"
 #include "services/engine/BusLoop.h"
 
 namespace quorl::syncd {
@@ -11,14 +12,15 @@ namespace quorl::syncd {
 class LocalWearables final : public WearablePort {
   public:
     /// @param embeddedCapacity of the embedded wearable, in bytes.
-    LocalWearables(engine::BusLoop& loop, std::uint64_t embeddedCapacity)
-        : loop_(loop), embeddedCapacity_(embeddedCapacity) {}
+    LocalWearables(engine::BusLoop& loop, base::Purpose purpose, std::uint64_t embeddedCapacity)
+        : loop_(loop), purpose_(purpose), embeddedCapacity_(embeddedCapacity) {}
 
     [[nodiscard]] std::unique_ptr<WatchedWearable> watch(const std::string& directory,
                                                          Noticed noticed) override;
 
   private:
     engine::BusLoop& loop_;
+    const base::Purpose purpose_;
     const std::uint64_t embeddedCapacity_;
 };
 

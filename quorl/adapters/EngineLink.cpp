@@ -57,20 +57,21 @@ TaskMessage taskMessage(Kind kind) {
 
 } // namespace
 
-EngineLink::EngineLink(Places places, Changed changed)
-    : places_(std::move(places)),
-      changed_(std::move(changed)),
+EngineLink::EngineLink(base::Purpose purpose, Changed changed)
+    : changed_(std::move(changed)),
       inbox_(std::make_shared<Inbox>()),
-      client_([this](const engine::Event& event) {
-          if (inbox_->add(event)) {
-              // The link may be gone when the main thread gets to it.
-              dispatch_async(dispatch_get_main_queue(), [this, inbox = std::weak_ptr(inbox_)] {
-                  if (!inbox.expired()) {
-                      fetch();
-                  }
-              });
-          }
-      }) {}
+      client_(
+          [this](const engine::Event& event) {
+              if (inbox_->add(event)) {
+                  // The link may be gone when the main thread gets to it.
+                  dispatch_async(dispatch_get_main_queue(), [this, inbox = std::weak_ptr(inbox_)] {
+                      if (!inbox.expired()) {
+                          fetch();
+                      }
+                  });
+              }
+          },
+          engine::busNameFor(purpose)) {}
 
 NSArray<DVSession> EngineLink::sessions(const std::string& type) const {
     auto sessions = std::make_shared<std::vector<std::shared_ptr<DVSession>>>();
@@ -88,9 +89,6 @@ void EngineLink::fetch() {
 void EngineLink::take(const engine::Event& event) {
     state_ = event.state;
     showAll(sessions_, state_->sessions, state_);
-    if (event.kind == Kind::EngineDidAppear) {
-        tellPlaces();
-    }
     tellObservers(event);
     if (isAboutSet(event.kind)) {
         NSNotificationCenter::defaultCenter().postNotificationName_object(
@@ -115,20 +113,6 @@ void EngineLink::tellObservers(const engine::Event& event) const {
             (observer.*taskMessage(event.kind))(*session, *session->task(event.task->path));
         }
     });
-}
-
-void EngineLink::tellPlaces() {
-    // A place is told only where it is another one: the engine begins anew with it.
-    if (places_.music != std::filesystem::path(state_->engine.musicFolder)) {
-        client_.setMusicFolder(places_.music.string());
-    }
-    const bool isOther =
-        places_.wearable.empty()
-            ? !state_->wearable.isEmbedded
-            : places_.wearable != std::filesystem::path(state_->wearable.directory);
-    if (isOther) {
-        client_.setWearableDirectory(places_.wearable.string());
-    }
 }
 
 } // namespace quorl

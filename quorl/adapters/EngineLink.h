@@ -1,6 +1,5 @@
 #pragma once
 
-#include <filesystem>
 #include <functional>
 
 #include "quorl/adapters/EngineSession.h"
@@ -17,15 +16,10 @@ class EngineLink final {
     /// when the session bus is gone; that sentence is empty otherwise.
     using Changed = std::function<void(const std::string& problem)>;
 
-    /// What the engine is to work with while this app is there.
-    struct Places {
-        std::filesystem::path music;    ///< absolute
-        std::filesystem::path wearable; ///< absolute; empty for the embedded one
-    };
-
-    /// Connects in the background and starts the engine where it does not run. Where there is
+    /// Connects in the background and starts the engine where it does not run; not that of a trial,
+    /// which is started with the trial. Where there is
     /// nothing to connect to there are no sessions, which is no error.
-    EngineLink(Places places, Changed changed);
+    EngineLink(base::Purpose purpose, Changed changed);
 
     EngineLink(const EngineLink&) = delete;
     EngineLink& operator=(const EngineLink&) = delete;
@@ -45,9 +39,7 @@ class EngineLink final {
     void fetch();
     void take(const engine::Event& event);
     void tellObservers(const engine::Event& event) const;
-    void tellPlaces();
 
-    const Places places_;
     const Changed changed_;
     std::shared_ptr<const engine::EngineState> state_ = std::make_shared<engine::EngineState>();
     std::vector<std::shared_ptr<EngineSession>> sessions_;

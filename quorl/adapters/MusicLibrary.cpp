@@ -38,10 +38,12 @@ void MusicLibrary::open(const std::filesystem::path& root, Taken taken) {
     taken_ = std::move(taken);
     // Held weakly: an inventory on its way keeps no library alive.
     folder_ = std::make_unique<media::MusicFolder>(
-        root, [reference = weak(this)](std::shared_ptr<const media::Inventory> inventory) {
+        root, [reference = weak(this),
+               number = ++foldersOpened_](std::shared_ptr<const media::Inventory> inventory) {
             dispatch_async(dispatch_get_main_queue(),
-                           [reference, inventory = std::move(inventory)] {
-                               if (const auto self = reference.lock()) {
+                           [reference, number, inventory = std::move(inventory)] {
+                               const auto self = reference.lock();
+                               if (self && self->foldersOpened_ == number) {
                                    self->take(inventory);
                                }
                            });

@@ -15,9 +15,9 @@ class MusicLibrary final : public AnnouncingLibrary {
     /// Is called on the main thread with each inventory that the library has taken.
     using Taken = std::function<void(const media::Inventory& inventory)>;
 
-    /// Begins to read and watch the folder at `root`, on a thread of its own; to be called once.
-    /// Throws `std::system_error` where the process may open no more files or start no more
-    /// threads.
+    /// Begins to read and watch the folder at `root`, on a thread of its own, instead of the one
+    /// before, whose contents stay until this one has been read. Throws `std::system_error` where
+    /// the process may open no more files or start no more threads.
     void open(const std::filesystem::path& root, Taken taken);
 
     /// Whether the folder has been read for the first time. Until then the library is empty.
@@ -30,6 +30,7 @@ class MusicLibrary final : public AnnouncingLibrary {
   private:
     void take(std::shared_ptr<const media::Inventory> inventory);
 
+    std::uint64_t foldersOpened_ = 0;
     std::shared_ptr<const media::Inventory> inventory_;
     std::vector<std::shared_ptr<LibraryPlaylist>> playlists_; ///< in the order of the inventory
     Taken taken_;

@@ -2,6 +2,9 @@
 
 #include <optional>
 
+#include "platform/Dispatch.h"
+#include "services/preferences/ChosenFolder.h"
+
 namespace quorl {
 
 namespace {
@@ -36,15 +39,50 @@ T stored(const Preference<T>& /*preference*/, std::optional<std::uint64_t> value
     }
 }
 
+/// What another program has changed. Any thread.
+void announce(const KeySet& keys,
+              const std::weak_ptr<const PreferencesStore::PlacesChanged>& tell) {
+    const auto places = keys.count(musicFolder.key) + keys.count(wearableDirectory.key);
+    if (places < keys.size()) {
+        SyncDefaults::announceChange();
+    }
+    if (places > 0) {
+        dispatch_async(dispatch_get_main_queue(), [tell] {
+            if (const auto placesChanged = tell.lock()) {
+                (*placesChanged)();
+            }
+        });
+    }
+}
+
 } // namespace
 
-PreferencesStore::PreferencesStore(Problem problem) : problem_(std::move(problem)) {
-    auto opened =
-        SharedPreferences::open([](SharedPreferences& /*preferences*/, const KeySet& /*keys*/) {
-            SyncDefaults::announceChange();
-        });
+PreferencesStore::PreferencesStore(base::Purpose purpose, Problem problem,
+                                   PlacesChanged placesChanged)
+    : problem_(std::move(problem)),
+      placesChanged_(std::make_shared<const PlacesChanged>(std::move(placesChanged))) {
+    auto opened = SharedPreferences::open([reference = std::weak_ptr(placesChanged_)](
+                                              const SharedPreferences& /*preferences*/,
+                                              const KeySet& keys) { announce(keys, reference); },
+                                          purpose);
     preferences_ = std::move(opened.preferences);
     problem_(opened.problem);
+}
+
+std::filesystem::path PreferencesStore::musicFolder() const {
+    return preferences_ ? chosenMusicFolder(*preferences_) : usualMusicFolder();
+}
+
+std::filesystem::path PreferencesStore::wearableDirectory() const {
+    return preferences_ ? preferences_->get(preferences::wearableDirectory) : std::string();
+}
+
+void PreferencesStore::choosePlaces(const std::filesystem::path& music,
+                                    const std::filesystem::path& wearable) {
+    if (preferences_) {
+        store(preferences::musicFolder, music.string());
+        store(preferences::wearableDirectory, wearable.string());
+    }
 }
 
 std::optional<std::uint64_t> PreferencesStore::value(SyncPreference preference) const {
@@ -58,9 +96,14 @@ bool PreferencesStore::setValue(SyncPreference preference, std::optional<std::ui
     if (!preferences_) {
         return false; // it was told at the opening
     }
-    const auto result = with(preference, [this, value](const auto& key) {
-        return preferences_->set(key, stored(key, value));
-    });
+    return with(preference,
+                [this, value](const auto& key) { return store(key, stored(key, value)); });
+}
+
+template <class T>
+bool PreferencesStore::store(const Preference<T>& preference,
+                             const std::type_identity_t<T>& value) {
+    const auto result = preferences_->set(preference, value);
     if (!result.problem.empty()) {
         problem_(result.problem);
     }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <filesystem>
 #include <functional>
 
 #include "runtime/services/SyncDefaults.h"
@@ -14,15 +15,31 @@ class PreferencesStore final : public SyncPreferencesStore {
     /// could not be stored; with an empty one once the opening has gone well.
     using Problem = std::function<void(const std::string& text)>;
 
+    /// Is called on the main thread when another program has chosen other places.
+    using PlacesChanged = std::function<void()>;
+
     /// Opens the preferences.
-    explicit PreferencesStore(Problem problem);
+    PreferencesStore(base::Purpose purpose, Problem problem, PlacesChanged placesChanged);
+
+    /// The music folder that was chosen, or else the usual one.
+    [[nodiscard]] std::filesystem::path musicFolder() const;
+
+    /// Where the chosen wearable is mounted; empty for the embedded one.
+    [[nodiscard]] std::filesystem::path wearableDirectory() const;
+
+    /// Chooses both for a trial.
+    void choosePlaces(const std::filesystem::path& music, const std::filesystem::path& wearable);
 
     [[nodiscard]] std::optional<std::uint64_t> value(SyncPreference preference) const override;
     [[nodiscard]] bool setValue(SyncPreference preference,
                                 std::optional<std::uint64_t> value) override;
 
   private:
+    template <class T>
+    bool store(const preferences::Preference<T>& preference, const std::type_identity_t<T>& value);
+
     const Problem problem_;
+    const std::shared_ptr<const PlacesChanged> placesChanged_;
     std::unique_ptr<preferences::SharedPreferences> preferences_; ///< null: nothing can be stored
 };
 

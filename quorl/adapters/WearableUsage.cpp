@@ -32,15 +32,21 @@ struct WearableUsage::Questions {
     int open = 0; ///< main thread only
 };
 
+/// The wearable that is asked.
+struct WearableUsage::Chosen {
+    std::shared_ptr<Questions> questions;
+};
+
 class WearableUsage::Client final : public WearableConnection {
   public:
-    explicit Client(std::shared_ptr<Questions> questions) : questions_(std::move(questions)) {}
+    explicit Client(std::shared_ptr<Chosen> chosen) : chosen_(std::move(chosen)) {}
 
     void requestUsage(LSSManager::UsageHandler reply) override {
-        ++questions_->open;
+        const auto& asked = chosen_->questions;
+        ++asked->open;
         // Held weakly: the reader must not be destroyed on its own thread.
-        questions_->reader.ask([reply = std::move(reply), reference = std::weak_ptr(questions_)](
-                                   const wearable::UsageReader::Answer& answer) {
+        asked->reader.ask([reply = std::move(reply), reference = std::weak_ptr(asked)](
+                              const wearable::UsageReader::Answer& answer) {
             pass(answer, reply);
             dispatch_async(dispatch_get_main_queue(), [reference] {
                 if (const auto questions = reference.lock()) {
@@ -51,16 +57,22 @@ class WearableUsage::Client final : public WearableConnection {
     }
 
   private:
-    std::shared_ptr<Questions> questions_;
+    std::shared_ptr<Chosen> chosen_;
 };
 
 WearableUsage::WearableUsage(const wearable::Wearable& wearable)
-    : questions_(std::make_shared<Questions>(wearable)) {}
-
-std::shared_ptr<WearableConnection> WearableUsage::connect() const {
-    return std::make_shared<Client>(questions_);
+    : chosen_(std::make_shared<Chosen>()) {
+    setWearable(wearable);
 }
 
-bool WearableUsage::isIdle() const { return questions_->open == 0; }
+void WearableUsage::setWearable(const wearable::Wearable& wearable) {
+    chosen_->questions = std::make_shared<Questions>(wearable);
+}
+
+std::shared_ptr<WearableConnection> WearableUsage::connect() const {
+    return std::make_shared<Client>(chosen_);
+}
+
+bool WearableUsage::isIdle() const { return chosen_->questions->open == 0; }
 
 } // namespace quorl

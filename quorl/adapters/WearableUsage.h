@@ -13,6 +13,9 @@ class WearableUsage {
   public:
     explicit WearableUsage(const wearable::Wearable& wearable);
 
+    /// Has what is asked from now on asked of another one.
+    void setWearable(const wearable::Wearable& wearable);
+
     /// A connection for one client, which may outlive this object.
     [[nodiscard]] std::shared_ptr<WearableConnection> connect() const;
 
@@ -23,8 +26,9 @@ class WearableUsage {
   private:
     class Client;
     struct Questions;
+    struct Chosen;
 
-    std::shared_ptr<Questions> questions_;
+    std::shared_ptr<Chosen> chosen_;
 };
 
 } // namespace quorl

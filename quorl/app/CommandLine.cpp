@@ -1,6 +1,5 @@
 #include "quorl/app/CommandLine.h"
 
-#include <QStandardPaths>
 #include <charconv>
 #include <iostream>
 #include <map>
@@ -63,10 +62,13 @@ void addModes(CLI::App& app, Options& options, bool& text, bool& library, bool& 
 }
 
 void addPlaces(CLI::App& app, Places& places) {
-    app.add_option("--music", places.music, "The music folder, instead of the user's own")
+    app.add_option(
+           "--music", places.music,
+           "For a trial with this music folder: with a sync engine and settings of its own, "
+           "so that nothing of what is chosen changes")
         ->type_name("DIR");
     app.add_option("--wearable", places.wearable,
-                   "The directory of a mounted Velora, instead of the one in this machine")
+                   "For a trial with the Velora that is mounted in this directory")
         ->type_name("DIR");
     app.add_option("--plugins", places.plugins, "Look for plug-ins here before all other places")
         ->type_name("DIR")
@@ -115,14 +117,11 @@ void chooseMode(Options& options, bool text, bool library, bool status) {
 }
 
 void complete(Places& places) {
-    if (!places.wearable.empty()) {
-        places.wearable = absolute(places.wearable).lexically_normal();
+    for (auto* place : {&places.music, &places.wearable}) {
+        if (!place->empty()) {
+            *place = absolute(*place).lexically_normal();
+        }
     }
-    if (places.music.empty()) {
-        places.music =
-            QStandardPaths::writableLocation(QStandardPaths::MusicLocation).toStdString();
-    }
-    places.music = absolute(places.music).lexically_normal();
 }
 
 } // namespace

@@ -31,7 +31,7 @@ void Companion::makeFrontPage() {
         return;
     }
     frontPage_ = FrontPage::over(host_->engineLink(), std::get<Class>(loaded), "Music",
-                                 places_.wearable.empty());
+                                 host_->isWearableEmbedded());
     navigation_->setRootPane(frontPage_);
     (void)frontPage_->specifiers(); // builds the rows before the page is shown
     host_->setEngineObserver([this] { frontPage_->refresh(); });
@@ -44,7 +44,7 @@ void Companion::start() {
                      "The Music pane cannot be shown. Install its plug-in again.");
     }
     screen_.scheduleDrawing();
-    host_->openLibrary(places_.music, [this] { Q_EMIT libraryRead(); });
+    host_->openLibrary([this] { Q_EMIT libraryRead(); });
 }
 
 void Companion::enterBackground() {

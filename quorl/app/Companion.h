@@ -33,6 +33,9 @@ class Companion final : public QObject {
 
     [[nodiscard]] PaneScreen& screen() { return screen_; }
 
+    /// Starts the sync engine of a trial, where this is one; that of the session starts by itself.
+    void startTrialEngine() { host_->startTrialEngine(); }
+
     /// Brings the Music pane on the screen, over the front page, and begins to read the music
     /// folder. Throws `std::system_error` where the process may open no more files or start no more
     /// threads.

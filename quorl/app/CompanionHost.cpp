@@ -1,28 +1,57 @@
 #include "quorl/app/CompanionHost.h"
 
 #include "services/base/Utf8.h"
+#include "services/preferences/ChosenFolder.h"
 
 namespace quorl {
 
 namespace {
 
-wearable::Wearable wearableOf(const Places& places) {
-    return places.wearable.empty() ? wearable::Wearable::embedded()
-                                   : wearable::Wearable{places.wearable, {}, false};
+wearable::Wearable wearableAt(const std::filesystem::path& directory, base::Purpose purpose) {
+    return directory.empty() ? wearable::Wearable::embedded(purpose)
+                             : wearable::Wearable{directory, {}, false};
+}
+
+/// The music folder of a trial.
+std::filesystem::path musicOf(const Places& places) {
+    return places.music.empty() ? preferences::chosenMusicFolder() : places.music;
 }
 
 } // namespace
 
 CompanionHost::CompanionHost(const Places& places, Screen& screen, Notices& notices)
-    : screen_(screen),
+    : purpose_(places.purpose()),
+      screen_(screen),
       notices_(notices),
       store_(
-          [&notices](const std::string& text) { notices.set(Notices::Topic::Preferences, text); }),
+          purpose_,
+          [&notices](const std::string& text) { notices.set(Notices::Topic::Preferences, text); },
+          [this] { placesDidChange(); }),
       syncDefaults_(std::make_shared<SyncDefaults>(store_)),
       library_(std::make_shared<MusicLibrary>()),
-      wearable_(wearableOf(places)),
-      engine_({places.music, places.wearable},
-              [this](const std::string& problem) { engineDidChange(problem); }) {}
+      wearable_(wearableAt(places.wearable, purpose_)),
+      engine_(purpose_, [this](const std::string& problem) { engineDidChange(problem); }) {
+    if (purpose_ == base::Purpose::Trial) {
+        store_.choosePlaces(musicOf(places), places.wearable);
+    }
+    wearable_.setWearable(wearableAt(store_.wearableDirectory(), purpose_));
+}
+
+void CompanionHost::startTrialEngine() {
+    if (purpose_ == base::Purpose::Trial) {
+        trialEngine_.emplace([this](const std::string& problem) {
+            notices_.set(Notices::Topic::TrialEngine, problem);
+        });
+    }
+}
+
+/// Another program has chosen another music folder or wearable.
+void CompanionHost::placesDidChange() {
+    wearable_.setWearable(wearableAt(store_.wearableDirectory(), purpose_));
+    if (libraryTaken_) {
+        readLibrary();
+    }
+}
 
 void CompanionHost::engineDidChange(const std::string& problem) {
     isEngineHeardOf_ = true;
@@ -32,10 +61,15 @@ void CompanionHost::engineDidChange(const std::string& problem) {
     }
 }
 
-void CompanionHost::openLibrary(const std::filesystem::path& music, std::function<void()> taken) {
-    library_->open(music, [this, taken = std::move(taken)](const media::Inventory& inventory) {
+void CompanionHost::openLibrary(std::function<void()> taken) {
+    libraryTaken_ = std::move(taken);
+    readLibrary();
+}
+
+void CompanionHost::readLibrary() {
+    library_->open(store_.musicFolder(), [this](const media::Inventory& inventory) {
         noticeProblems(inventory);
-        taken();
+        libraryTaken_();
     });
 }
 

@@ -3,6 +3,7 @@
 #include "quorl/adapters/EngineLink.h"
 #include "quorl/adapters/MusicLibrary.h"
 #include "quorl/adapters/PreferencesStore.h"
+#include "quorl/adapters/TrialEngine.h"
 #include "quorl/adapters/WearableUsage.h"
 #include "quorl/app/Notices.h"
 #include "quorl/app/Places.h"
@@ -23,8 +24,15 @@ class CompanionHost final : public Host {
     /// nobody.
     void setEngineObserver(std::function<void()> changed) { engineChanged_ = std::move(changed); }
 
-    /// Begins to read the music folder. `taken` is called after each reading.
-    void openLibrary(const std::filesystem::path& music, std::function<void()> taken);
+    /// Starts the engine of a trial, where this is one. Where a trial has none, nothing is synced.
+    void startTrialEngine();
+
+    /// Whether the chosen wearable is the one in this machine.
+    [[nodiscard]] bool isWearableEmbedded() const { return store_.wearableDirectory().empty(); }
+
+    /// Begins to read the music folder, and does so again when another one is chosen. `taken` is
+    /// called after each reading.
+    void openLibrary(std::function<void()> taken);
 
     /// Whether the music folder has been read for the first time, the wearable has answered all
     /// that it was asked, and the sync engine has been heard of.
@@ -42,15 +50,20 @@ class CompanionHost final : public Host {
   private:
     void noticeProblems(const media::Inventory& inventory);
     void engineDidChange(const std::string& problem);
+    void placesDidChange();
+    void readLibrary();
 
+    const base::Purpose purpose_;
     Screen& screen_;
     Notices& notices_;
     PreferencesStore store_;
     std::shared_ptr<SyncDefaults> syncDefaults_;
     std::shared_ptr<MusicLibrary> library_;
+    std::function<void()> libraryTaken_;
     WearableUsage wearable_;
     std::function<void()> engineChanged_;
-    bool isEngineHeardOf_ = false; ///< or of there being none
+    bool isEngineHeardOf_ = false;           ///< or of there being none
+    std::optional<TrialEngine> trialEngine_; ///< nothing where this is no trial
     EngineLink engine_;
 };
 

@@ -13,7 +13,7 @@ class Notices final : public QObject {
     Q_OBJECT
 
   public:
-    enum class Topic { Pane, SessionBus, Preferences, MusicFolder, Watching };
+    enum class Topic { Pane, SessionBus, TrialEngine, Preferences, MusicFolder, Watching };
 
     /// Puts `text` in place of what the topic had; an empty one takes it away.
     void set(Topic topic, const std::string& text);

@@ -7,6 +7,7 @@
 #include "runtime/services/SizeText.h"
 #include "services/base/Utf8.h"
 #include "services/media/MusicFolder.h"
+#include "services/preferences/ChosenFolder.h"
 
 namespace quorl {
 
@@ -68,9 +69,10 @@ void printLeftOut(const media::Inventory& inventory) {
 } // namespace
 
 ExitCode printLibrary(const std::filesystem::path& music) {
-    const auto inventory = media::scan(music);
+    const auto inventory = media::scan(music.empty() ? preferences::chosenMusicFolder() : music);
     if (!inventory->rootFound) {
-        std::cerr << "quorl: There is no music folder at " << base::printable(music.string())
+        std::cerr << "quorl: There is no music folder at "
+                  << base::printable(inventory->root.string())
                   << ". Create it, or name another one with --music.\n";
         return ExitCode::NoMusicFolder;
     }

@@ -18,6 +18,7 @@ ExitCode runInTerminal(char* program, const Places& places) {
     Notices notices;
     Companion companion(places, screen, notices);
     const TextSession session(companion, STDIN_FILENO, std::cout);
+    companion.startTrialEngine();
     companion.start();
     return static_cast<ExitCode>(QCoreApplication::exec());
 }

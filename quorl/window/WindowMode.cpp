@@ -28,6 +28,7 @@ ExitCode runInWindow(char* program, const Places& places) {
     Companion companion(places, screen, notices);
     MainWindow window(companion, screen);
     window.resize(usualSize);
+    companion.startTrialEngine();
     companion.start();
     window.show();
     return static_cast<ExitCode>(QApplication::exec());

@@ -1,9 +1,16 @@
 #pragma once
 
+#include "services/base/Purpose.h"
+
 /// Names that the sync engine has on the session bus; see resources/dbus.
 namespace quorl::engine {
 
 inline constexpr auto busName = "org.quorl.Velora.Sync";
+inline constexpr auto trialBusName = "org.quorl.Velora.Sync.Trial";
+
+[[nodiscard]] constexpr const char* busNameFor(base::Purpose purpose) {
+    return purpose == base::Purpose::Trial ? trialBusName : busName;
+}
 
 inline constexpr auto managerPath = "/org/quorl/Velora/Sync";
 inline constexpr auto enginePath = "/org/quorl/Velora/Sync/Engine";

@@ -85,10 +85,11 @@ std::string problemOf(const SchemaPointer& schema, std::string_view name, const 
 
 } // namespace
 
-FoundSchemas findSchemas(Purpose purpose) {
+FoundSchemas findSchemas(base::Purpose purpose) {
     FoundSchemas found;
     for (const auto name : schemaNames) {
-        const auto id = (purpose == Purpose::Trial ? trialPrefix : prefix) + std::string(name);
+        const auto id =
+            (purpose == base::Purpose::Trial ? trialPrefix : prefix) + std::string(name);
         auto schema = lookUp(id.c_str());
         if (auto problem = problemOf(schema, name, id); !problem.empty()) {
             return {{}, std::move(problem)};

@@ -3,8 +3,8 @@
 #include <string>
 #include <vector>
 
+#include "services/base/Purpose.h"
 #include "services/preferences/Pointers.h"
-#include "services/preferences/Purpose.h"
 
 namespace quorl::preferences {
 
@@ -20,6 +20,6 @@ struct [[nodiscard]] FoundSchemas {
 /// is right in a build tree and in any installation, then where GSettings looks, and checks that
 /// they have each value of the table with its type: GSettings would end the process on a value that
 /// is missing.
-FoundSchemas findSchemas(Purpose purpose);
+FoundSchemas findSchemas(base::Purpose purpose);
 
 } // namespace quorl::preferences

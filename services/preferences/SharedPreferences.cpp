@@ -248,7 +248,7 @@ SharedPreferences::SharedPreferences(std::unique_ptr<Store> store) : store_(std:
 
 SharedPreferences::~SharedPreferences() = default;
 
-SharedPreferences::Opened SharedPreferences::open(Changed changed, Purpose purpose) {
+SharedPreferences::Opened SharedPreferences::open(Changed changed, base::Purpose purpose) {
     auto found = findSchemas(purpose);
     if (!found.problem.empty()) {
         return {nullptr, std::move(found.problem)};

@@ -7,8 +7,8 @@
 #include <string_view>
 #include <type_traits>
 
+#include "services/base/Purpose.h"
 #include "services/preferences/Preference.h"
-#include "services/preferences/Purpose.h"
 
 namespace quorl::preferences {
 
@@ -66,7 +66,7 @@ class SharedPreferences {
     /// which is what GIO does by default with the bus connection that a process has in common.
     ///
     /// @param changed may be empty.
-    static Opened open(Changed changed, Purpose purpose = Purpose::Use);
+    static Opened open(Changed changed, base::Purpose purpose = base::Purpose::Use);
 
     SharedPreferences(const SharedPreferences&) = delete;
     SharedPreferences& operator=(const SharedPreferences&) = delete;

@@ -21,8 +21,9 @@ std::filesystem::path dataDirectory() {
 
 } // namespace
 
-Wearable Wearable::embedded(std::uint64_t capacity) {
-    return {dataDirectory() / "quorl/wearable", capacity, false};
+Wearable Wearable::embedded(base::Purpose purpose, std::uint64_t capacity) {
+    const auto* const name = purpose == base::Purpose::Trial ? "trial-wearable" : "wearable";
+    return {dataDirectory() / "quorl" / name, capacity, false};
 }
 
 Wearable Wearable::mounted(const std::filesystem::path& root) {

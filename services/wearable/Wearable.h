@@ -4,6 +4,8 @@
 #include <filesystem>
 #include <optional>
 
+#include "services/base/Purpose.h"
+
 namespace quorl::wearable {
 
 /// What the wearable is called in every text.
@@ -35,8 +37,10 @@ struct Wearable {
 
     [[nodiscard]] bool isEmbedded() const { return capacity.has_value(); }
 
-    /// The one in the user's data directory. It is made where it does not exist yet.
-    [[nodiscard]] static Wearable embedded(std::uint64_t capacity = embeddedCapacity);
+    /// The one in the user's data directory, which has another one for trials. It is made where it
+    /// does not exist yet.
+    [[nodiscard]] static Wearable embedded(base::Purpose purpose = base::Purpose::Use,
+                                           std::uint64_t capacity = embeddedCapacity);
 
     /// A device that is mounted at `root`, or at a directory above it.
     [[nodiscard]] static Wearable mounted(const std::filesystem::path& root);

@@ -119,9 +119,10 @@ bool Program::wait() {
     return g_subprocess_get_successful(process_.get()) != FALSE;
 }
 
-Peer::Peer(const Environment& environment, const std::filesystem::path& program, Purpose purpose)
-    : program_(purpose == Purpose::Trial ? std::vector<std::string>{program.string(), "trial"}
-                                         : std::vector<std::string>{program.string()},
+Peer::Peer(const Environment& environment, const std::filesystem::path& program,
+           base::Purpose purpose)
+    : program_(purpose == base::Purpose::Trial ? std::vector<std::string>{program.string(), "trial"}
+                                               : std::vector<std::string>{program.string()},
                environment),
       greeting_(reply()) {}
 

@@ -54,7 +54,7 @@ class Peer {
   public:
     explicit Peer(const Environment& environment = {},
                   const std::filesystem::path& program = PEER_PROGRAM,
-                  Purpose purpose = Purpose::Use);
+                  base::Purpose purpose = base::Purpose::Use);
 
     /// The line with which it began.
     [[nodiscard]] const std::string& greeting() const { return greeting_; }

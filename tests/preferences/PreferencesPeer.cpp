@@ -136,7 +136,7 @@ int main(int argc, char** /*argv*/) {
     Speaker speaker;
     const auto opened = SharedPreferences::open(
         [&speaker](SharedPreferences&, const KeySet& keys) { speaker.say(told(keys)); },
-        argc > 1 ? Purpose::Trial : Purpose::Use);
+        argc > 1 ? quorl::base::Purpose::Trial : quorl::base::Purpose::Use);
     if (!opened.preferences) {
         speaker.say("failed: " + opened.problem);
         return 1;

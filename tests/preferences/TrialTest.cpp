@@ -17,14 +17,15 @@ class PreferencesOfATrial : public DesktopSessionTest {
     }
 
     static std::unique_ptr<SharedPreferences> open(SharedPreferences::Changed changed = {}) {
-        auto [preferences, problem] = SharedPreferences::open(std::move(changed), Purpose::Trial);
+        auto [preferences, problem] =
+            SharedPreferences::open(std::move(changed), quorl::base::Purpose::Trial);
         EXPECT_EQ(problem, "");
         return std::move(preferences);
     }
 };
 
 TEST_F(PreferencesOfATrial, AreSeenByTheOthersOfTheTrialAndByNobodyElse) {
-    Peer trial({}, PEER_PROGRAM, Purpose::Trial);
+    Peer trial({}, PEER_PROGRAM, quorl::base::Purpose::Trial);
     Peer other;
     const auto preferences = open();
 
@@ -40,7 +41,7 @@ TEST_F(PreferencesOfATrial, AreSeenByTheOthersOfTheTrialAndByNobodyElse) {
 TEST_F(PreferencesOfATrial, AreToldToTheOthersOfTheTrialAndToNobodyElse) {
     Told told;
     const auto used = openShared(told.callback());
-    Peer trial({}, PEER_PROGRAM, Purpose::Trial);
+    Peer trial({}, PEER_PROGRAM, quorl::base::Purpose::Trial);
     Peer other;
     const auto preferences = open();
 

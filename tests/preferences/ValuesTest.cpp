@@ -30,7 +30,7 @@ TEST_F(Values, AreTheDefaultsAsLongAsNobodyWroteThem) {
 }
 
 TEST_F(Values, AreDeclaredInTheSchemasAsInTheTable) {
-    const auto [schemas, problem] = findSchemas(Purpose::Use);
+    const auto [schemas, problem] = findSchemas(quorl::base::Purpose::Use);
     ASSERT_EQ(problem, "");
 
     std::size_t count = 0;

@@ -35,8 +35,7 @@ class BrokenPlugin : public testing::Test {
 
     /// The page in a terminal, in one line.
     [[nodiscard]] std::string page() const {
-        QuorlProcess quorl(
-            {"--text", "--music", music_.path(), "--plugins", plugins_.path().string()});
+        QuorlProcess quorl({"--text", "--plugins", plugins_.path().string()});
         EXPECT_EQ(quorl.end(), 0) << quorl.errors();
         std::string text = quorl.output();
         std::ranges::replace(text, '\n', ' ');
@@ -98,7 +97,7 @@ TEST_F(BrokenPlugin, emptyPlaceFallsBackToTheInstalledPlugin) {
 
 TEST_F(BrokenPlugin, commandsGetAHintAndTheAppGoesOn) {
     registerAs("{");
-    QuorlProcess quorl({"--text", "--music", music_.path(), "--plugins", plugins_.path().string()});
+    QuorlProcess quorl({"--text", "--plugins", plugins_.path().string()});
     quorl.say("1");
     quorl.readUntil("A number taps the row");
     quorl.say("q");
@@ -108,8 +107,8 @@ TEST_F(BrokenPlugin, commandsGetAHintAndTheAppGoesOn) {
 TEST_F(BrokenPlugin, isPicturedToo) {
     registerAs("{");
     const auto file = (music_.folder() / "shot.png").string();
-    QuorlProcess quorl({"--screenshot", file, "--music", music_.path(), "--plugins",
-                        plugins_.path().string(), "--pane", "limit"});
+    QuorlProcess quorl(
+        {"--screenshot", file, "--plugins", plugins_.path().string(), "--pane", "limit"});
     EXPECT_EQ(quorl.end(), 0);
     EXPECT_EQ(QImage(QString::fromStdString(file)).size(), QSize(360, 720));
 }

@@ -1,4 +1,6 @@
 #include <filesystem>
+#include <future>
+#include <utility>
 
 #include <gmock/gmock.h>
 #include <nlohmann/json.hpp>
@@ -32,7 +34,7 @@ class WithEngine : public testing::Test {
     }
 
     [[nodiscard]] std::vector<std::string> arguments(const std::string& mode) const {
-        return {mode, "--music", music_.path()};
+        return {mode};
     }
 
     [[nodiscard]] static std::filesystem::path onWearable(const std::string& name) {
@@ -89,8 +91,7 @@ TEST_F(WithSlowEngine, engineThatIsKilledLeavesNoSessionOnTheScreen) {
 TEST(WithBusOfItsOwn, busThatGoesAwayIsToldAndTheAppNeitherEndsNorSpins) {
     const SampleMusic music;
     syncd::testing::SecondBus bus;
-    QuorlProcess quorl({"--text", "--music", music.path()},
-                       {{"DBUS_SESSION_BUS_ADDRESS", bus.address()}});
+    QuorlProcess quorl({"--text"}, {{"DBUS_SESSION_BUS_ADDRESS", bus.address()}});
     quorl.say("1");
     quorl.readUntil("  3  ✓ None\n");
 
@@ -208,7 +209,7 @@ TEST_F(WithEngine, titlesSteerNoTerminalWhenTheStatusIsPrinted) {
 
 TEST(WithoutEngine, statusSaysSo) {
     const SampleMusic music;
-    QuorlProcess status({"--status", "--music", music.path()});
+    QuorlProcess status({"--status"});
     EXPECT_EQ(status.end(), 0);
     EXPECT_THAT(status.output(), HasSubstr("not running; start quorl-syncd"));
 }
@@ -233,6 +234,43 @@ TEST(WithoutEngine, statusDoesNotGuessWhatBecameOfAChoice) {
     EXPECT_EQ(json["progress"], nullptr);
 }
 
+/// What the engine of the session has as its music folder.
+std::string musicFolderOfEngine() {
+    std::promise<std::string> folder;
+    bool isTold = false;
+    const engine::Client client([&](const engine::Event& event) {
+        if (event.state->isThere && !std::exchange(isTold, true)) {
+            folder.set_value(event.state->engine.musicFolder);
+        }
+    });
+    return folder.get_future().get();
+}
+
+TEST_F(WithSlowEngine, commandsThatOnlyReadLeaveTheMusicFolderAndTheRunningSyncAlone) {
+    QuorlProcess quorl(arguments("--text"));
+    choose(quorl);
+    const TemporaryDirectory other;
+    const auto picture = (other.path() / "a.png").string();
+
+    for (const std::vector<std::string>& command : {std::vector<std::string>{"--status"},
+                                                    {"--library"},
+                                                    {"--screenshot", picture},
+                                                    {"--text"}}) {
+        auto elsewhere = command;
+        elsewhere.insert(elsewhere.end(), {"--music", other.path().string()});
+        for (const auto& asked : {command, elsewhere}) {
+            QuorlProcess reader(asked);
+            EXPECT_EQ(reader.end(), 0) << asked.front() << reader.errors();
+        }
+    }
+
+    EXPECT_EQ(musicFolderOfEngine(), music_.path());
+    QuorlProcess status({"--status", "--json"});
+    ASSERT_EQ(status.end(), 0);
+    EXPECT_EQ(nlohmann::json::parse(status.output())["state"], "syncing");
+    EXPECT_EQ(quorl.end(), 0);
+}
+
 TEST(WithoutBus, statusIsAFailure) {
     QuorlProcess status({"--status"}, {{"DBUS_SESSION_BUS_ADDRESS", "unix:path=/nowhere"}});
     EXPECT_EQ(status.end(), 1);
@@ -242,7 +280,7 @@ TEST(WithoutBus, statusIsAFailure) {
 
 TEST(WithoutEngine, frontPageSaysWhatToDo) {
     const SampleMusic music;
-    QuorlProcess quorl({"--text", "--music", music.path()});
+    QuorlProcess quorl({"--text"});
     quorl.say("b");
     quorl.readUntil("The sync engine is not running");
     EXPECT_EQ(quorl.end(), 0);

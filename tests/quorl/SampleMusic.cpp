@@ -1,5 +1,7 @@
 #include "tests/quorl/SampleMusic.h"
 
+#include "tests/quorl/StoredPreferences.h"
+
 namespace quorl::tests {
 
 SampleMusic::SampleMusic() {
@@ -7,6 +9,7 @@ SampleMusic::SampleMusic() {
     folder_.write("Long Run.m3u8", "#EXTM3U\none.flac\ntwo.flac\nthree.flac\n");
     folder_.write("Morning Mix.m3u8", "#EXTM3U\n#GENERATED:mix\ntwo.flac\n");
     folder_.write("Road Trip.m3u8", "#EXTM3U\none.flac\ngone.flac\n");
+    storePreference("music-folder", path());
 }
 
 void SampleMusic::addPlaylist(const std::string& name) const {

@@ -5,7 +5,8 @@
 namespace quorl::tests {
 
 /// A music folder with two playlists, "Long Run" of three songs and "Road Trip" of one, a generated
-/// mix "Morning Mix", and a song that a playlist names and that is not there.
+/// mix "Morning Mix", and a song that a playlist names and that is not there. It is the one that is
+/// chosen in this session.
 class SampleMusic {
   public:
     SampleMusic();

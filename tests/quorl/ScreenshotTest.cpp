@@ -18,7 +18,7 @@ class Screenshot : public testing::Test {
   protected:
     QImage take(std::vector<std::string> options, const Environment& environment = {}) {
         const auto file = (music_.folder() / "shot.png").string();
-        options.insert(options.end(), {"--screenshot", file, "--music", music_.path()});
+        options.insert(options.end(), {"--screenshot", file});
         QuorlProcess quorl(options, environment);
         EXPECT_EQ(quorl.end(), 0) << quorl.errors();
         return QImage(QString::fromStdString(file));
@@ -76,7 +76,7 @@ TEST_F(Screenshot, rightToLeftLanguageMirrorsTheFinishedLayout) {
 TEST_F(Screenshot, playlistChooserShowsTheChosenPlaylist) {
     storePreference("asset-sync-enabled", "false");
     const auto none = tinted(take({"--pane", "playlist"}), headerHeight(1));
-    QuorlProcess quorl({"--text", "--music", music_.path()});
+    QuorlProcess quorl({"--text"});
     quorl.say("1");
     quorl.say("1");
     quorl.readUntil("✓ Long Run");
@@ -97,7 +97,7 @@ TEST_F(Screenshot, widestWindowKeepsTheCardsInTheMiddle) {
 }
 
 TEST_F(Screenshot, fileThatCannotBeWrittenIsNamed) {
-    QuorlProcess quorl({"--screenshot", "/nonexistent/a.png", "--music", music_.path()});
+    QuorlProcess quorl({"--screenshot", "/nonexistent/a.png"});
     EXPECT_EQ(quorl.end(), 1);
     EXPECT_THAT(quorl.errors(), HasSubstr("/nonexistent/a.png"));
 }

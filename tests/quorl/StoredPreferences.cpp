@@ -9,12 +9,17 @@ namespace {
 
 constexpr int patience = 60'000; // milliseconds
 
+QString schemaOf(const QString& key) {
+    return key == QStringLiteral("music-folder") || key == QStringLiteral("wearable-directory")
+               ? QStringLiteral("org.quorl.Velora.Places")
+               : QStringLiteral("org.quorl.Velora.AssetSync");
+}
+
 std::string gsettings(const char* command, const QStringList& arguments) {
     QProcess process;
     process.start(QStringLiteral("gsettings"),
                   QStringList{QStringLiteral("--schemadir"), QStringLiteral(SCHEMA_DIRECTORY),
-                              QString::fromLatin1(command),
-                              QStringLiteral("org.quorl.Velora.AssetSync")} +
+                              QString::fromLatin1(command), schemaOf(arguments.front())} +
                       arguments);
     if (!process.waitForFinished(patience) || process.exitCode() != 0) {
         throw std::runtime_error("gsettings: " + process.readAllStandardError().toStdString());

@@ -69,7 +69,7 @@ class TextSessionTest : public testing::Test {
     SampleMusic music_;
     TextScreen screen_;
     Notices notices_;
-    Companion companion_ = Companion(Places{music_.folder().path(), {}, {}}, screen_, notices_);
+    Companion companion_ = Companion(Places{}, screen_, notices_);
     std::array<int, 2> input_{};
     std::ostringstream output_;
     std::optional<TextSession> session_;

@@ -15,9 +15,7 @@ using testing::Not;
 
 class Text : public testing::Test {
   protected:
-    [[nodiscard]] std::vector<std::string> arguments() const {
-        return {"--text", "--music", music_.path()};
-    }
+    [[nodiscard]] std::vector<std::string> arguments() const { return {"--text"}; }
 
     SampleMusic music_;
 };

@@ -3,17 +3,26 @@
 #include <QTest>
 #include <stdexcept>
 
+#include "tests/quorl/StoredPreferences.h"
+
 namespace quorl::tests {
 
 namespace {
 
 constexpr int patience = 60'000; // milliseconds
 
+/// Chooses the folder, where one is given.
+Places placesWith(const std::filesystem::path& music) {
+    if (!music.empty()) {
+        storePreference("music-folder", music.string());
+    }
+    return {};
+}
+
 } // namespace
 
 Window::Window(const std::filesystem::path& music)
-    : companion_(Places{music.empty() ? music_.folder().path() : music, {}, {}}, screen_, notices_),
-      window_(companion_, screen_) {
+    : companion_(placesWith(music), screen_, notices_), window_(companion_, screen_) {
     window_.resize(360, 720);
     companion_.start();
     window_.show();
