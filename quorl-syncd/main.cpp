@@ -132,10 +132,14 @@ int serve(const Options& options) {
         engine.choicesDidChange();
     };
     syncd::DirectoryCheck check;
-    const syncd::BusObjects::ObjectionTo objectionTo = [&](const std::string& directory) {
-        return check.objectionTo(directory);
+    const auto remember = [&](const auto& place) {
+        return
+            [&](const std::string& path) { return opened.preferences->set(place, path).problem; };
     };
-    objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine, objectionTo);
+    const syncd::BusObjects::Places places{
+        [&](const std::string& directory) { return check.objectionTo(directory); },
+        remember(preferences::musicFolder), remember(preferences::wearableDirectory)};
+    objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine, places);
     try {
         loop.bus().requestName(engine::busNameFor(options.purpose));
     } catch (const sdbus::Error& error) {

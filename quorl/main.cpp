@@ -1,6 +1,8 @@
 #include <iostream>
 
 #include "quorl/app/CommandLine.h"
+#include "quorl/commands/PlaylistList.h"
+#include "quorl/commands/RunCommands.h"
 #include "quorl/reports/LibraryReport.h"
 #include "quorl/reports/Screenshot.h"
 #include "quorl/reports/StatusReport.h"
@@ -22,6 +24,10 @@ ExitCode run(char* program, const Options& options) {
         return takeScreenshot(program, options.places, options.picture);
     case Options::Mode::Library:
         return printLibrary(options.places.music);
+    case Options::Mode::Playlists:
+        return printPlaylists(options);
+    case Options::Mode::Commands:
+        return runCommands(options.commands);
     case Options::Mode::Status:
         return printStatus(options);
     }

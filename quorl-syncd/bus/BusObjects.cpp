@@ -25,10 +25,18 @@ void answering(const char* errorName, Act act) {
     }
 }
 
-void requireUsable(const BusObjects::ObjectionTo& objectionTo, const std::string& directory) {
-    const auto objection = objectionTo(directory);
-    if (!objection.empty()) {
+/// Throws `NotReady` where the directory cannot be taken, or not be remembered; then all is as it
+/// was.
+template <class Take>
+void choose(const std::string& directory, const std::string& before, Take take,
+            const BusObjects::Directory& check, const BusObjects::Directory& remember) {
+    if (const auto objection = check(directory); !objection.empty()) {
         throw NotReady(objection);
+    }
+    take(directory);
+    if (const auto problem = remember(directory); !problem.empty()) {
+        take(before);
+        throw NotReady(problem);
     }
 }
 
@@ -38,10 +46,10 @@ class BusObjects::EngineObject final
     : public sdbus::AdaptorInterfaces<org::quorl::Velora::Sync::Engine_adaptor,
                                       sdbus::Properties_adaptor> {
   public:
-    EngineObject(sdbus::IConnection& bus, Engine& engine, const ObjectionTo& objectionTo)
+    EngineObject(sdbus::IConnection& bus, Engine& engine, const Places& places)
         : AdaptorInterfaces{bus, engine::enginePath},
           engine_(engine),
-          objectionTo_(objectionTo),
+          places_(places),
           published_(engine.status()) {
         registerAdaptor();
     }
@@ -61,8 +69,10 @@ class BusObjects::EngineObject final
 
     void MusicFolder(const std::string& path) override {
         answering(engine::notReadyError, [&] {
-            requireUsable(objectionTo_, path);
-            engine_.setMusicFolder(path);
+            choose(
+                path, engine_.status().musicFolder,
+                [this](const std::string& folder) { engine_.setMusicFolder(folder); },
+                places_.check, places_.rememberMusicFolder);
         });
     }
 
@@ -78,6 +88,12 @@ class BusObjects::EngineObject final
 
     std::string PlaylistName() override { return engine::valueOf<"PlaylistName">(*published_); }
 
+    std::uint64_t PlaylistID() override { return engine::valueOf<"PlaylistID">(*published_); }
+
+    std::uint64_t LimitType() override { return engine::valueOf<"LimitType">(*published_); }
+
+    std::uint64_t Limit() override { return engine::valueOf<"Limit">(*published_); }
+
     bool LastSuccess() override { return engine::valueOf<"LastSuccess">(*published_); }
 
     std::string LastMessage() override { return engine::valueOf<"LastMessage">(*published_); }
@@ -85,7 +101,7 @@ class BusObjects::EngineObject final
     std::uint64_t LastTime() override { return engine::valueOf<"LastTime">(*published_); }
 
     Engine& engine_;
-    const ObjectionTo& objectionTo_;
+    const Places& places_;
     Published<engine::EngineStatus> published_;
 };
 
@@ -93,10 +109,10 @@ class BusObjects::WearableObject final
     : public sdbus::AdaptorInterfaces<org::quorl::Velora::Sync::Wearable_adaptor,
                                       sdbus::Properties_adaptor> {
   public:
-    WearableObject(sdbus::IConnection& bus, Engine& engine, const ObjectionTo& objectionTo)
+    WearableObject(sdbus::IConnection& bus, Engine& engine, const Places& places)
         : AdaptorInterfaces{bus, engine::wearablePath},
           engine_(engine),
-          objectionTo_(objectionTo),
+          places_(places),
           published_(engine.wearable()) {
         registerAdaptor();
     }
@@ -110,8 +126,11 @@ class BusObjects::WearableObject final
 
     void Directory(const std::string& path) override {
         answering(engine::notReadyError, [&] {
-            requireUsable(objectionTo_, path);
-            engine_.setWearableDirectory(path);
+            const auto before = engine_.wearable();
+            choose(
+                path, before.isEmbedded ? "" : before.directory,
+                [this](const std::string& root) { engine_.setWearableDirectory(root); },
+                places_.check, places_.rememberWearable);
         });
     }
 
@@ -142,13 +161,13 @@ class BusObjects::WearableObject final
     void Refresh() override { engine_.refreshWearable(); }
 
     Engine& engine_;
-    const ObjectionTo& objectionTo_;
+    const Places& places_;
     Published<engine::WearableStatus> published_;
 };
 
-BusObjects::BusObjects(sdbus::IConnection& bus, Engine& engine, const ObjectionTo& objectionTo)
-    : engine_(std::make_unique<EngineObject>(bus, engine, objectionTo)),
-      wearable_(std::make_unique<WearableObject>(bus, engine, objectionTo)) {
+BusObjects::BusObjects(sdbus::IConnection& bus, Engine& engine, const Places& places)
+    : engine_(std::make_unique<EngineObject>(bus, engine, places)),
+      wearable_(std::make_unique<WearableObject>(bus, engine, places)) {
     bus.addObjectManager(engine::managerPath, sdbus::floating_slot);
 }
 

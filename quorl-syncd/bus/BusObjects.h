@@ -14,11 +14,19 @@ class Engine;
 /// bus loop's thread.
 class BusObjects {
   public:
-    /// Says why the engine cannot work with a directory; an empty text where it can.
-    using ObjectionTo = std::function<std::string(const std::string& directory)>;
+    /// What is done with a directory that a client has chosen. Gives back an empty text, or a
+    /// sentence that says why it cannot be done.
+    using Directory = std::function<std::string(const std::string& directory)>;
+
+    /// What it takes to choose a place.
+    struct Places {
+        Directory check; ///< whether the engine can work with it
+        Directory rememberMusicFolder;
+        Directory rememberWearable;
+    };
 
     /// All of these outlive the objects.
-    BusObjects(sdbus::IConnection& bus, Engine& engine, const ObjectionTo& objectionTo);
+    BusObjects(sdbus::IConnection& bus, Engine& engine, const Places& places);
     ~BusObjects();
 
     BusObjects(const BusObjects&) = delete;

@@ -340,6 +340,9 @@ void Engine::publish() {
     status_.status = statusOf(now, status_.lastMessage);
     status_.syncState = syncStateOf(now);
     status_.playlistName = playlistName();
+    status_.playlistID = now.choices.isSyncEnabled ? now.choices.playlist.value_or(0) : 0;
+    status_.limitType = now.choices.limitType;
+    status_.limit = now.choices.limit;
     ports_.announcer.stateDidChange();
 }
 

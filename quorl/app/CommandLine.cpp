@@ -1,11 +1,15 @@
 #include "quorl/app/CommandLine.h"
 
+#include <algorithm>
 #include <charconv>
 #include <iostream>
 #include <map>
 #include <optional>
+#include <vector>
 
 #include <CLI/CLI.hpp>
+
+#include "services/preferences/Preference.h"
 
 namespace quorl {
 
@@ -15,7 +19,10 @@ constexpr const char* exitCodes = "Exit codes:\n"
                                   "  0  done\n"
                                   "  1  it could not be done; standard error says why\n"
                                   "  2  the command line is wrong\n"
-                                  "  3  --library: the music folder is missing";
+                                  "  3  --library, --playlists: the music folder is missing";
+
+/// So that megabytes are still a number of bytes.
+constexpr std::uint64_t mostOfALimit = std::uint64_t{1} << 40U;
 
 constexpr int smallestSide = 200;
 constexpr int largestSide = 8192;
@@ -45,20 +52,92 @@ std::string takeSize(const std::string& text, Picture& picture) {
     return {};
 }
 
-void addModes(CLI::App& app, Options& options, bool& text, bool& library, bool& status) {
-    auto* textFlag =
-        app.add_flag("--text", text, "Show the pane in the terminal, without any display");
+/// Which of the modes were given.
+struct Flags {
+    bool text = false;
+    bool library = false;
+    bool playlists = false;
+    bool status = false;
+};
+
+void excludeEachOther(const std::vector<CLI::Option*>& options) {
+    for (auto one = options.begin(); one != options.end(); ++one) {
+        std::for_each(std::next(one), options.end(),
+                      [one](CLI::Option* other) { (*one)->excludes(other); });
+    }
+}
+
+void addModes(CLI::App& app, Options& options, Flags& flags) {
+    auto* text =
+        app.add_flag("--text", flags.text, "Show the pane in the terminal, without any display");
     auto* screenshot = app.add_option("--screenshot", options.picture.file,
                                       "Write a picture of the pane to FILE (PNG) and end")
                            ->type_name("FILE");
-    auto* libraryFlag = app.add_flag(
-        "--library", library, "Print what the music folder holds and what was left out, and end");
-    auto* statusFlag =
-        app.add_flag("--status", status, "Print how the sync and the wearable stand, and end");
-    app.add_flag("--json", options.json, "Print the status as JSON")->needs(statusFlag);
-    textFlag->excludes(screenshot)->excludes(libraryFlag)->excludes(statusFlag);
-    screenshot->excludes(libraryFlag)->excludes(statusFlag);
-    libraryFlag->excludes(statusFlag);
+    auto* library =
+        app.add_flag("--library", flags.library,
+                     "Print what the music folder holds and what was left out, and end");
+    auto* playlists = app.add_flag("--playlists", flags.playlists,
+                                   "Print the playlists that can be chosen, one a line: id, songs, "
+                                   "bytes, name, separated by tabs; and end");
+    auto* status = app.add_flag("--status", flags.status,
+                                "Print how the sync and the wearable stand, and end");
+    excludeEachOther({text, screenshot, library, playlists, status});
+    app.add_flag("--json", options.json, "Print the status or the playlists as JSON");
+}
+
+/// What a unit of a limit counts; nothing where it is none.
+std::optional<std::uint64_t> limitTypeOf(const std::string& unit) {
+    static const std::map<std::string, std::uint64_t> types{
+        {"song", preferences::LimitType::Songs},
+        {"songs", preferences::LimitType::Songs},
+        {"mb", preferences::LimitType::Megabytes}};
+    const auto found = types.find(CLI::detail::to_lower(unit));
+    return found == types.end() ? std::nullopt : std::optional(found->second);
+}
+
+/// Takes "50 songs" or "500 MB"; gives what is wrong back, empty for nothing.
+std::string takeLimit(const std::string& text, Commands& commands) {
+    LimitChoice limit;
+    const char* end = text.data() + text.size();
+    const auto parsed = std::from_chars(text.data(), end, limit.amount);
+    const auto type = limitTypeOf(CLI::detail::trim_copy(std::string(parsed.ptr, end)));
+    if (parsed.ec != std::errc() || limit.amount == 0 || limit.amount > mostOfALimit || !type) {
+        return "give the limit as a number of songs or megabytes, for instance \"50 songs\" or "
+               "\"500 MB\"";
+    }
+    limit.type = *type;
+    commands.limit = limit;
+    return {};
+}
+
+void addCommands(CLI::App& app, Commands& commands) {
+    std::vector<CLI::Option*> all{
+        app.add_option("--choose", commands.playlist,
+                       "Choose this playlist, by its name or its id, or \"none\"")
+            ->type_name("PLAYLIST"),
+        app.add_option_function<std::string>(
+               "--limit",
+               [&commands](const std::string& limit) {
+                   if (const auto problem = takeLimit(limit, commands); !problem.empty()) {
+                       throw CLI::ValidationError("--limit", problem);
+                   }
+               },
+               "Choose how much of it is synced at most: \"50 songs\", \"500 MB\"")
+            ->type_name("LIMIT"),
+        app.add_flag("--sync", commands.sync,
+                     "Sync now, also off the charger and when everything was sent already"),
+        app.add_flag("--cancel", commands.cancel, "End the running sync"),
+        app.add_flag("--wait", commands.wait,
+                     "End when everything is on the wearable, or it is clear that it does not get "
+                     "there"),
+    };
+    app.get_option("--sync")->excludes(app.get_option("--cancel"));
+    for (auto* command : all) {
+        for (const auto* other : {"--text", "--screenshot", "--library", "--playlists", "--status",
+                                  "--json", "--music", "--wearable"}) {
+            command->excludes(app.get_option(other));
+        }
+    }
 }
 
 void addPlaces(CLI::App& app, Places& places) {
@@ -104,16 +183,17 @@ void addPictureOptions(CLI::App& app, Picture& picture) {
         ->needs(screenshot);
 }
 
-void chooseMode(Options& options, bool text, bool library, bool status) {
-    if (text) {
-        options.mode = Options::Mode::Text;
-    } else if (library) {
-        options.mode = Options::Mode::Library;
-    } else if (status) {
-        options.mode = Options::Mode::Status;
-    } else if (!options.picture.file.empty()) {
-        options.mode = Options::Mode::Screenshot;
-    }
+Options::Mode modeOf(const Options& options, const Flags& flags) {
+    const auto& commands = options.commands;
+    const bool isCommanded =
+        commands.playlist || commands.limit || commands.sync || commands.cancel || commands.wait;
+    return flags.text                      ? Options::Mode::Text
+           : flags.library                 ? Options::Mode::Library
+           : flags.playlists               ? Options::Mode::Playlists
+           : flags.status                  ? Options::Mode::Status
+           : isCommanded                   ? Options::Mode::Commands
+           : !options.picture.file.empty() ? Options::Mode::Screenshot
+                                           : Options::Mode::Window;
 }
 
 void complete(Places& places) {
@@ -128,18 +208,20 @@ void complete(Places& places) {
 
 std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* argv) {
     Options options;
-    bool text = false;
-    bool library = false;
-    bool status = false;
+    Flags flags;
     CLI::App app("Chooses the music that goes to your Velora.", "quorl");
     app.set_version_flag("--version", "quorl " QUORL_VERSION, "Print the version and end");
     app.set_help_flag("-h,--help", "Print this help and end");
     app.footer(exitCodes);
-    addModes(app, options, text, library, status);
+    addModes(app, options, flags);
     addPlaces(app, options.places);
+    addCommands(app, options.commands);
     addPictureOptions(app, options.picture);
     try {
         app.parse(argc, argv);
+        if (options.json && !flags.status && !flags.playlists) {
+            throw CLI::RequiresError("--json", "--status or --playlists");
+        }
     } catch (const CLI::ParseError& error) {
         if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) {
             app.exit(error); // help or version
@@ -148,7 +230,7 @@ std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* ar
         std::cerr << "quorl: " << error.what() << "\nRun \"quorl --help\" for the options.\n";
         return ExitCode::Usage;
     }
-    chooseMode(options, text, library, status);
+    options.mode = modeOf(options, flags);
     complete(options.places);
     return options;
 }

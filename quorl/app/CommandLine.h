@@ -1,5 +1,8 @@
 #pragma once
 
+#include <cstdint>
+#include <optional>
+#include <string>
 #include <variant>
 
 #include "quorl/app/ExitCode.h"
@@ -8,14 +11,30 @@
 
 namespace quorl {
 
+/// How much of the playlist is synced at most.
+struct LimitChoice {
+    std::uint64_t type = 0; ///< a `preferences::LimitType`
+    std::uint64_t amount = 0;
+};
+
+/// What is to be done without showing anything, in this order.
+struct Commands {
+    std::optional<std::string> playlist; ///< to be chosen: its name, its id, or "none"
+    std::optional<LimitChoice> limit;    ///< to be chosen
+    bool cancel = false;                 ///< the running sync
+    bool sync = false;                   ///< now
+    bool wait = false;                   ///< until all is on the wearable
+};
+
 /// What the command line asks for.
 struct Options {
-    enum class Mode { Window, Text, Screenshot, Library, Status };
+    enum class Mode { Window, Text, Screenshot, Library, Playlists, Status, Commands };
 
     Mode mode = Mode::Window;
     Places places;
-    Picture picture;   ///< of the screenshot
-    bool json = false; ///< of the status
+    Picture picture; ///< of the screenshot
+    Commands commands;
+    bool json = false; ///< of the status and the playlists
 };
 
 /// What the arguments ask for, or what to end with at once: after `--help` and `--version`, which

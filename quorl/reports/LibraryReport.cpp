@@ -1,7 +1,6 @@
 #include "quorl/reports/LibraryReport.h"
 
 #include <iostream>
-#include <numeric>
 
 #include "runtime/plugins/StringTable.h"
 #include "runtime/services/SizeText.h"
@@ -15,13 +14,6 @@ namespace {
 
 std::string countOf(std::size_t count, const std::string& singular) {
     return std::to_string(count) + " " + singular + (count == 1 ? "" : "s");
-}
-
-std::uint64_t bytesOf(const media::Playlist& playlist, const media::Inventory& inventory) {
-    return std::accumulate(playlist.songs.begin(), playlist.songs.end(), std::uint64_t{0},
-                           [&inventory](std::uint64_t sum, media::SongIndex song) {
-                               return sum + inventory.songs[song].size;
-                           });
 }
 
 std::string_view kindOf(const media::Playlist& playlist) {
@@ -43,8 +35,8 @@ std::string describe(const media::Playlist& playlist, const media::Inventory& in
                      const std::string& language) {
     std::string line = base::printable(playlist.name) + ": " +
                        countOf(playlist.songs.size(), "song") + ", " +
-                       sizeText(static_cast<double>(bytesOf(playlist, inventory)), language) +
-                       ", " + base::printable(playlist.path);
+                       sizeText(static_cast<double>(inventory.bytesOf(playlist)), language) + ", " +
+                       base::printable(playlist.path);
     const auto kind = kindOf(playlist);
     return kind.empty() ? line : line + " (" + std::string(kind) + ")";
 }

@@ -9,6 +9,8 @@
 
 #include <nlohmann/json.hpp>
 
+#include "runtime/plugins/StringTable.h"
+#include "runtime/services/SizeText.h"
 #include "services/base/Utf8.h"
 #include "services/engine/Client.h"
 #include "services/preferences/SharedPreferences.h"
@@ -101,6 +103,10 @@ Json jsonOf(const engine::EngineState& state, const Choice& choice) {
     return json;
 }
 
+std::string size(std::uint64_t bytes) {
+    return sizeText(static_cast<double>(bytes), environmentLanguages().front());
+}
+
 void printText(const engine::EngineState& state, const Choice& choice) {
     const bool isKnown = choice.state != engine::syncUnknown;
     std::cout << "Playlist:   "
@@ -121,8 +127,9 @@ void printText(const engine::EngineState& state, const Choice& choice) {
               << "Wearable:   " << base::printable(state.wearable.name)
               << (state.wearable.isConnected ? ", connected" : ", not connected")
               << (state.wearable.isOnCharger ? ", on its charger" : ", not on its charger") << '\n'
-              << "Storage:    " << state.wearable.available << " of " << state.wearable.capacity
-              << " bytes free, " << state.wearable.songs << " in songs\n"
+              << "Storage:    " << size(state.wearable.available) << " of "
+              << size(state.wearable.capacity) << " free, " << size(state.wearable.songs)
+              << " in songs\n"
               << "Last sync:  "
               << (state.engine.lastTime == 0 ? "not yet"
                                              : base::printable(state.engine.lastMessage))

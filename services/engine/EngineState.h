@@ -77,6 +77,10 @@ struct EngineStatus {
     std::string syncState = {};
     /// The chosen playlist, by the name that is shown; empty for none.
     std::string playlistName = {};
+    /// What the engine goes by. 0: sync is switched off, or no playlist is chosen.
+    std::uint64_t playlistID = 0;
+    std::uint64_t limitType = 0;
+    std::uint64_t limit = 0;
     /// What became of the last session with this wearable; no text before the first.
     bool lastSuccess = false;
     std::string lastMessage = {};

@@ -1,6 +1,7 @@
 #include "services/media/Inventory.h"
 
 #include <algorithm>
+#include <numeric>
 
 namespace quorl::media {
 
@@ -32,6 +33,12 @@ void SongTable::shrink() {
 const Playlist* Inventory::playlist(std::uint64_t id) const {
     const auto found = std::ranges::find(playlists, id, &Playlist::id);
     return found == playlists.end() ? nullptr : &*found;
+}
+
+std::uint64_t Inventory::bytesOf(const Playlist& playlist) const {
+    return std::accumulate(
+        playlist.songs.begin(), playlist.songs.end(), std::uint64_t{0},
+        [this](std::uint64_t sum, SongIndex song) { return sum + songs[song].size; });
 }
 
 std::string Inventory::unwatchedNotice() const {

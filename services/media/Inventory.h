@@ -116,6 +116,9 @@ struct Inventory {
     /// The playlist of this id; null: there is none.
     [[nodiscard]] const Playlist* playlist(std::uint64_t id) const;
 
+    /// The sizes of its songs together, of one that is listed twice both times.
+    [[nodiscard]] std::uint64_t bytesOf(const Playlist& playlist) const;
+
     /// What to tell a person about `unwatchedDirectories`, in English; empty where there are none.
     [[nodiscard]] std::string unwatchedNotice() const;
 

@@ -86,6 +86,7 @@ RULES = {
     "quorl/window": program("platform", "runtime", "quorl/app", "quorl/content"),
     "quorl/terminal": program(
         "platform", "runtime", "services/base", "quorl/app", "quorl/content"),
+    "quorl/commands": program("services", "quorl/app"),
     "quorl/reports": program("runtime", "services", "quorl/app", "quorl/window"),
     "quorl/main.cpp": program("quorl"),
     "quorl-script": program("platform", "runtime", "doubles"),

@@ -1,0 +1,32 @@
+#include "quorl/commands/EngineWatch.h"
+
+#include <future>
+
+namespace quorl {
+
+EngineWatch::EngineWatch() : client_([this](const engine::Event& event) { take(event); }) {}
+
+void EngineWatch::take(const engine::Event& event) {
+    const std::scoped_lock lock(mutex_);
+    state_ = event.state;
+    problem_ = event.state->isThere ? "" : event.message;
+    changed_.notify_all();
+}
+
+std::variant<std::shared_ptr<const engine::EngineState>, std::string>
+EngineWatch::waitUntil(const Condition& condition) {
+    std::unique_lock lock(mutex_);
+    changed_.wait(lock, [&] { return state_ && (!state_->isThere || condition(*state_)); });
+    if (state_->isThere) {
+        return state_;
+    }
+    return "The sync engine is not running. Start quorl-syncd, or log in again. (" + problem_ + ")";
+}
+
+std::string EngineWatch::ask(void (engine::Client::*what)(engine::Client::Reply)) {
+    std::promise<std::string> answer;
+    (client_.*what)([&answer](const std::string& problem) { answer.set_value(problem); });
+    return answer.get_future().get();
+}
+
+} // namespace quorl

@@ -1,0 +1,60 @@
+#include "quorl/commands/PlaylistList.h"
+
+#include <iostream>
+
+#include <nlohmann/json.hpp>
+
+#include "quorl/commands/OfferedPlaylists.h"
+#include "services/base/Utf8.h"
+#include "services/media/MusicFolder.h"
+#include "services/preferences/ChosenFolder.h"
+
+namespace quorl {
+
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+void printLines(const media::Inventory& inventory) {
+    for (const auto* playlist : offeredIn(inventory)) {
+        // Neither the name's tabs nor its line ends are left.
+        std::cout << playlist->id << '\t' << playlist->songs.size() << '\t'
+                  << inventory.bytesOf(*playlist) << '\t' << base::printable(playlist->name)
+                  << '\n';
+    }
+}
+
+void printJson(const media::Inventory& inventory) {
+    auto list = Json::array();
+    for (const auto* playlist : offeredIn(inventory)) {
+        // An id has more digits than many a reader of JSON keeps of a number.
+        list.push_back({{"id", std::to_string(playlist->id)},
+                        {"name", playlist->name},
+                        {"songs", playlist->songs.size()},
+                        {"bytes", inventory.bytesOf(*playlist)},
+                        {"path", playlist->path}});
+    }
+    std::cout << list.dump(2, ' ', false, Json::error_handler_t::replace) << '\n';
+}
+
+} // namespace
+
+ExitCode printPlaylists(const Options& options) {
+    const auto& music = options.places.music;
+    const auto inventory = media::scan(music.empty() ? preferences::chosenMusicFolder() : music);
+    if (!inventory->rootFound) {
+        std::cerr << "quorl: There is no music folder at "
+                  << base::printable(inventory->root.string())
+                  << ". Create it, or name another one with --music.\n";
+        return ExitCode::NoMusicFolder;
+    }
+    options.json ? printJson(*inventory) : printLines(*inventory);
+    std::cout.flush();
+    if (!std::cout) {
+        std::cerr << "quorl: The list could not be written to standard output.\n";
+        return ExitCode::Failure;
+    }
+    return ExitCode::Success;
+}
+
+} // namespace quorl

@@ -1,0 +1,177 @@
+// What is done from the command line without showing anything.
+
+#include <filesystem>
+
+#include <gmock/gmock.h>
+#include <nlohmann/json.hpp>
+
+#include "tests/quorl/QuorlProcess.h"
+#include "tests/quorl/SampleMusic.h"
+#include "tests/quorl/StoredPreferences.h"
+
+namespace quorl::tests {
+
+namespace {
+
+using testing::AllOf;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::Not;
+
+class Commands : public testing::Test {
+  protected:
+    /// Runs `quorl` to its end; gives its exit code back.
+    int run(const std::vector<std::string>& arguments) {
+        QuorlProcess quorl(arguments);
+        const int code = quorl.end();
+        output_ = quorl.output();
+        errors_ = quorl.errors();
+        return code;
+    }
+
+    /// The id of a playlist as it is listed.
+    std::string idOf(const std::string& name) {
+        EXPECT_EQ(run({"--playlists", "--json"}), 0) << errors_;
+        for (const auto& playlist : nlohmann::json::parse(output_)) {
+            if (playlist["name"] == name) {
+                return playlist["id"];
+            }
+        }
+        return "";
+    }
+
+    SampleMusic music_;
+    std::string output_;
+    std::string errors_;
+};
+
+TEST_F(Commands, playlistsAreThoseThatCanBeChosenWithSongsAndBytes) {
+    EXPECT_EQ(run({"--playlists"}), 0);
+    EXPECT_THAT(output_,
+                AllOf(HasSubstr("\t3\t3145728\tLong Run\n"), HasSubstr("\t1\t1048576\tRoad Trip\n"),
+                      Not(HasSubstr("Morning Mix"))));
+}
+
+TEST_F(Commands, playlistsOfAMissingFolderAreAFailure) {
+    EXPECT_EQ(run({"--playlists", "--music", "/nonexistent"}), 3);
+    EXPECT_THAT(errors_, HasSubstr("/nonexistent"));
+}
+
+TEST_F(Commands, choosingByNameOrIdIsStored) {
+    const auto id = idOf("Road Trip");
+
+    EXPECT_EQ(run({"--choose", "Road Trip"}), 0) << errors_;
+    EXPECT_EQ(storedPreference("asset-sync-enabled"), "true");
+    EXPECT_THAT(storedPreference("asset-sync-playlist-persistent-id"), HasSubstr(id));
+
+    const auto other = idOf("Long Run");
+    EXPECT_EQ(run({"--choose", other}), 0) << errors_;
+    EXPECT_THAT(storedPreference("asset-sync-playlist-persistent-id"), HasSubstr(other));
+}
+
+TEST_F(Commands, choosingNoneKeepsThePlaylist) {
+    const auto id = idOf("Road Trip");
+    ASSERT_EQ(run({"--choose", "Road Trip"}), 0) << errors_;
+
+    EXPECT_EQ(run({"--choose", "none"}), 0) << errors_;
+
+    EXPECT_EQ(storedPreference("asset-sync-enabled"), "false");
+    EXPECT_THAT(storedPreference("asset-sync-playlist-persistent-id"), HasSubstr(id));
+}
+
+TEST_F(Commands, choosingWhatIsNotOfferedSaysWhatToDoAndChangesNothing) {
+    for (const auto* name : {"Nothing", "Morning Mix", "", "1"}) {
+        EXPECT_EQ(run({"--choose", name}), 1) << name;
+        EXPECT_THAT(errors_, HasSubstr("quorl --playlists")) << name;
+    }
+    EXPECT_EQ(storedPreference("asset-sync-enabled"), "false");
+}
+
+TEST_F(Commands, choosingANameThatTwoHaveListsTheirIds) {
+    music_.folder().write("a/Road Trip.m3u8", "../one.flac\n");
+
+    EXPECT_EQ(run({"--choose", "Road Trip"}), 1);
+
+    EXPECT_THAT(errors_, AllOf(HasSubstr("Several"), HasSubstr("a/Road Trip.m3u8")));
+    EXPECT_EQ(storedPreference("asset-sync-enabled"), "false");
+}
+
+TEST_F(Commands, limitIsStored) {
+    EXPECT_EQ(run({"--limit", "50 songs"}), 0) << errors_;
+    EXPECT_EQ(storedPreference("asset-sync-limit"), "@mt 50");
+    EXPECT_EQ(storedPreference("asset-sync-limit-type"), "uint64 1");
+    EXPECT_EQ(run({"--limit", "2048MB"}), 0) << errors_;
+    EXPECT_EQ(storedPreference("asset-sync-limit"), "@mt 2048");
+    EXPECT_EQ(storedPreference("asset-sync-limit-type"), "uint64 0");
+}
+
+TEST_F(Commands, limitThatIsNoneIsAMistake) {
+    for (const auto* limit : {"50", "songs", "-1 songs", "0 MB", "1.5 MB", "50 GB", ""}) {
+        EXPECT_EQ(run({"--limit", limit}), 2) << limit;
+        EXPECT_THAT(errors_, HasSubstr("50 songs")) << limit;
+    }
+    EXPECT_EQ(storedPreference("asset-sync-limit"), "@mt 500");
+}
+
+TEST_F(Commands, withoutAnEngineWaitingSaysWhatToDo) {
+    EXPECT_EQ(run({"--wait"}), 1);
+    EXPECT_THAT(errors_, HasSubstr("Start quorl-syncd"));
+}
+
+class CommandsWithEngine : public Commands {
+  protected:
+    CommandsWithEngine() {
+        engine_.start(QStringLiteral(QUORL_ENGINE), {});
+        if (!engine_.waitForStarted()) {
+            throw std::runtime_error("the engine does not start");
+        }
+    }
+
+    ~CommandsWithEngine() override {
+        engine_.terminate();
+        engine_.waitForFinished();
+    }
+
+    QProcess engine_;
+};
+
+TEST_F(CommandsWithEngine, waitingEndsWhenTheChoiceIsOnTheWearable) {
+    EXPECT_EQ(run({"--choose", "Road Trip", "--limit", "15 songs", "--wait"}), 0) << errors_;
+
+    const auto wearable =
+        std::filesystem::path(qgetenv("XDG_DATA_HOME").toStdString()) / "quorl/wearable/Music";
+    EXPECT_TRUE(std::filesystem::exists(wearable / "Road Trip.m3u8"));
+    EXPECT_THAT(output_, IsEmpty());
+
+    EXPECT_EQ(run({"--choose", "Long Run", "--wait"}), 0) << errors_;
+    EXPECT_TRUE(std::filesystem::exists(wearable / "Long Run.m3u8"));
+}
+
+TEST_F(CommandsWithEngine, waitingForNothingIsAFailure) {
+    EXPECT_EQ(run({"--choose", "none", "--wait"}), 1);
+    EXPECT_THAT(errors_, HasSubstr("Music sync is switched off."));
+}
+
+TEST_F(CommandsWithEngine, syncingWithNothingChosenSaysWhy) {
+    EXPECT_EQ(run({"--sync"}), 1);
+    EXPECT_THAT(errors_, HasSubstr("Music sync is switched off."));
+}
+
+TEST_F(CommandsWithEngine, syncingNowWaitsForASessionOfItsOwn) {
+    ASSERT_EQ(run({"--choose", "Road Trip", "--wait"}), 0) << errors_;
+
+    EXPECT_EQ(run({"--sync", "--wait"}), 0) << errors_;
+    EXPECT_EQ(run({"--cancel"}), 0) << "nothing runs, which is no failure";
+}
+
+TEST_F(CommandsWithEngine, statusHasFiguresForPeople) {
+    ASSERT_EQ(run({"--choose", "Road Trip", "--wait"}), 0) << errors_;
+
+    EXPECT_EQ(run({"--status"}), 0);
+
+    EXPECT_THAT(output_, HasSubstr(" of 4 GB free, 1 MB in songs"));
+}
+
+} // namespace
+
+} // namespace quorl::tests
