@@ -478,6 +478,42 @@ TEST_F(Engine, TakesAnotherMusicFolderAtRunTime) {
     EXPECT_EQ(recorder_.state().engine.musicFolder, other.path().string());
 }
 
+TEST_F(Engine, KeepsTheChosenPlacesForItsNextRun) {
+    const TemporaryDirectory device;
+    const auto run = [this] {
+        engine_ = std::make_unique<Process>(std::vector<std::string>{ENGINE_PROGRAM});
+        recorder_.next(Kind::EngineDidAppear);
+    };
+    run();
+    EXPECT_EQ(recorder_.ask(&engine::Client::setMusicFolder, music_.path().string()), "");
+    EXPECT_EQ(recorder_.ask(&engine::Client::setWearableDirectory, device.path().string()), "");
+    end();
+
+    run();
+    EXPECT_EQ(recorder_.state().engine.musicFolder, music_.path());
+    EXPECT_EQ(recorder_.state().wearable.directory, device.path());
+    EXPECT_EQ(recorder_.ask(&engine::Client::setWearableDirectory, std::string()), "");
+    end();
+
+    run();
+    EXPECT_TRUE(recorder_.state().wearable.isEmbedded);
+}
+
+TEST_F(Engine, TakesAMusicFolderThatIsChosenInTheSettings) {
+    music_.list({});
+    Music other;
+    other.write("a.mp3", "a");
+    other.list({"a.mp3"});
+    engine_ = std::make_unique<Process>(std::vector<std::string>{ENGINE_PROGRAM});
+    recorder_.next(Kind::EngineDidAppear);
+    choose();
+
+    set(preferences::musicFolder, other.path().string());
+
+    EXPECT_TRUE(sessionEnd().success);
+    EXPECT_EQ(onWearable().at("a.mp3"), "a");
+}
+
 TEST_F(Engine, LeavesInOrderWhenItIsEndedInTheMiddle) {
     listLargeSongs();
     start({"--rate-limit", slowly});
