@@ -13,7 +13,7 @@ namespace quorl::base {
 
 namespace {
 
-std::atomic<bool> isAnyLeftBehind = false;
+std::atomic<int> looseThreads = 0;
 
 } // namespace
 
@@ -39,9 +39,11 @@ struct Errand::Shared {
 Errand::Errand(Work work, std::chrono::milliseconds patience)
     : shared_(std::make_shared<Shared>()),
       patience_(patience),
-      thread_([shared = shared_, work = std::move(work)]() mutable {
+      thread_([shared = shared_, work = std::move(work),
+               loose = std::make_unique<LooseThread>()]() mutable {
           work(shared->stop.get_token());
           work = {};
+          loose.reset();
           shared->end();
       }) {}
 
@@ -51,7 +53,6 @@ Errand::~Errand() {
         thread_.join();
     } else {
         thread_.detach();
-        noteThreadLeftBehind();
     }
 }
 
@@ -62,10 +63,12 @@ void Errand::stop() {
     }
 }
 
-void noteThreadLeftBehind() { isAnyLeftBehind = true; }
+LooseThread::LooseThread() { ++looseThreads; }
+
+LooseThread::~LooseThread() { --looseThreads; }
 
 int endOfProgram(int code) {
-    if (isAnyLeftBehind) {
+    if (looseThreads > 0) {
         std::cout.flush();
         std::fflush(nullptr);
         _exit(code);

@@ -38,11 +38,18 @@ class Errand {
     std::thread thread_;
 };
 
-/// A thread of this process was left to itself. Any thread.
-void noteThreadLeftBehind();
+/// Held for a thread for which nobody waits for ever, from before it begins until it ends.
+class LooseThread {
+  public:
+    LooseThread();
+    ~LooseThread();
 
-/// Ends the program: gives back `code`, to be returned by `main`. Where a thread was left behind,
-/// the process ends here and now, for that thread may still use what `exit` takes down.
+    LooseThread(const LooseThread&) = delete;
+    LooseThread& operator=(const LooseThread&) = delete;
+};
+
+/// Ends the program: gives back `code`, to be returned by `main`. Where a loose thread still runs,
+/// the process ends here and now, for that thread may use what `exit` takes down.
 [[nodiscard]] int endOfProgram(int code);
 
 } // namespace quorl::base

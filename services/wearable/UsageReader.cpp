@@ -67,10 +67,6 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
         }
         changed_.notify_one();
         clerk_.join();
-        const std::scoped_lock lock(mutex_);
-        if (lookers_ > 0) {
-            base::noteThreadLeftBehind();
-        }
     }
 
     void ask(Reply reply) {
@@ -140,7 +136,8 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
     /// The thread keeps the questions, and with it `look_`, for as long as the device hangs.
     [[nodiscard]] bool sendLooker(std::uint64_t number) {
         try {
-            std::thread([questions = shared_from_this(), number] {
+            std::thread([questions = shared_from_this(), number,
+                         loose = std::make_shared<base::LooseThread>()] {
                 questions->lookFor(number);
             }).detach();
             ++lookers_;

@@ -7,6 +7,7 @@
 
 #include "services/engine/Client.h"
 #include "tests/engine/Process.h"
+#include "tests/engine/SlowDevice.h"
 #include "tests/quorl/QuorlProcess.h"
 #include "tests/quorl/SampleMusic.h"
 #include "tests/quorl/StoredPreferences.h"
@@ -205,6 +206,20 @@ TEST_F(WithEngine, titlesSteerNoTerminalWhenTheStatusIsPrinted) {
     QuorlProcess json({"--status", "--json"});
     ASSERT_EQ(json.end(), 0);
     EXPECT_THAT(json.output(), HasSubstr(R"("Evil\u001b[2J\u009b1m\u202ekcab\u2066in\u2028line")"));
+}
+
+TEST(WithHangingWearable, appIsDrawnAndLeft) {
+    syncd::testing::SlowDevice device;
+    if (!device.isThere()) {
+        GTEST_SKIP() << "only root may mount";
+    }
+    const SampleMusic music;
+    device.stall();
+    QuorlProcess quorl({"--text", "--music", music.path(), "--wearable", device.path()});
+    quorl.readUntil("Synced Playlist");
+    device.awaitStalled();
+
+    EXPECT_EQ(quorl.end(), 0);
 }
 
 TEST(WithoutEngine, statusSaysSo) {
