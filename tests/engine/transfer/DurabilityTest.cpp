@@ -436,6 +436,24 @@ TEST_F(FullWearable, GetsAnotherChoiceInThePlaceOfTheOldOne) {
     EXPECT_LT(settled, find(steps, {"remove", "Music/old.mp3", ""}));
 }
 
+TEST_F(FullWearable, LosesNoSongBeforeItsPlaylistAlsoAfterASyncThatWasCutOff) {
+    music_.list({"new.mp3", "small.mp3"});
+    const auto cutOff = observedSync(wishFor(music_, player_), [](const Step& step) {
+        if (step.operation == "remove") {
+            fail(EIO);
+        }
+    });
+    EXPECT_EQ(cutOff.kind, Kind::Failed);
+    Steps steps;
+
+    const auto outcome =
+        observedSync(wishFor(music_, player_), [&](const Step& step) { steps.push_back(step); });
+
+    EXPECT_EQ(outcome.kind, Kind::Sent) << outcome.message;
+    EXPECT_LT(find(steps, {"remove", "Music/List.m3u8", ""}),
+              find(steps, {"remove", "Music/old.mp3", ""}));
+}
+
 TEST_F(FullWearable, IsNotTouchedWhereEvenThenThereIsNoRoom) {
     music_.write("large.mp3", std::string(2'000'000, 'l'));
     music_.list({"large.mp3"});
