@@ -169,7 +169,7 @@ bool make(int root, const std::string& name, mode_t mode) {
 std::string freeNameOnFat(int root) {
     const auto names = namesIn(root);
     for (int number = 1;; ++number) {
-        const auto name = "QUORL" + std::to_string(number) + ".NEW";
+        auto name = "QUORL" + std::to_string(number) + ".NEW";
         const auto isSame = [&](const std::string& other) {
             return strcasecmp(name.c_str(), other.c_str()) == 0;
         };
