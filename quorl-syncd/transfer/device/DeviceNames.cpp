@@ -104,7 +104,7 @@ bool TakenNames::insert(std::string_view name) {
 
 std::string TakenNames::take(std::string_view name) {
     constexpr int firstNumber = 2;
-    const auto wanted = deviceName(name);
+    auto wanted = deviceName(name);
     if (insert(wanted)) {
         return wanted;
     }
