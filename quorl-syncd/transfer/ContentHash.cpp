@@ -2,7 +2,6 @@
 
 #include <array>
 #include <new>
-#include <vector>
 
 #include <xxhash.h>
 
@@ -43,14 +42,15 @@ std::string hashOf(std::string_view text) {
 std::string hashOf(Reader& reader, const std::stop_token& stop) {
     constexpr std::size_t pieceSize = 1 << 20;
     ContentHash hash;
-    std::vector<std::byte> buffer(pieceSize);
+    const auto memory = std::make_unique_for_overwrite<std::byte[]>(pieceSize);
+    const std::span buffer(memory.get(), pieceSize);
     for (;;) {
         stopIf(stop);
         const auto size = reader.read(buffer);
         if (size == 0) {
             return hash.text();
         }
-        hash.add(std::span(buffer).first(size));
+        hash.add(buffer.first(size));
     }
 }
 

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <memory>
 #include <system_error>
 #include <utility>
 
@@ -78,11 +79,12 @@ std::string Copier::copyContents(OpenSong& source, UnfinishedFile& destination,
     const bool isShared = destination.share(source.descriptor());
     const auto mostBytes = progress_.bytes + size;
     ContentHash hash;
-    std::vector<std::byte> buffer(largestPiece);
+    const auto memory = std::make_unique_for_overwrite<std::byte[]>(largestPiece);
+    const std::span buffer(memory.get(), largestPiece);
     for (std::uint64_t copied = 0;;) {
         stopIf(means_.stop);
         const auto most = std::min(means_.ports.throttle.chunk(), largestPiece);
-        const auto piece = std::span(buffer).first(source.read(std::span(buffer).first(most)));
+        const auto piece = buffer.first(source.read(buffer.first(most)));
         if (piece.empty()) {
             return hash.text();
         }

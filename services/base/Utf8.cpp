@@ -48,8 +48,9 @@ bool isSteering(gunichar character) {
            (character >= firstIsolate && character <= lastIsolate);
 }
 
+/// Most names are plain ASCII, which has one form alone.
 std::string normalised(std::string_view text, GNormalizeMode mode) {
-    if (!g_utf8_validate_len(text.data(), text.size(), nullptr)) {
+    if (isAscii(text) || !g_utf8_validate_len(text.data(), text.size(), nullptr)) {
         return std::string(text);
     }
     return GLibText(g_utf8_normalize(text.data(), static_cast<gssize>(text.size()), mode)).get();
