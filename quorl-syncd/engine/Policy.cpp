@@ -98,7 +98,7 @@ Decision decide(const Situation& situation) {
 
 bool isClaimToBeForgotten(const Situation& situation, const Decision& decision) {
     if (decision.kind == Decision::Kind::Begin) {
-        return !isSent(decision.selection, situation);
+        return true; // also where all was sent: somebody may have asked because it is not there
     }
     return situation.choices.lastSent && situation.usage && !hasClaimed(situation);
 }

@@ -28,7 +28,7 @@ struct Decision {
 [[nodiscard]] Decision decide(const Situation& situation);
 
 /// Whether what the preferences say was sent is to be forgotten before the decision is carried out:
-/// the wearable that is there does not have it, or a sync is about to change what it has.
+/// the wearable that is there does not have it, or a sync begins, which may change what it has.
 [[nodiscard]] bool isClaimToBeForgotten(const Situation& situation, const Decision& decision);
 
 /// What stands in the way of a sync, in a sentence; empty where nothing does.

@@ -241,7 +241,7 @@ INSTANTIATE_TEST_SUITE_P(
         ClaimCase{"a sync begins that changes what was sent", {sendAnotherRevision}, true},
         ClaimCase{"a sync begins to another limit", {sendWithAnotherLimit}, true},
         ClaimCase{"all was sent", {send}, false},
-        ClaimCase{"all was sent, and is asked for again", {send, request}, false},
+        ClaimCase{"all was sent, and is asked for again", {send, request}, true},
         ClaimCase{"the wearable lost it", {rememberOnly}, true},
         ClaimCase{"the wearable lost it, and nothing is chosen", {rememberOnly, switchOff}, true},
         ClaimCase{
