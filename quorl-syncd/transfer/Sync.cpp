@@ -89,8 +89,8 @@ void Sync::perform(Device& device) {
     takeStock(device);
     requireRoom(device);
     told_(plan_.progress);
+    device.settle(); // an earlier sync may have been killed before it was durable
     if (isDone()) {
-        device.settle(); // an earlier sync may have been killed before it was durable
         return;
     }
     beginChanges(device);
@@ -130,10 +130,19 @@ Hashes Sync::hashes(Device& device) const {
                                                     {song.size, song.modified});
                 return hashOf(*file, stop_);
             },
-            [this, &device](const std::string& name) {
-                const auto file = device.openMusic(name);
-                return hashOf(*file, stop_);
-            }};
+            [this, &device](const std::string& name) { return hashOfCopy(device, name); }};
+}
+
+/// Empty where somebody has removed the file since it was looked at.
+std::string Sync::hashOfCopy(Device& device, const std::string& name) const {
+    try {
+        return hashOf(*device.openMusic(name), stop_);
+    } catch (const std::system_error& error) {
+        if (error.code() != std::errc::no_such_file_or_directory) {
+            throw;
+        }
+        return {};
+    }
 }
 
 void Sync::requireRoom(Device& device) {

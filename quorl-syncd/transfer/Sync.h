@@ -53,6 +53,7 @@ class Sync {
     void keepOnlyWhatIsWished(Device& device);
 
     [[nodiscard]] Hashes hashes(Device& device) const;
+    [[nodiscard]] std::string hashOfCopy(Device& device, const std::string& name) const;
     [[nodiscard]] Outcome outcome() const;
 
     const Order order_;

@@ -1,7 +1,6 @@
 #include "quorl-syncd/transfer/device/Device.h"
 
 #include <algorithm>
-#include <array>
 #include <span>
 #include <system_error>
 #include <utility>
@@ -30,8 +29,9 @@ char upperCase(char letter) {
 std::string readToEnd(Reader& reader) {
     constexpr std::size_t pieceSize = 65536;
     std::string text;
-    std::array<char, pieceSize> piece{};
-    while (const auto size = reader.read(std::as_writable_bytes(std::span(piece)))) {
+    const auto memory = std::make_unique_for_overwrite<char[]>(pieceSize);
+    const std::span piece(memory.get(), pieceSize);
+    while (const auto size = reader.read(std::as_writable_bytes(piece))) {
         text.append(piece.data(), size);
     }
     return text;
@@ -53,14 +53,30 @@ Device::Device(std::unique_ptr<Volume> volume) : volume_(std::move(volume)) { ma
 
 void Device::makeDirectories() {
     std::vector<Directory> made;
-    for (const auto directory : {Directory::Music, Directory::Own}) {
-        if (volume_->makeDirectory(directory)) {
-            made.push_back(directory);
-        }
+    if (volume_->makeDirectory(Directory::Music)) {
+        made.push_back(Directory::Music);
     }
-    if (made.empty()) {
-        return;
+    if (makeOwn()) {
+        made.push_back(Directory::Own);
     }
+    if (!made.empty()) {
+        makeDurable(made);
+    }
+}
+
+/// One that is empty was perhaps never made durable, and could not be removed then.
+bool Device::makeOwn() {
+    if (volume_->makeDirectory(Directory::Own)) {
+        return true;
+    }
+    if (!volume_->names(Directory::Own).empty()) {
+        return false;
+    }
+    volume_->removeDirectory(Directory::Own);
+    return volume_->makeDirectory(Directory::Own);
+}
+
+void Device::makeDurable(const std::vector<Directory>& made) {
     try {
         volume_->syncDirectory(Directory::Top);
     } catch (const std::system_error&) {

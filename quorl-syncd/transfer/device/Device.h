@@ -77,6 +77,8 @@ class Device {
     void discardUnsettled();
 
   private:
+    [[nodiscard]] bool makeOwn();
+    void makeDurable(const std::vector<Volume::Directory>& made);
     [[nodiscard]] std::optional<std::string> readOwn(const std::string& name);
     void makeDirectories();
     void writeGeneration(const std::string& name, const wearable::Manifest& manifest);

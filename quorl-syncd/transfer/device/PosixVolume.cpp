@@ -230,11 +230,16 @@ PosixVolume::PosixVolume(const wearable::Wearable& wearable)
     : wearable_(wearable),
       root_(openWearable(wearable)),
       isFat_(isFat(root_.get())),
-      isOwnNew_(make(root_.get(), Directory::Own, isFat_)) {
+      isOwnNew_(lockOwn()) {}
+
+/// True: it was made.
+bool PosixVolume::lockOwn() {
+    const bool isNew = make(root_.get(), Directory::Own, isFat_);
     own_ = openDirectory(root_.get(), Directory::Own);
     if (flock(own_.get(), LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK) {
         throw std::runtime_error(anotherProgramIsSyncing());
     }
+    return isNew;
 }
 
 int PosixVolume::descriptorOf(Directory directory) const {
@@ -251,7 +256,7 @@ int PosixVolume::descriptorOf(Directory directory) const {
 
 bool PosixVolume::makeDirectory(Directory directory) {
     if (directory == Directory::Own) {
-        return std::exchange(isOwnNew_, false);
+        return own_ ? std::exchange(isOwnNew_, false) : lockOwn();
     }
     const bool isNew = make(root_.get(), directory, isFat_);
     music_ = openDirectory(root_.get(), directory);
@@ -261,6 +266,9 @@ bool PosixVolume::makeDirectory(Directory directory) {
 void PosixVolume::removeDirectory(Directory directory) {
     if (unlinkat(root_.get(), nameOf(directory), AT_REMOVEDIR) != 0) {
         fail(nameOf(directory));
+    }
+    if (directory == Directory::Own) {
+        own_ = FileDescriptor();
     }
 }
 

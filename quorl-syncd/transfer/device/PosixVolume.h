@@ -42,6 +42,7 @@ class PosixVolume final : public Volume {
     [[nodiscard]] std::uint64_t available() override;
 
   private:
+    [[nodiscard]] bool lockOwn();
     [[nodiscard]] int descriptorOf(Directory directory) const;
 
     wearable::Wearable wearable_;
