@@ -12,9 +12,10 @@ namespace quorl::simulation {
 namespace {
 
 /// In the order of `Happening`; how often it happens.
-constexpr std::array<std::pair<std::string_view, std::uint64_t>, 37> happenings{{
+constexpr std::array<std::pair<std::string_view, std::uint64_t>, 38> happenings{{
     {"choose", 8},
     {"change-list", 10},
+    {"reorder-list", 3},
     {"empty-list", 1},
     {"rename-list", 2},
     {"delete-list", 1},
@@ -34,7 +35,7 @@ constexpr std::array<std::pair<std::string_view, std::uint64_t>, 37> happenings{
     {"free", 5},
     {"toggle-read-only", 2},
     {"toggle-slowness", 1},
-    {"fail-writes", 4},
+    {"fail-operations", 5},
     {"fail-sync", 5},
     {"add-file", 5},
     {"rename-file", 4},

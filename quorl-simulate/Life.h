@@ -14,6 +14,7 @@ namespace quorl::simulation {
 enum class Happening {
     Choose,
     ChangeList,
+    ReorderList,
     EmptyList,
     RenameList,
     DeleteList,
@@ -33,7 +34,7 @@ enum class Happening {
     FreeDevice,
     ToggleReadOnly,
     ToggleSlowness,
-    FailWrites,
+    FailOperations,
     FailSync,
     AddFileOfOthers,
     RenameFileOfOthers,

@@ -4,27 +4,28 @@
 #include <array>
 #include <cctype>
 #include <cerrno>
-#include <numeric>
 #include <set>
 #include <system_error>
+#include <utility>
 
 namespace quorl::simulation {
 
 namespace {
 
 constexpr std::size_t sectorSize = 8;
+constexpr std::int64_t oneSecond = 1'000'000'000;
 constexpr char garbage = '\x5A';
 
 [[noreturn]] void fail(int error, std::string_view what) {
     throw std::system_error(error, std::generic_category(), std::string(what));
 }
 
-std::string folded(std::string_view name) {
-    std::string result(name);
-    std::ranges::transform(result, result.begin(), [](unsigned char byte) {
-        return static_cast<char>(std::toupper(byte));
-    });
-    return result;
+char folded(char letter) {
+    return static_cast<char>(std::toupper(static_cast<unsigned char>(letter)));
+}
+
+bool isSameFolded(std::string_view first, std::string_view second) {
+    return std::ranges::equal(first, second, {}, folded, folded);
 }
 
 bool fitsShortName(std::string_view name) {
@@ -46,12 +47,13 @@ std::string shortName(std::string_view name) {
         }
     }
     const auto ending = dot == std::string_view::npos ? std::string_view() : name.substr(dot, 4);
-    return folded(base + "~1" + std::string(ending));
+    return base + "~1" + std::string(ending);
 }
 
 bool isSameName(std::string_view stored, std::string_view asked) {
-    return folded(stored) == folded(asked) ||
-           (!fitsShortName(stored) && shortName(stored) == folded(asked));
+    const bool mayBeShort = asked.find('~') != std::string_view::npos;
+    return isSameFolded(stored, asked) ||
+           (mayBeShort && !fitsShortName(stored) && isSameFolded(shortName(stored), asked));
 }
 
 } // namespace
@@ -126,6 +128,13 @@ std::optional<SimulatedDisk::Node> SimulatedDisk::find(Node directory,
     return found == entries_.at(directory).end() ? std::nullopt : std::optional(found->second.node);
 }
 
+std::optional<SimulatedDisk::Node> SimulatedDisk::findExactly(Node directory,
+                                                              std::string_view name) const {
+    const Entries& entries = entries_.at(directory);
+    const auto found = entries.find(name);
+    return found == entries.end() ? std::nullopt : std::optional(found->second.node);
+}
+
 SimulatedDisk::Status SimulatedDisk::status(Node node) const {
     const File& file = files_.at(node);
     return {file.now.bytes.size(), file.now.modified, file.isDirectory};
@@ -140,7 +149,7 @@ bool SimulatedDisk::isDurable(Node directory, std::string_view name) const {
     const auto durable = names.find(found->first);
     const File& file = files_.at(found->second.node);
     return durable != names.end() && durable->second.node == found->second.node &&
-           durable->second.isRecorded && file.now == file.durable &&
+           durable->second.isRecorded && file.isWhole() &&
            std::ranges::none_of(changes_, [&](const Change& change) {
                return change.directory == directory && change.name == found->first;
            });
@@ -159,6 +168,14 @@ void SimulatedDisk::note(Node directory, const std::string& name, std::optional<
         entries_[directory].erase(name);
     }
     changes_.push_back({directory, name, entry, step_});
+    ++revision_;
+}
+
+/// The contents of a file, to be changed.
+SimulatedDisk::Content& SimulatedDisk::change(Node file) {
+    ++revision_;
+    files_.at(file).isDirty = true;
+    return files_[file].now;
 }
 
 SimulatedDisk::Node SimulatedDisk::add(Node directory, const std::string& name, bool isDirectory) {
@@ -184,28 +201,39 @@ SimulatedDisk::Node SimulatedDisk::create(Node directory, const std::string& nam
 }
 
 void SimulatedDisk::append(Node file, std::string_view bytes) {
+    write(file, files_.at(file).now.bytes.size(), bytes);
+}
+
+void SimulatedDisk::write(Node file, std::size_t offset, std::string_view bytes) {
     beginWriting("write", {});
-    std::string& contents = files_.at(file).now.bytes;
-    if (contents.size() + bytes.size() > largestFile_) {
+    const std::size_t size = files_.at(file).now.bytes.size();
+    const std::size_t end = std::max(size, offset + bytes.size());
+    if (end > largestFile_) {
         fail(EFBIG, "write");
     }
-    if (bytes.size() > available()) {
+    if (end - size > available()) {
         fail(ENOSPC, "write");
     }
-    contents += bytes;
+    Content& content = change(file);
+    content.bytes.replace(offset, bytes.size(), bytes);
+    content.modified = kept(static_cast<std::int64_t>(revision_) * oneSecond / 2);
+    files_[file].isLost = files_[file].isLost && offset > 0; // else it is there to be written again
+}
+
+/// A time as the disk keeps it.
+std::int64_t SimulatedDisk::kept(std::int64_t nanoseconds) const {
+    return rules_ == DiskRules::Fat ? nanoseconds - nanoseconds % (2 * oneSecond) : nanoseconds;
 }
 
 void SimulatedDisk::truncate(Node file) {
     beginWriting("truncate", {});
-    files_.at(file).now.bytes.clear();
+    change(file).bytes.clear();
     files_[file].isLost = false;
 }
 
 void SimulatedDisk::setModified(Node file, std::int64_t nanoseconds) {
-    constexpr std::int64_t twoSeconds = 2'000'000'000;
     beginWriting("utimens", {});
-    files_.at(file).now.modified =
-        rules_ == DiskRules::Fat ? nanoseconds - nanoseconds % twoSeconds : nanoseconds;
+    change(file).modified = kept(nanoseconds);
 }
 
 void SimulatedDisk::rename(Node directory, const std::string& name, Node newDirectory,
@@ -223,41 +251,62 @@ void SimulatedDisk::rename(Node directory, const std::string& name, Node newDire
 void SimulatedDisk::remove(Node directory, const std::string& name) {
     beginWriting("unlink", name);
     const auto found = existing(directory, name);
-    File& file = files_[found->second.node];
     const Node node = found->second.node;
     ++step_;
     note(directory, std::string(found->first), std::nullopt);
-    const bool isShared = std::ranges::any_of(entries_, [node](const auto& each) {
-        return std::ranges::any_of(each.second,
-                                   [node](const auto& other) { return other.second.node == node; });
-    });
+    const bool isShared =
+        rules_ == DiskRules::Fat && std::ranges::any_of(entries_, [node](const auto& each) {
+            return std::ranges::any_of(
+                each.second, [node](const auto& other) { return other.second.node == node; });
+        });
     if (isShared) { // the clusters are somebody else's now
-        std::ranges::fill(file.now.bytes, garbage);
-        file.durable.bytes = file.now.bytes;
+        std::ranges::fill(change(node).bytes, garbage);
+        files_[node].durable.bytes = files_[node].now.bytes;
+    }
+}
+
+void SimulatedDisk::bringToMedium(Node file) {
+    if (files_[file].isDirty) {
+        files_[file].durable = files_[file].now;
+        files_[file].isDirty = false;
     }
 }
 
 /// The names of a file tell its size and place from now on, wherever they are durable already.
 void SimulatedDisk::record(Node node) {
-    const auto recordIn = [node](auto& entries) {
-        for (auto& [name, entry] : entries) {
-            entry.isRecorded = entry.isRecorded || entry.node == node;
-        }
-    };
     for (auto& [directory, entries] : entries_) {
-        recordIn(entries);
-        for (const auto& [name, entry] : entries) {
-            const auto durable = durableEntries_[directory].find(name);
-            if (entry.node == node && durable != durableEntries_[directory].end() &&
-                durable->second.node == node) {
-                durable->second.isRecorded = true;
+        for (auto& [name, entry] : entries) {
+            if (entry.node == node) {
+                recordName(directory, name, entry);
             }
-            for (Change& change : changes_) {
-                if (change.directory == directory && change.name == name && change.entry &&
-                    change.entry->node == node) {
-                    change.entry->isRecorded = true;
-                }
+        }
+    }
+}
+
+/// Of all files that are durable now.
+void SimulatedDisk::recordAll() {
+    for (auto& [directory, entries] : entries_) {
+        for (auto& [name, entry] : entries) {
+            if (!files_[entry.node].isLost) {
+                recordName(directory, name, entry);
             }
+        }
+    }
+}
+
+void SimulatedDisk::recordName(Node directory, const std::string& name, Entry& entry) {
+    if (std::exchange(entry.isRecorded, true)) {
+        return;
+    }
+    auto& durableNames = durableEntries_[directory];
+    const auto durable = durableNames.find(name);
+    if (durable != durableNames.end() && durable->second.node == entry.node) {
+        durable->second.isRecorded = true;
+    }
+    for (Change& change : changes_) {
+        if (change.directory == directory && change.name == name && change.entry &&
+            change.entry->node == entry.node) {
+            change.entry->isRecorded = true;
         }
     }
 }
@@ -272,24 +321,24 @@ void SimulatedDisk::keep(const Change& change) {
 }
 
 /// Makes the chosen changes of names durable, in their order, and forgets them.
-void SimulatedDisk::keepNames(const std::function<bool(const Change&)>& chosen) {
-    std::vector<Change> others;
-    for (const Change& change : changes_) {
-        if (!change.isLost && chosen(change)) {
+template <class Chosen>
+void SimulatedDisk::keepNames(Chosen chosen) {
+    std::erase_if(changes_, [&](const Change& change) {
+        const bool isKept = !change.isLost && chosen(change);
+        if (isKept) {
             keep(change);
-        } else {
-            others.push_back(change);
         }
-    }
-    changes_ = std::move(others);
+        return isKept;
+    });
 }
 
 void SimulatedDisk::sync(Node node) {
     begin("fsync", {});
-    File& file = files_.at(node);
+    ++revision_;
+    const File& file = files_.at(node);
     if (!file.isDirectory) {
         if (!file.isLost) {
-            file.durable = file.now;
+            bringToMedium(node);
             record(node);
         }
         return;
@@ -308,16 +357,18 @@ void SimulatedDisk::sync(Node node) {
 
 void SimulatedDisk::syncAll() {
     begin("syncfs", {});
+    ++revision_;
     for (Node node = 0; node < files_.size(); ++node) {
-        if (!files_[node].isDirectory && !files_[node].isLost) {
-            files_[node].durable = files_[node].now;
-            record(node);
+        if (!files_[node].isLost) {
+            bringToMedium(node);
         }
     }
+    recordAll();
     keepNames([](const Change&) { return true; });
 }
 
 void SimulatedDisk::failSync(Node node) {
+    ++revision_;
     files_.at(node).isLost = !files_[node].isDirectory;
     for (Change& change : changes_) {
         change.isLost = change.isLost || change.directory == node;
@@ -327,10 +378,7 @@ void SimulatedDisk::failSync(Node node) {
 
 /// What is left of a file that was not durable: of its sizes and of each sector, old or new, or
 /// nothing.
-SimulatedDisk::Content SimulatedDisk::remains(const File& file, Random& random) const {
-    if (file.now == file.durable) {
-        return file.now;
-    }
+SimulatedDisk::Content SimulatedDisk::remains(const File& file, Random& random) {
     Content left;
     left.modified = random.onceIn(2) ? file.now.modified : file.durable.modified;
     const std::size_t was = file.durable.bytes.size();
@@ -383,12 +431,15 @@ void SimulatedDisk::chooseRecords(Random& random) {
 }
 
 void SimulatedDisk::losePower(Random& random) {
+    ++revision_;
     chooseNames(random);
     chooseRecords(random);
     for (File& file : files_) {
-        file.now = remains(file, random);
-        file.durable = file.now;
-        file.isLost = false;
+        if (!file.isWhole()) {
+            file.now = remains(file, random);
+            file.durable = file.now;
+        }
+        file.isDirty = file.isLost = false;
     }
     entries_ = durableEntries_;
 }

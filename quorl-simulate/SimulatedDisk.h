@@ -26,6 +26,8 @@ enum class DiskRules {
 /// size and the place of its file only once the file was made durable under it, and two names that
 /// were left for one file share its clusters, which the removal of either gives away.
 ///
+/// Its clock stands but for half a second with each change.
+///
 /// Every failure throws `std::system_error`, as the system calls of the same meaning fail. One
 /// thread.
 class SimulatedDisk {
@@ -42,8 +44,8 @@ class SimulatedDisk {
         bool operator==(const Status&) const = default;
     };
 
-    /// Called before each operation but the first five, with its name and what it is done to. What
-    /// it throws is what the operation does instead.
+    /// Called before each operation that reads or changes something, with its name and what it is
+    /// done to. What it throws is what the operation does instead.
     using Before = std::function<void(std::string_view operation, std::string_view name)>;
 
     SimulatedDisk(DiskRules rules, std::uint64_t capacity, std::uint64_t largestFile);
@@ -52,10 +54,16 @@ class SimulatedDisk {
 
     void setBefore(Before before) { before_ = std::move(before); }
 
+    /// Another number after each change, also of what is durable.
+    [[nodiscard]] std::uint64_t revision() const { return revision_; }
+
     /// What others take of the space, in bytes.
     void setSpaceOfOthers(std::uint64_t bytes) { spaceOfOthers_ = bytes; }
 
     void setReadOnly(bool readOnly) { isReadOnly_ = readOnly; }
+
+    /// A mere look is an operation, too, for those who call this before it.
+    void look(std::string_view operation, std::string_view name) const { begin(operation, name); }
 
     [[nodiscard]] std::uint64_t available() const;
 
@@ -64,6 +72,9 @@ class SimulatedDisk {
     /// The file or directory of this name, also under another spelling by the rules of FAT; nothing
     /// where there is none.
     [[nodiscard]] std::optional<Node> find(Node directory, std::string_view name) const;
+
+    /// As `find`, under this very spelling.
+    [[nodiscard]] std::optional<Node> findExactly(Node directory, std::string_view name) const;
 
     [[nodiscard]] Status status(Node node) const;
 
@@ -77,6 +88,8 @@ class SimulatedDisk {
     /// Makes an empty file. Fails where the name is taken.
     [[nodiscard]] Node create(Node directory, const std::string& name);
     void append(Node file, std::string_view bytes);
+    /// Writes over what is there, and beyond its end.
+    void write(Node file, std::size_t offset, std::string_view bytes);
     void truncate(Node file);
     void setModified(Node file, std::int64_t nanoseconds);
 
@@ -110,7 +123,10 @@ class SimulatedDisk {
         bool isDirectory = false;
         Content now;
         Content durable;
-        bool isLost = false; ///< what differs is thought to be durable
+        bool isDirty = false; ///< the two may differ
+        bool isLost = false;  ///< what differs is thought to be durable
+
+        [[nodiscard]] bool isWhole() const { return !isDirty || now == durable; }
     };
 
     struct Entry {
@@ -135,11 +151,17 @@ class SimulatedDisk {
     [[nodiscard]] Entries::const_iterator existing(Node directory, std::string_view name) const;
     void requireFree(Node directory, std::string_view name) const;
     void note(Node directory, const std::string& name, std::optional<Entry> entry);
+    [[nodiscard]] Content& change(Node file);
+    [[nodiscard]] std::int64_t kept(std::int64_t nanoseconds) const;
+    void bringToMedium(Node file);
     void record(Node node);
+    void recordAll();
+    void recordName(Node directory, const std::string& name, Entry& entry);
     void keep(const Change& change);
-    void keepNames(const std::function<bool(const Change&)>& chosen);
+    template <class Chosen>
+    void keepNames(Chosen chosen);
     [[nodiscard]] Node add(Node directory, const std::string& name, bool isDirectory);
-    [[nodiscard]] Content remains(const File& file, Random& random) const;
+    [[nodiscard]] static Content remains(const File& file, Random& random);
     void chooseNames(Random& random);
     void chooseRecords(Random& random);
 
@@ -155,6 +177,7 @@ class SimulatedDisk {
     std::map<Node, Entries> durableEntries_;
     std::vector<Change> changes_;
     std::uint32_t step_ = 0;
+    std::uint64_t revision_ = 0;
 };
 
 } // namespace quorl::simulation

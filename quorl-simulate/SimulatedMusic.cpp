@@ -68,10 +68,17 @@ std::uint64_t revisionOf(const SimulatedMusic::Selected& songs) {
 
 void SimulatedMusic::note(const std::string& path) {
     const auto& song = *songs.at(path);
-    everWas_.emplace(path, song.bytes.size(), song.modified, song.bytes);
+    versions_[path].push_back({song.modified, song.bytes});
 }
 
 std::shared_ptr<const media::Inventory> SimulatedMusic::inventory() {
+    if (!inventory_) {
+        inventory_ = takeInventory();
+    }
+    return inventory_;
+}
+
+std::shared_ptr<const media::Inventory> SimulatedMusic::takeInventory() {
     auto inventory = std::make_shared<media::Inventory>();
     inventory->root = "/music";
     inventory->rootFound = true;
@@ -108,18 +115,23 @@ const SimulatedMusic::Selected* SimulatedMusic::held(std::uint64_t list,
     return found == held_.end() ? nullptr : &found->second;
 }
 
-bool SimulatedMusic::everWas(const std::string& path, std::uint64_t size, std::int64_t modified,
+bool SimulatedMusic::everWas(const std::string& path, std::int64_t modified,
                              const std::string& bytes) const {
-    return everWas_.contains({path, size, modified, bytes});
+    const auto found = versions_.find(path);
+    return found != versions_.end() &&
+           std::ranges::any_of(found->second, [&](const Version& version) {
+               return version.modified == modified && version.bytes == bytes;
+           });
 }
 
 void SimulatedMusic::didChange() {
+    inventory_.reset();
     turns_.callAt(turns_.now() + std::chrono::milliseconds(10), [this] { tell(); });
 }
 
 void SimulatedMusic::tell() {
     const auto now = inventory();
-    if (changed_ && (!told_ || *told_ != *now)) {
+    if (changed_ && (!told_ || (told_ != now && *told_ != *now))) {
         told_ = now;
         changed_(now);
     }

@@ -2,7 +2,6 @@
 
 #include <map>
 #include <memory>
-#include <set>
 #include <string>
 #include <tuple>
 #include <vector>
@@ -43,9 +42,10 @@ class SimulatedMusic final : public syncd::MusicPort, public syncd::SongSource {
 
     /// What a list held in a revision: path, size and time of each song. Null: never seen.
     [[nodiscard]] const Selected* held(std::uint64_t list, std::uint64_t revision) const;
-    /// Whether the song ever had these bytes while it had this size and time.
-    [[nodiscard]] bool everWas(const std::string& path, std::uint64_t size, std::int64_t modified,
+    /// Whether the song ever had these bytes and this time.
+    [[nodiscard]] bool everWas(const std::string& path, std::int64_t modified,
                                const std::string& bytes) const;
+    /// As it is now.
     [[nodiscard]] std::shared_ptr<const media::Inventory> inventory();
 
     /// The engine is gone.
@@ -60,13 +60,22 @@ class SimulatedMusic final : public syncd::MusicPort, public syncd::SongSource {
                                                         const base::FileState& expected) override;
 
   private:
+    struct Version {
+        std::int64_t modified = 0;
+        std::string bytes;
+    };
+
+    [[nodiscard]] std::shared_ptr<const media::Inventory> takeInventory();
     void tell();
 
     VirtualTurns& turns_;
     Changed changed_;
+    /// Null after a change.
+    std::shared_ptr<const media::Inventory> inventory_;
     std::shared_ptr<const media::Inventory> told_;
     std::map<std::pair<std::uint64_t, std::uint64_t>, Selected> held_;
-    std::set<std::tuple<std::string, std::uint64_t, std::int64_t, std::string>> everWas_;
+    /// By path.
+    std::map<std::string, std::vector<Version>, std::less<>> versions_;
 };
 
 } // namespace quorl::simulation

@@ -49,7 +49,8 @@ class SimulatedFile final : public syncd::VolumeFile {
         std::string text(bytes.size(), '\0');
         std::ranges::transform(bytes, text.begin(),
                                [](std::byte byte) { return static_cast<char>(byte); });
-        disk_.append(file_, text);
+        disk_.write(file_, written_, text);
+        written_ += text.size();
     }
 
     void setModified(std::int64_t nanoseconds) override { disk_.setModified(file_, nanoseconds); }
@@ -67,6 +68,7 @@ class SimulatedFile final : public syncd::VolumeFile {
     SimulatedDisk& disk_;
     const SimulatedDisk::Node file_;
     const SimulatedVolume::FailsSync failsSync_;
+    std::size_t written_ = 0;
 };
 
 } // namespace
@@ -106,10 +108,12 @@ void SimulatedVolume::removeDirectory(Directory directory) {
 }
 
 std::vector<std::string> SimulatedVolume::names(Directory directory) {
+    disk_.look("readdir", nameOf(directory));
     return disk_.names(node(directory));
 }
 
 std::optional<base::FileState> SimulatedVolume::find(Directory directory, const std::string& name) {
+    disk_.look("stat", name);
     const auto found = disk_.find(node(directory), name);
     if (!found || disk_.status(*found).isDirectory) {
         return std::nullopt;
@@ -119,6 +123,7 @@ std::optional<base::FileState> SimulatedVolume::find(Directory directory, const 
 }
 
 std::unique_ptr<syncd::Reader> SimulatedVolume::open(Directory directory, const std::string& name) {
+    disk_.look("open", name);
     return std::make_unique<SimulatedReader>(disk_, file(directory, name));
 }
 
@@ -129,9 +134,8 @@ std::unique_ptr<syncd::VolumeFile> SimulatedVolume::create(Directory directory,
 
 std::unique_ptr<syncd::VolumeFile> SimulatedVolume::overwrite(Directory directory,
                                                               const std::string& name) {
-    const auto found = file(directory, name);
-    disk_.truncate(found);
-    return std::make_unique<SimulatedFile>(disk_, found, failsSync_);
+    disk_.look("open", name);
+    return std::make_unique<SimulatedFile>(disk_, file(directory, name), failsSync_);
 }
 
 void SimulatedVolume::rename(Directory directory, const std::string& name,
@@ -157,6 +161,9 @@ void SimulatedVolume::sync() {
     disk_.syncAll();
 }
 
-std::uint64_t SimulatedVolume::available() { return disk_.available(); }
+std::uint64_t SimulatedVolume::available() {
+    disk_.look("statfs", {});
+    return disk_.available();
+}
 
 } // namespace quorl::simulation

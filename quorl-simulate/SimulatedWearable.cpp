@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "quorl-simulate/SimulatedVolume.h"
+#include "quorl-syncd/transfer/device/Device.h"
 #include "services/wearable/Generations.h"
 
 namespace quorl::simulation {
@@ -11,10 +12,14 @@ namespace {
 
 using Directory = syncd::Volume::Directory;
 
-std::optional<std::string> readOwn(const SimulatedDisk& disk, const char* name) {
+constexpr std::array manifestFiles{wearable::generationFiles[0], wearable::generationFiles[1],
+                                   wearable::formerManifestFile};
+
+/// Null where there is no such file.
+const std::string* readOwn(const SimulatedDisk& disk, std::string_view name) {
     const auto own = directoryOf(disk, Directory::Own);
     const auto file = own ? disk.find(*own, name) : std::nullopt;
-    return file ? std::optional(disk.read(*file)) : std::nullopt;
+    return file ? &disk.read(*file) : nullptr;
 }
 
 bool isListed(const wearable::Manifest& list, const std::string& name, std::uint64_t size) {
@@ -27,13 +32,32 @@ bool isListed(const wearable::Manifest& list, const std::string& name, std::uint
 
 } // namespace
 
-SimulatedDisk::Node SimulatedWearable::music() const {
-    return directoryOf(disk, Directory::Music).value();
+/// A save begins with emptying the file that does not count.
+bool ManifestMemory::isAsBefore(const SimulatedDisk& disk, std::size_t index) const {
+    const auto* const file = readOwn(disk, manifestFiles.at(index));
+    const auto& before = (*files_)[index];
+    return (file == nullptr ? !before : before == *file) ||
+           (index == next_ && file != nullptr && file->empty());
 }
 
-wearable::Manifest SimulatedWearable::manifest() const {
-    return wearable::newestManifest([this](const char* name) { return readOwn(disk, name); })
-        .manifest;
+const wearable::Manifest& ManifestMemory::read(const SimulatedDisk& disk) {
+    if (files_ && isAsBefore(disk, 0) && isAsBefore(disk, 1) && isAsBefore(disk, 2)) {
+        return manifest_;
+    }
+    const auto read = [&disk](const char* name) {
+        const auto* const file = readOwn(disk, name);
+        return file == nullptr ? std::nullopt : std::optional(*file);
+    };
+    files_.reset();
+    auto stored = wearable::newestManifest(read);
+    manifest_ = std::move(stored.manifest);
+    next_ = stored.number == 0 ? std::nullopt : std::optional(stored.next);
+    files_ = {read(manifestFiles[0]), read(manifestFiles[1]), read(manifestFiles[2])};
+    return manifest_;
+}
+
+SimulatedDisk::Node SimulatedWearable::music() const {
+    return directoryOf(disk, Directory::Music).value();
 }
 
 bool SimulatedWearable::isManifestDurable() const {
@@ -43,16 +67,23 @@ bool SimulatedWearable::isManifestDurable() const {
            });
 }
 
-std::optional<wearable::Manifest> SimulatedWearable::readableManifest() const {
+const wearable::Manifest* SimulatedWearable::readableManifest() const {
     try {
-        return manifest();
+        return &manifest();
     } catch (const wearable::BadManifest&) {
-        return std::nullopt;
+        return nullptr;
     }
 }
 
+bool SimulatedWearable::isManifestAsExcused() const {
+    const auto* const list = readableManifest();
+    return std::ranges::any_of(excusedManifests, [list](const auto& excused) {
+        return list == nullptr ? !excused : excused == *list;
+    });
+}
+
 wearable::Usage SimulatedWearable::usage() const {
-    const auto list = manifest();
+    const auto& list = manifest();
     wearable::Usage usage{0, disk.available(), 0, list.sent};
     const auto count = [&](const wearable::Entry& entry) {
         const auto file = disk.find(music(), entry.name);
@@ -75,20 +106,79 @@ void SimulatedWearable::excuse() {
     isExcused = true;
     isClaimExcused = true;
     isLookedAt = false;
+    excusedManifests.clear();
     rememberExcused();
 }
 
 void SimulatedWearable::engineLooks() {
     isLookedAt = true;
+    takePossibleTwins();
+    if (std::exchange(isListLost, false)) {
+        takeOrphans();
+    }
     if (isExcused) {
         rememberExcused();
+    } else {
+        excusedManifests.clear();
+    }
+}
+
+void SimulatedWearable::considerExcuse() {
+    if (isLookedAt && !excusedManifests.empty()) {
+        isExcused = isManifestAsExcused() || !isManifestDurable();
+    }
+}
+
+void SimulatedWearable::endExcuse() {
+    isExcused = false;
+    excusedManifests.clear();
+    checkedRevision.reset();
+}
+
+void SimulatedWearable::loseList() {
+    isDamaged = isListLost = true;
+    takeOrphans();
+    excuse();
+}
+
+void SimulatedWearable::takeOrphans() {
+    const auto names = disk.names(music());
+    orphans.insert(names.begin(), names.end());
+}
+
+void SimulatedWearable::takePossibleTwins() {
+    possibleTwins.clear();
+    const auto names = disk.names(music());
+    const auto statusOf = [&](const std::string& name) {
+        return disk.status(*disk.find(music(), name));
+    };
+    for (const auto& name : names) {
+        const bool isLikeAnother =
+            syncd::Device::isUnfinished(name) && std::ranges::any_of(names, [&](const auto& other) {
+                return other != name && statusOf(other) == statusOf(name);
+            });
+        if (isLikeAnother) {
+            possibleTwins.insert(name);
+        }
+    }
+}
+
+bool SimulatedWearable::isExcusedFile(const std::string& name) const {
+    return filesOfOthers.contains(name) || orphans.contains(name) || possibleTwins.contains(name);
+}
+
+void SimulatedWearable::rereadFilesOfOthers() {
+    for (auto& [name, file] : filesOfOthers) {
+        const auto node = *disk.findExactly(music(), name);
+        file = {disk.read(node), disk.status(node).modified};
     }
 }
 
 /// As it is, it is not the engine's.
 void SimulatedWearable::rememberExcused() {
-    excusedManifest = readableManifest();
-    excusedPlaylist = excusedManifest ? excusedManifest->playlist : std::nullopt;
+    const auto* const list = readableManifest();
+    excusedManifests.push_back(list == nullptr ? std::nullopt : std::optional(*list));
+    excusedPlaylist = list == nullptr ? std::nullopt : list->playlist;
 }
 
 void SimulatedWearable::removeFileOfOthers(const std::string& name) {
@@ -96,18 +186,25 @@ void SimulatedWearable::removeFileOfOthers(const std::string& name) {
     filesOfOthers.erase(name);
 }
 
-/// What was ours before somebody changed it can be as it was.
+/// What was ours before somebody changed it can be as it was. Of an empty file nobody can tell
+/// whose it was.
 void SimulatedWearable::takeFilesOfOthers() {
     auto names = formerFilesOfOthers;
     for (const auto& [name, file] : filesOfOthers) {
         names.insert(name);
     }
     filesOfOthers.clear();
-    const auto list = readableManifest().value_or(wearable::Manifest());
+    const auto* const readable = readableManifest();
+    const auto list = readable == nullptr ? wearable::Manifest() : *readable;
     for (const auto& name : disk.names(music())) {
-        const auto file = *disk.find(music(), name);
-        if (names.contains(name) && !isListed(list, name, disk.status(file).size)) {
-            filesOfOthers[name] = {disk.read(file), disk.status(file).modified};
+        const auto file = *disk.findExactly(music(), name);
+        const auto status = disk.status(file);
+        const bool isTheirs = nodesOfOthers.contains(file) ||
+                              (names.contains(name) && !isListed(list, name, status.size));
+        if (isTheirs && status.size > 0) {
+            filesOfOthers[name] = {disk.read(file), status.modified};
+        } else if (names.contains(name) && status.size == 0) {
+            orphans.insert(name);
         }
     }
 }
@@ -122,7 +219,7 @@ std::string SimulatedWearable::text() const {
                 (filesOfOthers.contains(name) ? ", of others" : "") + ")\n";
     }
     try {
-        const auto list = manifest();
+        const auto& list = manifest();
         for (const auto& song : list.songs) {
             text += "  song   " + song.name + " <- " + song.source + "\n";
         }

@@ -1,15 +1,34 @@
 #pragma once
 
+#include <array>
 #include <map>
 #include <optional>
 #include <set>
 #include <string>
 #include <utility>
+#include <vector>
 
 #include "quorl-simulate/SimulatedDisk.h"
 #include "services/wearable/Usage.h"
 
 namespace quorl::simulation {
+
+/// The manifest of a disk, which is parsed again only when its files have become others.
+class ManifestMemory {
+  public:
+    /// As the engine reads it. Throws `wearable::BadManifest`.
+    [[nodiscard]] const wearable::Manifest& read(const SimulatedDisk& disk);
+
+  private:
+    using Files = std::array<std::optional<std::string>, 3>;
+
+    [[nodiscard]] bool isAsBefore(const SimulatedDisk& disk, std::size_t index) const;
+
+    std::optional<Files> files_;
+    /// Which of the files is older than the other.
+    std::optional<std::size_t> next_;
+    wearable::Manifest manifest_;
+};
 
 /// A wearable, and what is known of it from outside.
 struct SimulatedWearable {
@@ -18,10 +37,15 @@ struct SimulatedWearable {
     SimulatedDisk disk;
     /// Files of others in the music directory: contents and time.
     Files filesOfOthers = {};
+    /// Those that they have made.
+    std::set<SimulatedDisk::Node> nodesOfOthers = {};
     /// What they have removed or renamed, which a loss of power can bring back.
     std::set<std::string> formerFilesOfOthers = {};
     /// Names of files that were ours until somebody damaged the list of them.
     std::set<std::string> orphans = {};
+
+    /// Names of unfinished files that were like another one when the engine looked.
+    std::set<std::string> possibleTwins = {};
 
     /// Somebody has removed or changed what is ours, and the engine has not looked since.
     bool isExcused = false;
@@ -30,31 +54,54 @@ struct SimulatedWearable {
     bool isLookedAt = false;
     /// Ever.
     bool isDamaged = false;
-    std::optional<wearable::Manifest> excusedManifest = {};
+    /// Since then, what a sync has put there that was under way is not known either.
+    bool isListLost = false;
+    /// As they were then; a save that fails can bring them back.
+    std::vector<std::optional<wearable::Manifest>> excusedManifests = {};
     std::optional<wearable::Entry> excusedPlaylist = {};
 
     [[nodiscard]] SimulatedDisk::Node music() const;
 
+    /// Of the disk when the promises were last looked at.
+    std::optional<std::uint64_t> checkedRevision = {};
+    mutable ManifestMemory memory = {};
+
     /// As the engine reads it. Throws `wearable::BadManifest`.
-    [[nodiscard]] wearable::Manifest manifest() const;
+    [[nodiscard]] const wearable::Manifest& manifest() const { return memory.read(disk); }
+
     [[nodiscard]] bool isManifestDurable() const;
-    /// Nothing where it cannot be read.
-    [[nodiscard]] std::optional<wearable::Manifest> readableManifest() const;
+    /// Null where it cannot be read.
+    [[nodiscard]] const wearable::Manifest* readableManifest() const;
 
     [[nodiscard]] wearable::Usage usage() const;
 
     /// A hand has been on what is ours.
     void excuse();
+    /// Ends it where the engine has written the manifest.
+    void considerExcuse();
+    void endExcuse();
+    /// A hand has damaged the manifest.
+    void loseList();
     void engineLooks();
-    void rememberExcused();
 
     void removeFileOfOthers(const std::string& name);
+
+    /// Not one that the engine has to remove in the end.
+    [[nodiscard]] bool isExcusedFile(const std::string& name) const;
+
+    /// What the others have is as they have left it just now.
+    void rereadFilesOfOthers();
 
     /// What the others have is what there is now.
     void takeFilesOfOthers();
 
     /// In several lines.
     [[nodiscard]] std::string text() const;
+
+    [[nodiscard]] bool isManifestAsExcused() const;
+    void rememberExcused();
+    void takeOrphans();
+    void takePossibleTwins();
 };
 
 } // namespace quorl::simulation

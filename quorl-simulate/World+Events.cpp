@@ -1,5 +1,6 @@
 #include <algorithm>
 #include <array>
+#include <cerrno>
 #include <iterator>
 
 #include "quorl-simulate/SimulatedVolume.h"
@@ -33,7 +34,7 @@ std::string drawPath(Random& random) {
     static constexpr std::array names{
         "One.mp3",  "one.MP3", "A long name of a song.mp3", "A long name of a tune.mp3",
         "Zwei.ogg", "aux.mp3", "Drei\xC3\xA4.mp3",          "List 1.m3u8",
-        "#no.mp3",  "x.mp3"};
+        "#no.mp3",  "x.mp3",   "not \xFC UTF-8.mp3",        "not \xF6 UTF-8.mp3"};
     return (random.onceIn(2) ? "a/" : "b/") + std::string(names.at(random.below(names.size())));
 }
 
@@ -61,7 +62,7 @@ void World::addSong(Random& random) {
 }
 
 void World::happenToMusic(Happening what, Random& random) {
-    constexpr std::array mine{ChangeList, EmptyList, RenameList, DeleteList, AddSong};
+    constexpr std::array mine{ChangeList, ReorderList, EmptyList, RenameList, DeleteList, AddSong};
     if (std::ranges::find(mine, what) == mine.end()) {
         return;
     }
@@ -73,9 +74,12 @@ void World::happenToMusic(Happening what, Random& random) {
     auto& [id, list] = drawFrom(music_.lists, random);
     if (what == RenameList) {
         list.title = random.onceIn(2) ? "List 1" : "Other " + std::to_string(random.below(3));
+    } else if (what == ReorderList) {
+        std::ranges::reverse(list.songs);
     } else if (what == EmptyList) {
         list.songs.clear();
     } else if (what == DeleteList) {
+        note(Trouble::ListGone);
         music_.lists.erase(id);
     } else if (list.songs.empty() || random.onceIn(2)) {
         list.songs.push_back(drawFrom(music_.songs, random).first);
@@ -92,13 +96,14 @@ void World::happenToSong(Happening what, Random& random) {
     if (std::ranges::find(mine, what) == mine.end() || music_.songs.size() < 2) {
         return;
     }
-    troubles_.insert("song");
     auto& [path, song] = drawFrom(music_.songs, random);
     if (what == RemoveSong) {
+        note(Trouble::SongGone);
         music_.songs.erase(path);
         music_.didChange();
         return;
     }
+    note(what == LockSong ? Trouble::SongUnreadable : Trouble::SongChanged);
     switch (what) {
     case ChangeSong: // its time alone, in place, or as another file
         song = random.onceIn(2) ? std::make_shared<SimulatedMusic::Song>(*song) : song;
@@ -116,6 +121,7 @@ void World::happenToSong(Happening what, Random& random) {
         song->bytes.clear();
         break;
     default:
+        note(Trouble::SongTooLarge);
         song->bytes = drawBytes(random, largestFile + 1);
     }
     if (what != ReplaceSongAlike && what != LockSong) {
@@ -141,6 +147,7 @@ void World::happenToChoices(Happening what, Random& random) {
         now.isSyncEnabled = !now.isSyncEnabled;
         break;
     case FailPreferences:
+        note(Trouble::BadPreferences);
         isNotLookedAt_ = isNotLookedAt_ || choices_.writesUntilFailure == 0;
         choices_.writesUntilFailure = random.onceIn(3) ? -1 : static_cast<int>(random.below(3));
         return;
@@ -150,25 +157,38 @@ void World::happenToChoices(Happening what, Random& random) {
     default:
         return;
     }
+    note(Trouble::OtherChoice);
     turns_.call([this] { engine_->choicesDidChange(); });
 }
 
-void World::plug(bool isPlugged, bool isOther) {
-    device().disk.losePower(random_);
+void World::plug(bool isPlugged, bool isOther, Random& random) {
+    device().disk.losePower(random);
     device().takeFilesOfOthers();
     current_ = isOther ? 1 - current_ : current_;
     isPlugged_ = isPlugged;
     ++pluggings_;
     isNotLookedAt_ = true;
-    turns_.call([this] { noticed_(syncd::WearableNews::MayBeAnother); });
+    note(Trouble::Away);
+    turns_.call([this] {
+        ++news_;
+        noticed_(syncd::WearableNews::MayBeAnother);
+    });
 }
 
-void World::happenToDevice(Happening what, Random& random) {
+void World::failOperations(std::uint64_t seed) {
+    constexpr std::array errors{EIO, ENOSPC, EROFS, ESTALE};
+    constexpr std::uint64_t most = 3;
+    errorOfOperations_ = errors.at(seed % errors.size());
+    operationsToFail_ = 1 + seed / errors.size() % most;
+}
+
+void World::happenToDevice(const Event& event, Random& random) {
     auto& disk = device().disk;
     const auto attach = [this](bool connected, bool onCharger) {
+        note(Trouble::OtherAttachment);
         turns_.call([this, connected, onCharger] { engine_->attach({connected, onCharger}); });
     };
-    switch (what) {
+    switch (event.what) {
     case ToggleCharger:
         if (isEmbedded_) {
             attach(attachment_.connected, !attachment_.onCharger);
@@ -178,12 +198,12 @@ void World::happenToDevice(Happening what, Random& random) {
         if (isEmbedded_) {
             attach(!attachment_.connected, attachment_.onCharger);
         } else {
-            plug(!isPlugged_, false);
+            plug(!isPlugged_, false, random);
         }
         break;
     case SwapWearable:
         if (!isEmbedded_) {
-            plug(true, true);
+            plug(true, true, random);
         }
         break;
     case FillDevice:
@@ -205,11 +225,11 @@ void World::happenToDevice(Happening what, Random& random) {
     case ToggleSlowness:
         isSlow_ = !isSlow_;
         break;
-    case FailWrites:
-        writesToFail_ = 1 + random.below(3);
+    case FailOperations:
+        failOperations(event.seed);
         break;
     case FailSync:
-        syncsToFail_ = 1 + random.below(2);
+        syncsToFail_ = 1 + event.seed % 2;
         break;
     default:
         break;
@@ -229,10 +249,10 @@ void World::addFileOfOthers(Random& random) {
     if (disk.find(device().music(), name) || disk.available() < 200) {
         return;
     }
-    troubles_.insert("names");
     const auto file = disk.create(device().music(), name);
     disk.append(file, drawBytes(random, 1 + random.below(100)));
     disk.setModified(file, drawTime(random));
+    device().nodesOfOthers.insert(file);
     device().filesOfOthers[name] = {disk.read(file), disk.status(file).modified};
 }
 
@@ -250,7 +270,6 @@ void World::damageManifest(Random& random) {
         return;
     }
     const auto kind = random.below(4);
-    device().isDamaged = true;
     for (std::size_t index = 0; index < 2; ++index) {
         const auto file = disk.find(*own, wearable::generationFiles.at(index));
         if (!file || (kind < 2 && kind != index)) {
@@ -260,9 +279,8 @@ void World::damageManifest(Random& random) {
         disk.append(*file,
                     drawBytes(random, std::min<std::uint64_t>(random.below(50), disk.available())));
     }
-    const auto names = disk.names(device().music());
-    device().orphans.insert(names.begin(), names.end());
-    device().excuse();
+    note(Trouble::BadManifest);
+    device().loseList();
 }
 
 void World::happenToFiles(Happening what, Random& random) {
@@ -301,8 +319,8 @@ void World::happenToFiles(Happening what, Random& random) {
         if (what == RemoveFileOfOthers) {
             disk.remove(music, name);
             device().removeFileOfOthers(name);
-        } else if (!disk.find(music, wanted)) {
-            troubles_.insert("names");
+            device().rereadFilesOfOthers(); // a second name of it has lost its contents
+        } else if (!contents.first.empty() && !disk.find(music, wanted)) {
             disk.rename(music, name, music, wanted);
             device().removeFileOfOthers(name);
             others[wanted] = contents;
@@ -310,16 +328,16 @@ void World::happenToFiles(Happening what, Random& random) {
     }
 }
 
-void World::happenToEngine(Happening what, Random& /*random*/) {
-    switch (what) {
+void World::happenToEngine(const Event& event) {
+    switch (event.what) {
     case KillEngine:
-        endEngine(End::Killed);
+        endEngine(End::Killed, event.seed);
         break;
     case EndEngine:
-        endEngine(End::Orderly);
+        endEngine(End::Orderly, event.seed);
         break;
     case LosePower:
-        endEngine(End::PowerLost);
+        endEngine(End::PowerLost, event.seed);
         break;
     case StartNow:
         turns_.call([this] {
@@ -332,6 +350,7 @@ void World::happenToEngine(Happening what, Random& /*random*/) {
         break;
     case Cancel:
         isCancelled_ = true;
+        note(Trouble::Cancelled);
         turns_.call([this] { announcer_.cancel(); });
         break;
     default:

@@ -1,6 +1,8 @@
 #include <algorithm>
 #include <limits>
-#include <sstream>
+#include <span>
+#include <string_view>
+#include <utility>
 
 #include "quorl-simulate/SimulatedVolume.h"
 #include "quorl-simulate/World.h"
@@ -13,38 +15,38 @@ using namespace std::chrono_literals;
 
 constexpr auto upToDate = "Everything is up to date.";
 
-/// The songs of a choice: each once.
-SimulatedMusic::Selected withinLimit(const SimulatedMusic::Selected& songs,
-                                     const wearable::Selection& choice) {
+/// The songs of a choice, as far as they are within its limit.
+std::span<const SimulatedMusic::Selected::value_type>
+withinLimit(const SimulatedMusic::Selected& songs, const wearable::Selection& choice) {
     constexpr std::uint64_t megabyte = 1 << 20;
     const auto most = std::numeric_limits<std::uint64_t>::max();
     const auto mostBytes = choice.limitType == 0 ? choice.limit * megabyte : most;
     const auto mostSongs = choice.limitType == 1 ? choice.limit : most;
     std::uint64_t bytes = 0;
-    SimulatedMusic::Selected chosen;
+    std::size_t count = 0;
     for (const auto& song : songs) {
         bytes += std::get<1>(song);
-        if (bytes > mostBytes || chosen.size() == mostSongs) {
+        if (bytes > mostBytes || count == mostSongs) {
             break;
         }
-        chosen.push_back(song);
+        ++count;
     }
-    return chosen;
+    return std::span(songs).first(count);
 }
 
-std::vector<std::string> linesOf(const std::string& playlist) {
-    std::istringstream text(playlist);
-    std::vector<std::string> lines;
-    for (std::string line; std::getline(text, line);) {
+/// The names that a playlist has.
+std::vector<std::string_view> linesOf(std::string_view playlist) {
+    std::vector<std::string_view> lines;
+    while (!playlist.empty()) {
+        const auto end = std::min(playlist.find('\n'), playlist.size());
+        auto line = playlist.substr(0, end);
+        playlist.remove_prefix(std::min(end + 1, playlist.size()));
         if (!line.starts_with('#')) {
-            lines.push_back(line.starts_with("./") ? line.substr(2) : line);
+            line.remove_prefix(line.starts_with("./") ? 2 : 0);
+            lines.push_back(line);
         }
     }
     return lines;
-}
-
-bool contains(const std::string& text, std::string_view part) {
-    return text.find(part) != std::string::npos;
 }
 
 } // namespace
@@ -63,40 +65,37 @@ void World::check() {
         return;
     }
     const Quiet quiet(isQuiet_);
-    checkFilesOfOthers(device());
-    checkManifest(device());
+    auto& wearable = device();
+    const auto revision = wearable.disk.revision();
+    if (std::exchange(wearable.checkedRevision, revision) != revision) {
+        checkFilesOfOthers(wearable);
+        checkManifest(wearable);
+    }
+    checkPreferences(wearable);
 }
 
 void World::checkFilesOfOthers(const SimulatedWearable& wearable) {
-    const auto names = wearable.disk.names(wearable.music());
+    const auto music = wearable.music();
     for (const auto& [name, file] : wearable.filesOfOthers) {
-        if (std::ranges::find(names, name) == names.end()) {
+        const auto node = wearable.disk.findExactly(music, name);
+        if (!node) {
             breach("a file of others is gone: " + name);
-            continue;
-        }
-        const auto node = *wearable.disk.find(wearable.music(), name);
-        if (wearable.disk.read(node) != file.first ||
-            wearable.disk.status(node).modified != file.second) {
+        } else if (wearable.disk.read(*node) != file.first ||
+                   wearable.disk.status(*node).modified != file.second) {
             breach("a file of others was changed: " + name);
         }
     }
 }
 
 void World::checkManifest(SimulatedWearable& wearable) {
-    if (wearable.isExcused && wearable.isLookedAt) {
-        wearable.isExcused = wearable.readableManifest() == wearable.excusedManifest ||
-                             !wearable.isManifestDurable();
-    }
+    wearable.considerExcuse();
     if (!wearable.isExcused) {
         try {
-            const auto manifest = wearable.manifest();
+            const auto& manifest = wearable.manifest();
             if (manifest.sent) {
                 checkSent(wearable, manifest);
             }
             checkPlaylist(wearable, manifest);
-            if (!wearable.isClaimExcused) {
-                checkPreferences(manifest);
-            }
         } catch (const wearable::BadManifest& error) {
             if (!wearable.isDamaged) {
                 breach(std::string("the manifest cannot be read: ") + error.what());
@@ -113,8 +112,8 @@ void World::checkSent(const SimulatedWearable& wearable, const wearable::Manifes
         return;
     }
     const auto music = wearable.music();
-    std::vector<std::string> names;
-    std::set<std::string> sources;
+    std::vector<std::string_view> names;
+    std::set<std::string_view> sources;
     for (const auto& [path, size, modified] : withinLimit(*held, *manifest.sent)) {
         const auto entry = std::ranges::find(manifest.songs, path, &wearable::Entry::source);
         const auto file =
@@ -123,7 +122,8 @@ void World::checkSent(const SimulatedWearable& wearable, const wearable::Manifes
             breach("called sent, but not there: " + path);
             return;
         }
-        if (!music_.everWas(path, size, modified, wearable.disk.read(*file))) {
+        const auto& bytes = wearable.disk.read(*file);
+        if (bytes.size() != size || !music_.everWas(path, modified, bytes)) {
             breach("called sent, but with other contents: " + path);
         } else if (!wearable.disk.isDurable(music, entry->name)) {
             breach("called sent, but not durable: " + path);
@@ -144,13 +144,16 @@ void World::checkSent(const SimulatedWearable& wearable, const wearable::Manifes
 
 /// They say nothing that the wearable does not say, unless they cannot be written, or the engine
 /// has not looked at this wearable yet.
-void World::checkPreferences(const wearable::Manifest& manifest) {
+void World::checkPreferences(const SimulatedWearable& wearable) {
     const auto& claim = choices_.now.lastSent;
-    if (!claim || isNotLookedAt_ || choices_.writesUntilFailure == 0) {
+    const bool isExcused = wearable.isExcused || wearable.isClaimExcused || isNotLookedAt_ ||
+                           choices_.writesUntilFailure == 0;
+    const auto* const manifest = claim && !isExcused ? wearable.readableManifest() : nullptr;
+    if (manifest == nullptr) {
         return;
     }
-    if (!manifest.sent ||
-        *claim != syncd::SentPlaylist{manifest.sent->playlist, manifest.sent->revision}) {
+    const auto& sent = manifest->sent;
+    if (!sent || *claim != syncd::SentPlaylist{sent->playlist, sent->revision}) {
         breach("the preferences say what the wearable does not");
     }
 }
@@ -160,12 +163,13 @@ void World::checkPlaylist(const SimulatedWearable& wearable, const wearable::Man
                           ? wearable.disk.find(wearable.music(), manifest.playlist->name)
                           : std::nullopt;
     if (!list || manifest.playlist == wearable.excusedPlaylist ||
+        wearable.filesOfOthers.contains(manifest.playlist->name) ||
         wearable.disk.status(*list).size != manifest.playlist->size) {
         return;
     }
-    for (const auto& name : linesOf(wearable.disk.read(*list))) {
+    for (const auto name : linesOf(wearable.disk.read(*list))) {
         if (!wearable.disk.find(wearable.music(), name)) {
-            breach("the playlist names a song that is not there: " + name);
+            breach("the playlist names a song that is not there: " + std::string(name));
         }
     }
 }
@@ -175,7 +179,7 @@ void World::checkRemembered(const syncd::SentPlaylist& sent) {
     const Quiet quiet(isQuiet_);
     const auto& wearable = wearables_[opened_];
     if (!wearable.isExcused) {
-        const auto manifest = wearable.manifest();
+        const auto& manifest = wearable.manifest();
         if (!manifest.sent ||
             syncd::SentPlaylist{manifest.sent->playlist, manifest.sent->revision} != sent) {
             breach("remembered as sent, but not by the wearable");
@@ -186,21 +190,13 @@ void World::checkRemembered(const syncd::SentPlaylist& sent) {
 }
 
 void World::checkMessage(bool success, const std::string& message) {
-    const auto happened = [this](const char* trouble) { return troubles_.contains(trouble); };
-    const bool isTrue = contains(message, "is full") || contains(message, "not enough space")
-                            ? happened("full")
-                        : contains(message, "write-protected")     ? happened("protected")
-                        : contains(message, "went away")           ? happened("away")
-                        : contains(message, "could not be synced") ? happened("names")
-                        : contains(message, "cannot be used")      ? device().isExcused
-                                                                   : true;
     if (isDead_) {
         return;
     }
     if (success && choices_.now.lastSent == std::nullopt) {
         breach("a success that was not remembered");
     }
-    if (!isTrue) {
+    if (!troubles_.explain(message)) {
         breach("told, but not true: " + message);
     }
 }
@@ -238,7 +234,8 @@ void World::checkStatus() {
     if (!expected.empty() && status != expected) {
         breach("says “" + status + "” instead of “" + expected + "”");
     }
-    if (expected.empty() && status == upToDate && !isSent()) {
+    const bool isToldBefore = status == engine_->status().lastMessage;
+    if (expected.empty() && (status == upToDate ? !isSent() : !isToldBefore)) {
         breach("says “" + status + "”, which is not so");
     }
 }
@@ -274,12 +271,15 @@ void World::mendDevices() {
         wearable.disk.setSpaceOfOthers(0);
     }
     isReadOnly_ = isSlow_ = false;
-    writesToFail_ = syncsToFail_ = 0;
+    operationsToFail_ = syncsToFail_ = 0;
     if (!isPlugged_) {
-        plug(true, false);
+        Random random(life_.seed);
+        plug(true, false, random);
     }
     turns_.call([this] {
-        if (attachment_ != wearable::Attachment()) {
+        const wearable::Attachment wished;
+        if (attachment_ != wished || engine_->attachment() != wished) {
+            note(Trouble::OtherAttachment);
             engine_->attach({true, true});
         }
     });
@@ -305,6 +305,7 @@ void World::mendMusic() {
         isSongUnlocked_ = isSongUnlocked_ || !song->isReadable;
         song->isReadable = true;
         if (song->bytes.size() > largestFile) {
+            note(Trouble::SongChanged);
             song->bytes.resize(largestFile / 2);
             song->modified += 1;
         }
@@ -323,6 +324,7 @@ void World::mendChoices() {
     if (!now.playlist || !music_.lists.contains(*now.playlist)) {
         now.playlist = firstList;
     }
+    note(Trouble::OtherChoice);
     if (now != before || isCancelled_ || isSongUnlocked_) {
         turns_.call([this] { engine_->choicesDidChange(); });
     }
@@ -336,7 +338,7 @@ bool World::isAtRest() {
 
 void World::checkEnd() {
     const Quiet quiet(isQuiet_);
-    device().isExcused = false;
+    device().endExcuse();
     check();
     checkNothingElse(device().manifest());
 }
@@ -360,7 +362,7 @@ void World::checkNothingElse(const wearable::Manifest& manifest) {
                             std::ranges::find(manifest.songs, name, &wearable::Entry::name) !=
                                 manifest.songs.end() ||
                             manifest.playlist->name == name;
-        if (!isOurs && !device().filesOfOthers.contains(name) && !device().orphans.contains(name)) {
+        if (!isOurs && !device().isExcusedFile(name)) {
             breach("is left at the end: " + name);
         }
     }

@@ -17,9 +17,10 @@ constexpr std::uint64_t capacity = 60'000;
 constexpr auto noticedAfter = 1ms;
 constexpr auto patience = 30s;
 
-bool isWrite(std::string_view operation) {
-    return operation != "read" && operation != "fsync" && operation != "syncfs" &&
-           operation != "utimens";
+Trouble troubleOf(int error) {
+    return error == ENOSPC  ? Trouble::Full
+           : error == EROFS ? Trouble::WriteProtected
+                            : Trouble::Away;
 }
 
 } // namespace
@@ -27,7 +28,6 @@ bool isWrite(std::string_view operation) {
 World::World(const Life& life, Trace trace)
     : life_(life),
       trace_(std::move(trace)),
-      random_(life.seed),
       isEmbedded_(life.rules == DiskRules::Posix && life.seed % 2 == 0),
       turns_([plant = life.plant](VirtualTurns::Duration untilThen) {
           return plant == Plant::NoRetry && untilThen > patience;
@@ -43,13 +43,14 @@ World::World(const Life& life, Trace trace)
           {[this](const std::string& what) { breach(what); },
            [this] {
                ++sessions_;
-               troubles_.clear();
+               noteTroublesOfSession();
            },
            [this](bool success, const std::string& message) { checkMessage(success, message); }}),
       syncs_(
           turns_,
           {[this](const wearable::Wearable&) { return openVolume(); }, music_, turns_, turns_},
           [this] {
+              isCleaningUp_ = false;
               check();
               if (end_) {
                   throw EngineEnded();
@@ -68,10 +69,11 @@ World::World(const Life& life, Trace trace)
         static_cast<void>(SimulatedVolume(disk).makeDirectory(syncd::Volume::Directory::Music));
         disk.syncAll();
     }
+    Random random(life.seed);
     for (int count = 0; count < 6; ++count) {
-        addSong(random_);
+        addSong(random);
     }
-    addFileOfOthers(random_);
+    addFileOfOthers(random);
     device().disk.syncAll();
     choices_.now.isSyncEnabled = true;
     choices_.now.playlist = firstList;
@@ -103,7 +105,7 @@ LifeResult World::live() {
     if (!breach_) {
         checkEnd();
     }
-    return {breach_, operations_, sessions_};
+    return {breach_, operations_, sessions_, moments_ - momentOfEvent_};
 }
 
 /// One turn; or, where none is left, the next event.
@@ -143,10 +145,10 @@ void World::perform(const Event& event) {
         happenToMusic(event.what, random);
         happenToSong(event.what, random);
         happenToChoices(event.what, random);
-        happenToDevice(event.what, random);
+        happenToDevice(event, random);
         happenToFiles(event.what, random);
     }
-    happenToEngine(event.what, random);
+    happenToEngine(event);
 }
 
 /// What happens beside a sync happens before one of its operations.
@@ -172,26 +174,41 @@ void World::beforeOperation(std::size_t wearable, std::string_view operation,
     if (trace_) {
         trace_("   " + std::string(operation) + " " + std::string(name));
     }
-    const auto fail = [&](const char* trouble, int error) {
-        troubles_.insert(trouble);
-        throw std::system_error(error, std::generic_category());
-    };
     if (wearable != current_ || openedAt_ != pluggings_) {
-        fail("away", ENODEV);
+        note(Trouble::Away);
+        throw std::system_error(ENODEV, std::generic_category());
     }
-    if (isWrite(operation) && writesToFail_ > 0) {
-        --writesToFail_;
-        fail("away", EIO);
+    // Not all devices keep times.
+    if (operation != "utimens" && operationsToFail_ > 0 && !isCleaningUp_) {
+        --operationsToFail_;
+        note(troubleOf(errorOfOperations_));
+        throw std::system_error(errorOfOperations_, std::generic_category());
     }
-    noteTroubles();
+    noteTroublesOfDevice();
 }
 
-void World::noteTroubles() {
+void World::noteTroublesOfDevice() {
     if (isReadOnly_) {
-        troubles_.insert("protected");
+        note(Trouble::WriteProtected);
     }
     if (device().disk.available() < capacity / 4) {
-        troubles_.insert("full");
+        note(Trouble::Full);
+    }
+}
+
+/// Those that have lasted for some time.
+void World::noteTroublesOfSession() {
+    troubles_.sessionBegins(turns_.now());
+    for (const auto& [path, song] : music_.songs) {
+        if (!song->isReadable) {
+            note(Trouble::SongUnreadable);
+        }
+        if (song->bytes.size() > largestFile) {
+            note(Trouble::SongTooLarge);
+        }
+    }
+    if (choices_.writesUntilFailure >= 0) {
+        note(Trouble::BadPreferences);
     }
 }
 
@@ -203,13 +220,15 @@ void World::startEngine() {
 }
 
 /// A sync that is under way is waited for where the engine ends in order.
-void World::endEngine(End end) {
+void World::endEngine(End end, std::uint64_t seed) {
+    seedOfEnd_ = seed;
+    note(Trouble::Ended);
     if (end == End::Orderly && syncs_.isRunning()) {
         end_ = end_.value_or(end);
         syncs_.stop();
         return;
     }
-    end_ = end;
+    end_ = end == End::Killed && isCleaningUp_ ? End::PowerLost : end;
     isDead_ = end != End::Orderly;
     throw EngineEnded();
 }
@@ -221,6 +240,7 @@ void World::revive() {
     }
     const auto end = *std::exchange(end_, std::nullopt);
     syncs_.forget();
+    isCleaningUp_ = false;
     engine_.reset();
     turns_.forget();
     music_.forget();
@@ -228,11 +248,12 @@ void World::revive() {
     ++pluggings_;
     if (end == End::PowerLost) {
         const Quiet quiet(isQuiet_);
+        Random random(seedOfEnd_);
         for (auto& wearable : wearables_) {
-            wearable.disk.losePower(random_);
+            wearable.disk.losePower(random);
             wearable.takeFilesOfOthers();
         }
-        choices_.losePower(random_);
+        choices_.losePower(random);
     }
     check();
     startEngine();
@@ -245,10 +266,13 @@ struct World::Looked final : syncd::WatchedWearable {
     [[nodiscard]] wearable::Wearable identity() const override { return world_.identity(); }
 
     void look(Reply reply) override {
-        world_.turns_.callAt(world_.turns_.now() + noticedAfter, [this, reply = std::move(reply)] {
+        const auto answer = [this, reply = std::move(reply), asked = world_.news_] {
             reply(world_.look());
-            world_.wasLookedAt();
-        });
+            if (asked == world_.news_) { // else it is of another wearable, perhaps
+                world_.wasLookedAt();
+            }
+        };
+        world_.turns_.callAt(world_.turns_.now() + noticedAfter, answer);
     }
 
     void save(const wearable::Attachment& attachment, Saved saved) override {
@@ -290,7 +314,7 @@ syncd::WatchedWearable::Answer World::look() {
 
 std::unique_ptr<syncd::Volume> World::openVolume() {
     if (!isPlugged_) {
-        troubles_.insert("away");
+        note(Trouble::Away);
         throw std::system_error(ENODEV, std::generic_category());
     }
     openedAt_ = pluggings_;
@@ -298,13 +322,17 @@ std::unique_ptr<syncd::Volume> World::openVolume() {
     {
         const Quiet quiet(isQuiet_);
         device().engineLooks();
+        if (device().readableManifest() == nullptr) {
+            note(Trouble::BadManifest);
+        }
     }
-    noteTroubles();
+    noteTroublesOfDevice();
     auto volume = std::make_unique<SimulatedVolume>(device().disk, [this] {
         const bool fails = syncsToFail_ > 0;
         syncsToFail_ -= fails ? 1 : 0;
         if (fails) {
-            troubles_.insert("away");
+            note(Trouble::Away);
+            isCleaningUp_ = true;
         }
         return fails;
     });

@@ -3,7 +3,6 @@
 #include <functional>
 #include <memory>
 #include <optional>
-#include <set>
 #include <string>
 #include <string_view>
 
@@ -12,6 +11,7 @@
 #include "quorl-simulate/SimulatedChoices.h"
 #include "quorl-simulate/SimulatedMusic.h"
 #include "quorl-simulate/SimulatedWearable.h"
+#include "quorl-simulate/Troubles.h"
 #include "quorl-simulate/WatchfulAnnouncer.h"
 #include "quorl-syncd/engine/Engine.h"
 
@@ -31,6 +31,8 @@ struct LifeResult {
     std::optional<Breach> breach;
     std::uint64_t operations = 0; ///< of the wearable
     std::uint64_t syncs = 0;
+    /// Operations and turns from the last event until all was at rest.
+    std::uint64_t moments = 0;
 };
 
 /// The engine, and everything that it touches, in one life.
@@ -76,8 +78,12 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     void perform(const Event& event);
     void performDueEvents();
     void beforeOperation(std::size_t wearable, std::string_view operation, std::string_view name);
-    void noteTroubles();
-    void endEngine(End end);
+
+    void note(Trouble trouble) { troubles_.note(trouble, turns_.now()); }
+
+    void noteTroublesOfDevice();
+    void noteTroublesOfSession();
+    void endEngine(End end, std::uint64_t seed);
     void startEngine();
     void revive();
 
@@ -85,10 +91,11 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     void happenToMusic(Happening what, Random& random);
     void happenToSong(Happening what, Random& random);
     void happenToChoices(Happening what, Random& random);
-    void happenToDevice(Happening what, Random& random);
+    void happenToDevice(const Event& event, Random& random);
+    void failOperations(std::uint64_t seed);
     void happenToFiles(Happening what, Random& random);
-    void happenToEngine(Happening what, Random& random);
-    void plug(bool isPlugged, bool isOther);
+    void happenToEngine(const Event& event);
+    void plug(bool isPlugged, bool isOther, Random& random);
     void addSong(Random& random);
     void addFileOfOthers(Random& random);
     void damageManifest(Random& random);
@@ -101,7 +108,7 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     void checkFilesOfOthers(const SimulatedWearable& wearable);
     void checkManifest(SimulatedWearable& wearable);
     void checkSent(const SimulatedWearable& wearable, const wearable::Manifest& manifest);
-    void checkPreferences(const wearable::Manifest& manifest);
+    void checkPreferences(const SimulatedWearable& wearable);
     void checkPlaylist(const SimulatedWearable& wearable, const wearable::Manifest& manifest);
     void checkRemembered(const syncd::SentPlaylist& sent);
     void checkMessage(bool success, const std::string& message);
@@ -135,7 +142,6 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
 
     const Life life_;
     const Trace trace_;
-    Random random_;
     const bool isEmbedded_;
 
     VirtualTurns turns_;
@@ -152,6 +158,8 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     /// Changes whenever what was opened on a wearable is of no use any more.
     std::uint64_t pluggings_ = 0;
     std::uint64_t openedAt_ = 0;
+    /// How often the engine has heard that the wearable may be another.
+    std::uint64_t news_ = 0;
     std::size_t opened_ = 0;
     /// Since another one was put in its place, or the engine was started.
     bool isNotLookedAt_ = true;
@@ -161,13 +169,15 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     /// read is tried again.
     bool isCancelled_ = false;
     bool isSongUnlocked_ = false;
-    std::uint64_t writesToFail_ = 0;
+    std::uint64_t operationsToFail_ = 0;
+    int errorOfOperations_ = 0;
     std::uint64_t syncsToFail_ = 0;
+    /// In the sync that is under way; what could not be made durable has to be removed.
+    bool isCleaningUp_ = false;
     syncd::LastResult lastResult_;
     Noticed noticed_;
 
-    // What can be told of a session, for it has happened.
-    std::set<std::string> troubles_;
+    Troubles troubles_;
 
     std::size_t nextEvent_ = 0;
     std::uint64_t moments_ = 0;
@@ -177,6 +187,8 @@ class World : private syncd::WearablePort, private syncd::ResultStore {
     bool isQuiet_ = false;
     bool isDead_ = false;
     std::optional<End> end_;
+    /// From which it follows what a loss of power leaves.
+    std::uint64_t seedOfEnd_ = 0;
     std::string wearableBefore_;
     std::optional<Breach> breach_;
 

@@ -11,11 +11,15 @@ namespace {
 
 using namespace quorl::simulation;
 
-constexpr std::uint64_t lives = QUORL_LIVES;
 constexpr std::size_t events = 120;
+constexpr std::uint64_t livesInAll = 2'000;
+/// Parts run side by side.
+constexpr std::uint64_t parts = 8;
 
-std::optional<Life> firstBroken(DiskRules rules, Plant plant, std::uint64_t most) {
-    for (std::uint64_t seed = 1; seed <= most; ++seed) {
+/// Of `count` lives from this seed on.
+std::optional<Life> firstBroken(DiskRules rules, Plant plant, std::uint64_t seed,
+                                std::uint64_t count) {
+    for (const auto end = seed + count; seed < end; ++seed) {
         auto life = drawLife(seed, rules, events);
         life.plant = plant;
         if (liveOnce(life).breach) {
@@ -25,26 +29,32 @@ std::optional<Life> firstBroken(DiskRules rules, Plant plant, std::uint64_t most
     return std::nullopt;
 }
 
-class Lives : public testing::TestWithParam<DiskRules> {};
+class Lives : public testing::TestWithParam<std::tuple<DiskRules, std::uint64_t>> {};
 
-INSTANTIATE_TEST_SUITE_P(Rules, Lives, testing::Values(DiskRules::Posix, DiskRules::Fat));
+INSTANTIATE_TEST_SUITE_P(Parts, Lives,
+                         testing::Combine(testing::Values(DiskRules::Posix, DiskRules::Fat),
+                                          testing::Range<std::uint64_t>(0, parts)));
 
 TEST_P(Lives, KeepAllPromises) {
-    const auto broken = firstBroken(GetParam(), Plant::None, lives);
+    constexpr auto count = livesInAll / parts;
+    const auto [rules, part] = GetParam();
+    const auto broken = firstBroken(rules, Plant::None, 1 + part * count, count);
 
     EXPECT_FALSE(broken) << toText(broken.value_or(Life())) << "\n"
                          << liveOnce(broken.value_or(Life())).breach.value_or(Breach()).what;
 }
 
-TEST_P(Lives, AreTheSameFromTheSameSeed) {
-    const auto life = drawLife(7, GetParam(), events);
-    std::string first;
-    std::string second;
-    static_cast<void>(liveOnce(life, [&](const std::string& line) { first += line + "\n"; }));
-    static_cast<void>(liveOnce(life, [&](const std::string& line) { second += line + "\n"; }));
+TEST(Life, IsTheSameFromTheSameSeed) {
+    for (const auto rules : {DiskRules::Posix, DiskRules::Fat}) {
+        const auto life = drawLife(7, rules, events);
+        std::string first;
+        std::string second;
+        static_cast<void>(liveOnce(life, [&](const std::string& line) { first += line + "\n"; }));
+        static_cast<void>(liveOnce(life, [&](const std::string& line) { second += line + "\n"; }));
 
-    EXPECT_FALSE(first.empty());
-    EXPECT_EQ(first, second);
+        EXPECT_FALSE(first.empty());
+        EXPECT_EQ(first, second);
+    }
 }
 
 TEST(LifeText, CanBeReadAgain) {
@@ -66,18 +76,20 @@ TEST(Corpus, IsNotBrokenAnyMore) {
     }
 }
 
-class PlantedDefect : public testing::TestWithParam<Plant> {};
+class PlantedDefect : public testing::TestWithParam<std::tuple<Plant, DiskRules>> {};
 
-INSTANTIATE_TEST_SUITE_P(Plants, PlantedDefect,
-                         testing::Values(Plant::NoFileSync, Plant::NoDirectorySync,
-                                         Plant::ManifestFirst, Plant::SentBeforeManifest,
-                                         Plant::RemovalFirst, Plant::NoOwnership, Plant::NoRetry));
+INSTANTIATE_TEST_SUITE_P(
+    Plants, PlantedDefect,
+    testing::Combine(testing::Values(Plant::NoFileSync, Plant::NoDirectorySync,
+                                     Plant::ManifestFirst, Plant::SentBeforeManifest,
+                                     Plant::RemovalFirst, Plant::NoOwnership, Plant::NoRetry),
+                     testing::Values(DiskRules::Posix, DiskRules::Fat)));
 
 TEST_P(PlantedDefect, IsFound) {
-    constexpr std::uint64_t most = 300;
+    constexpr std::uint64_t most = 1'000;
+    const auto [plant, rules] = GetParam();
 
-    EXPECT_TRUE(firstBroken(DiskRules::Posix, GetParam(), most));
-    EXPECT_TRUE(firstBroken(DiskRules::Fat, GetParam(), most));
+    EXPECT_TRUE(firstBroken(rules, plant, 1, most));
 }
 
 } // namespace
