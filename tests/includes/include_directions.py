@@ -88,7 +88,7 @@ RULES = {
         "platform", "runtime", "services/base", "quorl/app", "quorl/content"),
     "quorl/commands": program("services", "quorl/app"),
     "quorl/reports": program("runtime", "services", "quorl/app", "quorl/window"),
-    "quorl/main.cpp": program("quorl"),
+    "quorl/main.cpp": program("services/base", "quorl"),
     "quorl-script": program("platform", "runtime", "doubles"),
     "quorl-syncd/transfer": program("services"),
     "quorl-syncd/engine": program("services", "quorl-syncd/transfer"),
