@@ -1,6 +1,6 @@
 #include <gmock/gmock.h>
 
-#include "quorl/window/rows/RowTexts.h"
+#include "quorl/window/accessible/RowTexts.h"
 
 namespace quorl::tests {
 

@@ -10,8 +10,8 @@
 #include <QStyle>
 #include <cmath>
 
+#include "quorl/window/accessible/RowsAccessible.h"
 #include "quorl/window/rows/CellPainter.h"
-#include "quorl/window/rows/RowsAccessible.h"
 #include "quorl/window/rows/WrappedText.h"
 
 namespace quorl {

@@ -8,7 +8,7 @@
 #include "quorl/content/PaneContent.h"
 #include "quorl/window/PaneColors.h"
 #include "quorl/window/WindowScreen.h"
-#include "quorl/window/rows/RowTexts.h"
+#include "quorl/window/accessible/RowTexts.h"
 #include "quorl/window/rows/RowsLayout.h"
 
 namespace quorl {

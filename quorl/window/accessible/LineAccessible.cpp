@@ -1,4 +1,4 @@
-#include "quorl/window/rows/LineAccessible.h"
+#include "quorl/window/accessible/LineAccessible.h"
 
 namespace quorl {
 

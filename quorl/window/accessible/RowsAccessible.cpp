@@ -1,6 +1,6 @@
-#include "quorl/window/rows/RowsAccessible.h"
+#include "quorl/window/accessible/RowsAccessible.h"
 
-#include "quorl/window/rows/LineAccessible.h"
+#include "quorl/window/accessible/LineAccessible.h"
 
 namespace quorl {
 

@@ -1,4 +1,4 @@
-#include "quorl/window/rows/RowTexts.h"
+#include "quorl/window/accessible/RowTexts.h"
 
 #include "quorl/content/SwitchCell.h"
 
