@@ -4,7 +4,7 @@
 #include <QPainter>
 #include <QToolButton>
 
-#include "quorl/window/PaneColors.h"
+#include "quorl/window/look/PaneColors.h"
 
 namespace quorl {
 

@@ -4,8 +4,8 @@
 #include <gmock/gmock.h>
 
 #include "quorl/app/CompanionHost.h"
-#include "quorl/window/WindowScreen.h"
-#include "quorl/window/rows/CellPainter.h"
+#include "quorl/window/cells/CellPainter.h"
+#include "quorl/window/look/WindowScreen.h"
 
 namespace quorl::tests {
 

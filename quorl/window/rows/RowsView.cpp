@@ -11,8 +11,8 @@
 #include <cmath>
 
 #include "quorl/window/accessible/RowsAccessible.h"
-#include "quorl/window/rows/CellPainter.h"
-#include "quorl/window/rows/WrappedText.h"
+#include "quorl/window/cells/CellPainter.h"
+#include "quorl/window/cells/WrappedText.h"
 
 namespace quorl {
 

@@ -6,9 +6,9 @@
 #include <memory>
 
 #include "quorl/content/PaneContent.h"
-#include "quorl/window/PaneColors.h"
-#include "quorl/window/WindowScreen.h"
 #include "quorl/window/accessible/RowTexts.h"
+#include "quorl/window/look/PaneColors.h"
+#include "quorl/window/look/WindowScreen.h"
 #include "quorl/window/rows/RowsLayout.h"
 
 namespace quorl {

@@ -1,4 +1,4 @@
-#include "quorl/window/rows/WrappedText.h"
+#include "quorl/window/cells/WrappedText.h"
 
 #include <QFontMetricsF>
 #include <QTextLayout>

@@ -1,4 +1,4 @@
-#include "quorl/window/PaneColors.h"
+#include "quorl/window/look/PaneColors.h"
 
 namespace quorl {
 

@@ -3,7 +3,7 @@
 #include <QPainter>
 
 #include "platform/UserInterface.h"
-#include "quorl/window/PaneColors.h"
+#include "quorl/window/look/PaneColors.h"
 
 namespace quorl {
 

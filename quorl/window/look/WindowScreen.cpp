@@ -1,4 +1,4 @@
-#include "quorl/window/WindowScreen.h"
+#include "quorl/window/look/WindowScreen.h"
 
 #include <QFontInfo>
 #include <QFontMetricsF>

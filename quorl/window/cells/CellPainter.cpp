@@ -1,4 +1,4 @@
-#include "quorl/window/rows/CellPainter.h"
+#include "quorl/window/cells/CellPainter.h"
 
 #include <QFontMetricsF>
 
