@@ -70,6 +70,34 @@ void ListContent::draw(NSInteger /*firstRow*/, NSInteger /*rowsOnScreen*/) {
         ++sections_.back().rowCount;
         rows_.push_back({row.specifier, cellOf(row)});
     }
+    leaveOutHidden();
+}
+
+void ListContent::leaveOutHidden() {
+    if (!shownRows_) {
+        return;
+    }
+    std::erase_if(*shownRows_, [this](NSInteger row) { return !rowAt(row); });
+    auto shown = shownRows_->begin();
+    NSInteger end = 0;
+    for (Section& section : sections_) {
+        end += section.rowCount;
+        const auto after = std::lower_bound(shown, shownRows_->end(), end);
+        section =
+            after == shown ? Section() : Section{section.title, section.footer, after - shown};
+        shown = after;
+    }
+}
+
+void ListContent::showOnly(std::optional<std::vector<NSInteger>> paneRows) {
+    shownRows_ = std::move(paneRows);
+}
+
+NSInteger ListContent::paneRowCount() const { return static_cast<NSInteger>(rows_.size()); }
+
+std::shared_ptr<UITableViewCell> ListContent::cellOfPaneRow(NSInteger paneRow) {
+    const Row* found = rowAt(paneRow);
+    return found ? found->cell : nullptr;
 }
 
 /// A list that is drawn anew for its texts keeps its rows.
@@ -86,21 +114,20 @@ bool ListContent::isCurrent() const {
                       });
 }
 
-const ListContent::Row* ListContent::rowAt(NSInteger row) const {
-    return row >= 0 && row < static_cast<NSInteger>(rows_.size())
-               ? &rows_[static_cast<std::size_t>(row)]
+const ListContent::Row* ListContent::rowAt(NSInteger paneRow) const {
+    return paneRow >= 0 && paneRow < static_cast<NSInteger>(rows_.size())
+               ? &rows_[static_cast<std::size_t>(paneRow)]
                : nullptr;
 }
 
 std::shared_ptr<UITableViewCell> ListContent::cell(NSInteger row) const {
-    const Row* found = rowAt(row);
+    const bool isShown = row >= 0 && row < rowCount();
+    const Row* found = isShown ? rowAt(paneRow(row)) : nullptr;
     return found ? found->cell : nullptr;
 }
 
-std::shared_ptr<UITableViewCell> ListContent::cellAnywhere(NSInteger row) { return cell(row); }
-
 bool ListContent::tap(NSInteger row) {
-    const Row* found = rowAt(row);
+    const Row* found = rowAt(paneRow(row));
     if (!found || !isCurrent()) {
         return false;
     }

@@ -4,7 +4,7 @@
 
 namespace quorl {
 
-/// The rows of a list pane, all of them on the screen. A pane that is no list has none.
+/// The rows of a list pane, all that are shown on the screen. A pane that is no list has none.
 class ListContent final : public PaneContent {
   public:
     ListContent(std::shared_ptr<UIViewController> pane, NavigationController& navigation)
@@ -18,10 +18,17 @@ class ListContent final : public PaneContent {
 
     [[nodiscard]] bool isCurrent() const override;
     [[nodiscard]] std::shared_ptr<UITableViewCell> cell(NSInteger row) const override;
-    [[nodiscard]] std::shared_ptr<UITableViewCell> cellAnywhere(NSInteger row) override;
     bool tap(NSInteger row) override;
     [[nodiscard]] std::optional<NSInteger> row(const UITableView& table,
                                                const NSIndexPath& path) const override;
+    void showOnly(std::optional<std::vector<NSInteger>> paneRows) override;
+    [[nodiscard]] NSInteger paneRowCount() const override;
+    [[nodiscard]] std::shared_ptr<UITableViewCell> cellOfPaneRow(NSInteger paneRow) override;
+
+  protected:
+    [[nodiscard]] const std::optional<std::vector<NSInteger>>& shownRows() const override {
+        return shownRows_;
+    }
 
   private:
     struct Row {
@@ -29,12 +36,14 @@ class ListContent final : public PaneContent {
         std::shared_ptr<UITableViewCell> cell;
     };
 
-    [[nodiscard]] const Row* rowAt(NSInteger row) const;
+    [[nodiscard]] const Row* rowAt(NSInteger paneRow) const;
+    void leaveOutHidden();
 
     std::shared_ptr<UIViewController> pane_;
     NavigationController& navigation_;
     std::vector<Section> sections_;
-    std::vector<Row> rows_;
+    std::vector<Row> rows_; ///< all of the pane
+    std::optional<std::vector<NSInteger>> shownRows_;
 };
 
 } // namespace quorl

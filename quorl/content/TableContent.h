@@ -21,13 +21,19 @@ class TableContent final : public PaneContent {
 
     [[nodiscard]] bool isCurrent() const override;
     [[nodiscard]] std::shared_ptr<UITableViewCell> cell(NSInteger row) const override;
-    [[nodiscard]] std::shared_ptr<UITableViewCell> cellAnywhere(NSInteger row) override;
     bool tap(NSInteger row) override;
     [[nodiscard]] std::optional<NSInteger> row(const UITableView& table,
                                                const NSIndexPath& path) const override;
+    void showOnly(std::optional<std::vector<NSInteger>> paneRows) override;
+    [[nodiscard]] NSInteger paneRowCount() const override;
+    [[nodiscard]] std::shared_ptr<UITableViewCell> cellOfPaneRow(NSInteger paneRow) override;
+
+  protected:
+    [[nodiscard]] const std::optional<std::vector<NSInteger>>& shownRows() const override;
 
   private:
     [[nodiscard]] TableView& table() const;
+    [[nodiscard]] NSInteger shownWithin(NSInteger first, NSInteger end) const;
 
     std::shared_ptr<UITableViewController> pane_;
     std::vector<Section> sections_;

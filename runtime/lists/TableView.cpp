@@ -38,7 +38,7 @@ void TableView::reloadData() {
     screen().tableWillReloadData(*this);
     loaded_ = false;
     staleRows_.clear();
-    recycleRowsOutside(0, 0);
+    recycleAllBut({});
 }
 
 void TableView::reloadRowsAtIndexPaths_withRowAnimation(const std::vector<NSIndexPath>& paths,
@@ -64,21 +64,43 @@ void TableView::draw() {
     if (!loaded_) {
         loadSections();
     }
-    firstRow_ = std::clamp<NSInteger>(wantedFirstRow_, 0,
-                                      std::max<NSInteger>(rowCount_ - rowsOnScreen_, 0));
-    wantedFirstRow_ = firstRow_;
-    const NSInteger end = std::min(firstRow_ + rowsOnScreen_, rowCount_);
-    recycleRowsOutside(firstRow_, end);
+    const auto rows = rowsToDraw();
+    recycleAllBut(rows);
     for (const NSInteger row : std::exchange(staleRows_, {})) {
         if (auto stale = cells_.extract(row)) {
             recycle(std::move(stale.mapped()));
         }
     }
-    for (NSInteger row = firstRow_; row < end; ++row) {
+    for (const NSInteger row : rows) {
         if (!cells_.contains(row)) {
             cells_[row] = controller_.tableView_cellForRowAtIndexPath(*this, pathOfRow(row));
         }
     }
+}
+
+std::vector<NSInteger> TableView::rowsToDraw() {
+    const NSInteger count = shownRows_ ? static_cast<NSInteger>(shownRows_->size()) : rowCount_;
+    firstRow_ =
+        std::clamp<NSInteger>(wantedFirstRow_, 0, std::max<NSInteger>(count - rowsOnScreen_, 0));
+    wantedFirstRow_ = firstRow_;
+    std::vector<NSInteger> rows;
+    for (NSInteger place = firstRow_; place < std::min(firstRow_ + rowsOnScreen_, count); ++place) {
+        rows.push_back(shownRows_ ? (*shownRows_)[static_cast<std::size_t>(place)] : place);
+    }
+    return rows;
+}
+
+void TableView::showOnly(std::optional<std::vector<NSInteger>> rows) {
+    shownRows_ = std::move(rows);
+}
+
+std::shared_ptr<UITableViewCell> TableView::borrowCell(NSInteger index) {
+    if (!loaded_ || index < 0 || index >= rowCount_) {
+        return nullptr;
+    }
+    auto cell = controller_.tableView_cellForRowAtIndexPath(*this, pathOfRow(index));
+    recycle(cell);
+    return cell;
 }
 
 std::vector<TableView::VisibleRow> TableView::visibleRows() const {
@@ -119,16 +141,19 @@ void TableView::loadSections() {
         sectionLengths_.push_back(controller_.tableView_numberOfRowsInSection(*this, section));
     }
     rowCount_ = std::accumulate(sectionLengths_.begin(), sectionLengths_.end(), NSInteger{0});
+    if (shownRows_) {
+        std::erase_if(*shownRows_, [this](NSInteger row) { return row >= rowCount_; });
+    }
     loaded_ = true;
 }
 
-void TableView::recycleRowsOutside(NSInteger first, NSInteger end) {
+void TableView::recycleAllBut(const std::vector<NSInteger>& rows) {
     for (auto row = cells_.begin(); row != cells_.end();) {
-        if (row->first < first || row->first >= end) {
+        if (std::binary_search(rows.begin(), rows.end(), row->first)) {
+            ++row;
+        } else {
             recycle(std::move(row->second));
             row = cells_.erase(row);
-        } else {
-            ++row;
         }
     }
 }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <map>
+#include <optional>
 
 #include "platform/UserInterface.h"
 
@@ -40,9 +41,19 @@ class TableView : public UITableView {
     /// How many rows the screen shows at once.
     void setRowsOnScreen(NSInteger count);
 
-    /// Makes the row at `index`, counted over all sections, the first on the screen, as far as the
-    /// table's length allows. The position is kept over reloads.
+    /// Makes the row at `index`, counted over all sections and only over those that are shown, the
+    /// first on the screen, as far as the table's length allows. The position is kept over reloads.
     void scrollToRow(NSInteger index);
+
+    /// Has only these rows shown, counted over all sections, in rising order; null for all. The
+    /// controller need not know: rows keep their places in the table. A reload leaves out those
+    /// that the table has no more.
+    void showOnly(std::optional<std::vector<NSInteger>> rows);
+
+    /// The rows that `showOnly` left, or null for all.
+    [[nodiscard]] const std::optional<std::vector<NSInteger>>& shownRows() const {
+        return shownRows_;
+    }
 
     /// Asks the controller for what changed since the last drawing and for the rows that have come
     /// on the screen; rows that have left it give their cells back for use by others. Does nothing
@@ -60,13 +71,18 @@ class TableView : public UITableView {
 
     [[nodiscard]] NSIndexPath pathOfRow(NSInteger index) const;
 
-    /// The first row on the screen, counted over all sections, as last drawn.
+    /// The first row on the screen, counted as for `scrollToRow`, as last drawn.
     [[nodiscard]] NSInteger firstRow() const { return firstRow_; }
+
+    /// What a row says that is not on the screen; null for no such row, and while the rows are not
+    /// loaded. The cell is the caller's until the table is next asked for anything.
+    [[nodiscard]] std::shared_ptr<UITableViewCell> borrowCell(NSInteger index);
 
   private:
     [[nodiscard]] NSInteger indexOf(const NSIndexPath& path) const;
     void loadSections();
-    void recycleRowsOutside(NSInteger first, NSInteger end);
+    void recycleAllBut(const std::vector<NSInteger>& rows);
+    [[nodiscard]] std::vector<NSInteger> rowsToDraw();
     void recycle(std::shared_ptr<UITableViewCell> cell);
 
     UITableViewController& controller_;
@@ -77,6 +93,7 @@ class TableView : public UITableView {
     NSInteger firstRow_ = 0;
     NSInteger rowCount_ = 0;
     std::vector<NSInteger> sectionLengths_;
+    std::optional<std::vector<NSInteger>> shownRows_;
     std::map<NSInteger, std::shared_ptr<UITableViewCell>> cells_; ///< by place over all sections
     std::vector<NSInteger> staleRows_;                            ///< to be asked for again
     std::multimap<std::string, std::shared_ptr<UITableViewCell>, std::less<>> reusable_;

@@ -100,6 +100,48 @@ TEST_F(Table, AsksForEachRowOnceUntilSomethingChanges) {
     EXPECT_EQ(rows_->asked, 3);
 }
 
+TEST_F(Table, ShowsOnlyTheRowsThatAreWanted) {
+    table_.showOnly(std::vector<NSInteger>{1, 3, 4});
+    draw();
+    EXPECT_THAT(shown(), ElementsAre("0.1", "1.0", "1.1"));
+    EXPECT_TRUE(table_.cellForRowAtIndexPath(row(1, 0)));
+    EXPECT_FALSE(table_.cellForRowAtIndexPath(row(0, 0)));
+
+    table_.showOnly(std::nullopt);
+    draw();
+    EXPECT_THAT(shown(), ElementsAre("0.0", "0.1", "0.2"));
+}
+
+TEST_F(Table, ScrollsOverTheRowsThatAreWanted) {
+    table_.setRowsOnScreen(1);
+    table_.showOnly(std::vector<NSInteger>{1, 4});
+    table_.scrollToRow(1);
+    draw();
+    EXPECT_THAT(shown(), ElementsAre("1.1"));
+    EXPECT_EQ(table_.firstRow(), 1);
+}
+
+TEST_F(Table, LeavesOutWantedRowsThatAReloadTakesAway) {
+    table_.showOnly(std::vector<NSInteger>{1, 4});
+    draw();
+    rows_->secondLength = 0;
+    table_.reloadData();
+    draw();
+    EXPECT_THAT(shown(), ElementsAre("0.1"));
+}
+
+TEST_F(Table, LendsTheCellOfARowOffTheScreen) {
+    draw();
+    const auto cell = table_.borrowCell(4);
+    ASSERT_TRUE(cell);
+    EXPECT_EQ(cell->textLabel().text(), "1.1");
+    EXPECT_THAT(shown(), ElementsAre("0.0", "0.1", "0.2"));
+    EXPECT_EQ(table_.borrowCell(4), cell) << "a cell is made once";
+    EXPECT_EQ(table_.borrowCell(5), nullptr);
+    table_.reloadData();
+    EXPECT_EQ(table_.borrowCell(0), nullptr);
+}
+
 TEST_F(Table, KnowsThePlaceOfEachRow) {
     draw();
 
