@@ -6,13 +6,6 @@
 
 namespace quorl {
 
-namespace {
-
-/// Shows at least 4:1 against white and against the darkest grey that rows are painted on.
-constexpr const char* tint = "#5b6ef5";
-
-} // namespace
-
 PaneScreen::PaneScreen() {
     timer_.setSingleShot(true);
     timer_.setInterval(0);
@@ -37,7 +30,7 @@ void PaneScreen::whenDrawn(QObject& waiting, std::function<void()> next) {
                    });
 }
 
-UIColor PaneScreen::tintColor() const { return tint; }
+UIColor PaneScreen::tintColor() const { return tintName; }
 
 std::optional<UIColor> PaneScreen::listTextColor() const { return std::nullopt; }
 

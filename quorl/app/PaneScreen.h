@@ -14,6 +14,10 @@ class PaneScreen : public QObject, public Screen {
     Q_OBJECT
 
   public:
+    /// The name by which panes and whoever paints them speak of the tint, which depends on what it
+    /// is painted on.
+    static constexpr const char* tintName = "tint";
+
     PaneScreen();
 
     /// Has `drawing` emitted soon.

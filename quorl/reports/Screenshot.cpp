@@ -82,6 +82,9 @@ ExitCode takeScreenshot(char* program, const Places& places, const Picture& pict
     QtSetup::followUsersLanguage();
     chooseLook(picture);
     WindowScreen screen;
+    Look still = screen.look();
+    still.motion = Motion::Reduced;
+    screen.setLook(still);
     Notices notices;
     Companion companion(places, screen, notices);
     MainWindow window(companion, screen);

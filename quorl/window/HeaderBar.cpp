@@ -11,46 +11,57 @@ namespace {
 constexpr int barHeight = 56;
 constexpr int margin = 16;
 constexpr int gap = 8;
-constexpr int smallestButton = 44;
 constexpr QSize chevronSize(14, 18); // with a gap before the text
-constexpr double backShare = 0.36;   // of the width, at the most
+constexpr QSize lensSize(20, 20);
+constexpr double widestBack = 0.5; // of the width
+constexpr double backShare = 0.36; // where the title needs the room
 
 /// Points to where the pane below lies.
-QIcon chevron(const QColor& color, Qt::LayoutDirection direction, qreal scale) {
-    constexpr QSize size = chevronSize;
-    QPixmap picture(size * scale);
-    picture.setDevicePixelRatio(scale);
-    picture.fill(Qt::transparent);
-    QPainter painter(&picture);
-    painter.setRenderHint(QPainter::Antialiasing);
-    painter.setPen(QPen(color, 2.4, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin));
-    const bool isMirrored = direction == Qt::RightToLeft;
+void drawChevron(QPainter& painter, const QSizeF& size, bool isMirrored) {
     const qreal tip = isMirrored ? size.width() - 2 : 2;
     const qreal back = isMirrored ? tip - 7 : tip + 7;
     painter.drawPolyline(QPolygonF{QPointF(back, 2), QPointF(tip, 9), QPointF(back, 16)});
-    return picture;
+}
+
+void drawLens(QPainter& painter, const QSizeF& size, bool /*isMirrored*/) {
+    const QRectF glass(2, 2, size.width() * 0.6, size.height() * 0.6);
+    painter.drawEllipse(glass);
+    painter.drawLine(glass.center() + QPointF(4.6, 4.6),
+                     QPointF(size.width(), size.height()) - QPointF(2, 2));
 }
 
 } // namespace
 
-HeaderBar::HeaderBar(const QColor& tint, QWidget* parent)
-    : QWidget(parent), back_(new QToolButton(this)), label_(new QLabel(this)), tint_(tint) {
-    setMinimumHeight(barHeight);
+HeaderBar::HeaderBar(WindowScreen& screen, QWidget* parent)
+    : QWidget(parent),
+      back_(new FlatButton(screen, drawChevron, this)),
+      search_(new FlatButton(screen, drawLens, this)),
+      label_(new QLabel(this)) {
     back_->setObjectName(QStringLiteral("back"));
-    back_->setAutoRaise(true);
     back_->setToolButtonStyle(Qt::ToolButtonTextBesideIcon);
     back_->setIconSize(chevronSize);
+    search_->setObjectName(QStringLiteral("search"));
+    search_->setIconSize(lensSize);
+    search_->setAccessibleName(tr("Search"));
+    search_->setToolTip(tr("Search"));
     label_->setAlignment(Qt::AlignCenter);
     label_->setTextFormat(Qt::PlainText);
     connect(back_, &QToolButton::clicked, this, &HeaderBar::backClicked);
+    connect(search_, &QToolButton::clicked, this, &HeaderBar::searchClicked);
 }
 
-void HeaderBar::setTitles(const QString& title, const QString& below) {
+void HeaderBar::setTitles(const QString& title, const QString& below, Search search) {
     title_ = title;
     below_ = below;
     back_->setVisible(!below.isEmpty());
-    back_->setAccessibleName(tr("Back to %1").arg(below));
-    label_->setAccessibleName(title);
+    search_->setVisible(search == Search::Offered);
+    if (const auto name = tr("Back to %1").arg(below); name != back_->accessibleName()) {
+        back_->setAccessibleName(name);
+        back_->setToolTip(name);
+    }
+    if (title != label_->accessibleName()) {
+        label_->setAccessibleName(title);
+    }
     fitTexts();
 }
 
@@ -61,40 +72,64 @@ void HeaderBar::resizeEvent(QResizeEvent* event) {
 
 void HeaderBar::changeEvent(QEvent* event) {
     QWidget::changeEvent(event);
-    if (event->type() == QEvent::FontChange || event->type() == QEvent::LayoutDirectionChange ||
-        event->type() == QEvent::PaletteChange) {
+    if (event->type() == QEvent::FontChange || event->type() == QEvent::LayoutDirectionChange) {
         fitTexts();
     }
 }
 
-void HeaderBar::dress() {
-    QPalette colors = palette();
-    colors.setColor(QPalette::ButtonText, tint_);
-    back_->setPalette(colors);
-    back_->setIcon(chevron(tint_, layoutDirection(), devicePixelRatioF()));
+int HeaderBar::backWidth(const QString& text) const {
+    if (below_.isEmpty()) {
+        return 0;
+    }
+    const int forText = text.isEmpty() ? 0 : back_->fontMetrics().horizontalAdvance(text) + gap;
+    return std::max(chevronSize.width() + forText + 2 * gap, FlatButton::smallestSide);
+}
+
+/// Between the buttons in the middle of the bar, or beside the first where the title is too long
+/// for that.
+QRect HeaderBar::roomForTitle(int backWidth) const {
+    const int start = backWidth > 0 ? backWidth + 2 * gap : margin;
+    const int end = search_->isHidden() ? margin : FlatButton::smallestSide + 2 * gap;
+    const int side = std::max(start, end);
+    const QRect middle = rect().adjusted(side, 0, -side, 0);
+    const bool fits = label_->fontMetrics().horizontalAdvance(title_) <= middle.width();
+    return fits ? middle : rect().adjusted(start, 0, -end, 0);
+}
+
+/// The name of the pane below gives way to the title: the chevron alone says enough.
+QString HeaderBar::fittingBackText() const {
+    const QFontMetrics metrics = back_->fontMetrics();
+    const int beside = chevronSize.width() + 3 * gap;
+    for (const double share : {widestBack, backShare}) {
+        QString text =
+            metrics.elidedText(below_, Qt::ElideRight, static_cast<int>(width() * share) - beside);
+        if (label_->fontMetrics().horizontalAdvance(title_) <=
+            roomForTitle(backWidth(text)).width()) {
+            return text;
+        }
+    }
+    return {};
+}
+
+void HeaderBar::place(QWidget& widget, const QRect& leftToRight) const {
+    widget.setGeometry(QStyle::visualRect(layoutDirection(), rect(), leftToRight));
+}
+
+void HeaderBar::fitTexts() {
     QFont bold = font();
     bold.setBold(true);
     label_->setFont(bold);
-}
-
-/// The title is in the middle of the bar, or beside the button where it is too long for that.
-void HeaderBar::fitTexts() {
-    dress();
-    const bool goesBack = !below_.isEmpty();
-    const int widest = goesBack ? static_cast<int>(width() * backShare) : 0;
-    const int forText = widest - back_->iconSize().width() - 2 * gap;
-    back_->setText(back_->fontMetrics().elidedText(below_, Qt::ElideRight, forText));
-    const int backWidth =
-        goesBack ? std::clamp(back_->sizeHint().width(), smallestButton, widest) : 0;
-    const QRect button(gap, (height() - smallestButton) / 2, backWidth, smallestButton);
-    back_->setGeometry(QStyle::visualRect(layoutDirection(), rect(), button));
-    const int side = goesBack ? backWidth + 2 * gap : margin;
-    QRect middle = rect().adjusted(side, 0, -side, 0);
-    if (label_->fontMetrics().horizontalAdvance(title_) > middle.width()) {
-        middle = QStyle::visualRect(layoutDirection(), rect(), rect().adjusted(side, 0, -gap, 0));
-    }
-    label_->setText(label_->fontMetrics().elidedText(title_, Qt::ElideRight, middle.width()));
-    label_->setGeometry(middle);
+    setMinimumHeight(std::max(barHeight, label_->fontMetrics().height() + 2 * gap));
+    const QString text = fittingBackText();
+    back_->setText(text);
+    const int side = FlatButton::smallestSide;
+    const int top = (height() - side) / 2;
+    place(*back_, {gap, top, backWidth(text), side});
+    place(*search_, {width() - gap - side, top, side, side});
+    const QRect room = roomForTitle(backWidth(text));
+    label_->setText(label_->fontMetrics().elidedText(title_, Qt::ElideRight, room.width()));
+    label_->setToolTip(label_->text() == title_ ? QString() : title_);
+    place(*label_, room);
 }
 
 } // namespace quorl

@@ -1,37 +1,47 @@
 #pragma once
 
 #include <QLabel>
-#include <QToolButton>
 #include <QWidget>
+
+#include "quorl/window/look/FlatButton.h"
 
 namespace quorl {
 
-/// The bar above a pane: its title, and a button back to the pane below. Main thread.
+/// The bar above a pane: its title, a button back to the pane below, and one that finds rows. Main
+/// thread.
 class HeaderBar final : public QWidget {
     Q_OBJECT
 
   public:
-    HeaderBar(const QColor& tint, QWidget* parent);
+    /// Whether the pane's rows can be searched.
+    enum class Search { None, Offered };
+
+    /// `screen` outlives the bar.
+    HeaderBar(WindowScreen& screen, QWidget* parent);
 
     /// `below` names the pane that the button goes back to; empty for no button.
-    void setTitles(const QString& title, const QString& below);
+    void setTitles(const QString& title, const QString& below, Search search);
 
   Q_SIGNALS:
     void backClicked();
+    void searchClicked();
 
   protected:
     void resizeEvent(QResizeEvent* event) override;
     void changeEvent(QEvent* event) override;
 
   private:
-    void dress();
     void fitTexts();
+    [[nodiscard]] int backWidth(const QString& text) const;
+    [[nodiscard]] QString fittingBackText() const;
+    [[nodiscard]] QRect roomForTitle(int backWidth) const;
+    void place(QWidget& widget, const QRect& leftToRight) const;
 
     QString title_;
     QString below_;
-    QToolButton* back_;
+    FlatButton* back_;
+    FlatButton* search_;
     QLabel* label_;
-    const QColor tint_;
 };
 
 } // namespace quorl

@@ -14,41 +14,61 @@ QString titleOf(const UIViewController& pane) {
     return QString::fromStdString(pane.title().value_or(""));
 }
 
-QColor tintOf(const Screen& screen) { return QString::fromStdString(screen.tintColor()); }
-
 } // namespace
 
 MainWindow::MainWindow(Companion& companion, WindowScreen& screen)
     : companion_(companion),
       screen_(screen),
-      header_(new HeaderBar(tintOf(screen), this)),
+      header_(new HeaderBar(screen, this)),
       pages_(new QStackedWidget(this)),
+      slide_(new PageSlide(pages_)),
       foreground_(*this, companion) {
     setFont(screen.font());
-    const QColor tint = tintOf(screen);
     auto* column = new QVBoxLayout(this);
     column->setContentsMargins(0, 0, 0, 0);
     column->setSpacing(0);
     column->addWidget(header_);
-    column->addWidget(new NoticeBar(companion.notices(), tint, this));
+    column->addWidget(new NoticeBar(companion.notices(), screen, this));
     column->addWidget(pages_, 1);
     addShortcuts();
     connect(&screen, &PaneScreen::drawing, this, &MainWindow::draw);
     if (!companion.problem().empty()) {
         pages_->addWidget(new ProblemPage(QString::fromStdString(companion.problem()), pages_));
         setWindowTitle(tr("Music"));
-        header_->setTitles(windowTitle(), QString());
+        header_->setTitles(windowTitle(), QString(), HeaderBar::Search::None);
     }
     draw();
 }
 
 void MainWindow::addShortcuts() {
     connect(header_, &HeaderBar::backClicked, this, &MainWindow::goBack);
-    for (const QKeySequence& keys :
-         {QKeySequence(Qt::Key_Escape), QKeySequence(Qt::ALT | Qt::Key_Left),
-          QKeySequence(Qt::Key_Back)}) {
-        connect(new QShortcut(keys, this), &QShortcut::activated, this, &MainWindow::goBack);
+    connect(header_, &HeaderBar::searchClicked, this, &MainWindow::search);
+    const auto add = [this](const QKeySequence& keys, void (MainWindow::*action)()) {
+        connect(new QShortcut(keys, this), &QShortcut::activated, this, action);
+    };
+    add(Qt::Key_Escape, &MainWindow::escape);
+    add(Qt::Key_Back, &MainWindow::escape);
+    add(Qt::ALT | Qt::Key_Left, &MainWindow::goBack);
+    add(QKeySequence::Find, &MainWindow::search);
+}
+
+void MainWindow::escape() {
+    if (topView() && topView()->isSearched()) {
+        topView()->closeSearch();
+    } else {
+        goBack();
     }
+}
+
+void MainWindow::search() {
+    if (topView()) {
+        topView()->openSearch();
+    }
+}
+
+void MainWindow::resizeEvent(QResizeEvent* event) {
+    QWidget::resizeEvent(event);
+    screen_.scheduleDrawing(); // the title depends on whether all rows are seen
 }
 
 RowsView* MainWindow::topView() const { return views_.empty() ? nullptr : views_.back(); }
@@ -66,8 +86,28 @@ void MainWindow::draw() {
     showTitles();
 }
 
-/// Makes the views those of the stack.
+/// Makes the views those of the stack, and shows the last one.
 void MainWindow::showTopPane() {
+    const auto depth = views_.size();
+    const bool moves = isVisible() && depth > 0 && screen_.look().motion == Motion::Full;
+    const RowsView* shown = topView();
+    const QPixmap before = moves ? pages_->grab() : QPixmap();
+    takeViewsOfStack();
+    if (!topView() || topView() == shown) {
+        return;
+    }
+    pages_->setCurrentWidget(topView());
+    topView()->setFocus(Qt::OtherFocusReason);
+    if (moves) {
+        topView()->draw();
+        slide_->begin(before, pages_->grab(),
+                      views_.size() > depth ? PageSlide::Direction::Forward
+                                            : PageSlide::Direction::Back,
+                      screen_.look().motion);
+    }
+}
+
+void MainWindow::takeViewsOfStack() {
     const auto& stack = companion_.navigation().stack();
     const auto shows = [](const RowsView* view, const std::shared_ptr<UIViewController>& pane) {
         return &view->content().pane() == pane.get();
@@ -84,10 +124,6 @@ void MainWindow::showTopPane() {
         pages_->addWidget(view);
         views_.push_back(view);
     }
-    if (topView() && pages_->currentWidget() != topView()) {
-        pages_->setCurrentWidget(topView());
-        topView()->setFocus(Qt::OtherFocusReason);
-    }
 }
 
 void MainWindow::showTitles() {
@@ -96,8 +132,10 @@ void MainWindow::showTitles() {
         return;
     }
     setWindowTitle(titleOf(*stack.front()));
+    const bool isLong = topView() && topView()->canBeSearched();
     header_->setTitles(titleOf(*stack.back()),
-                       stack.size() > 1 ? titleOf(**(stack.end() - 2)) : QString());
+                       stack.size() > 1 ? titleOf(**(stack.end() - 2)) : QString(),
+                       isLong ? HeaderBar::Search::Offered : HeaderBar::Search::None);
 }
 
 } // namespace quorl

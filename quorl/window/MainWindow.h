@@ -6,6 +6,7 @@
 #include "quorl/app/Companion.h"
 #include "quorl/window/ForegroundWatch.h"
 #include "quorl/window/HeaderBar.h"
+#include "quorl/window/PageSlide.h"
 #include "quorl/window/rows/RowsView.h"
 
 namespace quorl {
@@ -24,16 +25,23 @@ class MainWindow final : public QWidget {
     /// Leaves the top pane; the root pane stays.
     void goBack();
 
+  protected:
+    void resizeEvent(QResizeEvent* event) override;
+
   private:
     void addShortcuts();
+    void escape();
+    void search();
     void draw();
     void showTopPane();
+    void takeViewsOfStack();
     void showTitles();
 
     Companion& companion_;
     WindowScreen& screen_;
     HeaderBar* header_;
     QStackedWidget* pages_;
+    PageSlide* slide_;
     std::vector<RowsView*> views_; ///< of the panes of the stack, in its order; owned by `pages_`
     ForegroundWatch foreground_;
 };

@@ -2,8 +2,8 @@
 
 #include <QHBoxLayout>
 #include <QPainter>
-#include <QToolButton>
 
+#include "quorl/window/look/FlatButton.h"
 #include "quorl/window/look/PaneColors.h"
 
 namespace quorl {
@@ -11,26 +11,24 @@ namespace quorl {
 namespace {
 
 constexpr int margin = 16;
-constexpr int buttonSide = 44;
 
 } // namespace
 
-NoticeBar::NoticeBar(Notices& notices, const QColor& tint, QWidget* parent)
-    : QFrame(parent), notices_(notices), tint_(tint), label_(new QLabel(this)) {
+NoticeBar::NoticeBar(Notices& notices, WindowScreen& screen, QWidget* parent)
+    : QFrame(parent), notices_(notices), screen_(screen), label_(new QLabel(this)) {
     label_->setWordWrap(true);
     label_->setTextFormat(Qt::PlainText);
     label_->setTextInteractionFlags(Qt::TextSelectableByMouse);
-    auto* close = new QToolButton(this);
-    close->setAutoRaise(true);
+    auto* close = new FlatButton(screen, nullptr, this);
     close->setText(QStringLiteral("✕"));
     close->setAccessibleName(tr("Put the notice away"));
-    close->setFixedSize(buttonSide, buttonSide);
     auto* row = new QHBoxLayout(this);
     row->setContentsMargins(margin, margin / 2, margin / 2, margin / 2);
     row->addWidget(label_, 1);
     row->addWidget(close, 0, Qt::AlignTop);
     connect(close, &QToolButton::clicked, this, &QWidget::hide);
     connect(&notices_, &Notices::changed, this, &NoticeBar::showNotices);
+    connect(&screen, &WindowScreen::lookChanged, this, qOverload<>(&QWidget::update));
     showNotices();
 }
 
@@ -44,7 +42,7 @@ void NoticeBar::showNotices() {
 }
 
 void NoticeBar::paintEvent(QPaintEvent* /*event*/) {
-    QPainter(this).fillRect(rect(), PaneColors::of(palette(), tint_).notice);
+    QPainter(this).fillRect(rect(), PaneColors::of(palette(), screen_.look()).notice);
 }
 
 } // namespace quorl

@@ -4,6 +4,7 @@
 #include <QLabel>
 
 #include "quorl/app/Notices.h"
+#include "quorl/window/look/WindowScreen.h"
 
 namespace quorl {
 
@@ -13,8 +14,8 @@ class NoticeBar final : public QFrame {
     Q_OBJECT
 
   public:
-    /// `notices` outlives the bar.
-    NoticeBar(Notices& notices, const QColor& tint, QWidget* parent);
+    /// `notices` and `screen` outlive the bar.
+    NoticeBar(Notices& notices, WindowScreen& screen, QWidget* parent);
 
   protected:
     void paintEvent(QPaintEvent* event) override;
@@ -23,7 +24,7 @@ class NoticeBar final : public QFrame {
     void showNotices();
 
     Notices& notices_;
-    const QColor tint_;
+    const WindowScreen& screen_;
     QLabel* label_;
 };
 

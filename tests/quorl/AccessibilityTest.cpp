@@ -2,6 +2,7 @@
 
 #include <gmock/gmock.h>
 
+#include "tests/quorl/ShownTable.h"
 #include "tests/quorl/Window.h"
 
 namespace quorl::tests {
@@ -56,6 +57,88 @@ TEST(Accessibility, lineIsWhereItIsPainted) {
     auto* list = QAccessible::queryAccessibleInterface(&window.view());
     EXPECT_EQ(list->childAt(line.rect().center().x(), line.rect().center().y()), &line);
     EXPECT_GE(line.rect().height(), 44);
+}
+
+TEST(Accessibility, rowsTellWhichOfHowManyTheyAre) {
+    Window window;
+    window.click(0);
+    EXPECT_EQ(lineNamed(window.view(), "Long Run").text(QAccessible::Description), "1 of 3");
+    EXPECT_EQ(lineNamed(window.view(), "None").text(QAccessible::Description), "3 of 3");
+    window.press(Qt::Key_Escape);
+    EXPECT_EQ(lineNamed(window.view(), "Synced Playlist").text(QAccessible::Description),
+              "None, 1 of 2");
+}
+
+TEST(Accessibility, switchOfTheFrontPageIsOneThatTellsWhetherItIsOn) {
+    Window window;
+    window.press(Qt::Key_Escape);
+    ASSERT_EQ(window.title(), "Velora");
+    EXPECT_EQ(lineNamed(window.view(), "On Charger").role(), QAccessible::CheckBox);
+    EXPECT_TRUE(lineNamed(window.view(), "On Charger").state().checkable);
+}
+
+TEST(Accessibility, onlyWhatIsSeenIsShowing) {
+    ShownTable shown(manyNames(200), "nobody");
+    EXPECT_FALSE(lineNamed(shown.view(), "Name 1000").state().invisible);
+    EXPECT_TRUE(lineNamed(shown.view(), "Name 1150").state().invisible);
+    shown.view().setCurrentRow(150);
+    EXPECT_TRUE(lineNamed(shown.view(), "Name 1000").state().invisible);
+    EXPECT_FALSE(lineNamed(shown.view(), "Name 1150").state().invisible);
+    shown.view().hide();
+    EXPECT_TRUE(lineNamed(shown.view(), "Name 1150").state().invisible);
+}
+
+/// Of which lines of a view assistive technology has been told anything, in that order.
+void noteNews(RowsView& view, QStringList& names) {
+    QObject::connect(&view, &RowsView::told, &view, [&view, &names](int line) {
+        auto* list = QAccessible::queryAccessibleInterface(&view);
+        names << list->child(line)->text(QAccessible::Name);
+    });
+}
+
+TEST(Accessibility, onlyTheRowThatChangesIsTold) {
+    ShownTable shown(manyNames(8), "Name 1002");
+    QStringList told;
+    noteNews(shown.view(), told);
+    shown.reloadWith(manyNames(8));
+    EXPECT_EQ(told, QStringList());
+    shown.table().status = "Synced";
+    shown.reloadWith(manyNames(8));
+    EXPECT_EQ(told, QStringList{"Name 1002"});
+}
+
+/// A list of one group.
+class Footed final : public PSListController {
+  public:
+    [[nodiscard]] NSArray<PSSpecifier> specifiers() override {
+        if (!_specifiers) {
+            group = PSSpecifier::preferenceSpecifierNamed_target_set_get_detail_cell_edit(
+                "Group", nullptr, std::nullopt, std::nullopt, std::nullopt, PSCellType::Group,
+                std::nullopt);
+            group->setProperty_forKey("Before", PSFooterTextGroupKey);
+            _specifiers = std::make_shared<std::vector<std::shared_ptr<PSSpecifier>>>(1, group);
+        }
+        return _specifiers;
+    }
+
+    std::shared_ptr<PSSpecifier> group;
+};
+
+TEST(Accessibility, footerThatChangesIsTold) {
+    ShownTable host({});
+    const auto list = ::create<Footed>();
+    const auto navigation = ::create<NavigationController>();
+    list->viewDidAppear(false);
+    RowsView view(PaneContent::of(list, *navigation), host.screen(), nullptr);
+    view.resize(360, 720);
+    view.show();
+    view.draw();
+    QStringList told;
+    noteNews(view, told);
+    list->group->setProperty_forKey("After", PSFooterTextGroupKey);
+    list->reload();
+    view.draw();
+    EXPECT_EQ(told, QStringList{"After"});
 }
 
 TEST(Accessibility, focusFollowsTheKeys) {

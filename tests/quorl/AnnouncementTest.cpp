@@ -11,9 +11,32 @@ using testing::IsEmpty;
 
 const RowTexts syncing{QStringLiteral("Road Trip"), QStringLiteral("5% Synced…"), true};
 
+RowTexts syncedTo(const QString& percentage) {
+    return {syncing.title, percentage + QStringLiteral(" Synced…"), true};
+}
+
 TEST(Announcement, runningPercentageIsNotTold) {
-    const RowTexts later{syncing.title, QStringLiteral("16% Synced…"), true};
-    EXPECT_THAT(newsOf(syncing, later), IsEmpty());
+    EXPECT_THAT(newsOf(syncedTo("5%"), syncedTo("16%")), IsEmpty());
+    EXPECT_THAT(newsOf(syncedTo("26%"), syncedTo("49%")), IsEmpty());
+}
+
+TEST(Announcement, percentageIsToldAtEveryQuarter) {
+    for (const auto& [before, now] :
+         {std::pair("24%", "25%"), std::pair("49%", "51%"), std::pair("3%", "75%")}) {
+        EXPECT_THAT(newsOf(syncedTo(before), syncedTo(now)),
+                    ElementsAre(QAccessible::DescriptionChanged));
+    }
+}
+
+TEST(Announcement, percentageInArabicDigitsIsToldAtEveryQuarterToo) {
+    EXPECT_THAT(newsOf(syncedTo("١٠٪"), syncedTo("٢٤٪")), IsEmpty());
+    EXPECT_THAT(newsOf(syncedTo("٢٤٪"), syncedTo("٢٥٪")),
+                ElementsAre(QAccessible::DescriptionChanged));
+}
+
+TEST(Announcement, numberThatIsNoPercentageIsTold) {
+    EXPECT_THAT(newsOf({"Storage", "1 GB free", false}, {"Storage", "2 GB free", false}),
+                ElementsAre(QAccessible::DescriptionChanged));
 }
 
 TEST(Announcement, endOfTheSyncIsTold) {

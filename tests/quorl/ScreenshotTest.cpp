@@ -1,7 +1,9 @@
+#include <QApplication>
 #include <QImage>
 
 #include <gmock/gmock.h>
 
+#include "quorl/window/look/PaneColors.h"
 #include "tests/quorl/QuorlProcess.h"
 #include "tests/quorl/SampleMusic.h"
 #include "tests/quorl/StoredPreferences.h"
@@ -11,8 +13,6 @@ namespace quorl::tests {
 namespace {
 
 using testing::HasSubstr;
-
-constexpr QRgb tint = qRgb(0x5b, 0x6e, 0xf5);
 
 class Screenshot : public testing::Test {
   protected:
@@ -29,6 +29,7 @@ class Screenshot : public testing::Test {
 
 /// Where the picture has the tint, below `top`.
 QRect tinted(const QImage& picture, int top = 0) {
+    const QRgb tint = PaneColors::of(QApplication::palette(), Look()).tint.rgb();
     QRect found;
     for (int y = top; y < picture.height(); ++y) {
         for (int x = 0; x < picture.width(); ++x) {

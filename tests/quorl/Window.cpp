@@ -1,5 +1,6 @@
 #include "tests/quorl/Window.h"
 
+#include <QApplication>
 #include <QTest>
 #include <stdexcept>
 
@@ -23,6 +24,9 @@ Places placesWith(const std::filesystem::path& music) {
 
 Window::Window(const std::filesystem::path& music)
     : companion_(placesWith(music), screen_, notices_), window_(companion_, screen_) {
+    Look still = screen_.look();
+    still.motion = Motion::Reduced;
+    screen_.setLook(still);
     window_.resize(360, 720);
     companion_.start();
     window_.show();
@@ -42,6 +46,12 @@ void Window::click(NSInteger row) {
 
 void Window::press(Qt::Key key) {
     QTest::keyClick(&view(), key);
+    QCoreApplication::processEvents();
+}
+
+void Window::pressWithFocus(Qt::Key key, Qt::KeyboardModifiers modifiers) {
+    auto* focus = QApplication::focusWidget();
+    QTest::keyClick(focus ? focus : &window_, key, modifiers);
     QCoreApplication::processEvents();
 }
 

@@ -10,8 +10,8 @@ namespace quorl::tests {
 /// The app's window over a music folder of its own, with the real plug-in and the real services.
 class Window {
   public:
-    /// Shows the window, phone-sized, and waits until the music folder has been read: the one
-    /// given here, or one of its own.
+    /// Shows the window, phone-sized, in which nothing moves by itself, and waits until the music
+    /// folder has been read: the one given here, or one of its own.
     explicit Window(const std::filesystem::path& music = {});
 
     [[nodiscard]] SampleMusic& music() { return music_; }
@@ -32,6 +32,9 @@ class Window {
     void click(NSInteger row);
 
     void press(Qt::Key key);
+
+    /// Presses a key wherever the focus is.
+    void pressWithFocus(Qt::Key key, Qt::KeyboardModifiers modifiers = Qt::NoModifier);
 
     /// Runs the event loop until the top pane has this among its `rows`; false where that does not
     /// come.

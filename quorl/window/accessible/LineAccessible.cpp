@@ -1,5 +1,9 @@
 #include "quorl/window/accessible/LineAccessible.h"
 
+#include <QCoreApplication>
+
+#include "quorl/content/SwitchCell.h"
+
 namespace quorl {
 
 bool LineAccessible::isValid() const { return index_ < view_.layout().lineCount(); }
@@ -37,6 +41,9 @@ QAccessible::Role LineAccessible::role() const {
         break;
     }
     const auto cell = this->cell();
+    if (cell && dynamic_cast<const SwitchCell*>(cell.get())) {
+        return QAccessible::CheckBox;
+    }
     const bool opens =
         cell && cell->accessoryType() == UITableViewCellAccessoryType::DisclosureIndicator;
     return opens ? QAccessible::Button : QAccessible::ListItem;
@@ -49,12 +56,14 @@ QAccessible::State LineAccessible::state() const {
         return state;
     }
     const QRectF place = view_.onViewport(line().rect);
-    state.offscreen = !place.intersects(QRectF(view_.viewport()->rect()));
+    const bool isSeen = view_.isVisible() && place.intersects(QRectF(view_.viewport()->rect()));
+    state.offscreen = !isSeen;
+    state.invisible = !isSeen; // only that keeps a line from being told as showing
     if (const auto cell = this->cell()) {
         const bool isCurrent = view_.currentRow() == line().row;
         state.focusable = true;
         state.focused = isCurrent && view_.hasFocus();
-        state.checkable = role() == QAccessible::ListItem;
+        state.checkable = role() != QAccessible::Button;
         state.checked = textsOf(*cell).isChecked;
     } else {
         state.readOnly = true;
@@ -72,13 +81,31 @@ QString LineAccessible::text(QAccessible::Text kind) const {
         return {};
     }
     if (const auto cell = this->cell()) {
-        const RowTexts texts = textsOf(*cell);
-        const bool isValue = kind == QAccessible::Value || kind == QAccessible::Description;
-        return kind == QAccessible::Name ? texts.title : isValue ? texts.value : QString();
+        return textOfRow(textsOf(*cell), kind);
     }
     const auto& section = view_.content().sections()[line().section];
     const auto& text = line().kind == RowsLayout::LineKind::Title ? section.title : section.footer;
     return kind == QAccessible::Name ? QString::fromStdString(text.value_or("")) : QString();
+}
+
+QString LineAccessible::textOfRow(const RowTexts& texts, QAccessible::Text kind) const {
+    switch (kind) {
+    case QAccessible::Name:
+        return texts.title;
+    case QAccessible::Value:
+        return texts.value;
+    case QAccessible::Description:
+        return texts.value + (texts.value.isEmpty() ? QString() : QStringLiteral(", ")) +
+               position();
+    default:
+        return {};
+    }
+}
+
+QString LineAccessible::position() const {
+    return QCoreApplication::translate("LineAccessible", "%1 of %2")
+        .arg(line().row + 1)
+        .arg(view_.layout().rowCount());
 }
 
 void LineAccessible::setText(QAccessible::Text /*kind*/, const QString& /*text*/) {}

@@ -41,6 +41,11 @@ class LineAccessible final : public QAccessibleInterface, public QAccessibleActi
     /// The row's cell; null for a title or a footer.
     [[nodiscard]] std::shared_ptr<UITableViewCell> cell() const;
 
+    [[nodiscard]] QString textOfRow(const RowTexts& texts, QAccessible::Text kind) const;
+
+    /// Which of how many rows it is.
+    [[nodiscard]] QString position() const;
+
     RowsView& view_;
     const int index_;
 };

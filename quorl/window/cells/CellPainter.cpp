@@ -3,26 +3,16 @@
 #include <QFontMetricsF>
 
 #include "quorl/content/SwitchCell.h"
+#include "quorl/window/cells/CellArrangement.h"
 
 namespace quorl {
 
 namespace {
 
-constexpr qreal margin = 16;          // of the accessory from the end of the row
-constexpr qreal roundingError = 0.01; // of a width that a text just fits into
 constexpr QSizeF checkmarkSize(14, 11);
 constexpr QSizeF chevronSize(7, 12);
 constexpr QSizeF toggleSize(44, 26);
-
-QRectF toRect(const CGRect& frame) {
-    return {static_cast<qreal>(frame.x), static_cast<qreal>(frame.y),
-            static_cast<qreal>(frame.width), static_cast<qreal>(frame.height)};
-}
-
-QColor colorOr(const std::optional<UIColor>& name, const QColor& otherwise) {
-    const QColor color = name ? QColor(QString::fromStdString(*name)) : QColor();
-    return color.isValid() ? color : otherwise;
-}
+constexpr qreal accessoryGap = 14;
 
 /// Of a row: the side where reading starts, or the other one.
 enum class Side { Start, End };
@@ -33,20 +23,19 @@ class Painting {
     Painting(QPainter& painter, const QRectF& place, Qt::LayoutDirection direction)
         : painter_(painter), place_(place), isMirrored_(direction == Qt::RightToLeft) {}
 
-    void label(const UILabel& label, const QColor& color, Side side) {
-        const QRectF frame = toRect(label.frame());
-        if (!label.text() || frame.width() <= 0) {
-            return;
-        }
-        const QFontMetricsF metrics(painter_.font());
-        const QString text = metrics.elidedText(QString::fromStdString(*label.text()),
-                                                Qt::ElideRight, frame.width() + roundingError);
+    void text(const CellArrangement::Text& text, const QColor& color, Side side) {
+        const qreal height = QFontMetricsF(painter_.font()).height();
         const auto alignment = (side == Side::End) == isMirrored_ ? Qt::AlignLeft : Qt::AlignRight;
+        const QRectF place = onPage(text.place);
+        qreal top = place.center().y() - height * static_cast<qreal>(text.lines.size()) / 2;
         painter_.setPen(color);
-        painter_.drawText(onPage(frame),
-                          static_cast<int>(alignment | Qt::AlignAbsolute) | Qt::AlignVCenter |
-                              Qt::TextSingleLine | Qt::TextDontClip,
-                          text);
+        for (const QString& line : text.lines) {
+            painter_.drawText(QRectF(place.left(), top, place.width(), height),
+                              static_cast<int>(alignment | Qt::AlignAbsolute) | Qt::AlignVCenter |
+                                  Qt::TextSingleLine | Qt::TextDontClip,
+                              line);
+            top += height;
+        }
     }
 
     /// Ticks the same way in every direction of reading.
@@ -54,8 +43,8 @@ class Painting {
         stroke({{0, 0.5}, {0.36, 1}, {1, 0}}, checkmarkSize, color);
     }
 
-    void toggle(bool isOn, const QColor& onColor, const QColor& offColor) {
-        const QRectF track = onPage({place_.width() - margin - toggleSize.width(),
+    void toggle(bool isOn, const QColor& color, const QColor& knobColor) {
+        const QRectF track = onPage({place_.width() - cellMargin - toggleSize.width(),
                                      (place_.height() - toggleSize.height()) / 2,
                                      toggleSize.width(), toggleSize.height()});
         const qreal radius = track.height() / 2;
@@ -65,9 +54,9 @@ class Painting {
         painter_.save();
         painter_.setRenderHint(QPainter::Antialiasing);
         painter_.setPen(Qt::NoPen);
-        painter_.setBrush(isOn ? onColor : offColor);
+        painter_.setBrush(color);
         painter_.drawRoundedRect(track, radius, radius);
-        painter_.setBrush(Qt::white);
+        painter_.setBrush(knobColor);
         painter_.drawEllipse(knob, radius - 2, radius - 2);
         painter_.restore();
     }
@@ -81,8 +70,8 @@ class Painting {
     /// A line within the box of the accessory, from 0 to 1 each way.
     void stroke(std::initializer_list<QPointF> points, const QSizeF& size, const QColor& color) {
         const QRectF box =
-            onPage({place_.width() - margin - size.width(), (place_.height() - size.height()) / 2,
-                    size.width(), size.height()});
+            onPage({place_.width() - cellMargin - size.width(),
+                    (place_.height() - size.height()) / 2, size.width(), size.height()});
         QPolygonF line;
         for (const QPointF& point : points) {
             line << box.topLeft() + QPointF(point.x() * box.width(), point.y() * box.height());
@@ -108,22 +97,31 @@ class Painting {
 
 } // namespace
 
+qreal accessoryRoom(const UITableViewCell& cell) {
+    if (dynamic_cast<const SwitchCell*>(&cell)) {
+        return toggleSize.width() + accessoryGap;
+    }
+    const bool hasMark = cell.accessoryType() != UITableViewCellAccessoryType::None;
+    return hasMark ? checkmarkSize.width() + accessoryGap : 0;
+}
+
 void paintCell(QPainter& painter, const UITableViewCell& cell, const QRectF& place,
                const QFont& font, const PaneColors& colors, Qt::LayoutDirection direction) {
     painter.setFont(font);
     painter.setLayoutDirection(Qt::LayoutDirectionAuto); // names read as they are written
+    const auto texts = CellArrangement::of(cell, place.size(), font);
     Painting painting(painter, place, direction);
-    painting.label(cell.textLabel(), colorOr(cell.textLabel().textColor(), colors.text),
-                   Side::Start);
-    painting.label(cell.detailTextLabel(),
-                   colorOr(cell.detailTextLabel().textColor(), colors.secondary),
-                   cell.style() == UITableViewCellStyle::Subtitle ? Side::Start : Side::End);
+    painting.text(texts.title, colors.named(cell.textLabel().textColor(), colors.text),
+                  Side::Start);
+    painting.text(texts.value, colors.named(cell.detailTextLabel().textColor(), colors.secondary),
+                  texts.isStacked ? Side::Start : Side::End);
     if (const auto* toggle = dynamic_cast<const SwitchCell*>(&cell)) {
-        painting.toggle(toggle->isOn(), colors.tint, colors.faint);
+        const QColor track = toggle->isOn() ? colors.tint : colors.mark;
+        painting.toggle(toggle->isOn(), track, colors.knobOn(track));
     } else if (cell.accessoryType() == UITableViewCellAccessoryType::Checkmark) {
-        painting.checkmark(colorOr(cell.tintColor(), colors.tint));
+        painting.checkmark(colors.named(cell.tintColor(), colors.tint));
     } else if (cell.accessoryType() != UITableViewCellAccessoryType::None) {
-        painting.chevron(colors.faint);
+        painting.chevron(colors.mark);
     }
 }
 

@@ -5,19 +5,38 @@
 
 namespace quorl {
 
-QStringList wrappedLines(const QString& text, const QFont& font, qreal width) {
+namespace {
+
+struct Lines {
+    QStringList texts;
+    qreal width = 0; ///< of the widest
+};
+
+Lines broken(const QString& text, const QFont& font, qreal width, QTextOption::WrapMode mode) {
     QTextOption option;
-    option.setWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
+    option.setWrapMode(mode);
     QTextLayout layout(text, font);
     layout.setTextOption(option);
     layout.beginLayout();
-    QStringList lines;
+    Lines lines;
     for (QTextLine line = layout.createLine(); line.isValid(); line = layout.createLine()) {
         line.setLineWidth(width);
-        lines << text.mid(line.textStart(), line.textLength()).trimmed();
+        lines.texts << text.mid(line.textStart(), line.textLength()).trimmed();
+        lines.width = std::max(lines.width, line.naturalTextWidth());
     }
     layout.endLayout();
     return lines;
+}
+
+} // namespace
+
+QStringList wrappedLines(const QString& text, const QFont& font, qreal width) {
+    return broken(text, font, width, QTextOption::WrapAtWordBoundaryOrAnywhere).texts;
+}
+
+std::optional<QStringList> linesOfWholeWords(const QString& text, const QFont& font, qreal width) {
+    auto lines = broken(text, font, width, QTextOption::WordWrap);
+    return lines.width <= width ? std::optional(std::move(lines.texts)) : std::nullopt;
 }
 
 qreal heightOfLines(const QStringList& lines, const QFont& font) {

@@ -3,11 +3,16 @@
 #include <QFont>
 #include <QPainter>
 #include <QStringList>
+#include <optional>
 
 namespace quorl {
 
 /// The lines that a text takes in a width, without the spaces at which it was broken.
 [[nodiscard]] QStringList wrappedLines(const QString& text, const QFont& font, qreal width);
+
+/// The same, without a break within a word: null where there is a word that is too wide.
+[[nodiscard]] std::optional<QStringList> linesOfWholeWords(const QString& text, const QFont& font,
+                                                           qreal width);
 
 /// The height of such lines.
 [[nodiscard]] qreal heightOfLines(const QStringList& lines, const QFont& font);

@@ -1,8 +1,9 @@
 #include "quorl/window/look/WindowScreen.h"
 
+#include <QApplication>
 #include <QFontInfo>
 #include <QFontMetricsF>
-#include <QGuiApplication>
+#include <QStyle>
 #include <cmath>
 
 namespace quorl {
@@ -12,18 +13,43 @@ namespace {
 constexpr qreal smallestRowHeight = 44;
 constexpr qreal rowPadding = 8;
 constexpr qreal smallestTextHeight = 15; // pixels of the font's size
+constexpr int smallestSmallTextHeight = 13;
 
 qreal upToPixel(qreal length, qreal scale) { return std::ceil(length * scale - 1e-6) / scale; }
 
 } // namespace
 
-WindowScreen::WindowScreen() { setFont(QGuiApplication::font()); }
+WindowScreen::WindowScreen() {
+    setFont(QGuiApplication::font());
+    if (QApplication::style()->styleHint(QStyle::SH_Widget_Animation_Duration) == 0) {
+        look_.motion = Motion::Reduced;
+    }
+}
+
+void WindowScreen::setLook(const Look& look) {
+    if (look != look_) {
+        look_ = look;
+        Q_EMIT lookChanged();
+    }
+}
 
 void WindowScreen::setFont(const QFont& applicationFont) {
     font_ = applicationFont;
     if (QFontInfo(font_).pixelSize() < smallestTextHeight) {
         font_.setPixelSize(static_cast<int>(smallestTextHeight));
     }
+}
+
+QFont WindowScreen::headingFont() const {
+    QFont font = smallFont();
+    font.setBold(true);
+    return font;
+}
+
+QFont WindowScreen::smallFont() const {
+    QFont font = font_;
+    font.setPixelSize(std::max(QFontInfo(font_).pixelSize() * 7 / 8, smallestSmallTextHeight));
+    return font;
 }
 
 qreal WindowScreen::rowHeight() const {

@@ -4,6 +4,8 @@
 #include <QRectF>
 
 #include "quorl/app/PaneScreen.h"
+#include "quorl/window/look/LastInput.h"
+#include "quorl/window/look/Look.h"
 
 namespace quorl {
 
@@ -14,8 +16,19 @@ class WindowScreen final : public PaneScreen {
   public:
     WindowScreen();
 
+    /// How things are to look now. At first nothing moves where the toolkit's style does not.
+    [[nodiscard]] const Look& look() const { return look_; }
+
+    void setLook(const Look& look);
+
+    [[nodiscard]] const LastInput& lastInput() const { return lastInput_; }
+
     /// What rows are written in.
     [[nodiscard]] const QFont& font() const { return font_; }
+
+    /// What titles and footers of groups are written in.
+    [[nodiscard]] QFont headingFont() const;
+    [[nodiscard]] QFont smallFont() const;
 
     /// The height of a row, in points: at least what a finger and two lines need, and
     /// whole device pixels.
@@ -33,7 +46,12 @@ class WindowScreen final : public PaneScreen {
     [[nodiscard]] CGSize sizeOfText(const UILabel& label) const override;
     void layOutLabels(UITableViewCell& cell) override;
 
+  Q_SIGNALS:
+    void lookChanged();
+
   private:
+    Look look_;
+    LastInput lastInput_;
     QFont font_;
     qreal rowWidth_ = 0;
     qreal scale_ = 1;

@@ -40,7 +40,7 @@ void RowsLayout::add(const PaneContent::Section& content, const HeightOfText& he
         !hasText(content.title) && content.rowCount == 0 && !hasText(content.footer);
     height_ += isEmpty ? 0 : sectionGap;
     if (hasText(content.title)) {
-        const qreal height = std::ceil(heightOfText(*content.title, textWidth));
+        const qreal height = std::ceil(heightOfText(LineKind::Title, *content.title, textWidth));
         section.title = {textLeft, height_, textWidth, height};
         height_ += height + textGap;
     }
@@ -50,7 +50,7 @@ void RowsLayout::add(const PaneContent::Section& content, const HeightOfText& he
         height_ += height;
     }
     if (hasText(content.footer)) {
-        const qreal height = std::ceil(heightOfText(*content.footer, textWidth));
+        const qreal height = std::ceil(heightOfText(LineKind::Footer, *content.footer, textWidth));
         section.footer = {textLeft, height_ + textGap, textWidth, height};
         height_ += textGap + height;
     }
@@ -133,6 +133,30 @@ int RowsLayout::lineOfRow(NSInteger row) const {
         line += linesOf(section);
     }
     return line;
+}
+
+std::vector<int> RowsLayout::linesBetween(qreal top, qreal bottom) const {
+    std::vector<int> lines;
+    int first = 0;
+    for (const Section& section : sections_) {
+        const int title = section.title.isEmpty() ? 0 : 1;
+        const auto isSeen = [top, bottom](const QRectF& place) {
+            return !place.isEmpty() && place.bottom() > top && place.top() < bottom;
+        };
+        if (isSeen(section.title)) {
+            lines.push_back(first);
+        }
+        NSInteger row = std::max(firstRowBelow(top), section.firstRow);
+        const NSInteger end = section.firstRow + section.rowCount;
+        for (; row < end && isSeen(rowRect(section, row)); ++row) {
+            lines.push_back(first + title + static_cast<int>(row - section.firstRow));
+        }
+        if (isSeen(section.footer)) {
+            lines.push_back(first + linesOf(section) - 1);
+        }
+        first += linesOf(section);
+    }
+    return lines;
 }
 
 } // namespace quorl

@@ -23,6 +23,8 @@ class RowsLayout {
         std::size_t section = 0;
         NSInteger row = 0; ///< of a row
         QRectF rect;
+
+        [[nodiscard]] bool operator==(const Line&) const = default;
     };
 
     struct Section {
@@ -31,10 +33,12 @@ class RowsLayout {
         QRectF footer;
         NSInteger firstRow = 0;
         NSInteger rowCount = 0;
+
+        [[nodiscard]] bool operator==(const Section&) const = default;
     };
 
-    /// Gives the height of a text that is wrapped to a width.
-    using HeightOfText = std::function<qreal(const std::string& text, qreal width)>;
+    /// Gives the height of a title or a footer that is wrapped to a width.
+    using HeightOfText = std::function<qreal(LineKind kind, const std::string& text, qreal width)>;
 
     /// An empty layout.
     RowsLayout() = default;
@@ -42,6 +46,8 @@ class RowsLayout {
     /// `left` and `width` are those of the cards.
     RowsLayout(const std::vector<PaneContent::Section>& sections, qreal left, qreal width,
                qreal rowHeight, const HeightOfText& heightOfText);
+
+    [[nodiscard]] bool operator==(const RowsLayout&) const = default;
 
     [[nodiscard]] const std::vector<Section>& sections() const { return sections_; }
 
@@ -67,6 +73,9 @@ class RowsLayout {
 
     /// The line of a row.
     [[nodiscard]] int lineOfRow(NSInteger row) const;
+
+    /// The lines that are seen between two heights, from top to bottom.
+    [[nodiscard]] std::vector<int> linesBetween(qreal top, qreal bottom) const;
 
   private:
     [[nodiscard]] QRectF rowRect(const Section& section, NSInteger row) const;

@@ -1,18 +1,12 @@
 #include "quorl/window/rows/RowsView.h"
 
-#include <QAccessible>
-#include <QApplication>
-#include <QKeyEvent>
 #include <QPainter>
-#include <QPainterPath>
 #include <QScrollBar>
-#include <QScroller>
-#include <QStyle>
 #include <cmath>
 
 #include "quorl/window/accessible/RowsAccessible.h"
-#include "quorl/window/cells/CellPainter.h"
 #include "quorl/window/cells/WrappedText.h"
+#include "quorl/window/rows/RowsPainter.h"
 
 namespace quorl {
 
@@ -20,15 +14,6 @@ namespace {
 
 constexpr qreal pageMargin = 16;
 constexpr qreal widestCard = 640;
-constexpr qreal cardRadius = 10;
-constexpr qreal separatorIndent = 16;
-constexpr int fadeDuration = 250;      // milliseconds
-constexpr int highlightDuration = 350; // milliseconds
-
-void prepare(QVariantAnimation& animation) {
-    animation.setStartValue(1.0);
-    animation.setEndValue(0.0);
-}
 
 } // namespace
 
@@ -36,47 +21,67 @@ RowsView::RowsView(std::unique_ptr<PaneContent> content, WindowScreen& screen, Q
     : QAbstractScrollArea(parent),
       content_(std::move(content)),
       screen_(screen),
-      colors_(PaneColors::of(palette(), QColor(QString::fromStdString(screen.tintColor())))) {
+      colors_(PaneColors::of(palette(), screen.look())),
+      places_(*content_),
+      touch_(screen),
+      momentum_(*viewport()),
+      finder_(*content_),
+      search_(new SearchField(screen, this)),
+      scrollBar_(new OverlayScrollBar(*verticalScrollBar(), screen, this)) {
     RowsAccessible::install();
     setFrameShape(QFrame::NoFrame);
     setFocusPolicy(Qt::StrongFocus);
     setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
-    QScroller::grabGesture(viewport(), QScroller::TouchGesture);
-    prepare(highlight_);
-    prepare(fade_);
-    connect(&highlight_, &QVariantAnimation::valueChanged, viewport(),
-            qOverload<>(&QWidget::update));
-    connect(&highlight_, &QVariantAnimation::finished, this, &RowsView::endHighlight);
-    connect(&fade_, &QVariantAnimation::valueChanged, viewport(), qOverload<>(&QWidget::update));
-    connect(&fade_, &QVariantAnimation::finished, this, [this] { fadingRows_.clear(); });
+    setVerticalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
+    viewport()->setMouseTracking(true);
+    connect(&touch_, &RowTouch::changed, this, &RowsView::updateRow);
+    connect(&fades_, &RowFades::changed, this, &RowsView::updateRow);
     connectScreen();
+    connectSearch();
 }
+
+RowsView::~RowsView() = default;
 
 void RowsView::connectScreen() {
     connect(&screen_, &PaneScreen::rowsWillFade, this, &RowsView::fadeRows);
     connect(&screen_, &PaneScreen::rowWillBeDeselected, this,
             [this](const UITableView& table, const NSIndexPath& path, bool animated) {
-                if (content_->row(table, path) == highlightedRow_) {
-                    animated ? fadeHighlight() : endHighlight();
+                if (content_->row(table, path) == touch_.litRow()) {
+                    animated ? touch_.fade() : touch_.endLight();
                 }
             });
+    connect(&screen_, &WindowScreen::lookChanged, this, [this] {
+        colors_ = PaneColors::of(palette(), screen_.look());
+        viewport()->update();
+    });
+    connect(&screen_.lastInput(), &LastInput::changed, this, &RowsView::updateCurrentRow);
 }
 
 void RowsView::draw() {
-    if (press_ && !content_->isCurrent()) {
-        releasePress(); // the finger came down on another row
+    const bool isReloaded = !content_->isCurrent();
+    if (isReloaded) {
+        touch_.cancel(); // a finger came down on another row
     }
+    const RowsLayout before = layout_;
+    const int scrolled = verticalScrollBar()->value();
     layOut(); // the screen's geometry is that of this view before cells are laid out
     drawRows();
     layOut();
-    tellAccessibility();
-    viewport()->update();
+    if (isReloaded) {
+        keepPlaces(before, scrolled);
+        finder_.rowsDidChange();
+    }
+    notePlaces();
+    showChanges(before);
+    if (isVisible() && !std::exchange(isOpened_, true)) {
+        finder_.findChecked();
+    }
 }
 
 void RowsView::drawRows() {
-    const qreal rowHeight = screen_.rowHeight();
     // Also right for a pane that has more rows now than when it was laid out.
-    const auto onScreen = static_cast<NSInteger>(std::ceil(viewport()->height() / rowHeight)) + 1;
+    const auto onScreen =
+        static_cast<NSInteger>(std::ceil(viewport()->height() / screen_.rowHeight())) + 1;
     content_->draw(layout_.firstRowBelow(verticalScrollBar()->value()), onScreen);
 }
 
@@ -87,51 +92,85 @@ void RowsView::layOut() {
     const qreal left = std::round((available - width) / 2 * scale) / scale;
     const qreal rowWidth = std::floor(width * scale) / scale;
     screen_.setGeometry(rowWidth, scale);
-    const QFont font = smallFont();
-    layout_ = RowsLayout(content_->sections(), left, rowWidth, screen_.rowHeight(),
-                         [&font](const std::string& text, qreal textWidth) {
-                             const auto lines =
-                                 wrappedLines(QString::fromStdString(text), font, textWidth);
-                             return heightOfLines(lines, font);
-                         });
+    const auto heightOf = [this](RowsLayout::LineKind kind, const std::string& text, qreal room) {
+        const QFont font =
+            kind == RowsLayout::LineKind::Title ? screen_.headingFont() : screen_.smallFont();
+        return heightOfLines(wrappedLines(QString::fromStdString(text), font, room), font);
+    };
+    layout_ = RowsLayout(content_->sections(), left, rowWidth, screen_.rowHeight(), heightOf);
     const int beyond = static_cast<int>(layout_.height()) - viewport()->height();
     verticalScrollBar()->setRange(0, std::max(beyond, 0));
     verticalScrollBar()->setPageStep(viewport()->height());
     verticalScrollBar()->setSingleStep(static_cast<int>(screen_.rowHeight() / 2));
 }
 
-QFont RowsView::smallFont() const {
-    QFont font = screen_.font();
-    font.setPixelSize(std::max(QFontInfo(font).pixelSize() * 7 / 8, 13));
-    return font;
+/// Who is at the top of a pane stays there, and sees what arrives.
+void RowsView::keepPlaces(const RowsLayout& before, int scrolled) {
+    const auto move = places_.moveOnScreen();
+    if (const auto row = places_.placeOfCurrent()) {
+        currentRow_ = *row;
+    } else {
+        currentRow_ = std::max<NSInteger>(currentRow_ + (move ? move->to - move->from : 0), 0);
+        places_.forgetCurrent();
+    }
+    if (move && scrolled > 0) {
+        const qreal shift = layout_.rowRect(move->to).top() - before.rowRect(move->from).top();
+        verticalScrollBar()->setValue(scrolled + qRound(shift));
+    }
 }
 
-void RowsView::tellAccessibility() {
-    std::map<NSInteger, RowTexts> texts;
-    NSInteger row = layout_.firstRowBelow(verticalScrollBar()->value());
-    for (auto cell = content_->cell(row); cell; cell = content_->cell(++row)) {
-        texts.emplace(row, textsOf(*cell));
-        if (const auto before = told_.find(row); before != told_.end()) {
-            tellChanges(layout_.lineOfRow(row), before->second, texts.at(row));
+void RowsView::showChanges(const RowsLayout& before) {
+    auto now = linesOnScreen();
+    if (layout_ != before) {
+        viewport()->update();
+    }
+    for (const auto& [line, shown] : now) {
+        const auto known = shown_.find(line);
+        if (known == shown_.end()) {
+            updatePlace(shown.place);
+        } else if (known->second != shown) {
+            updatePlace(shown.place);
+            for (const auto news : newsOf(known->second.texts, shown.texts)) {
+                tell(line, news);
+            }
         }
     }
-    told_ = std::move(texts);
+    shown_ = std::move(now);
 }
 
-void RowsView::tellChanges(int line, const RowTexts& before, const RowTexts& now) {
-    const auto tell = [line](QAccessibleEvent&& event) {
+std::map<int, RowsView::ShownLine> RowsView::linesOnScreen() const {
+    std::map<int, ShownLine> lines;
+    const int top = verticalScrollBar()->value();
+    for (const int index : layout_.linesBetween(top, top + viewport()->height())) {
+        const auto line = layout_.line(index);
+        lines.emplace(index, ShownLine{line.rect, textsOfLine(line)});
+    }
+    return lines;
+}
+
+RowTexts RowsView::textsOfLine(const RowsLayout::Line& line) const {
+    if (line.kind == RowsLayout::LineKind::Row) {
+        const auto cell = content_->cell(line.row);
+        return cell ? textsOf(*cell) : RowTexts();
+    }
+    const auto& section = content_->sections()[line.section];
+    const auto& text = line.kind == RowsLayout::LineKind::Title ? section.title : section.footer;
+    return {QString::fromStdString(text.value_or("")), {}, false};
+}
+
+void RowsView::tell(int line, QAccessible::Event news) {
+    const auto send = [line](QAccessibleEvent&& event) {
         event.setChild(line);
         QAccessible::updateAccessibility(&event);
     };
-    for (const QAccessible::Event type : newsOf(before, now)) {
-        if (type == QAccessible::StateChanged) {
-            QAccessible::State checked;
-            checked.checked = true;
-            tell(QAccessibleStateChangeEvent(this, checked));
-        } else {
-            tell(QAccessibleEvent(this, type));
-        }
+    if (news == QAccessible::StateChanged) {
+        QAccessible::State checked;
+        checked.checked = true;
+        send(QAccessibleStateChangeEvent(this, checked));
+    } else {
+        send(QAccessibleEvent(this, news));
     }
+    Q_EMIT told(line, news);
 }
 
 QRectF RowsView::onViewport(const QRectF& place) const {
@@ -147,192 +186,78 @@ std::optional<NSInteger> RowsView::currentRow() const {
     return count > 0 ? std::optional(std::min(currentRow_, count - 1)) : std::nullopt;
 }
 
-void RowsView::setCurrentRow(NSInteger row) {
+void RowsView::makeCurrent(NSInteger row) {
+    updateCurrentRow();
     currentRow_ = row;
+    updateCurrentRow();
+    notePlaces();
+}
+
+void RowsView::notePlaces() {
+    places_.note(layout_.firstRowBelow(verticalScrollBar()->value()), currentRow_);
+}
+
+void RowsView::setCurrentRow(NSInteger row) {
+    finder_.stopFindingChecked();
+    momentum_.stop();
+    makeCurrent(row);
     const QRectF place = layout_.rowRect(row);
     QScrollBar& bar = *verticalScrollBar();
     const int margin = static_cast<int>(screen_.rowHeight());
     const int lowest = static_cast<int>(std::ceil(place.bottom())) + margin - viewport()->height();
     const int highest = static_cast<int>(place.top()) - margin;
     bar.setValue(std::min(std::max(bar.value(), lowest), std::max(highest, 0)));
-    viewport()->update();
-    QAccessibleEvent focused(this, QAccessible::Focus);
-    focused.setChild(layout_.lineOfRow(row));
-    QAccessible::updateAccessibility(&focused);
+    tell(layout_.lineOfRow(row), QAccessible::Focus);
 }
 
 void RowsView::tap(NSInteger row) {
     if (!content_->isCurrent()) {
-        releasePress();
+        touch_.cancel();
         return;
     }
-    highlight_.stop();
-    highlightedRow_ = row;
-    currentRow_ = row;
-    viewport()->update();
+    makeCurrent(row);
+    touch_.light(row);
     content_->tap(row);
-    if (highlightedRow_ && highlight_.state() != QAbstractAnimation::Running) {
-        fadeHighlight(); // lists do not tell when to
+    if (touch_.litRow() && !touch_.isFading()) {
+        touch_.fade(); // lists do not tell when to
     }
     screen_.scheduleDrawing();
 }
 
-void RowsView::fadeHighlight() { startFading(highlight_, highlightDuration); }
-
-void RowsView::endHighlight() {
-    highlight_.stop();
-    highlightedRow_.reset();
-    viewport()->update();
-}
-
-/// Ends at once where the user wants no animations.
-void RowsView::startFading(QVariantAnimation& animation, int milliseconds) {
-    const bool isWanted =
-        style()->styleHint(QStyle::SH_Widget_Animation_Duration, nullptr, this) > 0;
-    animation.stop();
-    animation.setDuration(isWanted ? milliseconds : 0);
-    animation.start();
-}
-
 void RowsView::fadeRows(const UITableView& table, const std::vector<NSIndexPath>& paths) {
-    if (!isVisible()) {
+    if (!isVisible() || screen_.look().motion == Motion::Reduced) {
         return;
     }
     for (const NSIndexPath& path : paths) {
         const auto row = content_->row(table, path);
         const QRectF place = row ? onViewport(layout_.rowRect(*row)) : QRectF();
         if (row && viewport()->rect().intersects(place.toAlignedRect())) {
-            fadingRows_[*row] = viewport()->grab(place.toAlignedRect());
+            fades_.keep(*row, viewport()->grab(place.toAlignedRect()));
         }
     }
-    startFading(fade_, fadeDuration);
+    fades_.begin(screen_.look().motion);
 }
 
-void RowsView::resizeEvent(QResizeEvent* event) {
-    QAbstractScrollArea::resizeEvent(event);
-    draw();
+void RowsView::updatePlace(const QRectF& place) {
+    viewport()->update(onViewport(place).toAlignedRect().adjusted(-1, -1, 1, 1));
 }
 
-void RowsView::changeEvent(QEvent* event) {
-    QAbstractScrollArea::changeEvent(event);
-    if (event->type() == QEvent::PaletteChange) {
-        colors_ = PaneColors::of(palette(), colors_.tint);
-        viewport()->update();
-    } else if (event->type() == QEvent::FontChange || event->type() == QEvent::StyleChange ||
-               event->type() == QEvent::LayoutDirectionChange) {
-        screen_.scheduleDrawing();
+void RowsView::updateRow(NSInteger row) { updatePlace(layout_.rowRect(row)); }
+
+void RowsView::updateCurrentRow() {
+    if (const auto row = currentRow()) {
+        updateRow(*row);
     }
 }
 
-void RowsView::scrollContentsBy(int /*horizontally*/, int /*vertically*/) {
-    press_.reset();
-    fadingRows_.clear();
-    if (content_->isCurrent()) { // else the layout is not that of the rows: `draw` takes both anew
-        drawRows();
-    }
-    viewport()->update();
+bool RowsView::showsFocus() const {
+    return hasFocus() && screen_.lastInput().kind() == LastInput::Kind::Keys;
 }
 
-void RowsView::mousePressEvent(QMouseEvent* event) {
-    const auto row = layout_.rowAt(onPane(event->position()));
-    if (event->button() == Qt::LeftButton && row && content_->isCurrent()) {
-        press_ = Press{*row, event->position()};
-        showsCurrentRow_ = false;
-        highlight_.stop();
-        highlightedRow_ = *row;
-        viewport()->update();
-    }
-}
-
-void RowsView::mouseMoveEvent(QMouseEvent* event) {
-    const bool isDrag = press_ && (event->position() - press_->position).manhattanLength() >
-                                      QApplication::startDragDistance();
-    if (isDrag && layout_.rowAt(onPane(event->position())) != press_->row) {
-        releasePress();
-    }
-}
-
-void RowsView::mouseReleaseEvent(QMouseEvent* event) {
-    if (event->button() != Qt::LeftButton) {
-        return;
-    }
-    if (press_ && layout_.rowAt(onPane(event->position())) == press_->row) {
-        const NSInteger row = press_->row;
-        press_.reset();
-        tap(row);
-    } else {
-        releasePress();
-    }
-}
-
-void RowsView::releasePress() {
-    press_.reset();
-    if (highlightedRow_) {
-        fadeHighlight();
-    }
-}
-
-std::optional<NSInteger> RowsView::rowByKey(int key) const {
-    const NSInteger last = layout_.rowCount() - 1;
-    const NSInteger row = currentRow().value_or(0);
-    const auto page = std::max<NSInteger>(
-        static_cast<NSInteger>(viewport()->height() / layout_.rowHeight()) - 1, 1);
-    const auto within = [last](NSInteger wanted) {
-        return std::clamp<NSInteger>(wanted, 0, std::max<NSInteger>(last, 0));
-    };
-    switch (key) {
-    case Qt::Key_Up:
-        return within(showsCurrentRow_ ? row - 1 : row);
-    case Qt::Key_Down:
-        return within(showsCurrentRow_ ? row + 1 : row);
-    case Qt::Key_PageUp:
-        return within(row - page);
-    case Qt::Key_PageDown:
-        return within(row + page);
-    case Qt::Key_Home:
-        return within(0);
-    case Qt::Key_End:
-        return within(last);
-    default:
-        return std::nullopt;
-    }
-}
-
-void RowsView::keyPressEvent(QKeyEvent* event) {
-    const auto row = currentRow();
-    if (!row) {
-        QAbstractScrollArea::keyPressEvent(event);
-        return;
-    }
-    if (const auto next = rowByKey(event->key())) {
-        showsCurrentRow_ = true;
-        setCurrentRow(*next);
-        return;
-    }
-    switch (event->key()) {
-    case Qt::Key_Return:
-    case Qt::Key_Enter:
-    case Qt::Key_Space:
-    case Qt::Key_Select:
-        showsCurrentRow_ = true;
-        setCurrentRow(*row);
-        tap(*row);
-        return;
-    default:
-        QAbstractScrollArea::keyPressEvent(event);
-    }
-}
-
-void RowsView::focusInEvent(QFocusEvent* event) {
-    QAbstractScrollArea::focusInEvent(event);
-    showsCurrentRow_ = event->reason() == Qt::TabFocusReason ||
-                       event->reason() == Qt::BacktabFocusReason || showsCurrentRow_;
-    viewport()->update();
-}
-
-void RowsView::focusOutEvent(QFocusEvent* event) {
-    QAbstractScrollArea::focusOutEvent(event);
-    viewport()->update();
+TouchState RowsView::stateOf(NSInteger row) const {
+    TouchState state = touch_.stateOf(row);
+    state.isRinged = showsFocus() && currentRow() == row;
+    return state;
 }
 
 void RowsView::paintEvent(QPaintEvent* event) {
@@ -342,86 +267,39 @@ void RowsView::paintEvent(QPaintEvent* event) {
     const qreal scale = devicePixelRatioF();
     const qreal offset = std::round(verticalScrollBar()->value() * scale) / scale;
     painter.translate(0, -offset);
-    const QRectF exposed = QRectF(event->rect()).translated(0, offset);
-    for (std::size_t number = 0; number < layout_.sections().size(); ++number) {
-        paintSection(painter, number, exposed);
-    }
-    paintFade(painter);
+    painter.setLayoutDirection(layoutDirection());
+    const RowsPainter::Subject subject{*content_, layout_, screen_, colors_,
+                                       [this](NSInteger row) { return stateOf(row); }};
+    RowsPainter(painter, subject).paint(QRectF(event->rect()).translated(0, offset));
+    fades_.paint(painter, layout_);
 }
 
-void RowsView::paintSection(QPainter& painter, std::size_t number, const QRectF& exposed) const {
-    const auto& content = content_->sections()[number];
-    const auto& section = layout_.sections()[number];
-    painter.setFont(smallFont());
-    painter.setPen(colors_.secondary);
-    if (section.title.intersects(exposed)) {
-        paintWrapped(painter, QString::fromStdString(content.title.value_or("")), section.title,
-                     layoutDirection());
-    }
-    if (section.footer.intersects(exposed)) {
-        paintWrapped(painter, QString::fromStdString(content.footer.value_or("")), section.footer,
-                     layoutDirection());
-    }
-    if (section.card.intersects(exposed)) {
-        paintCard(painter, section, exposed);
-    }
+void RowsView::resizeEvent(QResizeEvent* event) {
+    QAbstractScrollArea::resizeEvent(event);
+    placeSearch();
+    draw();
 }
 
-void RowsView::paintCard(QPainter& painter, const RowsLayout::Section& section,
-                         const QRectF& exposed) const {
-    // Corners that are far off the screen are beyond what a painter can reckon with.
-    const QRectF near = exposed.adjusted(0, -4 * cardRadius, 0, 4 * cardRadius);
-    QPainterPath card;
-    card.addRoundedRect(section.card.intersected(near.adjusted(-widestCard, 0, widestCard, 0)),
-                        cardRadius, cardRadius);
-    painter.save();
-    painter.setRenderHint(QPainter::Antialiasing);
-    painter.fillPath(card, colors_.card);
-    if (highlightedRow_) {
-        const bool isFading = highlight_.state() == QAbstractAnimation::Running;
-        painter.setClipPath(card);
-        painter.setOpacity(isFading ? highlight_.currentValue().toDouble() : 1.0);
-        painter.fillRect(layout_.rowRect(*highlightedRow_), colors_.highlight);
-    }
-    painter.restore();
-    const NSInteger end = section.firstRow + section.rowCount;
-    NSInteger row = std::max(layout_.firstRowBelow(exposed.top()), section.firstRow);
-    for (; row < end && layout_.rowRect(row).top() < exposed.bottom(); ++row) {
-        paintRow(painter, row, row + 1 == end);
+void RowsView::changeEvent(QEvent* event) {
+    QAbstractScrollArea::changeEvent(event);
+    if (event->type() == QEvent::PaletteChange) {
+        colors_ = PaneColors::of(palette(), screen_.look());
+        viewport()->update();
+    } else if (event->type() == QEvent::FontChange || event->type() == QEvent::StyleChange ||
+               event->type() == QEvent::LayoutDirectionChange) {
+        screen_.scheduleDrawing();
     }
 }
 
-void RowsView::paintRow(QPainter& painter, NSInteger row, bool isLast) const {
-    const QRectF place = layout_.rowRect(row);
-    if (const auto cell = content_->cell(row)) {
-        paintCell(painter, *cell, place, screen_.font(), colors_, layoutDirection());
+void RowsView::scrollContentsBy(int /*horizontally*/, int /*vertically*/) {
+    touch_.cancel();
+    touch_.hover(std::nullopt);
+    fades_.end();
+    if (content_->isCurrent()) { // else the layout is not that of the rows: `draw` takes both anew
+        drawRows();
+        notePlaces();
     }
-    if (!isLast) {
-        const qreal thickness = 1 / devicePixelRatioF();
-        const bool isMirrored = layoutDirection() == Qt::RightToLeft;
-        const qreal left = place.left() + (isMirrored ? 0 : separatorIndent);
-        painter.fillRect(
-            QRectF(left, place.bottom() - thickness, place.width() - separatorIndent, thickness),
-            colors_.separator);
-    }
-    if (showsCurrentRow_ && hasFocus() && currentRow() == row) {
-        painter.save();
-        painter.setRenderHint(QPainter::Antialiasing);
-        painter.setPen(QPen(colors_.tint, 2));
-        painter.drawRoundedRect(place.adjusted(2, 2, -2, -2), cardRadius - 2, cardRadius - 2);
-        painter.restore();
-    }
-}
-
-void RowsView::paintFade(QPainter& painter) const {
-    painter.setOpacity(fade_.currentValue().toDouble());
-    for (const auto& [row, picture] : fadingRows_) {
-        const QRectF place = layout_.rowRect(row);
-        if (!place.isEmpty()) {
-            painter.drawPixmap(place.topLeft(), picture);
-        }
-    }
-    painter.setOpacity(1);
+    viewport()->update();
 }
 
 } // namespace quorl

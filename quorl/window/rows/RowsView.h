@@ -1,26 +1,35 @@
 #pragma once
 
 #include <QAbstractScrollArea>
-#include <QVariantAnimation>
 #include <map>
 #include <memory>
 
 #include "quorl/content/PaneContent.h"
+#include "quorl/content/RowPlaces.h"
 #include "quorl/window/accessible/RowTexts.h"
 #include "quorl/window/look/PaneColors.h"
 #include "quorl/window/look/WindowScreen.h"
+#include "quorl/window/rows/Momentum.h"
+#include "quorl/window/rows/OverlayScrollBar.h"
+#include "quorl/window/rows/RowFades.h"
+#include "quorl/window/rows/RowTouch.h"
 #include "quorl/window/rows/RowsLayout.h"
+#include "quorl/window/search/RowFinder.h"
+#include "quorl/window/search/SearchField.h"
+#include "quorl/window/search/TypeAhead.h"
 
 namespace quorl {
 
 /// A pane in a window: groups of rows on cards, painted on one surface that scrolls by touch, wheel
-/// and keys. Main thread.
+/// and keys, and can be searched where it is long. It opens at the row that is checked. A person's
+/// place in it stays at the same rows when they are loaded anew. Main thread.
 class RowsView final : public QAbstractScrollArea {
     Q_OBJECT
 
   public:
     /// `screen` outlives the view.
     RowsView(std::unique_ptr<PaneContent> content, WindowScreen& screen, QWidget* parent);
+    ~RowsView() override;
 
     /// Draws the pane and shows what has changed.
     void draw();
@@ -43,12 +52,30 @@ class RowsView final : public QAbstractScrollArea {
     /// Makes a row the one that keys act on, and scrolls until it is seen.
     void setCurrentRow(NSInteger row);
 
+    /// Whether the pane has more rows than are seen at once, or is being searched.
+    [[nodiscard]] bool canBeSearched() const;
+
+    /// Opens a field that leaves only rows with its text, where the pane can be searched.
+    void openSearch();
+
+    /// Shows all rows again, at the one that was found.
+    void closeSearch();
+
+    [[nodiscard]] bool isSearched() const { return !search_->isHidden(); }
+
+  Q_SIGNALS:
+    /// Assistive technology is told this of a line on the screen.
+    void told(int line, QAccessible::Event news);
+
   protected:
+    bool viewportEvent(QEvent* event) override;
     void paintEvent(QPaintEvent* event) override;
     void resizeEvent(QResizeEvent* event) override;
     void changeEvent(QEvent* event) override;
     void scrollContentsBy(int horizontally, int vertically) override;
+    void wheelEvent(QWheelEvent* event) override;
     void mousePressEvent(QMouseEvent* event) override;
+    void mouseDoubleClickEvent(QMouseEvent* event) override;
     void mouseMoveEvent(QMouseEvent* event) override;
     void mouseReleaseEvent(QMouseEvent* event) override;
     void keyPressEvent(QKeyEvent* event) override;
@@ -56,44 +83,59 @@ class RowsView final : public QAbstractScrollArea {
     void focusOutEvent(QFocusEvent* event) override;
 
   private:
-    struct Press {
-        NSInteger row;
-        QPointF position;
+    /// What is seen of a line, by which a change is told.
+    struct ShownLine {
+        QRectF place;
+        RowTexts texts;
+
+        [[nodiscard]] bool operator==(const ShownLine&) const = default;
     };
 
     void connectScreen();
+    void connectSearch();
     void drawRows();
     void layOut();
-    void tellAccessibility();
-    void tellChanges(int line, const RowTexts& before, const RowTexts& now);
-    void releasePress();
-    [[nodiscard]] std::optional<NSInteger> rowByKey(int key) const;
-    [[nodiscard]] QFont smallFont() const;
+    void keepPlaces(const RowsLayout& before, int scrolled);
+    void showChanges(const RowsLayout& before);
+    [[nodiscard]] std::map<int, ShownLine> linesOnScreen() const;
+    [[nodiscard]] RowTexts textsOfLine(const RowsLayout::Line& line) const;
+    void tell(int line, QAccessible::Event news);
+    void updatePlace(const QRectF& place);
+    void updateRow(NSInteger row);
+    void updateCurrentRow();
+    void makeCurrent(NSInteger row);
+    void notePlaces();
+
+    void showMatches(std::optional<std::vector<NSInteger>> paneRows);
+    void placeSearch();
+    void typeAhead(const QKeyEvent& event);
+    void goToPaneRow(NSInteger paneRow);
+    void openAt(NSInteger paneRow);
+    bool takeKey(const QKeyEvent& event);
+    [[nodiscard]] NSInteger rowsOnPage() const;
+    [[nodiscard]] std::optional<NSInteger> rowAt(QPointF onViewport) const;
+    [[nodiscard]] QString toolTipAt(QPointF onViewport) const;
 
     void fadeRows(const UITableView& table, const std::vector<NSIndexPath>& paths);
-    void startFading(QVariantAnimation& animation, int milliseconds);
-    void fadeHighlight();
-    void endHighlight();
-
-    void paintSection(QPainter& painter, std::size_t number, const QRectF& exposed) const;
-    void paintCard(QPainter& painter, const RowsLayout::Section& section,
-                   const QRectF& exposed) const;
-    void paintRow(QPainter& painter, NSInteger row, bool isLast) const;
-    void paintFade(QPainter& painter) const;
+    [[nodiscard]] TouchState stateOf(NSInteger row) const;
+    [[nodiscard]] bool showsFocus() const;
 
     std::unique_ptr<PaneContent> content_;
     WindowScreen& screen_;
     RowsLayout layout_;
     PaneColors colors_;
+    RowPlaces places_;
     NSInteger currentRow_ = 0;
-    bool showsCurrentRow_ = false; ///< keys were used last
-    std::optional<Press> press_;   ///< a finger is down
-    std::optional<NSInteger> highlightedRow_;
-    QVariantAnimation highlight_;             ///< its opacity, from 1 to 0
-    std::map<NSInteger, QPixmap> fadingRows_; ///< what reloaded rows looked like
-    QVariantAnimation fade_;                  ///< its opacity, from 1 to 0
-
-    std::map<NSInteger, RowTexts> told_; ///< what assistive technology knows of the rows on screen
+    RowTouch touch_;
+    RowFades fades_;
+    Momentum momentum_;
+    RowFinder finder_;
+    TypeAhead typeAhead_;
+    SearchField* search_;
+    OverlayScrollBar* scrollBar_;
+    bool wasPressed_ = false;        ///< ever
+    bool isOpened_ = false;          ///< it has been seen
+    std::map<int, ShownLine> shown_; ///< as last drawn; what assistive technology knows
 };
 
 } // namespace quorl

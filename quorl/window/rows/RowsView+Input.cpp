@@ -1,0 +1,147 @@
+#include <QApplication>
+#include <QHelpEvent>
+#include <QKeyEvent>
+#include <QScrollBar>
+#include <QToolTip>
+
+#include "quorl/window/cells/CellArrangement.h"
+#include "quorl/window/rows/RowKeys.h"
+#include "quorl/window/rows/RowsView.h"
+
+namespace quorl {
+
+namespace {
+
+/// A touch that nobody took comes as what a mouse does.
+bool isFinger(const QMouseEvent& event) {
+    return event.source() != Qt::MouseEventNotSynthesized ||
+           event.pointingDevice()->type() == QInputDevice::DeviceType::TouchScreen;
+}
+
+bool isTapping(int key) {
+    return key == Qt::Key_Return || key == Qt::Key_Enter || key == Qt::Key_Space ||
+           key == Qt::Key_Select;
+}
+
+/// Whether a key writes something, rather than orders something.
+bool isWriting(const QKeyEvent& event) {
+    const bool isOrder =
+        event.modifiers() & (Qt::ControlModifier | Qt::AltModifier | Qt::MetaModifier);
+    return !isOrder && !event.text().isEmpty() && event.text().front().isPrint();
+}
+
+} // namespace
+
+std::optional<NSInteger> RowsView::rowAt(QPointF onViewport) const {
+    return layout_.rowAt(onPane(onViewport));
+}
+
+void RowsView::wheelEvent(QWheelEvent* event) {
+    finder_.stopFindingChecked();
+    if (!momentum_.isOver(*event)) {
+        QAbstractScrollArea::wheelEvent(event);
+    }
+}
+
+void RowsView::mousePressEvent(QMouseEvent* event) {
+    wasPressed_ = true;
+    finder_.stopFindingChecked();
+    if (momentum_.takesPress()) {
+        return;
+    }
+    const auto row = rowAt(event->position());
+    if (event->button() == Qt::LeftButton && row && content_->isCurrent()) {
+        touch_.press(*row, event->position());
+    }
+}
+
+/// The second of two quick presses is one like any other, unless the first opened this view.
+void RowsView::mouseDoubleClickEvent(QMouseEvent* event) {
+    if (wasPressed_) {
+        mousePressEvent(event);
+    }
+}
+
+void RowsView::mouseMoveEvent(QMouseEvent* event) {
+    const auto row = rowAt(event->position());
+    touch_.moveTo(event->position(), row);
+    if (isFinger(*event)) {
+        return;
+    }
+    touch_.hover(row);
+    if (scrollBar_->geometry()
+            .translated(-viewport()->pos())
+            .contains(event->position().toPoint())) {
+        scrollBar_->appear();
+    }
+}
+
+void RowsView::mouseReleaseEvent(QMouseEvent* event) {
+    if (event->button() != Qt::LeftButton) {
+        return;
+    }
+    if (const auto row = touch_.release(rowAt(event->position()))) {
+        tap(*row);
+    }
+}
+
+bool RowsView::viewportEvent(QEvent* event) {
+    if (event->type() == QEvent::Leave) {
+        touch_.hover(std::nullopt);
+    } else if (event->type() == QEvent::ToolTip) {
+        const auto& help = static_cast<QHelpEvent&>(*event);
+        QToolTip::showText(help.globalPos(), toolTipAt(help.pos()), viewport());
+        return true;
+    }
+    return QAbstractScrollArea::viewportEvent(event);
+}
+
+/// The whole of what is shortened there.
+QString RowsView::toolTipAt(QPointF onViewport) const {
+    const auto row = rowAt(onViewport);
+    const auto cell = row ? content_->cell(*row) : nullptr;
+    if (!cell || CellArrangement::of(*cell, layout_.rowRect(*row).size(), screen_.font()).isWhole) {
+        return {};
+    }
+    const RowTexts texts = textsOf(*cell);
+    return texts.title + (texts.value.isEmpty() ? QString() : u'\n' + texts.value);
+}
+
+NSInteger RowsView::rowsOnPage() const {
+    return std::max<NSInteger>(
+        static_cast<NSInteger>(viewport()->height() / layout_.rowHeight()) - 1, 1);
+}
+
+void RowsView::keyPressEvent(QKeyEvent* event) {
+    if (!currentRow() || !takeKey(*event)) {
+        QAbstractScrollArea::keyPressEvent(event);
+    }
+}
+
+bool RowsView::takeKey(const QKeyEvent& event) {
+    const NSInteger row = *currentRow();
+    if (const auto next = rowByKey(event.key(), row, layout_.rowCount() - 1, rowsOnPage())) {
+        setCurrentRow(*next);
+    } else if (isTapping(event.key()) &&
+               !(typeAhead_.isUnderWay(event.timestamp()) && event.key() == Qt::Key_Space)) {
+        setCurrentRow(row);
+        tap(row);
+    } else if (isWriting(event)) {
+        typeAhead(event);
+    } else {
+        return false;
+    }
+    return true;
+}
+
+void RowsView::focusInEvent(QFocusEvent* event) {
+    QAbstractScrollArea::focusInEvent(event);
+    updateCurrentRow();
+}
+
+void RowsView::focusOutEvent(QFocusEvent* event) {
+    QAbstractScrollArea::focusOutEvent(event);
+    updateCurrentRow();
+}
+
+} // namespace quorl
