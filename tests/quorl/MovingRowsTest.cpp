@@ -84,6 +84,22 @@ TEST_F(MovingRows, touchOnRowsAtRestChooses) {
     EXPECT_THAT(shown_.table().selected, ElementsAre(name));
 }
 
+TEST_F(MovingRows, everyOneOfQuickTouchesChooses) {
+    const std::string name = nameUnderFinger();
+    touch();
+    touch();
+    touch();
+    EXPECT_THAT(shown_.table().selected, ElementsAre(name, name, name));
+}
+
+TEST_F(MovingRows, fingerThatDragsThemPressesNoRow) {
+    finger_.press(*shown_.view().viewport(), place);
+    QScroller::scroller(shown_.view().viewport())
+        ->handleInput(QScroller::InputMove, QPointF(place) + QPointF(0, 90), 1'000'000);
+    finger_.release(*shown_.view().viewport(), place + QPoint(0, 90));
+    EXPECT_THAT(shown_.table().selected, IsEmpty());
+}
+
 TEST_F(MovingRows, clickThatStopsThemChoosesNothing) {
     flick();
     click();

@@ -23,6 +23,8 @@ void Momentum::follow(QScroller::State state) {
         stopsByTouch_ = before == QScroller::Scrolling;
     } else if (state != QScroller::Dragging) { // that is still the same finger
         stopsByTouch_ = false;
+    } else {
+        Q_EMIT dragged();
     }
 }
 

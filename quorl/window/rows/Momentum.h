@@ -24,6 +24,10 @@ class Momentum final : public QObject {
 
     void stop();
 
+  Q_SIGNALS:
+    /// The finger that is down drags the rows now.
+    void dragged();
+
   private:
     void follow(QScroller::State state);
 

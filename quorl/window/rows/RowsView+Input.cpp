@@ -12,12 +12,6 @@ namespace quorl {
 
 namespace {
 
-/// A touch that nobody took comes as what a mouse does.
-bool isFinger(const QMouseEvent& event) {
-    return event.source() != Qt::MouseEventNotSynthesized ||
-           event.pointingDevice()->type() == QInputDevice::DeviceType::TouchScreen;
-}
-
 bool isTapping(int key) {
     return key == Qt::Key_Return || key == Qt::Key_Enter || key == Qt::Key_Space ||
            key == Qt::Key_Select;
@@ -43,15 +37,39 @@ void RowsView::wheelEvent(QWheelEvent* event) {
     }
 }
 
+void RowsView::pressAt(QPointF onViewport) {
+    finder_.stopFindingChecked();
+    const auto row = rowAt(onViewport);
+    if (!momentum_.takesPress() && row && content_->isCurrent()) {
+        touch_.press(*row, onViewport);
+    }
+}
+
+void RowsView::releaseAt(QPointF onViewport) {
+    if (const auto row = touch_.release(rowAt(onViewport))) {
+        tap(*row);
+    }
+}
+
+/// Not left to become what a mouse does: of two quick touches the second would be lost.
+void RowsView::takeTouch(const QTouchEvent& event) {
+    const QPointF place = event.points().front().position();
+    if (event.points().size() > 1 || event.type() == QEvent::TouchCancel) {
+        touch_.cancel();
+    } else if (event.type() == QEvent::TouchBegin) {
+        touch_.hover(std::nullopt);
+        pressAt(place);
+    } else if (event.type() == QEvent::TouchUpdate) {
+        touch_.moveTo(place, rowAt(place));
+    } else {
+        releaseAt(place);
+    }
+}
+
 void RowsView::mousePressEvent(QMouseEvent* event) {
     wasPressed_ = true;
-    finder_.stopFindingChecked();
-    if (momentum_.takesPress()) {
-        return;
-    }
-    const auto row = rowAt(event->position());
-    if (event->button() == Qt::LeftButton && row && content_->isCurrent()) {
-        touch_.press(*row, event->position());
+    if (event->button() == Qt::LeftButton) {
+        pressAt(event->position());
     }
 }
 
@@ -65,33 +83,37 @@ void RowsView::mouseDoubleClickEvent(QMouseEvent* event) {
 void RowsView::mouseMoveEvent(QMouseEvent* event) {
     const auto row = rowAt(event->position());
     touch_.moveTo(event->position(), row);
-    if (isFinger(*event)) {
-        return;
-    }
     touch_.hover(row);
-    if (scrollBar_->geometry()
-            .translated(-viewport()->pos())
-            .contains(event->position().toPoint())) {
+    const QRect strip = scrollBar_->geometry().translated(-viewport()->pos());
+    if (strip.contains(event->position().toPoint())) {
         scrollBar_->appear();
     }
 }
 
 void RowsView::mouseReleaseEvent(QMouseEvent* event) {
-    if (event->button() != Qt::LeftButton) {
-        return;
-    }
-    if (const auto row = touch_.release(rowAt(event->position()))) {
-        tap(*row);
+    if (event->button() == Qt::LeftButton) {
+        releaseAt(event->position());
     }
 }
 
 bool RowsView::viewportEvent(QEvent* event) {
-    if (event->type() == QEvent::Leave) {
-        touch_.hover(std::nullopt);
-    } else if (event->type() == QEvent::ToolTip) {
+    switch (event->type()) {
+    case QEvent::TouchBegin:
+    case QEvent::TouchUpdate:
+    case QEvent::TouchEnd:
+    case QEvent::TouchCancel:
+        takeTouch(static_cast<QTouchEvent&>(*event));
+        return true;
+    case QEvent::ToolTip: {
         const auto& help = static_cast<QHelpEvent&>(*event);
         QToolTip::showText(help.globalPos(), toolTipAt(help.pos()), viewport());
         return true;
+    }
+    case QEvent::Leave:
+        touch_.hover(std::nullopt);
+        break;
+    default:
+        break;
     }
     return QAbstractScrollArea::viewportEvent(event);
 }

@@ -35,6 +35,7 @@ RowsView::RowsView(std::unique_ptr<PaneContent> content, WindowScreen& screen, Q
     setVerticalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     viewport()->setMouseTracking(true);
     connect(&touch_, &RowTouch::changed, this, &RowsView::updateRow);
+    connect(&momentum_, &Momentum::dragged, &touch_, &RowTouch::cancel);
     connect(&fades_, &RowFades::changed, this, &RowsView::updateRow);
     connectScreen();
     connectSearch();

@@ -112,6 +112,9 @@ class RowsView final : public QAbstractScrollArea {
     void goToPaneRow(NSInteger paneRow);
     void openAt(NSInteger paneRow);
     bool takeKey(const QKeyEvent& event);
+    void pressAt(QPointF onViewport);
+    void releaseAt(QPointF onViewport);
+    void takeTouch(const QTouchEvent& event);
     [[nodiscard]] NSInteger rowsOnPage() const;
     [[nodiscard]] std::optional<NSInteger> rowAt(QPointF onViewport) const;
     [[nodiscard]] QString toolTipAt(QPointF onViewport) const;
