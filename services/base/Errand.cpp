@@ -40,7 +40,7 @@ Errand::Errand(Work work, std::chrono::milliseconds patience)
     : shared_(std::make_shared<Shared>()),
       patience_(patience),
       thread_([shared = shared_, work = std::move(work),
-               loose = std::make_unique<LooseThread>()]() mutable {
+               loose = std::make_shared<LooseThread>()]() mutable {
           work(shared->stop.get_token());
           work = {};
           loose.reset();

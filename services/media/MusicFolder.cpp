@@ -166,15 +166,15 @@ class MusicFolder::Worker {
         }
     }
 
-    /// Waits for a change for at most `patience`, and marks what changed. False: nothing changed in
+    /// Waits for a change for at most so long, and marks what changed. False: nothing changed in
     /// that time, or the thread was woken up.
-    bool takeChanges(std::chrono::milliseconds patience) {
+    bool takeChanges(std::chrono::milliseconds longest) {
         std::array<pollfd, 4> descriptors{pollfd{wakeUp_.get(), POLLIN, 0},
                                           pollfd{rootWatch_->descriptor(), POLLIN, 0},
                                           pollfd{directoryWatch_.descriptor(), POLLIN, 0},
                                           pollfd{mountWatch_->descriptor(), POLLPRI, 0}};
         const auto& [woken, root, directories, mounts] = descriptors;
-        if (poll(descriptors.data(), descriptors.size(), static_cast<int>(patience.count())) <= 0) {
+        if (poll(descriptors.data(), descriptors.size(), static_cast<int>(longest.count())) <= 0) {
             return false;
         }
         if (woken.revents != 0) {
