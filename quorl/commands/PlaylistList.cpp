@@ -4,6 +4,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "quorl/app/Printing.h"
 #include "quorl/commands/OfferedPlaylists.h"
 #include "services/base/Utf8.h"
 #include "services/media/MusicFolder.h"
@@ -43,18 +44,10 @@ ExitCode printPlaylists(const Options& options) {
     const auto& music = options.places.music;
     const auto inventory = media::scan(music.empty() ? preferences::chosenMusicFolder() : music);
     if (!inventory->rootFound) {
-        std::cerr << "quorl: There is no music folder at "
-                  << base::printable(inventory->root.string())
-                  << ". Create it, or name another one with --music.\n";
-        return ExitCode::NoMusicFolder;
+        return tellMissingMusicFolder(inventory->root);
     }
     options.json ? printJson(*inventory) : printLines(*inventory);
-    std::cout.flush();
-    if (!std::cout) {
-        std::cerr << "quorl: The list could not be written to standard output.\n";
-        return ExitCode::Failure;
-    }
-    return ExitCode::Success;
+    return finishPrinting();
 }
 
 } // namespace quorl

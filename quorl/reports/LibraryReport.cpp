@@ -2,6 +2,7 @@
 
 #include <iostream>
 
+#include "quorl/app/Printing.h"
 #include "runtime/plugins/StringTable.h"
 #include "runtime/services/SizeText.h"
 #include "services/base/Utf8.h"
@@ -63,21 +64,13 @@ void printLeftOut(const media::Inventory& inventory) {
 ExitCode printLibrary(const std::filesystem::path& music) {
     const auto inventory = media::scan(music.empty() ? preferences::chosenMusicFolder() : music);
     if (!inventory->rootFound) {
-        std::cerr << "quorl: There is no music folder at "
-                  << base::printable(inventory->root.string())
-                  << ". Create it, or name another one with --music.\n";
-        return ExitCode::NoMusicFolder;
+        return tellMissingMusicFolder(inventory->root);
     }
     printPlaylists(*inventory);
     if (!inventory->leftOut.empty()) {
         printLeftOut(*inventory);
     }
-    std::cout.flush();
-    if (!std::cout) {
-        std::cerr << "quorl: The list could not be written to standard output.\n";
-        return ExitCode::Failure;
-    }
-    return ExitCode::Success;
+    return finishPrinting();
 }
 
 } // namespace quorl
