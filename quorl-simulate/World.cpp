@@ -275,8 +275,11 @@ struct World::Looked final : syncd::WatchedWearable {
         world_.turns_.callAt(world_.turns_.now() + noticedAfter, answer);
     }
 
-    void save(const wearable::Attachment& attachment, Saved saved) override {
-        world_.attachment_ = attachment;
+    void save(const wearable::AttachmentChange& change, Saved saved) override {
+        if (world_.isDead_) {
+            return;
+        }
+        world_.attachment_ = change.appliedTo(world_.attachment_);
         world_.turns_.call([saved = std::move(saved)] { saved({}); });
     }
 

@@ -44,9 +44,11 @@ class Known {
     }
 
     /// Gives back an empty text, or a sentence.
-    [[nodiscard]] std::string save(const wearable::Attachment& attachment) const {
+    [[nodiscard]] std::string save(const wearable::AttachmentChange& change) const {
         try {
-            saveAttachment(open(identity()).get(), attachment);
+            base::makeDirectories(identity().root); // it may not have been looked at yet
+            const auto root = open(identity());
+            saveAttachment(root.get(), change.appliedTo(wearable::loadAttachment(root.get())));
             return {};
         } catch (const std::system_error& error) {
             return "The wearable could not remember how it is attached: " + error.code().message() +
@@ -84,13 +86,12 @@ class LocalWearable final : public WatchedWearable {
         });
     }
 
-    void save(const wearable::Attachment& attachment, Saved saved) override {
+    void save(const wearable::AttachmentChange& change, Saved saved) override {
         const auto tell = lifeline_.whileThere(std::move(saved));
         try {
             saving_.emplace(
-                [known = known_, attachment, tell,
-                 mailbox = loop_.mailbox()](const std::stop_token&) {
-                    mailbox->post([tell, problem = known->save(attachment)] { tell(problem); });
+                [known = known_, change, tell, mailbox = loop_.mailbox()](const std::stop_token&) {
+                    mailbox->post([tell, problem = known->save(change)] { tell(problem); });
                 },
                 patience);
         } catch (const std::system_error& error) {

@@ -12,12 +12,16 @@ namespace quorl::syncd {
 AttachedWearable::AttachedWearable(WearablePort& port, Changed changed)
     : port_(port), changed_(std::move(changed)) {}
 
+AttachedWearable::~AttachedWearable() { saveLastWish(); }
+
 void AttachedWearable::choose(const std::string& directory) {
-    watched_ = port_.watch(directory, [this](WearableNews news) { notice(news); });
+    auto watched = port_.watch(directory, [this](WearableNews news) { notice(news); });
+    saveLastWish();
+    watched_ = std::move(watched);
     identity_ = watched_->identity();
     saved_.reset();
     wished_ = {};
-    isSaving_ = false;
+    saving_.reset();
     wasThere_ = false;
     forget();
     refresh();
@@ -31,7 +35,7 @@ void AttachedWearable::refresh() {
     });
 }
 
-void AttachedWearable::attach(const AttachmentChange& change) {
+void AttachedWearable::attach(const wearable::AttachmentChange& change) {
     if (!identity_.isEmbedded()) {
         throw NotReady("This wearable is a device; plug it in or out instead.");
     }
@@ -41,25 +45,32 @@ void AttachedWearable::attach(const AttachmentChange& change) {
 }
 
 wearable::Attachment AttachedWearable::attachment() const {
-    const auto saved = saved_.value_or(wearable::Attachment());
-    return {wished_.connected.value_or(saved.connected),
-            wished_.onCharger.value_or(saved.onCharger)};
+    return wished_.appliedTo(saved_.value_or(wearable::Attachment()));
 }
 
 /// One at a time, so that of many wishes in a row only the last one is saved.
 void AttachedWearable::save() {
-    if (!saved_ || isSaving_ || *saved_ == attachment()) {
+    if (!saved_ || saving_ || *saved_ == attachment()) {
         return;
     }
-    isSaving_ = true;
-    watched_->save(attachment(), [this, saving = attachment()](const std::string& problem) {
+    saving_ = attachment();
+    watched_->save(wished_, [this, saving = attachment()](const std::string& problem) {
         wasSaved(saving, problem);
     });
 }
 
+/// Nobody is there any more to hear what becomes of it.
+void AttachedWearable::saveLastWish() {
+    const bool isSaved = saved_ ? saving_.value_or(*saved_) == attachment()
+                                : !wished_.connected && !wished_.onCharger;
+    if (!isSaved) {
+        watched_->save(wished_, [](const std::string& /*problem*/) {});
+    }
+}
+
 void AttachedWearable::wasSaved(const wearable::Attachment& attachment,
                                 const std::string& problem) {
-    isSaving_ = false;
+    saving_.reset();
     if (problem.empty()) {
         saved_ = attachment;
         save();

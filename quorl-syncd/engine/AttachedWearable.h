@@ -10,12 +10,6 @@
 
 namespace quorl::syncd {
 
-/// What of an attachment is to become another one.
-struct AttachmentChange {
-    std::optional<bool> connected;
-    std::optional<bool> onCharger;
-};
-
 /// The wearable that the engine syncs to: what it is, how it is attached, and how it stood when it
 /// was last looked at.
 class AttachedWearable {
@@ -32,6 +26,12 @@ class AttachedWearable {
     /// @param changed called in turns of its own, never within a call of this.
     AttachedWearable(WearablePort& port, Changed changed);
 
+    /// Has what was not saved yet be saved still.
+    ~AttachedWearable();
+
+    AttachedWearable(const AttachedWearable&) = delete;
+    AttachedWearable& operator=(const AttachedWearable&) = delete;
+
     /// Takes another one, of which nothing is known until it was looked at; to be called before
     /// anything else. Throws as `WearablePort::watch`; then all is as it was.
     void choose(const std::string& directory);
@@ -41,7 +41,7 @@ class AttachedWearable {
 
     /// Counts at once, and is saved on the wearable some time later; where that fails, what was
     /// saved before counts again. Throws `NotReady` for a mounted wearable.
-    void attach(const AttachmentChange& change);
+    void attach(const wearable::AttachmentChange& change);
 
     /// All songs of the selection are on it; known before it is looked at again, which is due.
     void wasSent(const wearable::Selection& selection);
@@ -66,6 +66,7 @@ class AttachedWearable {
     void take(const WatchedWearable::Answer& answer);
     [[nodiscard]] Change takeSight(const Sight& sight);
     void save();
+    void saveLastWish();
     void wasSaved(const wearable::Attachment& attachment, const std::string& problem);
 
     WearablePort& port_;
@@ -74,8 +75,9 @@ class AttachedWearable {
 
     /// As it is on the wearable; nothing as long as that is not known.
     std::optional<wearable::Attachment> saved_;
-    AttachmentChange wished_;
-    bool isSaving_ = false;
+    wearable::AttachmentChange wished_;
+    /// Nothing where nothing is being saved.
+    std::optional<wearable::Attachment> saving_;
 
     std::optional<wearable::Usage> usage_;
     wearable::Unseen problem_;

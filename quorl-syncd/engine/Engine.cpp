@@ -109,7 +109,7 @@ void Engine::setWearableDirectory(const std::string& path) {
     consider();
 }
 
-void Engine::attach(const AttachmentChange& change) {
+void Engine::attach(const wearable::AttachmentChange& change) {
     wearable_.attach(change);
     givenUp_.reset();
     consider();

@@ -57,7 +57,7 @@ class Engine {
     void setRateLimit(std::uint64_t bytesPerSecond);
     void setWearableDirectory(const std::string& path);
     /// Throws `NotReady` for a mounted wearable.
-    void attach(const AttachmentChange& change);
+    void attach(const wearable::AttachmentChange& change);
 
     [[nodiscard]] wearable::Attachment attachment() const { return wearable_.attachment(); }
 

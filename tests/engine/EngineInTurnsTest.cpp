@@ -97,8 +97,8 @@ struct FixedWearables final : WearablePort {
 
         void look(Reply reply) override { port_.replies.push_back(std::move(reply)); }
 
-        void save(const wearable::Attachment& attachment, Saved saved) override {
-            port_.saves.push_back({attachment, std::move(saved)});
+        void save(const wearable::AttachmentChange& change, Saved saved) override {
+            port_.saves.push_back({change.appliedTo(port_.attachment), std::move(saved)});
         }
 
         FixedWearables& port_;
@@ -569,6 +569,39 @@ TEST_F(EngineInTurns, TakesASwitchBackThatCannotBeSaved) {
 
     EXPECT_TRUE(engine_->wearable().isOnCharger);
     EXPECT_THAT(wearables_.saves, IsEmpty());
+}
+
+TEST_F(EngineInTurns, SavesTheLastSwitchAlsoWhenItEndsBeforeTheOneBeforeIsSaved) {
+    startSyncing();
+    engine_->attach({.connected = {}, .onCharger = false});
+    ASSERT_EQ(wearables_.saves.size(), 1);
+    engine_->attach({.connected = {}, .onCharger = true});
+
+    engine_.reset();
+
+    ASSERT_EQ(wearables_.saves.size(), 2);
+    EXPECT_TRUE(wearables_.saves.back().attachment.onCharger);
+}
+
+TEST_F(EngineInTurns, SavesASwitchAlsoWhenItEndsBeforeTheWearableWasSeen) {
+    start();
+    engine_->attach({.connected = {}, .onCharger = false});
+    wearables_.attachment.connected = false;
+    ASSERT_THAT(wearables_.saves, IsEmpty());
+
+    engine_.reset();
+
+    ASSERT_EQ(wearables_.saves.size(), 1);
+    EXPECT_EQ(wearables_.saves.back().attachment, (wearable::Attachment{false, false}));
+}
+
+TEST_F(EngineInTurns, SavesNothingAtItsEndThatIsBeingSaved) {
+    startSyncing();
+    engine_->attach({.connected = {}, .onCharger = false});
+
+    engine_.reset();
+
+    EXPECT_EQ(wearables_.saves.size(), 1);
 }
 
 TEST_F(EngineInTurns, SaysWhyItCannotStartOrAttach) {

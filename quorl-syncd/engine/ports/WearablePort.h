@@ -38,8 +38,9 @@ class WatchedWearable {
     virtual void look(Reply reply) = 0;
 
     /// Of the embedded wearable only. Returns at once; `saved` comes in a later turn, once it
-    /// outlives a loss of power. Not to be called again before that.
-    virtual void save(const wearable::Attachment& attachment, Saved saved) = 0;
+    /// outlives a loss of power. It is saved also where this object is destroyed meanwhile, unless
+    /// the device does not answer. Called again before that, it waits a while for the former.
+    virtual void save(const wearable::AttachmentChange& change, Saved saved) = 0;
 };
 
 /// What was noticed of a wearable.
