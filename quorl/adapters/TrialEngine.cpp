@@ -13,7 +13,7 @@ constexpr int alreadyRunning = 3;
 
 } // namespace
 
-TrialEngine::TrialEngine(Problem problem) {
+TrialEngine::TrialEngine(const Problem& problem) {
     process_.setProcessChannelMode(QProcess::ForwardedChannels);
     QObject::connect(&process_, &QProcess::errorOccurred, &process_,
                      [this, problem](QProcess::ProcessError error) {

@@ -14,7 +14,7 @@ class TrialEngine final {
     using Problem = std::function<void(const std::string& text)>;
 
     /// Starts the `quorl-syncd` beside the running program.
-    explicit TrialEngine(Problem problem);
+    explicit TrialEngine(const Problem& problem);
 
     /// Ends it, and waits for that for some seconds.
     ~TrialEngine();
