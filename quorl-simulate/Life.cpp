@@ -53,12 +53,16 @@ constexpr std::array<std::pair<std::string_view, std::uint64_t>, 38> happenings{
     {"cancel", 1},
 }};
 
-Happening drawHappening(Random& random) {
-    std::uint64_t all = 0;
+constexpr std::uint64_t weightOfAll = [] {
+    std::uint64_t sum = 0;
     for (const auto& [name, weight] : happenings) {
-        all += weight;
+        sum += weight;
     }
-    auto place = random.below(all);
+    return sum;
+}();
+
+Happening drawHappening(Random& random) {
+    auto place = random.below(weightOfAll);
     std::size_t index = 0;
     while (place >= happenings.at(index).second) {
         place -= happenings.at(index).second;

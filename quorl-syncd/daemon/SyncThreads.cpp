@@ -61,6 +61,8 @@ class Told {
 
 /// Shared with the threads of syncs that were left behind.
 struct SyncThreads::Means {
+    explicit Means(KeepAwake given) : keepAwake(std::move(given)) {}
+
     KeepAwake keepAwake;
     PosixSongSource songs;
     RateLimit rate;
