@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "quorl-simulate/Plant.h"
-#include "quorl-simulate/SimulatedDisk.h"
+#include "quorl-simulate/parts/SimulatedDisk.h"
 
 namespace quorl::simulation {
 

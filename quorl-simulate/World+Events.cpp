@@ -3,8 +3,8 @@
 #include <cerrno>
 #include <iterator>
 
-#include "quorl-simulate/SimulatedVolume.h"
 #include "quorl-simulate/World.h"
+#include "quorl-simulate/parts/SimulatedVolume.h"
 #include "quorl-syncd/engine/NotReady.h"
 #include "quorl-syncd/transfer/device/Device.h"
 #include "services/wearable/Generations.h"

@@ -4,8 +4,8 @@
 #include <string_view>
 #include <utility>
 
-#include "quorl-simulate/SimulatedVolume.h"
 #include "quorl-simulate/World.h"
+#include "quorl-simulate/parts/SimulatedVolume.h"
 
 namespace quorl::simulation {
 

@@ -5,7 +5,7 @@
 #include <system_error>
 #include <utility>
 
-#include "quorl-simulate/SimulatedVolume.h"
+#include "quorl-simulate/parts/SimulatedVolume.h"
 
 namespace quorl::simulation {
 

@@ -6,13 +6,13 @@
 #include <string>
 #include <string_view>
 
-#include "quorl-simulate/InlineSyncs.h"
 #include "quorl-simulate/Life.h"
-#include "quorl-simulate/SimulatedChoices.h"
-#include "quorl-simulate/SimulatedMusic.h"
-#include "quorl-simulate/SimulatedWearable.h"
 #include "quorl-simulate/Troubles.h"
-#include "quorl-simulate/WatchfulAnnouncer.h"
+#include "quorl-simulate/parts/InlineSyncs.h"
+#include "quorl-simulate/parts/SimulatedChoices.h"
+#include "quorl-simulate/parts/SimulatedMusic.h"
+#include "quorl-simulate/parts/SimulatedWearable.h"
+#include "quorl-simulate/parts/WatchfulAnnouncer.h"
 #include "quorl-syncd/engine/Engine.h"
 
 namespace quorl::simulation {

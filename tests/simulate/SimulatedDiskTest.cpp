@@ -1,7 +1,7 @@
 // What a simulated disk keeps when it loses power: everything that was made durable, and of the
 // rest each part in some life or other, by the rules of its file system.
 
-#include "quorl-simulate/SimulatedDisk.h"
+#include "quorl-simulate/parts/SimulatedDisk.h"
 
 #include <set>
 #include <system_error>

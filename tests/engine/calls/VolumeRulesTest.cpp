@@ -8,7 +8,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "quorl-simulate/SimulatedVolume.h"
+#include "quorl-simulate/parts/SimulatedVolume.h"
 #include "tests/engine/Folders.h"
 #include "tests/engine/transfer/ObservedVolume.h"
 

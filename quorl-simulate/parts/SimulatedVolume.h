@@ -5,7 +5,7 @@
 #include <string>
 #include <vector>
 
-#include "quorl-simulate/SimulatedDisk.h"
+#include "quorl-simulate/parts/SimulatedDisk.h"
 #include "quorl-syncd/transfer/device/Volume.h"
 
 namespace quorl::simulation {

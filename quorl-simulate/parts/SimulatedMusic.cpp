@@ -1,4 +1,4 @@
-#include "quorl-simulate/SimulatedMusic.h"
+#include "quorl-simulate/parts/SimulatedMusic.h"
 
 #include <algorithm>
 #include <cstring>

@@ -1,4 +1,4 @@
-#include "quorl-simulate/WatchfulAnnouncer.h"
+#include "quorl-simulate/parts/WatchfulAnnouncer.h"
 
 #include <optional>
 

@@ -1,4 +1,4 @@
-#include "quorl-simulate/SimulatedVolume.h"
+#include "quorl-simulate/parts/SimulatedVolume.h"
 
 #include <algorithm>
 #include <cerrno>

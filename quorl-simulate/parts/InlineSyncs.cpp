@@ -1,4 +1,4 @@
-#include "quorl-simulate/InlineSyncs.h"
+#include "quorl-simulate/parts/InlineSyncs.h"
 
 #include "quorl-syncd/transfer/Sync.h"
 

@@ -2,7 +2,7 @@
 
 #include <stop_token>
 
-#include "quorl-simulate/VirtualTurns.h"
+#include "quorl-simulate/parts/VirtualTurns.h"
 #include "quorl-syncd/engine/ports/SyncRunner.h"
 #include "quorl-syncd/transfer/SyncPorts.h"
 

@@ -1,8 +1,8 @@
-#include "quorl-simulate/SimulatedWearable.h"
+#include "quorl-simulate/parts/SimulatedWearable.h"
 
 #include <algorithm>
 
-#include "quorl-simulate/SimulatedVolume.h"
+#include "quorl-simulate/parts/SimulatedVolume.h"
 #include "quorl-syncd/transfer/device/Device.h"
 #include "services/wearable/Generations.h"
 

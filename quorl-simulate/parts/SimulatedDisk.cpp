@@ -1,4 +1,4 @@
-#include "quorl-simulate/SimulatedDisk.h"
+#include "quorl-simulate/parts/SimulatedDisk.h"
 
 #include <algorithm>
 #include <array>

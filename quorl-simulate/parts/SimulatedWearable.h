@@ -8,7 +8,7 @@
 #include <utility>
 #include <vector>
 
-#include "quorl-simulate/SimulatedDisk.h"
+#include "quorl-simulate/parts/SimulatedDisk.h"
 #include "services/wearable/Usage.h"
 
 namespace quorl::simulation {

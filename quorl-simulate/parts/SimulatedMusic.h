@@ -6,7 +6,7 @@
 #include <tuple>
 #include <vector>
 
-#include "quorl-simulate/VirtualTurns.h"
+#include "quorl-simulate/parts/VirtualTurns.h"
 #include "quorl-syncd/engine/ports/MusicPort.h"
 #include "quorl-syncd/transfer/songs/SongSource.h"
 
