@@ -11,7 +11,7 @@
 #include "tests/quorl/QuorlProcess.h"
 #include "tests/quorl/SampleMusic.h"
 #include "tests/quorl/StoredPreferences.h"
-#include "tests/quorl/Window.h"
+#include "tests/quorl/window/Window.h"
 
 namespace quorl::tests {
 

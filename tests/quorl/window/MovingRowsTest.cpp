@@ -5,8 +5,8 @@
 
 #include <gmock/gmock.h>
 
-#include "tests/quorl/Finger.h"
-#include "tests/quorl/ShownTable.h"
+#include "tests/quorl/window/Finger.h"
+#include "tests/quorl/window/ShownTable.h"
 
 namespace quorl::tests {
 

@@ -1,4 +1,4 @@
-#include "tests/quorl/ShownTable.h"
+#include "tests/quorl/window/ShownTable.h"
 
 #include <QKeyEvent>
 #include <QTest>

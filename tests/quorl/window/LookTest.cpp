@@ -4,7 +4,7 @@
 #include <gmock/gmock.h>
 
 #include "quorl/window/look/PaneColors.h"
-#include "tests/quorl/Window.h"
+#include "tests/quorl/window/Window.h"
 
 namespace quorl::tests {
 

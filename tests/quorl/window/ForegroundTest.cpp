@@ -2,7 +2,7 @@
 
 #include <gmock/gmock.h>
 
-#include "tests/quorl/Window.h"
+#include "tests/quorl/window/Window.h"
 
 namespace quorl::tests {
 

@@ -3,7 +3,7 @@
 
 #include <gmock/gmock.h>
 
-#include "tests/quorl/ShownTable.h"
+#include "tests/quorl/window/ShownTable.h"
 
 namespace quorl::tests {
 

@@ -4,9 +4,9 @@
 #include <gmock/gmock.h>
 
 #include "quorl/window/PageSlide.h"
-#include "tests/quorl/Finger.h"
-#include "tests/quorl/ShownTable.h"
-#include "tests/quorl/Window.h"
+#include "tests/quorl/window/Finger.h"
+#include "tests/quorl/window/ShownTable.h"
+#include "tests/quorl/window/Window.h"
 
 namespace quorl::tests {
 

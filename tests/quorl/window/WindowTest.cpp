@@ -1,4 +1,4 @@
-#include "tests/quorl/Window.h"
+#include "tests/quorl/window/Window.h"
 
 #include <QScrollBar>
 #include <QTest>

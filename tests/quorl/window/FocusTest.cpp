@@ -3,8 +3,8 @@
 
 #include <gmock/gmock.h>
 
-#include "tests/quorl/Finger.h"
-#include "tests/quorl/Window.h"
+#include "tests/quorl/window/Finger.h"
+#include "tests/quorl/window/Window.h"
 
 namespace quorl::tests {
 

@@ -2,8 +2,8 @@
 
 #include <gmock/gmock.h>
 
-#include "tests/quorl/ShownTable.h"
-#include "tests/quorl/Window.h"
+#include "tests/quorl/window/ShownTable.h"
+#include "tests/quorl/window/Window.h"
 
 namespace quorl::tests {
 

@@ -8,8 +8,8 @@
 
 #include "quorl/content/SwitchCell.h"
 #include "quorl/window/cells/CellArrangement.h"
-#include "tests/quorl/ShownTable.h"
-#include "tests/quorl/Window.h"
+#include "tests/quorl/window/ShownTable.h"
+#include "tests/quorl/window/Window.h"
 
 namespace quorl::tests {
 

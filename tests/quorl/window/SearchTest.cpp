@@ -5,8 +5,8 @@
 #include <gmock/gmock.h>
 
 #include "quorl/window/search/FoldedText.h"
-#include "tests/quorl/ShownTable.h"
-#include "tests/quorl/Window.h"
+#include "tests/quorl/window/ShownTable.h"
+#include "tests/quorl/window/Window.h"
 
 namespace quorl::tests {
 
