@@ -46,10 +46,10 @@ class BusObjects::EngineObject final
     : public sdbus::AdaptorInterfaces<org::quorl::Velora::Sync::Engine_adaptor,
                                       sdbus::Properties_adaptor> {
   public:
-    EngineObject(sdbus::IConnection& bus, Engine& engine, const Places& places)
+    EngineObject(sdbus::IConnection& bus, Engine& engine, const PlaceKeeper& keeper)
         : AdaptorInterfaces{bus, engine::enginePath},
           engine_(engine),
-          places_(places),
+          keeper_(keeper),
           published_(engine.status()) {
         registerAdaptor();
     }
@@ -72,7 +72,7 @@ class BusObjects::EngineObject final
             choose(
                 path, engine_.status().musicFolder,
                 [this](const std::string& folder) { engine_.setMusicFolder(folder); },
-                places_.check, places_.rememberMusicFolder);
+                keeper_.check, keeper_.rememberMusicFolder);
         });
     }
 
@@ -101,7 +101,7 @@ class BusObjects::EngineObject final
     std::uint64_t LastTime() override { return engine::valueOf<"LastTime">(*published_); }
 
     Engine& engine_;
-    const Places& places_;
+    const PlaceKeeper& keeper_;
     Published<engine::EngineStatus> published_;
 };
 
@@ -109,10 +109,10 @@ class BusObjects::WearableObject final
     : public sdbus::AdaptorInterfaces<org::quorl::Velora::Sync::Wearable_adaptor,
                                       sdbus::Properties_adaptor> {
   public:
-    WearableObject(sdbus::IConnection& bus, Engine& engine, const Places& places)
+    WearableObject(sdbus::IConnection& bus, Engine& engine, const PlaceKeeper& keeper)
         : AdaptorInterfaces{bus, engine::wearablePath},
           engine_(engine),
-          places_(places),
+          keeper_(keeper),
           published_(engine.wearable()) {
         registerAdaptor();
     }
@@ -130,7 +130,7 @@ class BusObjects::WearableObject final
             choose(
                 path, before.isEmbedded ? "" : before.directory,
                 [this](const std::string& root) { engine_.setWearableDirectory(root); },
-                places_.check, places_.rememberWearable);
+                keeper_.check, keeper_.rememberWearable);
         });
     }
 
@@ -161,13 +161,13 @@ class BusObjects::WearableObject final
     void Refresh() override { engine_.refreshWearable(); }
 
     Engine& engine_;
-    const Places& places_;
+    const PlaceKeeper& keeper_;
     Published<engine::WearableStatus> published_;
 };
 
-BusObjects::BusObjects(sdbus::IConnection& bus, Engine& engine, const Places& places)
-    : engine_(std::make_unique<EngineObject>(bus, engine, places)),
-      wearable_(std::make_unique<WearableObject>(bus, engine, places)) {
+BusObjects::BusObjects(sdbus::IConnection& bus, Engine& engine, const PlaceKeeper& keeper)
+    : engine_(std::make_unique<EngineObject>(bus, engine, keeper)),
+      wearable_(std::make_unique<WearableObject>(bus, engine, keeper)) {
     bus.addObjectManager(engine::managerPath, sdbus::floating_slot);
 }
 

@@ -18,15 +18,15 @@ class BusObjects {
     /// sentence that says why it cannot be done.
     using Directory = std::function<std::string(const std::string& directory)>;
 
-    /// What it takes to choose a place.
-    struct Places {
+    /// What it takes to choose a place, besides the engine.
+    struct PlaceKeeper {
         Directory check; ///< whether the engine can work with it
         Directory rememberMusicFolder;
         Directory rememberWearable;
     };
 
     /// All of these outlive the objects.
-    BusObjects(sdbus::IConnection& bus, Engine& engine, const Places& places);
+    BusObjects(sdbus::IConnection& bus, Engine& engine, const PlaceKeeper& keeper);
     ~BusObjects();
 
     BusObjects(const BusObjects&) = delete;
