@@ -272,6 +272,11 @@ T SharedPreferences::get(const Preference<T>& preference) const {
 template <class T>
 WriteResult SharedPreferences::set(const Preference<T>& preference,
                                    const std::type_identity_t<T>& value) {
+    if (!isStorable<T>(value)) {
+        return {false,
+                std::string("The setting ") + preference.key +
+                    " was not changed: it holds text in UTF-8 only. Rename what it is to name."};
+    }
     return store_->write(preference.key, Stored<T>::wrap(value));
 }
 

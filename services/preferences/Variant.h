@@ -3,6 +3,7 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <type_traits>
 
 #include "services/preferences/Pointers.h"
 
@@ -35,15 +36,13 @@ struct Stored<std::uint64_t> {
     static std::uint64_t unwrap(GVariant& variant) { return g_variant_get_uint64(&variant); }
 };
 
-/// What is not UTF-8 cannot be stored; it becomes the empty text.
+/// Of UTF-8 without NUL only; see `isStorable`.
 template <>
 struct Stored<std::string> {
     static constexpr const char* type = "s";
 
     static VariantPointer wrap(const std::string& value) {
-        const bool isText = g_utf8_validate_len(value.data(), value.size(), nullptr) != FALSE;
-        return VariantPointer(
-            g_variant_ref_sink(g_variant_new_string(isText ? value.c_str() : "")));
+        return VariantPointer(g_variant_ref_sink(g_variant_new_string(value.c_str())));
     }
 
     static std::string unwrap(GVariant& variant) { return g_variant_get_string(&variant, nullptr); }
@@ -64,5 +63,15 @@ struct Stored<std::optional<std::uint64_t>> {
         return child ? std::optional(g_variant_get_uint64(child.get())) : std::nullopt;
     }
 };
+
+/// Whether the store can hold the value.
+template <class T>
+[[nodiscard]] bool isStorable(const T& value) {
+    if constexpr (std::is_same_v<T, std::string>) {
+        return g_utf8_validate_len(value.data(), value.size(), nullptr) != FALSE;
+    } else {
+        return true;
+    }
+}
 
 } // namespace quorl::preferences

@@ -84,6 +84,18 @@ TEST_F(Values, ComeBackAsTheyWereWritten) {
     });
 }
 
+TEST_F(Values, ThatAreNoTextAreRefusedInWords) {
+    const auto preferences = openShared();
+    ASSERT_TRUE(preferences->set(musicFolder, "/before").changed);
+
+    for (const auto& text : {std::string("/m\xFFsic"), std::string("/m\0sic", 6)}) {
+        const auto result = preferences->set(musicFolder, text);
+        EXPECT_FALSE(result.changed);
+        EXPECT_NE(result.problem.find("music-folder was not changed"), std::string::npos);
+    }
+    EXPECT_EQ(preferences->get(musicFolder), "/before");
+}
+
 TEST_F(Values, AreReadAndWrittenWithGsettings) {
     const auto preferences = openShared();
     forEachPreference([&]<class T>(const Preference<T>& preference) {
