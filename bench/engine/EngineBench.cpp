@@ -73,8 +73,9 @@ double secondsOfSync(const std::filesystem::path& music, const std::filesystem::
     std::filesystem::create_directories(target);
     const auto library = media::scan(music);
     const auto& playlist = library->playlists.front();
-    const syncd::Order order{
-        library, {playlist.id, playlist.revision, noLimit, 0}, wearable::Wearable::mounted(target)};
+    const syncd::Order order{library,
+                             {playlist.id, playlist.revision, noLimit, 0},
+                             wearable::Wearable{target, {}, false}};
     syncd::RateLimit rate;
     syncd::PosixSongSource songs;
     const syncd::SteadyClock clock;

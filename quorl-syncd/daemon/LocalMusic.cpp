@@ -4,7 +4,7 @@
 
 #include "quorl-syncd/daemon/Lifeline.h"
 #include "services/media/MusicFolder.h"
-#include "services/preferences/ChosenFolder.h"
+#include "services/preferences/ChosenPlaces.h"
 
 namespace quorl::syncd {
 

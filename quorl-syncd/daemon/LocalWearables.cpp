@@ -10,6 +10,7 @@
 #include "quorl-syncd/daemon/WearableWatch.h"
 #include "services/base/AtomicFile.h"
 #include "services/base/Errand.h"
+#include "services/base/Paths.h"
 #include "services/wearable/Lookout.h"
 #include "services/wearable/UsageReader.h"
 
@@ -113,18 +114,13 @@ class LocalWearable final : public WatchedWearable {
     std::optional<base::Errand> saving_;
 };
 
-std::filesystem::path normal(const std::filesystem::path& directory) {
-    const auto path = directory.lexically_normal();
-    return path.has_filename() ? path : path.parent_path();
-}
-
 } // namespace
 
 std::unique_ptr<WatchedWearable> LocalWearables::watch(const std::string& directory,
                                                        Noticed noticed) {
     const auto wearable = directory.empty()
                               ? wearable::Wearable::embedded(purpose_, embeddedCapacity_)
-                              : wearable::Wearable{normal(directory), {}, false};
+                              : wearable::Wearable{base::normal(directory), {}, false};
     return std::make_unique<LocalWearable>(loop_, wearable, noticed);
 }
 

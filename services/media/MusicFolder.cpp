@@ -18,6 +18,7 @@
 #include "services/base/DirectoryWatch.h"
 #include "services/base/FileDescriptor.h"
 #include "services/base/MountWatch.h"
+#include "services/base/Paths.h"
 #include "services/base/RootWatch.h"
 #include "services/media/FolderTree.h"
 #include "services/media/InventoryBuilder.h"
@@ -38,8 +39,7 @@ constexpr std::chrono::milliseconds longestWait{500};
 constexpr std::chrono::seconds patience{1};
 
 std::filesystem::path absoluteRoot(const std::filesystem::path& root) {
-    std::filesystem::path path = std::filesystem::absolute(root).lexically_normal();
-    return path.has_filename() ? path : path.parent_path();
+    return base::normal(std::filesystem::absolute(root));
 }
 
 /// While an inventory is built, the one before is still there. What that leaves free amounts to a

@@ -26,12 +26,6 @@ Wearable Wearable::embedded(base::Purpose purpose, std::uint64_t capacity) {
     return {dataDirectory() / "quorl" / name, capacity, false};
 }
 
-Wearable Wearable::mounted(const std::filesystem::path& root) {
-    auto absolute = std::filesystem::absolute(root).lexically_normal();
-    const bool mountPoint = wearable::isMountPoint(absolute);
-    return {std::move(absolute), std::nullopt, mountPoint};
-}
-
 bool isMountPoint(const std::filesystem::path& directory) {
     struct statx status {};
 

@@ -41,9 +41,6 @@ struct Wearable {
     /// does not exist yet.
     [[nodiscard]] static Wearable embedded(base::Purpose purpose = base::Purpose::Use,
                                            std::uint64_t capacity = embeddedCapacity);
-
-    /// A device that is mounted at `root`, or at a directory above it.
-    [[nodiscard]] static Wearable mounted(const std::filesystem::path& root);
 };
 
 /// Whether something is mounted exactly at `directory`. False where it does not exist. Waits for

@@ -63,7 +63,7 @@ class SentTo : public ::testing::Test {
                                .sent = sent_}));
     }
 
-    [[nodiscard]] Usage usage() const { return readUsage(Wearable::mounted(device_.path())); }
+    [[nodiscard]] Usage usage() const { return readUsage({device_.path(), {}, false}); }
 
     const Selection sent_{1, 2, 3, 4};
     const TemporaryDirectory device_;
@@ -97,7 +97,7 @@ TEST(Usage, OfAWearableThatIsGoneIsAnErrorInWords) {
     const TemporaryDirectory parent;
 
     try {
-        static_cast<void>(readUsage(Wearable::mounted(parent.path() / "gone")));
+        static_cast<void>(readUsage({parent.path() / "gone", {}, false}));
         FAIL();
     } catch (const std::runtime_error& error) {
         EXPECT_THAT(error.what(), ::testing::HasSubstr("cannot be reached"));
@@ -116,7 +116,8 @@ TEST(Usage, OfAMountedDeviceIsThatOfItsOwnFileSystemAndNotOfTheDirectoryBeneath)
     if (mount("tmpfs", device.path().c_str(), "tmpfs", 0, "size=1m") != 0) {
         GTEST_SKIP() << "only root may mount";
     }
-    const auto wearable = Wearable::mounted(device.path());
+    const Wearable wearable{device.path(), {}, isMountPoint(device.path())};
+    ASSERT_TRUE(wearable.isMountPoint);
 
     EXPECT_EQ(readUsage(wearable).capacity, 1 << 20);
     EXPECT_LE(readUsage(wearable).available, 1 << 20);
