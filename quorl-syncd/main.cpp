@@ -28,6 +28,7 @@
 #include "services/base/Utf8.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Names.h"
+#include "services/preferences/ChosenPlaces.h"
 #include "services/preferences/SharedPreferences.h"
 
 namespace {
@@ -77,12 +78,27 @@ void endWithInput(engine::BusLoop& loop) {
 syncd::EngineSettings complete(syncd::EngineSettings settings,
                                const preferences::SharedPreferences& preferences) {
     if (settings.musicFolder.empty()) {
-        settings.musicFolder = preferences.get(preferences::musicFolder);
+        settings.musicFolder = preferences::chosenMusicFolder(preferences);
     }
     if (settings.wearableDirectory.empty()) {
-        settings.wearableDirectory = preferences.get(preferences::wearableDirectory);
+        settings.wearableDirectory = preferences::chosenWearable(preferences);
     }
     return settings;
+}
+
+/// Where another place cannot be taken, the engine goes on with the one that it has.
+void followPlaces(syncd::Engine& engine, const preferences::SharedPreferences& preferences,
+                  const preferences::KeySet& keys) {
+    try {
+        if (keys.contains(preferences::musicFolder.key)) {
+            engine.setMusicFolder(preferences::chosenMusicFolder(preferences));
+        }
+        if (keys.contains(preferences::wearableDirectory.key)) {
+            engine.setWearableDirectory(preferences::chosenWearable(preferences));
+        }
+    } catch (const syncd::NotReady& error) {
+        std::cerr << "quorl-syncd: " << error.what() << '\n';
+    }
 }
 
 int serve(const Options& options) {
@@ -123,12 +139,7 @@ int serve(const Options& options) {
     const syncd::EnginePorts ports{turns, choices, music, wearables, syncs, results, announcer};
     syncd::Engine engine(ports, complete(options.engine, *opened.preferences));
     preferencesDidChange = [&](const preferences::KeySet& keys) {
-        if (keys.contains(preferences::musicFolder.key)) {
-            engine.setMusicFolder(opened.preferences->get(preferences::musicFolder));
-        }
-        if (keys.contains(preferences::wearableDirectory.key)) {
-            engine.setWearableDirectory(opened.preferences->get(preferences::wearableDirectory));
-        }
+        followPlaces(engine, *opened.preferences, keys);
         engine.choicesDidChange();
     };
     syncd::DirectoryCheck check;
@@ -136,10 +147,10 @@ int serve(const Options& options) {
         return
             [&](const std::string& path) { return opened.preferences->set(place, path).problem; };
     };
-    const syncd::BusObjects::Places places{
+    const syncd::BusObjects::PlaceKeeper keeper{
         [&](const std::string& directory) { return check.objectionTo(directory); },
         remember(preferences::musicFolder), remember(preferences::wearableDirectory)};
-    objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine, places);
+    objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine, keeper);
     try {
         loop.bus().requestName(engine::busNameFor(options.purpose));
     } catch (const sdbus::Error& error) {

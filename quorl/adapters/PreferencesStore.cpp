@@ -3,7 +3,7 @@
 #include <optional>
 
 #include "platform/Dispatch.h"
-#include "services/preferences/ChosenFolder.h"
+#include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
 
@@ -74,7 +74,7 @@ std::filesystem::path PreferencesStore::musicFolder() const {
 }
 
 std::filesystem::path PreferencesStore::wearableDirectory() const {
-    return preferences_ ? preferences_->get(preferences::wearableDirectory) : std::string();
+    return preferences_ ? chosenWearable(*preferences_) : std::filesystem::path();
 }
 
 void PreferencesStore::choosePlaces(const std::filesystem::path& music,

@@ -9,6 +9,7 @@
 
 #include <CLI/CLI.hpp>
 
+#include "services/base/Utf8.h"
 #include "services/preferences/Preference.h"
 
 namespace quorl {
@@ -204,6 +205,19 @@ void complete(Places& places) {
     }
 }
 
+/// A trial keeps its places in settings, which are texts. What only reads takes any path.
+void requireStorable(const Options& options) {
+    const bool isKept = options.mode == Options::Mode::Window ||
+                        options.mode == Options::Mode::Text ||
+                        options.mode == Options::Mode::Screenshot;
+    for (const auto& place : {options.places.music.native(), options.places.wearable.native()}) {
+        if (isKept && base::validUtf8(place) != place) {
+            throw CLI::ValidationError(base::printable(place),
+                                       "the name of this folder is not in UTF-8, rename it");
+        }
+    }
+}
+
 } // namespace
 
 std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* argv) {
@@ -222,6 +236,9 @@ std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* ar
         if (options.json && !flags.status && !flags.playlists) {
             throw CLI::RequiresError("--json", "--status or --playlists");
         }
+        options.mode = modeOf(options, flags);
+        complete(options.places);
+        requireStorable(options);
     } catch (const CLI::ParseError& error) {
         if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) {
             app.exit(error); // help or version
@@ -230,8 +247,6 @@ std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* ar
         std::cerr << "quorl: " << error.what() << "\nRun \"quorl --help\" for the options.\n";
         return ExitCode::Usage;
     }
-    options.mode = modeOf(options, flags);
-    complete(options.places);
     return options;
 }
 

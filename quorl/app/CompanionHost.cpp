@@ -1,7 +1,7 @@
 #include "quorl/app/CompanionHost.h"
 
 #include "services/base/Utf8.h"
-#include "services/preferences/ChosenFolder.h"
+#include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
 

@@ -8,7 +8,7 @@
 #include "quorl/commands/OfferedPlaylists.h"
 #include "services/base/Utf8.h"
 #include "services/media/MusicFolder.h"
-#include "services/preferences/ChosenFolder.h"
+#include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
 

@@ -5,7 +5,7 @@
 #include "quorl/commands/EngineWatch.h"
 #include "quorl/commands/OfferedPlaylists.h"
 #include "services/media/MusicFolder.h"
-#include "services/preferences/ChosenFolder.h"
+#include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
 

@@ -7,7 +7,7 @@
 #include "runtime/services/SizeText.h"
 #include "services/base/Utf8.h"
 #include "services/media/MusicFolder.h"
-#include "services/preferences/ChosenFolder.h"
+#include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
 

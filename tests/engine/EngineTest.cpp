@@ -11,6 +11,7 @@
 #include "quorl-syncd/transfer/device/Device.h"
 #include "services/base/AtomicFile.h"
 #include "services/engine/Names.h"
+#include "services/preferences/ChosenPlaces.h"
 #include "services/wearable/Generations.h"
 #include "tests/engine/EngineFixture.h"
 #include "tests/engine/SlowDevice.h"
@@ -512,6 +513,23 @@ TEST_F(Engine, TakesAMusicFolderThatIsChosenInTheSettings) {
 
     EXPECT_TRUE(sessionEnd().success);
     EXPECT_EQ(onWearable().at("a.mp3"), "a");
+}
+
+TEST_F(Engine, TakesPlacesInTheSettingsThatDoNotBeginAtTheTopForNone) {
+    set(preferences::musicFolder, "Songs");
+    set(preferences::wearableDirectory, "Velora");
+    engine_ = std::make_unique<Process>(std::vector<std::string>{ENGINE_PROGRAM});
+    recorder_.next(Kind::EngineDidAppear);
+    const auto usual = recorder_.state().engine.musicFolder;
+
+    EXPECT_EQ(usual, preferences::usualMusicFolder());
+    EXPECT_TRUE(recorder_.state().wearable.isEmbedded);
+
+    set(preferences::musicFolder, music_.path().string());
+    recorder_.awaitState(
+        [this](const auto& now) { return now.engine.musicFolder == music_.path(); });
+    set(preferences::musicFolder, "Songs");
+    recorder_.awaitState([&](const auto& now) { return now.engine.musicFolder == usual; });
 }
 
 TEST_F(Engine, LeavesInOrderWhenItIsEndedInTheMiddle) {

@@ -48,6 +48,18 @@ INSTANTIATE_TEST_SUITE_P(
                     std::vector<std::string>{"--screenshot", "a.png", "--pane", "other"},
                     std::vector<std::string>{"--plugins", "/nonexistent"}));
 
+TEST(CommandLine, trialOfAFolderWhoseNameIsNoTextSaysWhatToDo) {
+    QProcess shell;
+    shell.start(QStringLiteral("sh"),
+                {QStringLiteral("-c"),
+                 QStringLiteral("exec \"$0\" --text --music \"$(printf '/tmp/m\\377sic')\""),
+                 QStringLiteral(QUORL_PROGRAM)});
+    ASSERT_TRUE(shell.waitForFinished(60'000));
+    EXPECT_EQ(shell.exitCode(), 2);
+    EXPECT_THAT(shell.readAllStandardError().toStdString(),
+                testing::AllOf(HasSubstr("/tmp/m\uFFFDsic"), HasSubstr("UTF-8, rename it")));
+}
+
 TEST(CommandLine, windowWithoutADisplaySaysWhatToUseInstead) {
     QuorlProcess quorl({}, {{"DISPLAY", ""}, {"WAYLAND_DISPLAY", ""}});
     EXPECT_EQ(quorl.end(), 1);
