@@ -51,6 +51,7 @@ void World::addSong(Random& random) {
         music_.songs[path] = std::make_shared<SimulatedMusic::Song>(
             SimulatedMusic::Song{drawBytes(random, 1 + random.below(600)), drawTime(random)});
         music_.note(path);
+        note(Trouble::SongChanged); // where there was another of this name lately
     }
     const auto id = firstList + random.below(lists);
     auto& list = music_.lists[id];

@@ -266,9 +266,11 @@ struct World::Looked final : syncd::WatchedWearable {
     [[nodiscard]] wearable::Wearable identity() const override { return world_.identity(); }
 
     void look(Reply reply) override {
-        const auto answer = [this, reply = std::move(reply), asked = world_.news_] {
+        const auto asked = std::pair(world_.news_, world_.pluggings_);
+        const auto answer = [this, reply = std::move(reply), asked] {
             reply(world_.look());
-            if (asked == world_.news_) { // else it is of another wearable, perhaps
+            // Else it was asked of another wearable, perhaps, and may not count for the engine.
+            if (asked == std::pair(world_.news_, world_.pluggings_)) {
                 world_.wasLookedAt();
             }
         };
