@@ -44,6 +44,15 @@ class EngineTest : public ::testing::Test {
     /// Waits for the end of a session, and gives back that event.
     Event sessionEnd() { return recorder_.next(Event::Kind::SessionDidFinish); }
 
+    /// Waits until everything is sent that this limit allows. Whoever writes several preferences
+    /// for one choice may be slower than the engine waits, which then begins anew.
+    void awaitSyncedWithin(std::uint64_t amount, std::uint64_t type) {
+        recorder_.awaitState([=](const engine::EngineState& all) {
+            return all.engine.syncState == engine::syncSynced && all.engine.limit == amount &&
+                   all.engine.limitType == type;
+        });
+    }
+
     /// Waits for the next event of the task that carries the songs.
     Event nextOfAssets(Event::Kind kind);
 

@@ -161,10 +161,10 @@ TEST_F(Engine, SyncsAgainWhenTheLimitIsChanged) {
 
     limitTo(2, LimitType::Songs);
 
-    EXPECT_TRUE(sessionEnd().success);
+    awaitSyncedWithin(2, LimitType::Songs);
     EXPECT_EQ(onWearable().size(), 3);
     limitTo(1, LimitType::Megabytes);
-    EXPECT_TRUE(sessionEnd().success);
+    awaitSyncedWithin(1, LimitType::Megabytes);
     EXPECT_EQ(onWearable().size(), 2);
 }
 
