@@ -1,7 +1,7 @@
 #include "quorl/app/Companion.h"
 
-#include "quorl/app/FrontPage.h"
 #include "quorl/app/PaneLoader.h"
+#include "quorl/pages/FrontPage.h"
 #include "runtime/plugins/PluginBundle.h"
 
 namespace quorl {

@@ -82,7 +82,9 @@ RULES = {
     "doubles": program("platform", "runtime"),
     "quorl/content": program("platform", "runtime"),
     "quorl/adapters": program("platform", "runtime", "services"),
-    "quorl/app": program("platform", "runtime", "services", "quorl/adapters", "quorl/content"),
+    "quorl/pages": program("platform", "runtime", "services", "quorl/adapters", "quorl/content"),
+    "quorl/app": program(
+        "platform", "runtime", "services", "quorl/adapters", "quorl/content", "quorl/pages"),
     "quorl/window": program("platform", "runtime", "quorl/app", "quorl/content"),
     "quorl/terminal": program(
         "platform", "runtime", "services/base", "quorl/app", "quorl/content"),

@@ -1,4 +1,4 @@
-#include "quorl/app/FrontPage.h"
+#include "quorl/pages/FrontPage.h"
 
 #include <QDateTime>
 #include <QLocale>
