@@ -94,10 +94,9 @@ class SyncThread final : public RunningSync {
     SyncThread(const std::function<void(const std::stop_token&, const Told&)>& run,
                const std::shared_ptr<engine::Mailbox>& mailbox, const SyncRunner::Copied& copied,
                const SyncRunner::Ended& ended)
-        : errand_([run,
-                   told = Told(mailbox, lifeline_.whileThere(copied), lifeline_.whileThere(ended))](
-                      const std::stop_token& stop) { run(stop, told); },
-                  patience) {}
+        : told_(mailbox, lifeline_.whileThere(copied), lifeline_.whileThere(ended)),
+          errand_([run, told = told_](const std::stop_token& stop) { run(stop, told); }, patience) {
+    }
 
     void stop() override { errand_.stop(); }
 
@@ -105,6 +104,7 @@ class SyncThread final : public RunningSync {
     static constexpr std::chrono::seconds patience{2};
 
     const Lifeline lifeline_;
+    const Told told_;
     base::Errand errand_;
 };
 
