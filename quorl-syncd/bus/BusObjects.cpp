@@ -84,6 +84,12 @@ class BusObjects::EngineObject final
 
     std::string Status() override { return engine::valueOf<"Status">(*published_); }
 
+    std::string StatusCode() override { return engine::valueOf<"StatusCode">(*published_); }
+
+    std::vector<std::string> StatusArguments() override {
+        return engine::valueOf<"StatusArguments">(*published_);
+    }
+
     std::string SyncState() override { return engine::valueOf<"SyncState">(*published_); }
 
     std::string PlaylistName() override { return engine::valueOf<"PlaylistName">(*published_); }
@@ -98,7 +104,23 @@ class BusObjects::EngineObject final
 
     std::string LastMessage() override { return engine::valueOf<"LastMessage">(*published_); }
 
+    std::string LastCode() override { return engine::valueOf<"LastCode">(*published_); }
+
+    std::vector<std::string> LastArguments() override {
+        return engine::valueOf<"LastArguments">(*published_);
+    }
+
     std::uint64_t LastTime() override { return engine::valueOf<"LastTime">(*published_); }
+
+    std::uint64_t LastComplete() override { return engine::valueOf<"LastComplete">(*published_); }
+
+    std::vector<engine::LeftOutItem> LeftOut() override {
+        return engine::valueOf<"LeftOut">(*published_);
+    }
+
+    std::uint64_t LeftOutCount() override { return engine::valueOf<"LeftOutCount">(*published_); }
+
+    std::uint64_t BeyondLimit() override { return engine::valueOf<"BeyondLimit">(*published_); }
 
     Engine& engine_;
     const PlaceKeeper& keeper_;
@@ -157,6 +179,8 @@ class BusObjects::WearableObject final
     std::uint64_t Available() override { return engine::valueOf<"Available">(*published_); }
 
     std::uint64_t Songs() override { return engine::valueOf<"Songs">(*published_); }
+
+    std::uint64_t SongCount() override { return engine::valueOf<"SongCount">(*published_); }
 
     void Refresh() override { engine_.refreshWearable(); }
 

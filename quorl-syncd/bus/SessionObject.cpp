@@ -92,6 +92,8 @@ class SessionObject::Session final
 
     std::string Operation() override { return engine::valueOf<"Operation">(*published_); }
 
+    std::string CurrentItem() override { return engine::valueOf<"CurrentItem">(*published_); }
+
     double Progress() override { return engine::valueOf<"Progress">(*published_); }
 
     bool ProgressValid() override { return engine::valueOf<"ProgressValid">(*published_); }

@@ -36,6 +36,8 @@ struct SessionState {
     bool isFinished = false;
     /// What kind of job it is, for programs that show jobs of any kind.
     std::string operation = {};
+    /// The song that is being copied: its path in the music folder; empty for none.
+    std::string currentItem = {};
     Fraction progress = {};
     /// False as long as it is not known how much there is to copy.
     bool isProgressValid = false;
@@ -62,9 +64,13 @@ struct WearableStatus {
     std::uint64_t capacity = 0;
     std::uint64_t available = 0;
     std::uint64_t songs = 0;
+    std::uint64_t songCount = 0;
 
     bool operator==(const WearableStatus&) const = default;
 };
+
+/// An entry of a playlist, or the path of a song, and the code of why it is left out.
+using LeftOutItem = sdbus::Struct<std::string, std::string>;
 
 /// The engine itself.
 struct EngineStatus {
@@ -73,6 +79,9 @@ struct EngineStatus {
     std::uint64_t rateLimit = 0;
     /// A sentence for the user: what the engine does, or what it waits for.
     std::string status = {};
+    /// The same as a `Message`; no code where the engine has but the sentence.
+    std::string statusCode = {};
+    std::vector<std::string> statusArguments = {};
     /// How far the chosen playlist has come, as one of the words of Names.h.
     std::string syncState = {};
     /// The chosen playlist, by the name that is shown; empty for none.
@@ -84,8 +93,19 @@ struct EngineStatus {
     /// What became of the last session with this wearable; no text before the first.
     bool lastSuccess = false;
     std::string lastMessage = {};
+    /// The same as a `Message`; no code where the engine has but the sentence.
+    std::string lastCode = {};
+    std::vector<std::string> lastArguments = {};
     /// Microseconds since 1970.
     std::uint64_t lastTime = 0;
+    /// Of the last session with this wearable that got everything done; 0 for none.
+    std::uint64_t lastComplete = 0;
+    /// What the chosen playlist names and is not on its way to the wearable: some of it, and how
+    /// much there is.
+    std::vector<LeftOutItem> leftOut = {};
+    std::uint64_t leftOutCount = 0;
+    /// Songs of the chosen playlist that the limit leaves out.
+    std::uint64_t beyondLimit = 0;
 
     bool operator==(const EngineStatus&) const = default;
 };

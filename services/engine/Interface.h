@@ -39,6 +39,8 @@ struct Interface<EngineStatus> {
         Property{"MusicFolder", &EngineStatus::musicFolder, Access::ReadWrite},
         Property{"RateLimit", &EngineStatus::rateLimit, Access::ReadWrite},
         Property{"Status", &EngineStatus::status},
+        Property{"StatusCode", &EngineStatus::statusCode},
+        Property{"StatusArguments", &EngineStatus::statusArguments},
         Property{"SyncState", &EngineStatus::syncState},
         Property{"PlaylistName", &EngineStatus::playlistName},
         Property{"PlaylistID", &EngineStatus::playlistID},
@@ -46,7 +48,13 @@ struct Interface<EngineStatus> {
         Property{"Limit", &EngineStatus::limit},
         Property{"LastSuccess", &EngineStatus::lastSuccess},
         Property{"LastMessage", &EngineStatus::lastMessage},
+        Property{"LastCode", &EngineStatus::lastCode},
+        Property{"LastArguments", &EngineStatus::lastArguments},
         Property{"LastTime", &EngineStatus::lastTime},
+        Property{"LastComplete", &EngineStatus::lastComplete},
+        Property{"LeftOut", &EngineStatus::leftOut},
+        Property{"LeftOutCount", &EngineStatus::leftOutCount},
+        Property{"BeyondLimit", &EngineStatus::beyondLimit},
     };
 };
 
@@ -62,6 +70,7 @@ struct Interface<WearableStatus> {
         Property{"Capacity", &WearableStatus::capacity},
         Property{"Available", &WearableStatus::available},
         Property{"Songs", &WearableStatus::songs},
+        Property{"SongCount", &WearableStatus::songCount},
     };
 };
 
@@ -72,6 +81,7 @@ struct Interface<SessionState> {
         Property{"TypeIdentifier", &SessionState::typeIdentifier},
         Property{"Finished", &SessionState::isFinished},
         Property{"Operation", &SessionState::operation},
+        Property{"CurrentItem", &SessionState::currentItem},
         Property{"Progress", &SessionState::progress},
         Property{"ProgressValid", &SessionState::isProgressValid},
         Property{"Bytes", &SessionState::bytes},
@@ -129,15 +139,33 @@ std::vector<std::string> changedProperties(const State& before, const State& now
     return names;
 }
 
+inline void makeSpeakable(std::string& text) { text = base::validUtf8(text); }
+
+inline void makeSpeakable(LeftOutItem& item) {
+    makeSpeakable(std::get<0>(item));
+    makeSpeakable(std::get<1>(item));
+}
+
+template <class T>
+void makeSpeakable(std::vector<T>& list) {
+    for (auto& each : list) {
+        makeSpeakable(each);
+    }
+}
+
+/// There is nothing in it that is no text.
+template <class T>
+concept Wordless = std::is_arithmetic_v<T> || std::is_same_v<T, Fraction>;
+
+template <Wordless T>
+void makeSpeakable(T& /*value*/) {}
+
 /// `state` as the bus can carry it, which breaks off with whoever says what is not UTF-8: paths may
 /// have any bytes.
 template <class State>
 [[nodiscard]] State speakable(State state) {
-    forEachProperty<State>([&state]<class T>(const Property<State, T>& property) {
-        if constexpr (std::is_same_v<T, std::string>) {
-            state.*property.member = base::validUtf8(state.*property.member);
-        }
-    });
+    forEachProperty<State>(
+        [&state](const auto& property) { makeSpeakable(state.*property.member); });
     return state;
 }
 

@@ -78,7 +78,7 @@ RULES = {
     "services/media/playlists": services("services/base"),
     "services/preferences": services("services/base"),
     "services/wearable": services("services/base"),
-    "services/engine": services("services/base"),
+    "services/engine": services("services/base", "services/media/playlists", "services/wearable"),
     "doubles": program("platform", "runtime"),
     "quorl/content": program("platform", "runtime"),
     "quorl/adapters": program("platform", "runtime", "services"),

@@ -11,46 +11,59 @@ namespace {
 
 struct Explanation {
     Reason reason;
+    std::string_view code;
     std::string_view sentence;
 };
 
 constexpr std::array explanations{
-    Explanation{Reason::NoAddress, "The playlist names no file for this track."},
-    Explanation{Reason::RemoteAddress,
+    Explanation{Reason::NoAddress, "no-address", "The playlist names no file for this track."},
+    Explanation{Reason::RemoteAddress, "remote-address",
                 "It is not on this machine. Download it into the music folder."},
-    Explanation{Reason::OtherSystem, "It is a path of another system. Save the playlist again with "
-                                     "paths relative to it."},
-    Explanation{Reason::OutsideFolder,
+    Explanation{Reason::OtherSystem, "other-system",
+                "It is a path of another system. Save the playlist again with "
+                "paths relative to it."},
+    Explanation{Reason::OutsideFolder, "outside-folder",
                 "It is outside the music folder. Copy it into the music folder."},
-    Explanation{Reason::Missing,
+    Explanation{Reason::Missing, "missing",
                 "There is no such file. Put it back, or take it out of the playlist."},
-    Explanation{Reason::Unreachable, "A directory on the way to it may not be entered. Check the "
-                                     "permissions."},
-    Explanation{Reason::Hidden,
+    Explanation{Reason::Unreachable, "unreachable",
+                "A directory on the way to it may not be entered. Check the "
+                "permissions."},
+    Explanation{Reason::Hidden, "hidden",
                 "It is hidden: a name on the way to it begins with a dot. Rename it."},
-    Explanation{Reason::NotRegularFile, "It is not a regular file."},
-    Explanation{Reason::NotMusic, "It is neither audio nor video."},
-    Explanation{Reason::PlaylistUnreadable,
+    Explanation{Reason::NotRegularFile, "not-regular-file", "It is not a regular file."},
+    Explanation{Reason::NotMusic, "not-music", "It is neither audio nor video."},
+    Explanation{Reason::PlaylistUnreadable, "playlist-unreadable",
                 "The playlist cannot be read. Check its permissions and the disk."},
-    Explanation{Reason::PlaylistTooLarge, "The playlist is larger than 64 MiB. Split it."},
+    Explanation{Reason::PlaylistTooLarge, "playlist-too-large",
+                "The playlist is larger than 64 MiB. Split it."},
     Explanation{
-        Reason::PlaylistBroken,
+        Reason::PlaylistBroken, "playlist-broken",
         "The playlist is damaged, or not in an encoding that is known. Save it again with the "
         "program that made it, in UTF-8."},
-    Explanation{Reason::TooManyEntries,
+    Explanation{Reason::TooManyEntries, "too-many-entries",
                 "The playlist lists more than a million entries, and those after are ignored. "
                 "Split it."},
-    Explanation{Reason::SameAsAnother,
+    Explanation{Reason::SameAsAnother, "same-as-another",
                 "Another playlist has the same name but for how its accents are stored. Rename one "
                 "of the two."},
-    Explanation{Reason::DirectoryUnreadable,
+    Explanation{Reason::DirectoryUnreadable, "directory-unreadable",
                 "The directory cannot be read. Check its permissions and the disk."},
 };
 
+const Explanation& explanationOf(Reason reason) {
+    return *std::ranges::find(explanations, reason, &Explanation::reason);
+}
+
 } // namespace
 
-std::string_view sentence(Reason reason) {
-    return std::ranges::find(explanations, reason, &Explanation::reason)->sentence;
+std::string_view sentence(Reason reason) { return explanationOf(reason).sentence; }
+
+std::string_view code(Reason reason) { return explanationOf(reason).code; }
+
+std::optional<Reason> reasonOf(std::string_view code) {
+    const auto* const found = std::ranges::find(explanations, code, &Explanation::code);
+    return found == explanations.end() ? std::nullopt : std::optional(found->reason);
 }
 
 std::string describe(const LeftOut& leftOut) {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -29,6 +30,12 @@ enum class Reason : std::uint8_t {
 /// What to tell a person about `reason`: one or two English sentences that say what is the matter
 /// and, where something can be done about it, what.
 [[nodiscard]] std::string_view sentence(Reason reason);
+
+/// The word for programs, in small letters and dashes.
+[[nodiscard]] std::string_view code(Reason reason);
+
+/// Nothing for a word that stands for none.
+[[nodiscard]] std::optional<Reason> reasonOf(std::string_view code);
 
 /// One thing that was left out.
 struct LeftOut {

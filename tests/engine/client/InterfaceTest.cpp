@@ -72,6 +72,19 @@ TEST(ValueOf, IsTheMemberThatBelongsToTheName) {
     EXPECT_EQ(valueOf<"Progress">(TaskState{.progress = Fraction(0.5)}), 0.5);
 }
 
+TEST(Speakable, AreTextsOfEveryKind) {
+    const EngineStatus status{.statusCode = "other",
+                              .statusArguments = {"\xFF"},
+                              .leftOut = {LeftOutItem("b\xFF.mp3", "missing")},
+                              .leftOutCount = 1};
+
+    const auto spoken = speakable(status);
+
+    EXPECT_THAT(spoken.statusArguments, ElementsAre("\uFFFD"));
+    EXPECT_THAT(spoken.leftOut, ElementsAre(LeftOutItem("b\uFFFD.mp3", "missing")));
+    EXPECT_EQ(spoken.leftOutCount, 1);
+}
+
 TEST(Update, TakesWhatIsKnownAndOfTheRightType) {
     TaskState task{.groupingKey = "before", .totalItemCount = 1};
 

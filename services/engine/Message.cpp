@@ -1,0 +1,201 @@
+#include "services/engine/Message.h"
+
+#include <algorithm>
+#include <array>
+#include <charconv>
+#include <cstdint>
+#include <optional>
+#include <string_view>
+#include <utility>
+
+#include "services/base/Utf8.h"
+#include "services/engine/Codes.h"
+#include "services/media/playlists/LeftOut.h"
+#include "services/wearable/Wearable.h"
+
+namespace quorl::engine {
+
+namespace {
+
+using Arguments = std::vector<std::string>;
+
+/// More than any message has. Whoever sends more wants to have messages within messages worded.
+constexpr std::size_t mostArguments = 8;
+
+struct Wording {
+    std::string_view code;
+    /// With blanks in braces: the name of one of `blanks`, and the number of an argument.
+    std::string_view pattern;
+};
+
+constexpr std::array wordings{
+    Wording{code::syncOff, "Music sync is switched off."},
+    Wording{code::noPlaylist, "No playlist is chosen."},
+    Wording{code::readingMusic, "Reading the music folder…"},
+    Wording{code::playlistGone, "The chosen playlist is not in the music folder."},
+    Wording{code::lookingForWearable, "Looking for the wearable…"},
+    Wording{code::notConnected, "The wearable is not connected."},
+    Wording{code::notOnCharger, "The wearable is not on its charger."},
+    Wording{code::syncing, "Syncing music."},
+    Wording{code::stopping, "Ending the sync. {message 0}"},
+    Wording{code::aboutToSync, "About to sync music."},
+    Wording{code::upToDate, "Everything is up to date."},
+    Wording{code::upToDateBut,
+            "Everything that could be found is on the {wearable}. {songs 0} could "
+            "not be found or read."},
+    Wording{code::synced, "{songs 0} synced to {wearable}."},
+    Wording{code::syncedBut,
+            "{songs 0} synced to {wearable}. {songs 1} could not be found or read."},
+    Wording{code::songsLeftOut, "{message 1}{others 0}"},
+    Wording{code::cancelled, "The sync was cancelled."},
+    Wording{code::ended, "The sync engine was ended."},
+    Wording{code::stopped, "The sync was stopped."},
+    Wording{code::somethingElseChosen, "Something else was chosen."},
+    Wording{code::anotherProgram, "Another program is syncing to this {wearable}. Wait until it is "
+                                  "done, or end it."},
+    Wording{code::notEnoughMemory, "The {wearable} could not be synced, for there is not enough "
+                                   "memory. Close some programs."},
+    Wording{code::notEnoughSpace,
+            "The {wearable} has not enough space: {megabytes 0} are needed for new songs, "
+            "{megabytes 1} are available. Remove something from it, or choose a lower limit."},
+    Wording{code::wearableFull,
+            "The {wearable} is full. Remove something from it, or choose a lower limit."},
+    Wording{code::writeProtected, "The {wearable} cannot be written to{detail 0}. Check that it is "
+                                  "not write-protected."},
+    Wording{code::wentAway, "The {wearable} went away{detail 0}. Connect it again."},
+    Wording{code::obstructed, "On the {wearable}, “{music}” or “{own}” is not a directory. Give it "
+                              "another name, or remove it."},
+    Wording{code::notSynced, "The {wearable} could not be synced{detail 0}."},
+    Wording{code::songGone, "{song 0} is no longer in the music folder."},
+    Wording{code::songUnreadable, "{song 0} cannot be read{detail 1}."},
+    Wording{code::songNotAFile, "{song 0} is not a file any more."},
+    Wording{code::songChanged,
+            "{song 0} has just been changed. It will be sent once it stays as it is."},
+    Wording{code::songTooLarge, "{song 0} is larger than a file on the {wearable} can be."},
+    Wording{code::other, "{text 0}"},
+};
+
+std::string at(const Arguments& arguments, std::size_t place) {
+    return place < arguments.size() ? arguments[place] : std::string();
+}
+
+/// Nothing where it is no number; who sends such a thing is shown what was sent.
+std::optional<std::uint64_t> numberIn(const std::string& text) {
+    std::uint64_t number = 0;
+    const auto* const end = text.data() + text.size();
+    const auto read = std::from_chars(text.data(), end, number);
+    return read.ec == std::errc() && read.ptr == end ? std::optional(number) : std::nullopt;
+}
+
+std::string countOfSongs(std::uint64_t count) {
+    return count == 1 ? "1 song" : std::to_string(count) + " songs";
+}
+
+std::string songs(const Arguments& arguments, std::size_t place) {
+    const auto count = numberIn(at(arguments, place));
+    return count ? countOfSongs(*count) : at(arguments, place);
+}
+
+/// Of several songs those that are not named.
+std::string others(const Arguments& arguments, std::size_t place) {
+    const auto count = numberIn(at(arguments, place)).value_or(0);
+    return count < 2 ? "" : " " + countOfSongs(count - 1) + " more could not be sent.";
+}
+
+/// Rounded up.
+std::string megabytes(const Arguments& arguments, std::size_t place) {
+    constexpr std::uint64_t megabyte = 1 << 20;
+    const auto bytes = numberIn(at(arguments, place));
+    return bytes ? std::to_string(*bytes / megabyte + (*bytes % megabyte == 0 ? 0 : 1)) + " MB"
+                 : at(arguments, place);
+}
+
+std::string song(const Arguments& arguments, std::size_t place) {
+    const auto path = at(arguments, place);
+    return path.empty() ? "It" : "“" + base::printable(path) + "”";
+}
+
+std::string detail(const Arguments& arguments, std::size_t place) {
+    const auto text = at(arguments, place);
+    return text.empty() ? "" : ": " + text;
+}
+
+/// All arguments from here on are its own.
+std::string message(const Arguments& arguments, std::size_t place) {
+    if (place >= arguments.size()) {
+        return {};
+    }
+    const auto begin = arguments.begin() + static_cast<std::ptrdiff_t>(place);
+    return sentence({*begin, Arguments(begin + 1, arguments.end())});
+}
+
+std::string wearableIn(const Arguments& /*arguments*/, std::size_t /*place*/) {
+    return wearable::wearableName;
+}
+
+std::string musicDirectoryIn(const Arguments& /*arguments*/, std::size_t /*place*/) {
+    return wearable::musicDirectory;
+}
+
+std::string ownDirectoryIn(const Arguments& /*arguments*/, std::size_t /*place*/) {
+    return wearable::ownDirectory;
+}
+
+struct Blank {
+    std::string_view name;
+    std::string (*fill)(const Arguments& arguments, std::size_t place);
+};
+
+constexpr std::array blanks{
+    Blank{"wearable", wearableIn}, Blank{"music", musicDirectoryIn},
+    Blank{"own", ownDirectoryIn},  Blank{"songs", songs},
+    Blank{"others", others},       Blank{"megabytes", megabytes},
+    Blank{"song", song},           Blank{"detail", detail},
+    Blank{"message", message},     Blank{"text", at},
+};
+
+/// @param blank as it is between the braces.
+std::string filled(std::string_view blank, const Arguments& arguments) {
+    const auto space = std::min(blank.find(' '), blank.size());
+    const auto place = space < blank.size() ? blank[space + 1] - '0' : 0;
+    const auto* const found = std::ranges::find(blanks, blank.substr(0, space), &Blank::name);
+    return found->fill(arguments, static_cast<std::size_t>(place));
+}
+
+std::string worded(std::string_view pattern, const Arguments& arguments) {
+    std::string text;
+    for (;;) {
+        const auto open = pattern.find('{');
+        text += pattern.substr(0, open);
+        if (open == std::string_view::npos) {
+            return text;
+        }
+        const auto close = pattern.find('}', open);
+        text += filled(pattern.substr(open + 1, close - open - 1), arguments);
+        pattern.remove_prefix(close + 1);
+    }
+}
+
+} // namespace
+
+std::string sentence(const Message& message) {
+    if (message.arguments.size() > mostArguments) {
+        return {};
+    }
+    const auto* const wording = std::ranges::find(wordings, message.code, &Wording::code);
+    if (wording != wordings.end()) {
+        return worded(wording->pattern, message.arguments);
+    }
+    const auto reason = media::reasonOf(message.code);
+    return reason ? std::string(media::sentence(*reason)) : std::string();
+}
+
+Message other(std::string sentence) { return {code::other, {std::move(sentence)}}; }
+
+std::vector<std::string> flat(const Message& message) {
+    std::vector<std::string> list{message.code};
+    list.insert(list.end(), message.arguments.begin(), message.arguments.end());
+    return list;
+}
+
+} // namespace quorl::engine
