@@ -22,6 +22,7 @@ enum class PSCellType : NSInteger {
     LinkList = 2,   ///< shows a value text and opens a detail pane
     TitleValue = 4, ///< shows a value text
     Switch = 6,     ///< is on or off: its value is `PSSwitchOnValue` or `PSSwitchOffValue`
+    Button = 8,     ///< does what its setter does, which is given null, when it is tapped
 };
 
 /// The value texts of a switch.
@@ -51,8 +52,8 @@ class PSSpecifier : public NSObject {
     /// What the getter gives now; null without a getter, or where the target is gone.
     [[nodiscard]] std::optional<std::string> value();
 
-    /// Gives the setter a new value, for a switch a truth value; nothing without a setter, or where
-    /// the target is gone.
+    /// Gives the setter a new value, for a switch a truth value, for a button null; nothing without
+    /// a setter, or where the target is gone.
     void setValue(const std::shared_ptr<NSObject>& value);
 
     /// Sets a property, or takes it away where `value` is null. What is on screen changes when the

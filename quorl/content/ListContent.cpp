@@ -1,8 +1,12 @@
 #include "quorl/content/ListContent.h"
 
 #include <algorithm>
+#include <charconv>
 #include <limits>
 
+#include "platform/HostApp.h"
+#include "quorl/content/ButtonCell.h"
+#include "quorl/content/ProgressCell.h"
 #include "quorl/content/SwitchCell.h"
 #include "runtime/lists/ListView.h"
 
@@ -10,21 +14,47 @@ namespace quorl {
 
 namespace {
 
-std::shared_ptr<UITableViewCell> switchOf(const ListView::Row& row) {
-    auto cell = ::create<SwitchCell>(&UITableViewCell::initWithStyle_reuseIdentifier,
-                                     UITableViewCellStyle::Value1, std::string());
+/// A cell with what rows of all kinds have; it is still to be laid out.
+template <class Cell>
+std::shared_ptr<Cell> begin(const ListView::Row& row, UITableViewCellStyle style) {
+    auto cell =
+        ::create<Cell>(&UITableViewCell::initWithStyle_reuseIdentifier, style, std::string());
     cell->textLabel().setText(row.specifier->name());
     cell->textLabel().setTextColor(PSListController::appearance().textColor);
+    return cell;
+}
+
+std::shared_ptr<UITableViewCell> switchOf(const ListView::Row& row) {
+    auto cell = begin<SwitchCell>(row, UITableViewCellStyle::Value1);
     cell->setOn(row.value == PSSwitchOnValue);
     cell->layoutSubviews();
     return cell;
 }
 
+std::shared_ptr<UITableViewCell> buttonOf(const ListView::Row& row) {
+    auto cell = begin<ButtonCell>(row, UITableViewCellStyle::Value1);
+    cell->textLabel().setTextColor(QPSQuorlTintColor());
+    cell->layoutSubviews();
+    return cell;
+}
+
+/// Written and read the same in every language.
+double shareIn(std::string_view text) {
+    double share = 0;
+    std::from_chars(text.data(), text.data() + text.size(), share);
+    return std::clamp(share, 0.0, 1.0);
+}
+
+std::shared_ptr<UITableViewCell> progressOf(const ListView::Row& row, const std::string& progress) {
+    auto cell = begin<ProgressCell>(row, UITableViewCellStyle::Value1);
+    cell->detailTextLabel().setText(row.value);
+    cell->setProgress(shareIn(progress));
+    cell->layoutSubviews();
+    return cell;
+}
+
 std::shared_ptr<UITableViewCell> makeCell(const ListView::Row& row, UITableViewCellStyle style) {
-    auto cell = ::create<UITableViewCell>(&UITableViewCell::initWithStyle_reuseIdentifier, style,
-                                          std::string());
-    cell->textLabel().setText(row.specifier->name());
-    cell->textLabel().setTextColor(PSListController::appearance().textColor);
+    auto cell = begin<UITableViewCell>(row, style);
     cell->detailTextLabel().setText(row.value);
     if (row.specifier->detailControllerClass()) {
         cell->setAccessoryType(UITableViewCellAccessoryType::DisclosureIndicator);
@@ -43,6 +73,12 @@ bool isShortened(const UILabel& label) {
 std::shared_ptr<UITableViewCell> cellOf(const ListView::Row& row) {
     if (row.specifier->cellType() == PSCellType::Switch) {
         return switchOf(row);
+    }
+    if (row.specifier->cellType() == PSCellType::Button) {
+        return buttonOf(row);
+    }
+    if (const auto progress = row.specifier->propertyForKey(RowProgressKey)) {
+        return progressOf(row, *progress);
     }
     auto cell = makeCell(row, UITableViewCellStyle::Value1);
     return isShortened(cell->detailTextLabel()) ? makeCell(row, UITableViewCellStyle::Subtitle)
@@ -134,6 +170,8 @@ bool ListContent::tap(NSInteger row) {
     const std::shared_ptr specifier = found->specifier;
     if (const auto* toggle = dynamic_cast<const SwitchCell*>(found->cell.get())) {
         specifier->setValue(NSNumber::numberWithBool(!toggle->isOn()));
+    } else if (specifier->cellType() == PSCellType::Button) {
+        specifier->setValue(nullptr);
     } else {
         navigation_.open(specifier);
     }

@@ -3,6 +3,7 @@
 #include <QString>
 #include <sstream>
 
+#include "quorl/content/ButtonCell.h"
 #include "quorl/content/SwitchCell.h"
 #include "services/base/Utf8.h"
 
@@ -20,6 +21,9 @@ std::string textOfRow(NSInteger row, const UITableViewCell& cell) {
     line += number + "  ";
     if (cell.accessoryType() == UITableViewCellAccessoryType::Checkmark) {
         line += "✓ ";
+    }
+    if (dynamic_cast<const ButtonCell*>(&cell)) {
+        return line + '[' + textOfLabel(cell.textLabel()) + "]\n";
     }
     line += textOfLabel(cell.textLabel());
     if (const auto* toggle = dynamic_cast<const SwitchCell*>(&cell)) {

@@ -2,6 +2,7 @@
 
 #include <QCoreApplication>
 
+#include "quorl/content/ButtonCell.h"
 #include "quorl/content/SwitchCell.h"
 
 namespace quorl {
@@ -44,9 +45,10 @@ QAccessible::Role LineAccessible::role() const {
     if (cell && dynamic_cast<const SwitchCell*>(cell.get())) {
         return QAccessible::CheckBox;
     }
-    const bool opens =
-        cell && cell->accessoryType() == UITableViewCellAccessoryType::DisclosureIndicator;
-    return opens ? QAccessible::Button : QAccessible::ListItem;
+    const bool isButton =
+        cell && (dynamic_cast<const ButtonCell*>(cell.get()) ||
+                 cell->accessoryType() == UITableViewCellAccessoryType::DisclosureIndicator);
+    return isButton ? QAccessible::Button : QAccessible::ListItem;
 }
 
 QAccessible::State LineAccessible::state() const {

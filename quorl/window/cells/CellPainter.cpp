@@ -2,6 +2,7 @@
 
 #include <QFontMetricsF>
 
+#include "quorl/content/ProgressCell.h"
 #include "quorl/content/SwitchCell.h"
 #include "quorl/window/cells/CellArrangement.h"
 
@@ -13,6 +14,7 @@ constexpr QSizeF checkmarkSize(14, 11);
 constexpr QSizeF chevronSize(7, 12);
 constexpr QSizeF toggleSize(44, 26);
 constexpr qreal accessoryGap = 14;
+constexpr qreal barHeight = 4;
 
 /// Of a row: the side where reading starts, or the other one.
 enum class Side { Start, End };
@@ -58,6 +60,21 @@ class Painting {
         painter_.drawRoundedRect(track, radius, radius);
         painter_.setBrush(knobColor);
         painter_.drawEllipse(knob, radius - 2, radius - 2);
+        painter_.restore();
+    }
+
+    /// Along the bottom of the row; fills up in the direction of reading.
+    void bar(double share, const QColor& color, const QColor& ground) {
+        const qreal width = place_.width() - 2 * cellMargin;
+        const qreal top = place_.height() - 2 * barHeight;
+        painter_.save();
+        painter_.setRenderHint(QPainter::Antialiasing);
+        painter_.setPen(Qt::NoPen);
+        for (const auto& [part, brush] : {std::pair(1.0, ground), std::pair(share, color)}) {
+            painter_.setBrush(brush);
+            painter_.drawRoundedRect(onPage({cellMargin, top, width * part, barHeight}),
+                                     barHeight / 2, barHeight / 2);
+        }
         painter_.restore();
     }
 
@@ -118,6 +135,8 @@ void paintCell(QPainter& painter, const UITableViewCell& cell, const QRectF& pla
     if (const auto* toggle = dynamic_cast<const SwitchCell*>(&cell)) {
         const QColor track = toggle->isOn() ? colors.tint : colors.mark;
         painting.toggle(toggle->isOn(), track, colors.knobOn(track));
+    } else if (const auto* progress = dynamic_cast<const ProgressCell*>(&cell)) {
+        painting.bar(progress->progress(), colors.tint, colors.separator);
     } else if (cell.accessoryType() == UITableViewCellAccessoryType::Checkmark) {
         painting.checkmark(colors.named(cell.tintColor(), colors.tint));
     } else if (cell.accessoryType() != UITableViewCellAccessoryType::None) {
