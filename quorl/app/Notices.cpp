@@ -2,24 +2,29 @@
 
 namespace quorl {
 
-void Notices::set(Topic topic, const std::string& text) {
-    std::string& current = texts_[topic];
-    if (current == text) {
+void Notices::set(Topic topic, Notice notice) {
+    const auto before = notices_.find(topic);
+    const bool isNew = before == notices_.end() || before->second.text != notice.text;
+    if (notice.text.empty()) {
+        if (notices_.erase(topic) > 0) {
+            Q_EMIT changed();
+        }
         return;
     }
-    current = text;
-    if (!text.empty()) {
-        Q_EMIT added(text);
+    const bool isOther = isNew || before->second.actionName != notice.actionName;
+    const auto& now = notices_[topic] = std::move(notice);
+    if (isNew) {
+        Q_EMIT added(now.text);
     }
-    Q_EMIT changed();
+    if (isOther) {
+        Q_EMIT changed();
+    }
 }
 
 std::vector<std::string> Notices::texts() const {
     std::vector<std::string> texts;
-    for (const auto& [topic, text] : texts_) {
-        if (!text.empty()) {
-            texts.push_back(text);
-        }
+    for (const auto& [topic, notice] : notices_) {
+        texts.push_back(notice.text);
     }
     return texts;
 }

@@ -1,22 +1,45 @@
 #pragma once
 
 #include <QObject>
+#include <functional>
 #include <map>
 #include <string>
 #include <vector>
 
 namespace quorl {
 
-/// What the user has to be told without being interrupted, at the most one text for each topic.
-/// Main thread.
+/// Something that a person has to be told without being interrupted.
+struct Notice {
+    std::string text; ///< what is the matter and what to do; empty for nothing
+    /// What a button beside it is called; empty for no button.
+    std::string actionName = {};
+    std::function<void()> act = {}; ///< what the button does
+};
+
+/// What there is to be told, at the most one notice for each topic. Main thread.
 class Notices final : public QObject {
     Q_OBJECT
 
   public:
-    enum class Topic { Pane, SessionBus, TrialEngine, Preferences, MusicFolder, Watching };
+    /// The graver ones come first.
+    enum class Topic {
+        Pane,
+        SessionBus,
+        Engine,
+        TrialEngine,
+        Preferences,
+        MusicFolder,
+        Request,
+        Watching
+    };
 
-    /// Puts `text` in place of what the topic had; an empty one takes it away.
-    void set(Topic topic, const std::string& text);
+    /// Puts `notice` in place of what the topic had; one without a text takes it away.
+    void set(Topic topic, Notice notice);
+
+    void set(Topic topic, const std::string& text) { set(topic, Notice{text}); }
+
+    /// By topic.
+    [[nodiscard]] const std::map<Topic, Notice>& all() const { return notices_; }
 
     /// In the order of the topics.
     [[nodiscard]] std::vector<std::string> texts() const;
@@ -28,7 +51,7 @@ class Notices final : public QObject {
     void changed();
 
   private:
-    std::map<Topic, std::string> texts_;
+    std::map<Topic, Notice> notices_; ///< with a text each
 };
 
 } // namespace quorl

@@ -1,15 +1,18 @@
 #pragma once
 
 #include <QFrame>
-#include <QLabel>
+#include <QVBoxLayout>
 
 #include "quorl/app/Notices.h"
 #include "quorl/window/look/WindowScreen.h"
 
 namespace quorl {
 
-/// Shows the notices at the top of a window until they are put away or have become void. Never
-/// takes the focus. Main thread.
+class NoticeRow;
+
+/// Shows the notices at the top of a window, each until it is put away or has become void, with a
+/// button where something can be done. Never takes the focus; a screen reader is told of a new one
+/// as an alert. Main thread.
 class NoticeBar final : public QFrame {
     Q_OBJECT
 
@@ -21,11 +24,24 @@ class NoticeBar final : public QFrame {
     void paintEvent(QPaintEvent* event) override;
 
   private:
+    struct Row {
+        std::string text;
+        std::string actionName;
+        NoticeRow* widget; ///< owned by the bar
+    };
+
+    using Rows = std::map<Notices::Topic, Row>;
+
     void showNotices();
+    Rows::iterator remove(Rows::iterator row);
+    void add(Notices::Topic topic, const Notice& notice);
+    void putAway(Notices::Topic topic);
 
     Notices& notices_;
-    const WindowScreen& screen_;
-    QLabel* label_;
+    WindowScreen& screen_;
+    QVBoxLayout* column_;
+    Rows rows_;
+    std::map<Notices::Topic, std::string> putAway_; ///< the texts that nobody wants to see again
 };
 
 } // namespace quorl

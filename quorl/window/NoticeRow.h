@@ -1,0 +1,23 @@
+#pragma once
+
+#include <QLabel>
+
+#include "quorl/app/Notices.h"
+#include "quorl/window/look/WindowScreen.h"
+
+namespace quorl {
+
+/// One notice in a window, with a button for what can be done and one that puts it away. To a
+/// screen reader it is an alert. Main thread.
+class NoticeRow final : public QWidget {
+    Q_OBJECT
+
+  public:
+    /// `screen` outlives the row.
+    NoticeRow(const Notice& notice, WindowScreen& screen, QWidget* parent);
+
+  Q_SIGNALS:
+    void putAway();
+};
+
+} // namespace quorl
