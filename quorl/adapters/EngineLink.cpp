@@ -80,6 +80,17 @@ NSArray<DVSession> EngineLink::sessions(const std::string& type) const {
     return sessions;
 }
 
+void EngineLink::ask(Request request, Done done) {
+    (client_.*
+     request)([inbox = std::weak_ptr(inbox_), done = std::move(done)](const std::string& problem) {
+        dispatch_async(dispatch_get_main_queue(), [inbox, done, problem] {
+            if (!inbox.expired()) {
+                done(problem);
+            }
+        });
+    });
+}
+
 void EngineLink::fetch() {
     for (const engine::Event& event : inbox_->take()) {
         take(event);
@@ -94,9 +105,7 @@ void EngineLink::take(const engine::Event& event) {
         NSNotificationCenter::defaultCenter().postNotificationName_object(
             DVSessionsDidChangeNotification, nullptr);
     }
-    if (!isAboutTask(event.kind)) {
-        changed_(event.kind == Kind::BusDidVanish ? event.message : std::string());
-    }
+    changed_(event);
 }
 
 void EngineLink::tellObservers(const engine::Event& event) const {

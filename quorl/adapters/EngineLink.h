@@ -12,9 +12,14 @@ namespace quorl {
 /// observers of sessions are told too. Main thread.
 class EngineLink final {
   public:
-    /// Called whenever `state` has changed other than by a task, and with a sentence for the user
-    /// when the session bus is gone; that sentence is empty otherwise.
-    using Changed = std::function<void(const std::string& problem)>;
+    /// Called whenever `state` has changed, with what has happened.
+    using Changed = std::function<void(const engine::Event&)>;
+
+    /// Something that the engine's client is asked for.
+    using Request = void (engine::Client::*)(engine::Client::Reply);
+
+    /// Is called with an empty text, or with a sentence that says why something was not done.
+    using Done = std::function<void(const std::string& problem)>;
 
     /// Connects in the background and starts the engine where it does not run; not that of a trial,
     /// which is started with the trial. Where there is
@@ -28,6 +33,9 @@ class EngineLink final {
     [[nodiscard]] NSArray<DVSession> sessions(const std::string& type) const;
 
     [[nodiscard]] const engine::EngineState& state() const { return *state_; }
+
+    /// `done` is called once, unless the link is gone by then.
+    void ask(Request request, Done done);
 
     void setConnected(bool connected) { client_.setConnected(connected); }
 

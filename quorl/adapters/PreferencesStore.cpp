@@ -77,10 +77,16 @@ std::filesystem::path PreferencesStore::wearableDirectory() const {
     return preferences_ ? chosenWearable(*preferences_) : std::filesystem::path();
 }
 
+void PreferencesStore::chooseMusicFolder(const std::filesystem::path& folder) {
+    if (preferences_) {
+        store(preferences::musicFolder, folder.string());
+    }
+}
+
 void PreferencesStore::choosePlaces(const std::filesystem::path& music,
                                     const std::filesystem::path& wearable) {
+    chooseMusicFolder(music);
     if (preferences_) {
-        store(preferences::musicFolder, music.string());
         store(preferences::wearableDirectory, wearable.string());
     }
 }

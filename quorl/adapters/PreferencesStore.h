@@ -27,6 +27,9 @@ class PreferencesStore final : public SyncPreferencesStore {
     /// Where the chosen wearable is mounted; empty for the embedded one.
     [[nodiscard]] std::filesystem::path wearableDirectory() const;
 
+    /// Chooses the music folder.
+    void chooseMusicFolder(const std::filesystem::path& folder);
+
     /// Chooses both for a trial.
     void choosePlaces(const std::filesystem::path& music, const std::filesystem::path& wearable);
 

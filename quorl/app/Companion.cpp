@@ -30,11 +30,17 @@ void Companion::makeFrontPage() {
         problem_ = problem->text;
         return;
     }
-    frontPage_ = FrontPage::over(host_->engineLink(), std::get<Class>(loaded), "Music",
-                                 host_->isWearableEmbedded());
+    frontPage_ = FrontPage::over(*host_, std::get<Class>(loaded), "Music");
     navigation_->setRootPane(frontPage_);
     (void)frontPage_->specifiers(); // builds the rows before the page is shown
-    host_->setEngineObserver([this] { frontPage_->refresh(); });
+    host_->setEngineObserver([this] { refreshTopPage(); });
+}
+
+/// A page that is covered is refreshed when it comes back.
+void Companion::refreshTopPage() {
+    if (auto* page = dynamic_cast<AppPage*>(navigation_->top().get())) {
+        page->refresh();
+    }
 }
 
 void Companion::start() {

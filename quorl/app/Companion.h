@@ -36,6 +36,11 @@ class Companion final : public QObject {
     /// Starts the sync engine of a trial, where this is one; that of the session starts by itself.
     void startTrialEngine() { host_->startTrialEngine(); }
 
+    /// Who asks a person for a folder where one is needed.
+    void setFolderChooser(CompanionHost::AskForFolder ask) {
+        host_->setFolderChooser(std::move(ask));
+    }
+
     /// Brings the Music pane on the screen, over the front page, and begins to read the music
     /// folder. Throws `std::system_error` where the process may open no more files or start no more
     /// threads.
@@ -57,6 +62,7 @@ class Companion final : public QObject {
 
   private:
     void makeFrontPage();
+    void refreshTopPage();
 
     const Places places_;
     PaneScreen& screen_;

@@ -1,6 +1,7 @@
 #include "quorl/app/CompanionHost.h"
 
-#include "services/base/Utf8.h"
+#include "quorl/app/EngineTrouble.h"
+#include "quorl/app/FolderTrouble.h"
 #include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
@@ -30,7 +31,7 @@ CompanionHost::CompanionHost(const Places& places, Screen& screen, Notices& noti
       syncDefaults_(std::make_shared<SyncDefaults>(store_)),
       library_(std::make_shared<MusicLibrary>()),
       wearable_(wearableAt(places.wearable, purpose_)),
-      engine_(purpose_, [this](const std::string& problem) { engineDidChange(problem); }) {
+      engine_(purpose_, [this](const engine::Event& event) { engineDidChange(event); }) {
     if (purpose_ == base::Purpose::Trial) {
         store_.choosePlaces(musicOf(places), places.wearable);
     }
@@ -53,12 +54,44 @@ void CompanionHost::placesDidChange() {
     }
 }
 
-void CompanionHost::engineDidChange(const std::string& problem) {
+void CompanionHost::engineDidChange(const engine::Event& event) {
     isEngineHeardOf_ = true;
-    notices_.set(Notices::Topic::SessionBus, problem);
+    const bool isBusGone = event.kind == engine::Event::Kind::BusDidVanish;
+    notices_.set(Notices::Topic::SessionBus, isBusGone ? event.message : "");
+    if (isBusGone) {
+        notices_.set(Notices::Topic::Engine, "");
+    } else {
+        noticeEngine();
+    }
     if (engineChanged_) {
         engineChanged_();
     }
+}
+
+void CompanionHost::noticeEngine() {
+    const auto trouble = troubleIn(engine_.state());
+    if (!trouble) {
+        notices_.set(Notices::Topic::Engine, "");
+        return;
+    }
+    const auto remedy = trouble->remedy;
+    notices_.set(Notices::Topic::Engine,
+                 {trouble->sentence, nameOf(remedy), [this, remedy] { ask(requestOf(remedy)); }});
+}
+
+void CompanionHost::ask(EngineLink::Request request) {
+    engine_.ask(request, [this](const std::string& problem) {
+        notices_.set(Notices::Topic::Request, problem);
+    });
+}
+
+void CompanionHost::setFolderChooser(AskForFolder ask) { askForFolder_ = std::move(ask); }
+
+void CompanionHost::chooseMusicFolder() {
+    askForFolder_(store_.musicFolder(), [this](const std::filesystem::path& folder) {
+        store_.chooseMusicFolder(folder);
+        placesDidChange(); // the store announces the changes of others only
+    });
 }
 
 void CompanionHost::openLibrary(std::function<void()> taken) {
@@ -74,11 +107,12 @@ void CompanionHost::readLibrary() {
 }
 
 void CompanionHost::noticeProblems(const media::Inventory& inventory) {
-    notices_.set(Notices::Topic::MusicFolder,
-                 inventory.rootFound
-                     ? std::string()
-                     : "There is no music folder at " + base::printable(inventory.root.string()) +
-                           ". Create it, or start quorl with --music and another folder.");
+    Notice folder{troubleIn(inventory)};
+    if (askForFolder_) {
+        folder.actionName = "Choose Folder…";
+        folder.act = [this] { chooseMusicFolder(); };
+    }
+    notices_.set(Notices::Topic::MusicFolder, std::move(folder));
     notices_.set(Notices::Topic::Watching, inventory.unwatchedNotice());
 }
 

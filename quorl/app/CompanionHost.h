@@ -7,18 +7,17 @@
 #include "quorl/adapters/WearableUsage.h"
 #include "quorl/app/Notices.h"
 #include "quorl/app/Places.h"
+#include "quorl/pages/PageServices.h"
 #include "runtime/host/Host.h"
 #include "runtime/host/Screen.h"
 
 namespace quorl {
 
-/// The services that this app gives to panes. Main thread.
-class CompanionHost final : public Host {
+/// The services that this app gives to panes, and to its own pages. Main thread.
+class CompanionHost final : public Host, public PageServices {
   public:
     /// `screen` and `notices` outlive the host.
     CompanionHost(const Places& places, Screen& screen, Notices& notices);
-
-    [[nodiscard]] EngineLink& engineLink() { return engine_; }
 
     /// `changed` is called after the engine, its sessions or the wearable have changed; empty for
     /// nobody.
@@ -27,8 +26,13 @@ class CompanionHost final : public Host {
     /// Starts the engine of a trial, where this is one. Where a trial has none, nothing is synced.
     void startTrialEngine();
 
-    /// Whether the chosen wearable is the one in this machine.
-    [[nodiscard]] bool isWearableEmbedded() const { return store_.wearableDirectory().empty(); }
+    /// Asks a person for a folder, beginning at `start`; calls `chosen` where one was chosen.
+    using AskForFolder =
+        std::function<void(const std::filesystem::path& start,
+                           std::function<void(const std::filesystem::path& folder)> chosen)>;
+
+    /// Who can ask a person for a folder; without it nobody is asked.
+    void setFolderChooser(AskForFolder ask);
 
     /// Begins to read the music folder, and does so again when another one is chosen. `taken` is
     /// called after each reading.
@@ -47,9 +51,19 @@ class CompanionHost final : public Host {
     connectToWearable(dispatch_queue_t queue) override;
     [[nodiscard]] Screen& screen() override;
 
+    [[nodiscard]] const engine::EngineState& engineState() const override {
+        return engine_.state();
+    }
+
+    void ask(EngineLink::Request request) override;
+
+    void setOnCharger(bool isOnCharger) override { engine_.setOnCharger(isOnCharger); }
+
   private:
     void noticeProblems(const media::Inventory& inventory);
-    void engineDidChange(const std::string& problem);
+    void noticeEngine();
+    void chooseMusicFolder();
+    void engineDidChange(const engine::Event& event);
     void placesDidChange();
     void readLibrary();
 
@@ -62,6 +76,7 @@ class CompanionHost final : public Host {
     std::function<void()> libraryTaken_;
     WearableUsage wearable_;
     std::function<void()> engineChanged_;
+    AskForFolder askForFolder_;
     bool isEngineHeardOf_ = false;           ///< or of there being none
     std::optional<TrialEngine> trialEngine_; ///< nothing where this is no trial
     EngineLink engine_;

@@ -2,14 +2,17 @@
 
 #include <iostream>
 
-#include "services/base/Utf8.h"
+#include "quorl/app/FolderTrouble.h"
 
 namespace quorl {
 
-ExitCode tellMissingMusicFolder(const std::filesystem::path& root) {
-    std::cerr << "quorl: There is no music folder at " << base::printable(root.string())
-              << ". Create it, or name another one with --music.\n";
-    return ExitCode::NoMusicFolder;
+ExitCode tellFolderTrouble(const media::Inventory& inventory) {
+    if (const auto trouble = troubleIn(inventory); !trouble.empty()) {
+        std::cerr << "quorl: " << trouble << '\n';
+    }
+    return !inventory.rootFound      ? ExitCode::NoMusicFolder
+           : isUnreadable(inventory) ? ExitCode::Failure
+                                     : ExitCode::Success;
 }
 
 ExitCode finishPrinting() {

@@ -1,13 +1,13 @@
 #pragma once
 
-#include <filesystem>
-
 #include "quorl/app/ExitCode.h"
+#include "services/media/Inventory.h"
 
 namespace quorl {
 
-/// Says on standard error that there is no music folder at `root`; the program ends with the code.
-[[nodiscard]] ExitCode tellMissingMusicFolder(const std::filesystem::path& root);
+/// Says on standard error why there is nothing to choose from, where that is so. With the code the
+/// program ends: a folder that is read and has no playlists is a success.
+[[nodiscard]] ExitCode tellFolderTrouble(const media::Inventory& inventory);
 
 /// Brings what was printed to standard output. Where that fails it says so on standard error.
 [[nodiscard]] ExitCode finishPrinting();

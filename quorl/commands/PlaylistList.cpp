@@ -43,8 +43,8 @@ void printJson(const media::Inventory& inventory) {
 ExitCode printPlaylists(const Options& options) {
     const auto& music = options.places.music;
     const auto inventory = media::scan(music.empty() ? preferences::chosenMusicFolder() : music);
-    if (!inventory->rootFound) {
-        return tellMissingMusicFolder(inventory->root);
+    if (const auto code = tellFolderTrouble(*inventory); code != ExitCode::Success) {
+        return code;
     }
     options.json ? printJson(*inventory) : printLines(*inventory);
     return finishPrinting();

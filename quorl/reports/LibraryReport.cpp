@@ -63,8 +63,8 @@ void printLeftOut(const media::Inventory& inventory) {
 
 ExitCode printLibrary(const std::filesystem::path& music) {
     const auto inventory = media::scan(music.empty() ? preferences::chosenMusicFolder() : music);
-    if (!inventory->rootFound) {
-        return tellMissingMusicFolder(inventory->root);
+    if (const auto code = tellFolderTrouble(*inventory); code != ExitCode::Success) {
+        return code;
     }
     printPlaylists(*inventory);
     if (!inventory->leftOut.empty()) {

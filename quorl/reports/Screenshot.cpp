@@ -26,6 +26,8 @@ class Photographer final : public QObject {
     void beginWhenAnswered() {
         if (companion_.hasAllAnswers()) {
             disconnect(&companion_, &Companion::idle, this, nullptr);
+            // The picture is of a pane, whether an engine happens to run or not.
+            companion_.notices().set(Notices::Topic::Engine, "");
             companion_.screen().whenDrawn(*this, [this] { openPane(); });
         }
     }

@@ -1,5 +1,7 @@
 #include "quorl/window/MainWindow.h"
 
+#include <QFile>
+#include <QFileDialog>
 #include <QShortcut>
 #include <QVBoxLayout>
 
@@ -31,6 +33,8 @@ MainWindow::MainWindow(Companion& companion, WindowScreen& screen)
     column->addWidget(new NoticeBar(companion.notices(), screen, this));
     column->addWidget(pages_, 1);
     addShortcuts();
+    companion.setFolderChooser(
+        [this](const auto& start, const auto& chosen) { askForFolder(start, chosen); });
     connect(&screen, &PaneScreen::drawing, this, &MainWindow::draw);
     if (!companion.problem().empty()) {
         pages_->addWidget(new ProblemPage(QString::fromStdString(companion.problem()), pages_));
@@ -50,6 +54,18 @@ void MainWindow::addShortcuts() {
     add(Qt::Key_Back, &MainWindow::escape);
     add(Qt::ALT | Qt::Key_Left, &MainWindow::goBack);
     add(QKeySequence::Find, &MainWindow::search);
+}
+
+/// Does not wait for the answer.
+void MainWindow::askForFolder(const std::filesystem::path& start,
+                              const std::function<void(const std::filesystem::path&)>& chosen) {
+    auto* dialog = new QFileDialog(this, tr("Choose a Folder"), QFile::decodeName(start.c_str()));
+    dialog->setAttribute(Qt::WA_DeleteOnClose);
+    dialog->setFileMode(QFileDialog::Directory);
+    dialog->setOption(QFileDialog::ShowDirsOnly);
+    connect(dialog, &QFileDialog::fileSelected, this,
+            [chosen](const QString& folder) { chosen(QFile::encodeName(folder).toStdString()); });
+    dialog->open();
 }
 
 void MainWindow::escape() {

@@ -30,6 +30,8 @@ class MainWindow final : public QWidget {
 
   private:
     void addShortcuts();
+    void askForFolder(const std::filesystem::path& start,
+                      const std::function<void(const std::filesystem::path&)>& chosen);
     void escape();
     void search();
     void draw();

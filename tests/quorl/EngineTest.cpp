@@ -125,20 +125,20 @@ TEST_F(WithEngine, chosenPlaylistIsSyncedOnlyWhenItIsOnTheWearable) {
 TEST_F(WithEngine, offTheChargerThePlaylistWaits) {
     QuorlProcess quorl(arguments("--text"));
     quorl.say("b");
-    quorl.readUntil("  2  On Charger: on\n");
+    quorl.readUntil("  2  Simulated Charger: on\n");
     quorl.say("2");
-    quorl.readUntil("  2  On Charger: off\n");
-    quorl.say("5");
+    quorl.readUntil("  2  Simulated Charger: off\n");
+    quorl.say("6");
     quorl.say("1");
     quorl.readUntil("  3  ✓ None\n");
     quorl.say("2");
     quorl.readUntil("  2  ✓ Road Trip: Sync Pending…\n");
     quorl.say("b");
     quorl.say("b");
-    quorl.readUntil("  2  On Charger: off\n");
+    quorl.readUntil("  2  Simulated Charger: off\n");
     EXPECT_FALSE(std::filesystem::exists(onWearable("Road Trip.m3u8")));
     quorl.say("2");
-    quorl.readUntil("1 song synced to Velora.");
+    quorl.readUntil("Everything is up to date.");
     EXPECT_TRUE(std::filesystem::exists(onWearable("Road Trip.m3u8")));
     EXPECT_EQ(quorl.end(), 0);
 }

@@ -1,5 +1,8 @@
+#include "quorl/reports/LibraryReport.h"
+
 #include <gmock/gmock.h>
 
+#include "tests/media/WithoutPrivileges.h"
 #include "tests/quorl/QuorlProcess.h"
 #include "tests/quorl/SampleMusic.h"
 
@@ -51,7 +54,18 @@ TEST(LibraryReport, missingFolderEndsWithThreeAndSaysWhatToDo) {
     QuorlProcess quorl({"--library", "--music", "/nonexistent"});
     EXPECT_EQ(quorl.end(), 3);
     EXPECT_THAT(quorl.errors(), HasSubstr("/nonexistent"));
-    EXPECT_THAT(quorl.errors(), HasSubstr("--music"));
+    EXPECT_THAT(quorl.errors(), HasSubstr("Create it, or choose another one."));
+}
+
+TEST(LibraryReport, folderThatCannotBeReadIsNoSuccess) {
+    const TemporaryDirectory music;
+    std::filesystem::permissions(music.path(), std::filesystem::perms::none);
+    const media::test::WithoutPrivileges ordinary;
+    testing::internal::CaptureStderr();
+    const auto code = printLibrary(music.path());
+    EXPECT_THAT(testing::internal::GetCapturedStderr(),
+                HasSubstr("cannot be read. Change its permissions"));
+    EXPECT_EQ(code, ExitCode::Failure);
 }
 
 TEST(LibraryReport, withoutAnOptionReadsTheUsersMusicFolder) {

@@ -34,6 +34,8 @@ Window::Window(const std::filesystem::path& music)
                          patience)) {
         throw std::runtime_error("the music folder is not read: " + companion_.problem());
     }
+    notices_.set(Notices::Topic::Engine, ""); // that none runs
+    QCoreApplication::processEvents();
 }
 
 std::string Window::title() { return view().content().pane().title().value_or(""); }

@@ -1,0 +1,120 @@
+#include "quorl/pages/SyncPage.h"
+
+#include <algorithm>
+#include <filesystem>
+
+#include "platform/SizeFormatter.h"
+#include "quorl/pages/LeftOutPage.h"
+#include "quorl/pages/TimeLeft.h"
+#include "services/base/Utf8.h"
+
+namespace quorl {
+
+namespace {
+
+/// The session that is under way; null: none is.
+const engine::SessionState* sessionIn(const engine::EngineState& state) {
+    const auto found = std::ranges::find(state.sessions, false, &engine::SessionState::isFinished);
+    return found == state.sessions.end() ? nullptr : &*found;
+}
+
+/// The task that carries the songs; null: it has not begun.
+const engine::TaskState* songsOf(const engine::SessionState& session) {
+    const auto found = std::ranges::find_if(session.tasks, [](const engine::TaskState& task) {
+        return task.groupingKey == engine::assetGroupingKey && task.totalItemCount > 0;
+    });
+    return found == session.tasks.end() ? nullptr : &*found;
+}
+
+/// "Song 3 of 50" while the third is under way.
+std::string placeOf(const engine::TaskState& songs) {
+    const auto place = std::min(songs.completedItemCount + 1, songs.totalItemCount);
+    return "Song " + std::to_string(place) + " of " + std::to_string(songs.totalItemCount);
+}
+
+std::string percentOf(const engine::SessionState& session) {
+    return std::to_string(static_cast<int>(double(session.progress) * 100)) + "%";
+}
+
+std::string countOfSongs(std::uint64_t count) {
+    return std::to_string(count) + (count == 1 ? " song" : " songs");
+}
+
+std::string nameOf(const std::string& path) {
+    return base::printable(std::filesystem::path(path).stem().string());
+}
+
+} // namespace
+
+std::string SyncPage::summaryOf(const engine::EngineState& state) {
+    const auto* const session = sessionIn(state);
+    const auto& word = state.engine.syncState;
+    return session                       ? percentOf(*session)
+           : word == engine::syncSynced  ? "Up to date"
+           : word == engine::syncPending ? "Waiting"
+           : word == engine::syncOff     ? "Off"
+                                         : "";
+}
+
+bool SyncPage::init() {
+    setTitle("Sync");
+    return AppPage::init();
+}
+
+AppPage::Rows SyncPage::rows() {
+    const auto& engine = state().engine;
+    const auto title =
+        engine.playlistName.empty() ? std::nullopt : std::optional(engine.playlistName);
+    Rows rows{group(title, engine.status)};
+    addSession(rows);
+    addWearable(rows);
+    return rows;
+}
+
+void SyncPage::addSession(Rows& rows) {
+    const auto* const session = sessionIn(state());
+    if (!session) {
+        if (state().isThere && state().engine.syncState != engine::syncOff) {
+            rows.push_back(button("Sync Now", PSSetter::of<&SyncPage::syncNow>("syncNow::")));
+        }
+        return;
+    }
+    const auto* const songs = songsOf(*session);
+    rows.push_back(progress("Progress",
+                            songs ? placeOf(*songs) + ", " + percentOf(*session) : "Preparing",
+                            session->progress));
+    if (const auto left = timeLeft(*session); !left.empty()) {
+        rows.push_back(value("Time Left", left));
+    }
+    if (!session->currentItem.empty()) {
+        rows.push_back(value("Now", nameOf(session->currentItem)));
+    }
+    rows.push_back(button("Stop", PSSetter::of<&SyncPage::stop>("stop::")));
+}
+
+void SyncPage::addWearable(Rows& rows) {
+    const auto& engine = state().engine;
+    const auto& wearable = state().wearable;
+    rows.push_back(group("On the Velora", {}));
+    rows.push_back(value("Music", wearable.songCount == 0
+                                      ? "None"
+                                      : countOfSongs(wearable.songCount) + ", " +
+                                            CPFSSizeStrings(static_cast<float>(wearable.songs))));
+    if (engine.leftOutCount > 0) {
+        rows.push_back(
+            link("Could Not Be Sent", countOfSongs(engine.leftOutCount), Class::of<LeftOutPage>()));
+    }
+    if (engine.beyondLimit > 0) {
+        rows.push_back(value("Beyond the Limit", countOfSongs(engine.beyondLimit)));
+    }
+}
+
+void SyncPage::syncNow(const std::shared_ptr<NSObject>& /*nothing*/, const Row& /*row*/) {
+    services().ask(&engine::Client::startNow);
+}
+
+void SyncPage::stop(const std::shared_ptr<NSObject>& /*nothing*/, const Row& /*row*/) {
+    services().ask(&engine::Client::cancel);
+}
+
+} // namespace quorl

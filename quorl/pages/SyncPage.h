@@ -1,0 +1,26 @@
+#pragma once
+
+#include "quorl/pages/AppPage.h"
+
+namespace quorl {
+
+/// How the sync does and what came of it, with what can be done about it. Main thread.
+class SyncPage final : public AppPage {
+  public:
+    /// How the sync does, in a word or two.
+    [[nodiscard]] static std::string summaryOf(const engine::EngineState& state);
+
+    [[nodiscard]] bool init() override;
+
+  protected:
+    [[nodiscard]] Rows rows() override;
+
+  private:
+    void addSession(Rows& rows);
+    void addWearable(Rows& rows);
+
+    void syncNow(const std::shared_ptr<NSObject>& nothing, const Row& row);
+    void stop(const std::shared_ptr<NSObject>& nothing, const Row& row);
+};
+
+} // namespace quorl
