@@ -35,7 +35,7 @@ void InlineSyncs::run(const syncd::Order& order, const Copied& copied, const End
     isRunning_ = false;
     ended_();
     if (isTooEarly_ && !stop.stop_requested()) {
-        outcome = {syncd::Outcome::Kind::Sent, "Sent.", false, false};
+        outcome = {syncd::Outcome::Kind::Sent, engine::other("Sent."), false, false};
     }
     turns_.call([ended, outcome] { ended(outcome); });
 }

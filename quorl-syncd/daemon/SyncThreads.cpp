@@ -5,7 +5,7 @@
 #include <utility>
 
 #include "quorl-syncd/daemon/Lifeline.h"
-#include "quorl-syncd/transfer/Sentences.h"
+#include "quorl-syncd/transfer/Messages.h"
 #include "quorl-syncd/transfer/Sync.h"
 #include "quorl-syncd/transfer/device/PosixVolume.h"
 #include "quorl-syncd/transfer/pace/RateLimit.h"
@@ -111,8 +111,7 @@ class SyncThread final : public RunningSync {
 class NoSync final : public RunningSync {
   public:
     NoSync(engine::BusLoop& loop, const SyncRunner::Ended& ended, const std::error_code& why) {
-        const Outcome outcome{Outcome::Kind::Failed, sentence(DeviceTrouble::Other, why), false,
-                              true};
+        const Outcome outcome{Outcome::Kind::Failed, notSynced(why), false, true};
         loop.post([ended = lifeline_.whileThere(ended), outcome] { ended(outcome); });
     }
 

@@ -6,6 +6,7 @@
 
 #include "quorl-syncd/engine/NotReady.h"
 #include "services/base/Utf8.h"
+#include "services/engine/Codes.h"
 
 namespace quorl::syncd {
 
@@ -101,10 +102,15 @@ engine::WearableStatus AttachedWearable::status() const {
             usage.songs};
 }
 
+engine::Message AttachedWearable::problem() const {
+    return isLookedFor_ ? engine::Message{engine::code::lookingForWearable}
+                        : engine::other(problem_.sentence);
+}
+
 void AttachedWearable::forget() {
     ++changes_;
     usage_.reset();
-    problem_ = {"Looking for the wearable…", false};
+    problem_ = {};
     isLookedFor_ = true;
 }
 

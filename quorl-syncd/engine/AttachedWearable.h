@@ -7,6 +7,7 @@
 
 #include "quorl-syncd/engine/ports/WearablePort.h"
 #include "services/engine/EngineState.h"
+#include "services/engine/Message.h"
 
 namespace quorl::syncd {
 
@@ -53,7 +54,10 @@ class AttachedWearable {
     /// Nothing while it is not there or was not looked at yet; then the problem says why.
     [[nodiscard]] const std::optional<wearable::Usage>& usage() const { return usage_; }
 
-    [[nodiscard]] const wearable::Unseen& problem() const { return problem_; }
+    [[nodiscard]] engine::Message problem() const;
+
+    /// It was there, or may be, and does not answer.
+    [[nodiscard]] bool isSilent() const { return problem_.isSilence; }
 
     /// Whether there was no answer yet since it may have become another one.
     [[nodiscard]] bool isLookedFor() const { return isLookedFor_; }

@@ -4,11 +4,15 @@
 #include <system_error>
 #include <utility>
 
+#include "services/engine/Codes.h"
+
 namespace quorl::syncd {
 
 namespace {
 
 using namespace std::chrono_literals;
+
+namespace code = engine::code;
 
 /// The app writes several values for one choice.
 constexpr auto quietTime = 200ms;
@@ -44,10 +48,10 @@ Engine::~Engine() {
     if (!ongoing_) {
         return;
     }
-    stop("The sync engine was ended.");
+    stop({code::ended});
     ongoing_->sync.reset();
     try {
-        conclude(false, ongoing_->whyStopped);
+        conclude(false, *ongoing_->whyStopped);
     } catch (const std::runtime_error&) {
         // There is nobody to tell any more.
     }
@@ -67,9 +71,8 @@ void Engine::startNow() {
     }
     auto asked = situation();
     asked.isStartRequested = true;
-    const auto obstacle = obstacleIn(asked);
-    if (!obstacle.empty()) {
-        throw NotReady(obstacle);
+    if (const auto obstacle = obstacleIn(asked)) {
+        throw NotReady(*obstacle);
     }
     isStartRequested_ = true;
     consider();
@@ -78,7 +81,7 @@ void Engine::startNow() {
 void Engine::cancel() {
     if (ongoing_) {
         givenUp_ = ongoing_->order.selection;
-        stop("The sync was cancelled.");
+        stop({code::cancelled});
     }
 }
 
@@ -146,7 +149,7 @@ Situation Engine::situation() const {
     now.wearable = wearable_.identity();
     now.attachment = wearable_.attachment();
     now.usage = wearable_.usage();
-    now.wearableProblem = wearable_.problem().sentence;
+    now.wearableProblem = wearable_.problem();
     now.isWearableLookedFor = wearable_.isLookedFor();
     if (ongoing_) {
         now.running = {ongoing_->order.selection, ongoing_->order.wearable, ongoing_->charger};
@@ -175,7 +178,7 @@ void Engine::consider() {
         }
         break;
     case Decision::Kind::Stop:
-        stop(decision.sentence);
+        stop(decision.message);
         break;
     }
     publish();
@@ -222,20 +225,19 @@ void Engine::noteStall(std::uint64_t session) {
 
 /// Whether nobody waits any more for the sync, which was asked to end.
 bool Engine::isHopeless() const {
-    return !ongoing_->whyStopped.empty() &&
-           (wearable_.problem().isSilence ||
-            ongoing_->order.wearable.root != wearable_.identity().root);
+    return ongoing_->whyStopped &&
+           (wearable_.isSilent() || ongoing_->order.wearable.root != wearable_.identity().root);
 }
 
-void Engine::stop(const std::string& why) {
-    if (ongoing_->whyStopped.empty()) {
+void Engine::stop(const engine::Message& why) {
+    if (!ongoing_->whyStopped) {
         ongoing_->whyStopped = why;
     }
     ongoing_->sync->stop();
 }
 
 void Engine::abandon() {
-    conclude(false, ongoing_->whyStopped);
+    conclude(false, *ongoing_->whyStopped);
     ongoing_.reset();
     consider();
 }
@@ -271,9 +273,9 @@ std::string Engine::remember(const Order& order) {
 }
 
 /// Tells the result of the sync that has ended, here and to clients.
-void Engine::conclude(bool success, const std::string& message) {
+void Engine::conclude(bool success, const engine::Message& message) {
     keepResult(ongoing_->order.wearable.root, success, message);
-    ongoing_->session->finish(success, message);
+    ongoing_->session->finish(success, sentence(message));
 }
 
 /// A sync cannot begin as long as it is said that everything was sent.
@@ -281,10 +283,10 @@ void Engine::putOff(const wearable::Selection& selection, const std::string& why
     isStartRequested_ = false;
     givenUp_ = selection;
     tryAgainLater();
-    keepResult(wearable_.identity().root, false, why);
+    keepResult(wearable_.identity().root, false, engine::other(why));
 }
 
-void Engine::keepResult(const std::string& wearable, bool success, const std::string& message) {
+void Engine::keepResult(const std::string& wearable, bool success, const engine::Message& message) {
     try {
         ports_.results.remember(wearable, {success, message, ports_.turns.calendarTime()});
     } catch (const std::system_error& error) {
@@ -297,7 +299,9 @@ void Engine::keepResult(const std::string& wearable, bool success, const std::st
 void Engine::tellLastResult() {
     const auto result = ports_.results.of(wearable_.identity().root);
     status_.lastSuccess = result.success;
-    status_.lastMessage = result.message;
+    status_.lastMessage = sentence(result.message);
+    status_.lastCode = result.message.code;
+    status_.lastArguments = result.message.arguments;
     status_.lastTime = result.time;
 }
 
@@ -337,7 +341,10 @@ std::string Engine::playlistName() const {
 
 void Engine::publish() {
     const auto now = situation();
-    status_.status = statusOf(now, status_.lastMessage);
+    const auto status = statusOf(now, {status_.lastCode, status_.lastArguments});
+    status_.status = sentence(status);
+    status_.statusCode = status.code;
+    status_.statusArguments = status.arguments;
     status_.syncState = syncStateOf(now);
     status_.playlistName = playlistName();
     status_.playlistID = now.choices.isSyncEnabled ? now.choices.playlist.value_or(0) : 0;

@@ -68,7 +68,8 @@ class Engine {
     struct Ongoing {
         Order order;
         Charger charger;
-        std::string whyStopped;
+        /// Nothing as long as nobody has.
+        std::optional<engine::Message> whyStopped;
         /// Since that was last looked at.
         bool hasMoved = false;
         std::unique_ptr<SessionReport> session;
@@ -79,14 +80,14 @@ class Engine {
     void consider();
     void begin(const wearable::Selection& selection);
     void noteStall(std::uint64_t session);
-    void stop(const std::string& why);
+    void stop(const engine::Message& why);
     [[nodiscard]] bool isHopeless() const;
     void abandon();
     void finish(const Outcome& outcome);
     [[nodiscard]] std::string remember(const Order& order);
-    void conclude(bool success, const std::string& message);
+    void conclude(bool success, const engine::Message& message);
     void putOff(const wearable::Selection& selection, const std::string& why);
-    void keepResult(const std::string& wearable, bool success, const std::string& message);
+    void keepResult(const std::string& wearable, bool success, const engine::Message& message);
     void tryAgainLater();
     void lookAgainLater();
 

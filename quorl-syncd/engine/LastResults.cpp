@@ -16,7 +16,32 @@ constexpr auto fileName = "last-sync.json";
 
 } // namespace
 
-NLOHMANN_DEFINE_TYPE_NON_INTRUSIVE(LastResult, success, message, time)
+namespace {
+
+/// Earlier engines have kept the sentence alone, and later ones may know more codes.
+engine::Message messageIn(const Json& json) {
+    engine::Message message{json.value("code", ""),
+                            json.value("arguments", std::vector<std::string>())};
+    auto text = json.at("message").get<std::string>();
+    const bool isKnown = text.empty() || !sentence(message).empty();
+    return isKnown ? message : engine::other(std::move(text));
+}
+
+} // namespace
+
+/// With the sentence, for earlier engines.
+void to_json(Json& json, const LastResult& result) {
+    json = {{"success", result.success},
+            {"message", sentence(result.message)},
+            {"code", result.message.code},
+            {"arguments", result.message.arguments},
+            {"time", result.time}};
+}
+
+void from_json(const Json& json, LastResult& result) {
+    result = {json.at("success").get<bool>(), messageIn(json),
+              json.at("time").get<std::uint64_t>()};
+}
 
 LastResults::LastResults(std::filesystem::path directory) : directory_(std::move(directory)) {
     try {

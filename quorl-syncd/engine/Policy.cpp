@@ -3,6 +3,10 @@
 #include <algorithm>
 #include <array>
 #include <string_view>
+#include <utility>
+
+#include "services/engine/Codes.h"
+#include "services/engine/Names.h"
 
 namespace quorl::syncd {
 
@@ -10,13 +14,17 @@ namespace {
 
 using wearable::Selection;
 
+using engine::Message;
+
+namespace code = engine::code;
+
 struct Obstacle {
     bool (*isThere)(const Situation&);
-    std::string_view sentence;
+    /// Null for the message that the situation has.
+    const char* code;
 };
 
-/// Stands for the sentence that the situation has.
-constexpr std::string_view problemOfWearable;
+constexpr const char* problemOfWearable = nullptr;
 
 bool isChargerNeeded(const Situation& now) {
     return now.running ? now.running->charger == Charger::Needed : !now.isStartRequested;
@@ -27,18 +35,15 @@ bool isWaitingForAnswer(const Situation& now) { return now.running && now.isWear
 
 /// The first one that is there is told.
 constexpr std::array obstacles{
-    Obstacle{[](const Situation& now) { return !now.choices.isSyncEnabled; },
-             "Music sync is switched off."},
-    Obstacle{[](const Situation& now) { return !now.choices.playlist; }, "No playlist is chosen."},
-    Obstacle{[](const Situation& now) { return !now.isMusicRead; }, "Reading the music folder…"},
-    Obstacle{[](const Situation& now) { return !now.revision; },
-             "The chosen playlist is not in the music folder."},
+    Obstacle{[](const Situation& now) { return !now.choices.isSyncEnabled; }, code::syncOff},
+    Obstacle{[](const Situation& now) { return !now.choices.playlist; }, code::noPlaylist},
+    Obstacle{[](const Situation& now) { return !now.isMusicRead; }, code::readingMusic},
+    Obstacle{[](const Situation& now) { return !now.revision; }, code::playlistGone},
     Obstacle{[](const Situation& now) { return !now.usage && !isWaitingForAnswer(now); },
              problemOfWearable},
-    Obstacle{[](const Situation& now) { return !now.attachment.connected; },
-             "The wearable is not connected."},
+    Obstacle{[](const Situation& now) { return !now.attachment.connected; }, code::notConnected},
     Obstacle{[](const Situation& now) { return !now.attachment.onCharger && isChargerNeeded(now); },
-             "The wearable is not on its charger."},
+             code::notOnCharger},
 };
 
 /// Where a playlist is chosen and in the music folder.
@@ -71,27 +76,24 @@ bool isRunning(Selection wanted, const Situation& now) {
 
 } // namespace
 
-std::string obstacleIn(const Situation& situation) {
+std::optional<Message> obstacleIn(const Situation& situation) {
     const auto* const found = std::ranges::find_if(
         obstacles, [&](const Obstacle& obstacle) { return obstacle.isThere(situation); });
     if (found == obstacles.end()) {
-        return {};
+        return std::nullopt;
     }
-    return found->sentence == problemOfWearable ? situation.wearableProblem
-                                                : std::string(found->sentence);
+    return found->code == problemOfWearable ? situation.wearableProblem : Message{found->code};
 }
 
 Decision decide(const Situation& situation) {
     using Kind = Decision::Kind;
-    auto obstacle = obstacleIn(situation);
-    if (!obstacle.empty()) {
-        return {situation.running ? Kind::Stop : Kind::Rest, {}, obstacle};
+    if (auto obstacle = obstacleIn(situation)) {
+        return {situation.running ? Kind::Stop : Kind::Rest, {}, std::move(*obstacle)};
     }
     const auto wanted = wantedIn(situation);
     if (situation.running) {
-        return isRunning(wanted, situation)
-                   ? Decision{Kind::Continue, {}, {}}
-                   : Decision{Kind::Stop, {}, "Something else was chosen."};
+        return isRunning(wanted, situation) ? Decision{Kind::Continue, {}, {}}
+                                            : Decision{Kind::Stop, {}, {code::somethingElseChosen}};
     }
     return isDue(wanted, situation) ? Decision{Kind::Begin, wanted, {}} : Decision();
 }
@@ -103,19 +105,18 @@ bool isClaimToBeForgotten(const Situation& situation, const Decision& decision) 
     return situation.choices.lastSent && situation.usage && !hasClaimed(situation);
 }
 
-std::string statusOf(const Situation& situation, const std::string& lastMessage) {
-    auto obstacle = obstacleIn(situation);
-    if (!obstacle.empty()) {
-        return obstacle;
+Message statusOf(const Situation& situation, const Message& last) {
+    if (auto obstacle = obstacleIn(situation)) {
+        return std::move(*obstacle);
     }
     if (situation.running) {
-        return "Syncing music.";
+        return {code::syncing};
     }
     const auto wanted = wantedIn(situation);
     if (isSent(wanted, situation)) {
-        return "Everything is up to date.";
+        return {code::upToDate};
     }
-    return situation.givenUp == wanted ? lastMessage : "About to sync music.";
+    return situation.givenUp == wanted ? last : Message{code::aboutToSync};
 }
 
 std::string_view syncStateOf(const Situation& situation) {
@@ -138,17 +139,17 @@ std::string_view syncStateOf(const Situation& situation) {
 }
 
 Conclusion conclusionOf(const Outcome& outcome, const std::string& rememberProblem,
-                        const std::string& whyStopped) {
+                        const std::optional<Message>& whyStopped) {
     using Kind = Outcome::Kind;
     const bool isSent = outcome.kind == Kind::Sent;
     if (isSent && rememberProblem.empty()) {
         return {true, outcome.message, false, false};
     }
     if (outcome.kind == Kind::Stopped) {
-        return {false, whyStopped, false, false};
+        return {false, whyStopped.value_or(outcome.message), false, false};
     }
-    return {false, isSent ? rememberProblem : outcome.message, true,
-            whyStopped.empty() && (isSent || outcome.mayPass)};
+    return {false, isSent ? engine::other(rememberProblem) : outcome.message, true,
+            !whyStopped && (isSent || outcome.mayPass)};
 }
 
 } // namespace quorl::syncd

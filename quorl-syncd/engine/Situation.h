@@ -2,10 +2,10 @@
 
 #include <cstdint>
 #include <optional>
-#include <string>
 
 #include "quorl-syncd/engine/Choices.h"
 #include "quorl-syncd/transfer/pace/Clock.h"
+#include "services/engine/Message.h"
 #include "services/wearable/Attachment.h"
 #include "services/wearable/Manifest.h"
 #include "services/wearable/Usage.h"
@@ -37,7 +37,7 @@ struct Situation {
     /// Nothing while the wearable is not there or was not looked at yet; then `wearableProblem`
     /// says why.
     std::optional<wearable::Usage> usage;
-    std::string wearableProblem;
+    engine::Message wearableProblem;
     /// It may have become another one, and there was no answer since.
     bool isWearableLookedFor = false;
 

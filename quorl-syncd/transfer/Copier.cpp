@@ -22,8 +22,8 @@ constexpr std::size_t largestPiece = 1 << 20;
 Copier::Copier(const Means& means, const CopyProgress& progress)
     : means_(means), progress_(progress), rule_(means.ports.clock.now()) {}
 
-std::vector<std::string> Copier::copy(std::vector<Entry>& songs) {
-    std::vector<std::string> problems;
+std::vector<engine::Message> Copier::copy(std::vector<Entry>& songs) {
+    std::vector<engine::Message> problems;
     for (auto& song : songs) {
         if (!song.hash.empty()) {
             continue;
@@ -31,7 +31,7 @@ std::vector<std::string> Copier::copy(std::vector<Entry>& songs) {
         try {
             copySong(song);
         } catch (const SongProblem& problem) {
-            problems.emplace_back(problem.what());
+            problems.push_back(problem.message());
         } catch (const Stopped&) {
             commit();
             throw;
@@ -56,7 +56,7 @@ void Copier::copySong(Entry& song) {
             throw; // whoever opened the device takes back what was begun
         }
         means_.device.discard(file);
-        throw SongProblem(SongTrouble::TooLarge, song.name);
+        throw SongProblem(SongTrouble::TooLarge, song.source);
     } catch (const SongProblem&) {
         means_.device.discard(file);
         throw;

@@ -39,9 +39,9 @@ class Copier {
     /// their hashes; where a name turns out to be taken, under another one. Those that cannot be
     /// copied are taken out of `songs`.
     ///
-    /// Gives back a sentence for each of these. Throws `Stopped`, when all that was copied is on
-    /// the device, and what the device throws.
-    [[nodiscard]] std::vector<std::string> copy(std::vector<wearable::Entry>& songs);
+    /// Gives back what is the matter with each of these. Throws `Stopped`, when all that was copied
+    /// is on the device, and what the device throws.
+    [[nodiscard]] std::vector<engine::Message> copy(std::vector<wearable::Entry>& songs);
 
   private:
     /// A song whose copy is complete, but perhaps not on the device yet.

@@ -1,6 +1,8 @@
 #pragma once
 
-#include <string>
+#include <vector>
+
+#include "services/engine/Message.h"
 
 namespace quorl::syncd {
 
@@ -13,12 +15,13 @@ struct Outcome {
     };
 
     Kind kind = Kind::Failed;
-    /// For the user, in a sentence or several.
-    std::string message;
+    engine::Message message;
     /// The music folder is no longer as the order has it.
     bool isLibraryStale = false;
     /// What was in the way may go away by itself.
     bool mayPass = false;
+    /// Of each song that could not be sent. The first argument is its path.
+    std::vector<engine::Message> songProblems = {};
 
     bool operator==(const Outcome&) const = default;
 };

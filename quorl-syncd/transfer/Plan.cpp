@@ -109,7 +109,7 @@ class Matching {
             }
             plan_.songs.push_back(std::move(song));
         } catch (const SongProblem& problem) {
-            plan_.problems.emplace_back(problem.what());
+            plan_.problems.push_back(problem.message());
             troubled_.insert(song.source);
         }
     }

@@ -10,6 +10,7 @@
 #include "quorl-syncd/transfer/Order.h"
 #include "quorl-syncd/transfer/device/DeviceNames.h"
 #include "services/base/FileStatus.h"
+#include "services/engine/Message.h"
 #include "services/wearable/Manifest.h"
 
 /// What is to be done to a device, worked out from plain values.
@@ -60,8 +61,8 @@ struct Plan {
     TakenNames names;
     /// What there is to copy; nothing of it is done.
     CopyProgress progress;
-    /// A sentence for each song that cannot be sent.
-    std::vector<std::string> problems;
+    /// One for each song that cannot be sent.
+    std::vector<engine::Message> problems;
 };
 
 /// @param there as `whatIsThere` has given it.

@@ -8,14 +8,18 @@
 #include <utility>
 
 #include "quorl-syncd/transfer/ContentHash.h"
-#include "quorl-syncd/transfer/Sentences.h"
+#include "quorl-syncd/transfer/Messages.h"
 #include "quorl-syncd/transfer/Stopped.h"
+#include "quorl-syncd/transfer/SyncProblem.h"
+#include "services/engine/Codes.h"
 
 namespace quorl::syncd {
 
 namespace {
 
 using wearable::Entry;
+
+namespace code = engine::code;
 
 Files filesOf(const wearable::Manifest& manifest, Device& device) {
     Files files;
@@ -75,13 +79,15 @@ Outcome Sync::run() {
             throw;
         }
     } catch (const Stopped&) {
-        return {Kind::Stopped, "The sync was stopped.", false, false};
+        return {Kind::Stopped, {code::stopped}, false, false};
     } catch (const std::system_error& error) {
-        return {Kind::Failed, sentence(troubleOf(error.code()), error.code()), false, true};
+        return {Kind::Failed, messageOf(error.code()), false, true};
     } catch (const std::bad_alloc&) {
-        return {Kind::Failed, notEnoughMemory(), false, true};
+        return {Kind::Failed, {code::notEnoughMemory}, false, true};
+    } catch (const SyncProblem& problem) {
+        return {Kind::Failed, problem.message(), false, true};
     } catch (const std::exception& error) {
-        return {Kind::Failed, error.what(), false, true};
+        return {Kind::Failed, engine::other(error.what()), false, true};
     }
 }
 
@@ -149,7 +155,7 @@ void Sync::requireRoom(Device& device) {
     const auto available = device.available() + bytesOf(leftovers_, plan_.useless);
     room_ = roomFor(plan_, available);
     if (room_ == Room::NotEnough) {
-        throw std::runtime_error(notEnoughSpace(plan_.progress.totalBytes, available));
+        throw SyncProblem(notEnoughSpace(plan_.progress.totalBytes, available));
     }
 }
 
@@ -269,7 +275,7 @@ Outcome Sync::outcome() const {
         return {Outcome::Kind::Sent, synced(plan_.songs.size()), false, false};
     }
     // A song that can be read again, or stays as it is, tells nobody.
-    return {Outcome::Kind::Failed, notAllSent(plan_.problems), true, true};
+    return {Outcome::Kind::Failed, notAllSent(plan_.problems), true, true, plan_.problems};
 }
 
 } // namespace quorl::syncd

@@ -13,7 +13,7 @@ namespace quorl::syncd {
 
 /// All that a sync touches. The references outlive it.
 struct SyncPorts {
-    /// Throws `std::system_error` where the wearable cannot be opened, or another
+    /// Throws `std::system_error` where the wearable cannot be opened, `SyncProblem`, or another
     /// `std::exception` whose text is a sentence for the user.
     std::function<std::unique_ptr<Volume>(const wearable::Wearable&)> openVolume;
     SongSource& songs;

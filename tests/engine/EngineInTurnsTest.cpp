@@ -227,9 +227,9 @@ struct Sessions final : Announcer {
     std::vector<std::string> ends;
 };
 
-const Outcome sent{Outcome::Kind::Sent, "All sent.", false, false};
-const Outcome full{Outcome::Kind::Failed, "It is full.", false, true};
-const Outcome stopped{Outcome::Kind::Stopped, "", false, false};
+const Outcome sent{Outcome::Kind::Sent, engine::other("All sent."), false, false};
+const Outcome full{Outcome::Kind::Failed, engine::other("It is full."), false, true};
+const Outcome stopped{Outcome::Kind::Stopped, {}, false, false};
 const auto upToDate = "Everything is up to date.";
 
 class EngineInTurns : public ::testing::Test {
@@ -286,7 +286,7 @@ TEST_F(EngineInTurns, BeginsOnceMusicAndWearableAreKnownAndRemembersWhatItHasSen
 
     EXPECT_EQ(choices_.choices.lastSent, (SentPlaylist{7, 3}));
     EXPECT_THAT(bus_.ends, ElementsAre("+ All sent."));
-    EXPECT_EQ(results_.of("/embedded"), (LastResult{true, "All sent.", 17}));
+    EXPECT_EQ(results_.of("/embedded"), (LastResult{true, engine::other("All sent."), 17}));
     EXPECT_EQ(status(), upToDate);
     answerAsSent();
     EXPECT_EQ(syncs_.orders.size(), 1);
@@ -630,7 +630,7 @@ TEST_F(EngineInTurns, EndsTheSyncThatIsUnderWayWhenItEnds) {
     engine_.reset();
 
     EXPECT_THAT(bus_.ends, ElementsAre("- The sync engine was ended."));
-    EXPECT_EQ(results_.of("/embedded").message, "The sync engine was ended.");
+    EXPECT_EQ(results_.of("/embedded").message, engine::Message{"ended"});
 }
 
 } // namespace

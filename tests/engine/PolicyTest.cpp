@@ -13,32 +13,33 @@ void PrintTo(const Decision& decision, std::ostream* out) {
     constexpr std::array names{"Rest", "Begin", "Continue", "Stop"};
     *out << names.at(static_cast<std::size_t>(decision.kind)) << " playlist "
          << decision.selection.playlist << " revision " << decision.selection.revision << ": \""
-         << decision.sentence << '"';
+         << sentence(decision.message) << '"';
 }
 
 void PrintTo(const Conclusion& conclusion, std::ostream* out) {
-    *out << (conclusion.success ? "success" : "failure") << " \"" << conclusion.message << '"'
-         << (conclusion.isGivenUp ? ", given up" : "")
+    *out << (conclusion.success ? "success" : "failure") << " \"" << sentence(conclusion.message)
+         << '"' << (conclusion.isGivenUp ? ", given up" : "")
          << (conclusion.isTriedAgain ? ", tried again" : "");
 }
 
 namespace {
 
 using namespace std::chrono_literals;
+using engine::Message;
 using Kind = Decision::Kind;
 
 constexpr wearable::Selection wanted{7, 3, 1, 250};
 constexpr wearable::Selection older{7, 2, 1, 250};
 constexpr wearable::Selection other{8, 3, 1, 250};
 
-const auto offMessage = "Music sync is switched off.";
-const auto noPlaylistMessage = "No playlist is chosen.";
-const auto readingMessage = "Reading the music folder…";
-const auto goneMessage = "The chosen playlist is not in the music folder.";
-const auto awayMessage = "The Velora at /media/velora cannot be reached.";
-const auto disconnectedMessage = "The wearable is not connected.";
-const auto chargerMessage = "The wearable is not on its charger.";
-const auto otherMessage = "Something else was chosen.";
+const Message off{"sync-off"};
+const Message noPlaylist{"no-playlist"};
+const Message reading{"reading-music"};
+const Message gone{"playlist-gone"};
+const Message away = engine::other("The Velora at /media/velora cannot be reached.");
+const Message disconnected{"not-connected"};
+const Message notOnCharger{"not-on-charger"};
+const Message otherChosen{"something-else-chosen"};
 
 /// Playlist 7 is chosen and there, and so is the wearable, which has never got anything.
 Situation readyToBegin() {
@@ -48,7 +49,7 @@ Situation readyToBegin() {
     now.revision = 3;
     now.wearable = {"/media/velora", {}, false};
     now.usage = wearable::Usage();
-    now.wearableProblem = awayMessage;
+    now.wearableProblem = away;
     now.now = Clock::TimePoint(10s);
     return now;
 }
@@ -115,9 +116,9 @@ const Decision begins{Kind::Begin, wanted, {}};
 const Decision rests{Kind::Rest, {}, {}};
 const Decision continues{Kind::Continue, {}, {}};
 
-Decision waits(const std::string& obstacle) { return {Kind::Rest, {}, obstacle}; }
+Decision waits(const Message& obstacle) { return {Kind::Rest, {}, obstacle}; }
 
-Decision stops(const std::string& why) { return {Kind::Stop, {}, why}; }
+Decision stops(const Message& why) { return {Kind::Stop, {}, why}; }
 
 void sendAnotherRevision(Situation& now) {
     send(now);
@@ -151,25 +152,23 @@ const Decision beginsNewRevision{Kind::Begin, {7, 4, 1, 250}, {}};
 
 INSTANTIATE_TEST_SUITE_P(
     Obstacle, Decides,
-    ::testing::Values(
-        Case{"off", {switchOff}, waits(offMessage)},
-        Case{"nothing chosen", {chooseNothing, losePlaylist}, waits(noPlaylistMessage)},
-        Case{"music not read", {read, losePlaylist}, waits(readingMessage)},
-        Case{"playlist gone", {losePlaylist}, waits(goneMessage)},
-        Case{"wearable away", {loseWearable}, waits(awayMessage)},
-        Case{"wearable perhaps another one", {lookForWearable}, waits(awayMessage)},
-        Case{"not connected", {disconnect}, waits(disconnectedMessage)},
-        Case{"not on charger", {takeOffCharger}, waits(chargerMessage)}));
+    ::testing::Values(Case{"off", {switchOff}, waits(off)},
+                      Case{"nothing chosen", {chooseNothing, losePlaylist}, waits(noPlaylist)},
+                      Case{"music not read", {read, losePlaylist}, waits(reading)},
+                      Case{"playlist gone", {losePlaylist}, waits(gone)},
+                      Case{"wearable away", {loseWearable}, waits(away)},
+                      Case{"wearable perhaps another one", {lookForWearable}, waits(away)},
+                      Case{"not connected", {disconnect}, waits(disconnected)},
+                      Case{"not on charger", {takeOffCharger}, waits(notOnCharger)}));
 
 INSTANTIATE_TEST_SUITE_P(
     FirstOfTwoObstacles, Decides,
-    ::testing::Values(
-        Case{"off", {switchOff, chooseNothing}, waits(offMessage)},
-        Case{"nothing chosen", {chooseNothing, read}, waits(noPlaylistMessage)},
-        Case{"music not read", {read, losePlaylist}, waits(readingMessage)},
-        Case{"playlist gone", {losePlaylist, loseWearable}, waits(goneMessage)},
-        Case{"wearable away", {loseWearable, disconnect}, waits(awayMessage)},
-        Case{"not connected", {disconnect, takeOffCharger}, waits(disconnectedMessage)}));
+    ::testing::Values(Case{"off", {switchOff, chooseNothing}, waits(off)},
+                      Case{"nothing chosen", {chooseNothing, read}, waits(noPlaylist)},
+                      Case{"music not read", {read, losePlaylist}, waits(reading)},
+                      Case{"playlist gone", {losePlaylist, loseWearable}, waits(gone)},
+                      Case{"wearable away", {loseWearable, disconnect}, waits(away)},
+                      Case{"not connected", {disconnect, takeOffCharger}, waits(disconnected)}));
 
 INSTANTIATE_TEST_SUITE_P(
     Begin, Decides,
@@ -190,7 +189,7 @@ INSTANTIATE_TEST_SUITE_P(
                       Case{"given up", {giveUp, request}, begins},
                       Case{"preferences still change", {chooseJustNow, request}, begins},
                       Case{"not on charger", {takeOffCharger, request}, begins},
-                      Case{"not connected", {disconnect, request}, waits(disconnectedMessage)}));
+                      Case{"not connected", {disconnect, request}, waits(disconnected)}));
 
 INSTANTIATE_TEST_SUITE_P(
     Running, Decides,
@@ -199,22 +198,22 @@ INSTANTIATE_TEST_SUITE_P(
         Case{"cancelled and not ended yet", {run, giveUp}, continues},
         Case{"preferences still change", {run, chooseJustNow}, continues},
         Case{"another revision waits", {runAnOlderRevision}, continues},
-        Case{"switched off", {run, switchOff}, stops(offMessage)},
-        Case{"playlist gone", {run, losePlaylist}, stops(goneMessage)},
-        Case{"wearable away", {run, loseWearable}, stops(awayMessage)},
+        Case{"switched off", {run, switchOff}, stops(off)},
+        Case{"playlist gone", {run, losePlaylist}, stops(gone)},
+        Case{"wearable away", {run, loseWearable}, stops(away)},
         Case{"wearable perhaps another one", {run, lookForWearable}, continues},
-        Case{"not connected", {run, disconnect}, stops(disconnectedMessage)},
-        Case{"taken off the charger", {run, takeOffCharger}, stops(chargerMessage)},
+        Case{"not connected", {run, disconnect}, stops(disconnected)},
+        Case{"taken off the charger", {run, takeOffCharger}, stops(notOnCharger)},
         Case{"begun without a charger", {runIgnoringCharger, takeOffCharger}, continues},
         Case{"a request does not excuse the one that runs",
              {run, takeOffCharger, request},
-             stops(chargerMessage)},
-        Case{"another playlist", {runAnotherPlaylist}, stops(otherMessage)},
-        Case{"another limit", {runWithAnotherLimit}, stops(otherMessage)},
-        Case{"another wearable", {runToAnotherWearable}, stops(otherMessage)},
+             stops(notOnCharger)},
+        Case{"another playlist", {runAnotherPlaylist}, stops(otherChosen)},
+        Case{"another limit", {runWithAnotherLimit}, stops(otherChosen)},
+        Case{"another wearable", {runToAnotherWearable}, stops(otherChosen)},
         Case{"an obstacle is told before another choice",
              {runAnotherPlaylist, disconnect},
-             stops(disconnectedMessage)}));
+             stops(disconnected)}));
 
 struct ClaimCase {
     const char* name;
@@ -257,43 +256,44 @@ TEST(Status, TellsWhatIsDoneOrWhatIsWaitedFor) {
         for (const auto& change : changes) {
             change(now);
         }
-        return statusOf(now, "The last message.");
+        return statusOf(now, {"last"});
     };
 
-    EXPECT_EQ(statusWith({send}), "Everything is up to date.");
-    EXPECT_EQ(statusWith({send, giveUp}), "Everything is up to date.");
-    EXPECT_EQ(statusWith({giveUp}), "The last message.");
-    EXPECT_EQ(statusWith({giveUpOlder}), "About to sync music.");
-    EXPECT_EQ(statusWith({chooseJustNow}), "About to sync music.");
-    EXPECT_EQ(statusWith({sendWithAnotherLimit, chooseJustNow}), "About to sync music.");
-    EXPECT_EQ(statusWith({disconnect}), disconnectedMessage);
-    EXPECT_EQ(statusWith({giveUp, disconnect}), disconnectedMessage);
-    EXPECT_EQ(statusWith({run}), "Syncing music.");
-    EXPECT_EQ(statusWith({run, disconnect}), disconnectedMessage) << "it is being stopped";
-    EXPECT_EQ(statusWith({run, lookForWearable}), "Syncing music.");
+    EXPECT_EQ(statusWith({send}), Message{"up-to-date"});
+    EXPECT_EQ(statusWith({send, giveUp}), Message{"up-to-date"});
+    EXPECT_EQ(statusWith({giveUp}), Message{"last"});
+    EXPECT_EQ(statusWith({giveUpOlder}), Message{"about-to-sync"});
+    EXPECT_EQ(statusWith({chooseJustNow}), Message{"about-to-sync"});
+    EXPECT_EQ(statusWith({sendWithAnotherLimit, chooseJustNow}), Message{"about-to-sync"});
+    EXPECT_EQ(statusWith({disconnect}), disconnected);
+    EXPECT_EQ(statusWith({giveUp, disconnect}), disconnected);
+    EXPECT_EQ(statusWith({run}), Message{"syncing"});
+    EXPECT_EQ(statusWith({run, disconnect}), disconnected) << "it is being stopped";
+    EXPECT_EQ(statusWith({run, lookForWearable}), Message{"syncing"});
 }
 
 TEST(Conclusions, FollowFromHowASyncEndedAndWhetherThatCouldBeRemembered) {
     using End = Outcome::Kind;
-    const Outcome sent{End::Sent, "3 songs synced.", false, false};
-    const Outcome stopped{End::Stopped, "The sync was stopped.", false, false};
-    const Outcome full{End::Failed, "It is full.", false, true};
-    const Outcome changed{End::Failed, "A song has changed.", true, false};
+    const Message all{"synced", {"3"}};
+    const Message full{"wearable-full"};
+    const Message changed{"song-changed"};
+    const Message cancelled{"cancelled"};
+    const Outcome sent{End::Sent, all, false, false};
+    const Outcome stopped{End::Stopped, {"stopped"}, false, false};
+    const Outcome failed{End::Failed, full, false, true};
+    const Outcome left{End::Failed, changed, true, false};
 
-    EXPECT_EQ(conclusionOf(sent, "", ""), (Conclusion{true, "3 songs synced.", false, false}));
-    EXPECT_EQ(conclusionOf(sent, "", "Something else was chosen."),
-              (Conclusion{true, "3 songs synced.", false, false}))
+    EXPECT_EQ(conclusionOf(sent, "", {}), (Conclusion{true, all, false, false}));
+    EXPECT_EQ(conclusionOf(sent, "", otherChosen), (Conclusion{true, all, false, false}))
         << "it came too late";
-    EXPECT_EQ(conclusionOf(sent, "No store.", ""), (Conclusion{false, "No store.", true, true}));
-    EXPECT_EQ(conclusionOf(sent, "No store.", "Cancelled."),
-              (Conclusion{false, "No store.", true, false}));
-    EXPECT_EQ(conclusionOf(stopped, "", "Cancelled."),
-              (Conclusion{false, "Cancelled.", false, false}));
-    EXPECT_EQ(conclusionOf(full, "", ""), (Conclusion{false, "It is full.", true, true}));
-    EXPECT_EQ(conclusionOf(full, "", "Cancelled."),
-              (Conclusion{false, "It is full.", true, false}));
-    EXPECT_EQ(conclusionOf(changed, "", ""),
-              (Conclusion{false, "A song has changed.", true, false}));
+    EXPECT_EQ(conclusionOf(sent, "No store.", {}),
+              (Conclusion{false, engine::other("No store."), true, true}));
+    EXPECT_EQ(conclusionOf(sent, "No store.", cancelled),
+              (Conclusion{false, engine::other("No store."), true, false}));
+    EXPECT_EQ(conclusionOf(stopped, "", cancelled), (Conclusion{false, cancelled, false, false}));
+    EXPECT_EQ(conclusionOf(failed, "", {}), (Conclusion{false, full, true, true}));
+    EXPECT_EQ(conclusionOf(failed, "", cancelled), (Conclusion{false, full, true, false}));
+    EXPECT_EQ(conclusionOf(left, "", {}), (Conclusion{false, changed, true, false}));
 }
 
 } // namespace

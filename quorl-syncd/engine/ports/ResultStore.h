@@ -3,14 +3,16 @@
 #include <cstdint>
 #include <string>
 
+#include "services/engine/Message.h"
+
 namespace quorl::syncd {
 
 /// What became of a sync.
 struct LastResult {
     /// Everything that was wished for is on the wearable.
     bool success = false;
-    /// For the user, in a sentence or several; empty before the first sync.
-    std::string message;
+    /// No code before the first sync.
+    engine::Message message;
     /// Microseconds since 1970; 0 before the first sync.
     std::uint64_t time = 0;
 

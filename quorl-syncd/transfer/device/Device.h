@@ -20,7 +20,7 @@ namespace quorl::syncd {
 /// There are two directories: the music directory, in which there may be files of others and
 /// unfinished ones of ours, and one of our own, which holds the manifest. Nothing is ever renamed
 /// over anything. Every failure throws `std::system_error`, unless another one is named; the errors
-/// that have a sentence of their own are in `troubleOf`.
+/// that have a message of their own are in `messageOf`.
 ///
 /// On FAT a loss of power may leave a file without its name, or a name without its file; within a
 /// rename, both names or none; and a name only tells where its file is once the file was made

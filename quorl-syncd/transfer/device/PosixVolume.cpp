@@ -17,9 +17,10 @@
 #include <sys/vfs.h>
 #include <unistd.h>
 
-#include "quorl-syncd/transfer/Sentences.h"
+#include "quorl-syncd/transfer/SyncProblem.h"
 #include "services/base/AtomicFile.h"
 #include "services/base/FileContents.h"
+#include "services/engine/Codes.h"
 #include "services/wearable/Usage.h"
 
 namespace quorl::syncd {
@@ -237,7 +238,7 @@ bool PosixVolume::lockOwn() {
     const bool isNew = make(root_.get(), Directory::Own, isFat_);
     own_ = openDirectory(root_.get(), Directory::Own);
     if (flock(own_.get(), LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK) {
-        throw std::runtime_error(anotherProgramIsSyncing());
+        throw SyncProblem({engine::code::anotherProgram});
     }
     return isNew;
 }

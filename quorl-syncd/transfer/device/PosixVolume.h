@@ -20,7 +20,7 @@ namespace quorl::syncd {
 class PosixVolume final : public Volume {
   public:
     /// Opens the wearable, and makes our own directory, which nobody else can open for a sync as
-    /// long as this is there. Throws `std::runtime_error` with a sentence when another program is
+    /// long as this is there. Throws `SyncProblem` when another program is
     /// syncing to it.
     explicit PosixVolume(const wearable::Wearable& wearable);
 

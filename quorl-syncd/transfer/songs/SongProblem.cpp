@@ -1,31 +1,38 @@
 #include "quorl-syncd/transfer/songs/SongProblem.h"
 
-#include "services/base/Utf8.h"
-#include "services/wearable/Wearable.h"
+#include <utility>
+
+#include "services/engine/Codes.h"
 
 namespace quorl::syncd {
 
 namespace {
 
-std::string ending(SongTrouble trouble, const std::string& detail) {
+using engine::Message;
+
+Message messageOf(SongTrouble trouble, const std::string& song, const std::string& detail) {
+    namespace code = engine::code;
     switch (trouble) {
     case SongTrouble::Gone:
-        return " is no longer in the music folder.";
+        return {code::songGone, {song}};
     case SongTrouble::Unreadable:
-        return " cannot be read: " + detail + ".";
+        return {code::songUnreadable, {song, detail}};
     case SongTrouble::NotAFile:
-        return " is not a file any more.";
+        return {code::songNotAFile, {song}};
     case SongTrouble::Changed:
-        return " has just been changed. It will be sent once it stays as it is.";
+        return {code::songChanged, {song}};
     case SongTrouble::TooLarge:
         break;
     }
-    return std::string(" is larger than a file on the ") + wearable::wearableName + " can be.";
+    return {code::songTooLarge, {song}};
 }
 
 } // namespace
 
+SongProblem::SongProblem(Message message)
+    : std::runtime_error(sentence(message)), message_(std::move(message)) {}
+
 SongProblem::SongProblem(SongTrouble trouble, const std::string& song, const std::string& detail)
-    : std::runtime_error("“" + base::printable(song) + "”" + ending(trouble, detail)) {}
+    : SongProblem(messageOf(trouble, song, detail)) {}
 
 } // namespace quorl::syncd

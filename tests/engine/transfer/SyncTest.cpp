@@ -35,8 +35,8 @@ class SyncedWearable : public ::testing::Test {
 TEST_F(SyncedWearable, HasTheSongsByteForByteAndAPlaylistThatPlaysThem) {
     const auto outcome = syncAll();
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << outcome.message;
-    EXPECT_EQ(outcome.message, "2 songs synced to Velora.");
+    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(sentence(outcome.message), "2 songs synced to Velora.");
     EXPECT_EQ(player_.music(),
               (Contents{{"one.mp3", "one"},
                         {"two.ogg", "two two"},
@@ -117,7 +117,7 @@ TEST_F(SyncedWearable, GetsASongFromTheFarFutureOnce) {
 
     const auto outcome = syncAll();
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << outcome.message;
+    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
     EXPECT_EQ(copiedSongs_, 2);
     EXPECT_EQ(syncAll().kind, Kind::Sent);
     EXPECT_EQ(copiedSongs_, 0);
@@ -193,7 +193,7 @@ TEST_F(SyncedWearable, GetsTheSongsThatLinksInTheFolderLeadTo) {
 
     const auto outcome = syncAll();
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << outcome.message;
+    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
     EXPECT_EQ(player_.music().at("relative.mp3"), "one");
     EXPECT_EQ(player_.music().at("absolute.ogg"), "two two");
 }
@@ -227,7 +227,7 @@ TEST_F(SyncedWearable, IsSyncedWithAnEmptyPlaylist) {
     const auto outcome = syncAll();
 
     EXPECT_EQ(outcome.kind, Kind::Sent);
-    EXPECT_EQ(outcome.message, "0 songs synced to Velora.");
+    EXPECT_EQ(sentence(outcome.message), "0 songs synced to Velora.");
     EXPECT_EQ(player_.music(), (Contents{{"List.m3u8", "#EXTM3U\n#PLAYLIST:List\n"}}));
 }
 
@@ -241,7 +241,7 @@ TEST_F(SyncedWearable, CountsOnlyWhatIsNewAgainstItsSpace) {
 
     const auto outcome = sync(wishFor(music_, small));
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << outcome.message;
+    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
 }
 
 TEST_F(SyncedWearable, IsToldOfItsProgressPieceByPieceAndNeverBackwardsOrTooMuch) {

@@ -1,6 +1,6 @@
 // What the user is told of a sync.
 
-#include "quorl-syncd/transfer/Sentences.h"
+#include "quorl-syncd/transfer/Messages.h"
 
 #include <cerrno>
 #include <cstring>
@@ -11,16 +11,16 @@
 namespace {
 
 using namespace quorl::syncd;
+using quorl::engine::Message;
 using ::testing::AllOf;
 using ::testing::HasSubstr;
 using ::testing::StartsWith;
 
 std::string sentenceFor(int number) {
-    const std::error_code error(number, std::generic_category());
-    return sentence(troubleOf(error), error);
+    return sentence(messageOf(std::error_code(number, std::generic_category())));
 }
 
-TEST(Sentences, SayWhatIsWrongWithADeviceAndWhatToDo) {
+TEST(Messages, SayWhatIsWrongWithADeviceAndWhatToDo) {
     for (const auto number : {ENOSPC, EDQUOT}) {
         EXPECT_EQ(sentenceFor(number), "The Velora is full. Remove something from it, or choose a "
                                        "lower limit.");
@@ -43,20 +43,15 @@ TEST(Sentences, SayWhatIsWrongWithADeviceAndWhatToDo) {
     EXPECT_EQ(sentenceFor(EEXIST), "The Velora could not be synced: File exists.");
 }
 
-TEST(Sentences, RoundSpaceUpAndCountSongs) {
-    EXPECT_THAT(notEnoughSpace((1 << 20) + 1, 1 << 20),
-                HasSubstr("2 MB are needed for new songs, 1 MB are available"));
-    EXPECT_THAT(notEnoughSpace(~std::uint64_t{0}, 0),
-                HasSubstr("17592186044416 MB are needed for new songs, 0 MB are available"));
-    EXPECT_EQ(synced(1), "1 song synced to Velora.");
-    EXPECT_EQ(synced(2), "2 songs synced to Velora.");
+TEST(Messages, HaveNumbersForPrograms) {
+    EXPECT_EQ(notEnoughSpace((1 << 20) + 1, 7), (Message{"not-enough-space", {"1048577", "7"}}));
+    EXPECT_EQ(synced(2), (Message{"synced", {"2"}}));
 }
 
-TEST(Sentences, TellTheFirstSongThatIsMissingAndHowManyMoreThereAre) {
-    EXPECT_EQ(notAllSent({"One is gone."}), "One is gone.");
-    EXPECT_EQ(notAllSent({"One is gone.", "b"}), "One is gone. 1 song more could not be sent.");
-    EXPECT_EQ(notAllSent({"One is gone.", "b", "c"}),
-              "One is gone. 2 songs more could not be sent.");
+TEST(Messages, TellTheFirstSongThatIsMissingAndHowManyThereAre) {
+    const Message gone{"song-gone", {"a.mp3"}};
+    EXPECT_EQ(notAllSent({gone}), (Message{"songs-left-out", {"1", "song-gone", "a.mp3"}}));
+    EXPECT_EQ(notAllSent({gone, {}, {}}), (Message{"songs-left-out", {"3", "song-gone", "a.mp3"}}));
 }
 
 } // namespace
