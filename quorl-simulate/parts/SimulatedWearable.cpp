@@ -84,7 +84,7 @@ bool SimulatedWearable::isManifestAsExcused() const {
 
 wearable::Usage SimulatedWearable::usage() const {
     const auto& list = manifest();
-    wearable::Usage usage{0, disk.available(), 0, list.sent};
+    wearable::Usage usage{0, disk.available(), 0, 0, list.sent};
     const auto count = [&](const wearable::Entry& entry) {
         const auto file = disk.find(music(), entry.name);
         const auto size = file ? disk.status(*file).size : 0;

@@ -73,6 +73,7 @@ class SessionObject::Session final
         now.rate = static_cast<std::uint64_t>(static_cast<double>(progress.bytes) /
                                               std::max(elapsed.count(), 0.001));
         now.progress = fractionOf(progress);
+        now.currentItem = progress.song;
         published_.change(*this, now);
     }
 
@@ -80,6 +81,7 @@ class SessionObject::Session final
         auto now = *published_;
         now.isFinished = true;
         now.isCancelable = false;
+        now.currentItem.clear();
         now.progress = success ? engine::Fraction(1) : now.progress;
         published_.change(*this, now);
         emitCompleted(success, base::validUtf8(message));

@@ -99,7 +99,8 @@ engine::WearableStatus AttachedWearable::status() const {
             usage_ && attached.onCharger,
             usage.capacity,
             usage.available,
-            usage.songs};
+            usage.songs,
+            usage.songCount};
 }
 
 engine::Message AttachedWearable::problem() const {

@@ -156,6 +156,7 @@ Situation Engine::situation() const {
     }
     now.isStartRequested = isStartRequested_;
     now.givenUp = givenUp_;
+    now.leftOutCount = shortfall_.leftOutCount;
     now.now = ports_.turns.now();
     now.quietFrom = quietFrom_;
     return now;
@@ -163,6 +164,7 @@ Situation Engine::situation() const {
 
 /// Begins or ends a sync, where what is wished for asks for it.
 void Engine::consider() {
+    countShortfall();
     const auto now = situation();
     const auto decision = decide(now);
     const auto problem = isClaimToBeForgotten(now, decision) ? ports_.choices.forgetSent() : "";
@@ -255,6 +257,10 @@ void Engine::finish(const Outcome& outcome) {
     if (conclusion.isTriedAgain) {
         tryAgainLater();
     }
+    if (outcome.kind != Outcome::Kind::Stopped) {
+        tried_ = {selection, outcome.songProblems};
+        countedFor_.reset();
+    }
     conclude(conclusion.success, conclusion.message);
     ongoing_.reset();
     if (outcome.isLibraryStale) {
@@ -288,7 +294,9 @@ void Engine::putOff(const wearable::Selection& selection, const std::string& why
 
 void Engine::keepResult(const std::string& wearable, bool success, const engine::Message& message) {
     try {
-        ports_.results.remember(wearable, {success, message, ports_.turns.calendarTime()});
+        const auto now = ports_.turns.calendarTime();
+        const auto complete = success ? now : ports_.results.of(wearable).lastComplete;
+        ports_.results.remember(wearable, {success, message, now, complete});
     } catch (const std::system_error& error) {
         std::cerr << "quorl-syncd: What became of the sync is forgotten when the engine ends ("
                   << error.what() << ").\n";
@@ -303,6 +311,7 @@ void Engine::tellLastResult() {
     status_.lastCode = result.message.code;
     status_.lastArguments = result.message.arguments;
     status_.lastTime = result.time;
+    status_.lastComplete = result.lastComplete;
 }
 
 void Engine::tryAgainLater() {
@@ -332,22 +341,47 @@ void Engine::applyRateLimit() {
     ports_.syncs.setRateLimit(wearable_.identity().isEmbedded() ? status_.rateLimit : 0);
 }
 
-std::string Engine::playlistName() const {
+/// Nothing where none is wished for, or where the playlist is not there.
+std::optional<Order> Engine::wishedOrder() const {
     const auto choices = ports_.choices.read();
     const bool isWished = choices.isSyncEnabled && choices.playlist && inventory_;
     const auto* const playlist = isWished ? inventory_->playlist(*choices.playlist) : nullptr;
-    return playlist ? playlist->name : "";
+    if (!playlist) {
+        return std::nullopt;
+    }
+    return Order{inventory_,
+                 {playlist->id, playlist->revision, choices.limitType, choices.limit},
+                 wearable_.identity()};
+}
+
+/// Counting takes a while with a long playlist.
+void Engine::countShortfall() {
+    const auto order = wishedOrder();
+    const auto wished = order ? std::optional(order->selection) : std::nullopt;
+    if (wished == countedFor_ && inventory_ == countedIn_) {
+        return;
+    }
+    const auto isTried = order && order->selection == tried_.selection;
+    shortfall_ =
+        order ? shortfallOf(*order, isTried ? tried_.problems : SongProblems()) : Shortfall();
+    countedFor_ = wished;
+    countedIn_ = inventory_;
 }
 
 void Engine::publish() {
+    countShortfall();
     const auto now = situation();
     const auto status = statusOf(now, {status_.lastCode, status_.lastArguments});
     status_.status = sentence(status);
     status_.statusCode = status.code;
     status_.statusArguments = status.arguments;
     status_.syncState = syncStateOf(now);
-    status_.playlistName = playlistName();
+    const auto order = wishedOrder();
+    status_.playlistName = order ? order->playlist().name : "";
     status_.playlistID = now.choices.isSyncEnabled ? now.choices.playlist.value_or(0) : 0;
+    status_.leftOut = shortfall_.leftOut;
+    status_.leftOutCount = shortfall_.leftOutCount;
+    status_.beyondLimit = shortfall_.beyondLimit;
     status_.limitType = now.choices.limitType;
     status_.limit = now.choices.limit;
     ports_.announcer.stateDidChange();

@@ -5,12 +5,14 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "quorl-syncd/engine/AttachedWearable.h"
 #include "quorl-syncd/engine/EnginePorts.h"
 #include "quorl-syncd/engine/NotReady.h"
 #include "quorl-syncd/engine/Policy.h"
 #include "quorl-syncd/engine/RetryDelay.h"
+#include "quorl-syncd/engine/Shortfall.h"
 #include "services/engine/EngineState.h"
 
 namespace quorl::syncd {
@@ -94,7 +96,8 @@ class Engine {
     void wearableDidChange(AttachedWearable::Change change);
     void applyRateLimit();
     void tellLastResult();
-    [[nodiscard]] std::string playlistName() const;
+    [[nodiscard]] std::optional<Order> wishedOrder() const;
+    void countShortfall();
     void publish();
 
     const EnginePorts ports_;
@@ -108,6 +111,20 @@ class Engine {
     bool isLookDue_ = false;
     Clock::TimePoint quietFrom_;
     std::uint64_t sessions_ = 0;
+
+    using SongProblems = std::vector<engine::Message>;
+
+    /// What was last tried to the end, and which of its songs could not be sent.
+    struct Tried {
+        std::optional<wearable::Selection> selection;
+        SongProblems problems;
+    };
+
+    Tried tried_;
+    Shortfall shortfall_;
+    /// What it is the shortfall of.
+    std::optional<wearable::Selection> countedFor_;
+    std::shared_ptr<const media::Inventory> countedIn_;
 
     std::shared_ptr<const media::Inventory> inventory_;
     std::unique_ptr<WatchedMusic> music_;

@@ -31,16 +31,15 @@ engine::Message messageIn(const Json& json) {
 
 /// With the sentence, for earlier engines.
 void to_json(Json& json, const LastResult& result) {
-    json = {{"success", result.success},
-            {"message", sentence(result.message)},
-            {"code", result.message.code},
-            {"arguments", result.message.arguments},
-            {"time", result.time}};
+    json = {{"success", result.success},   {"message", sentence(result.message)},
+            {"code", result.message.code}, {"arguments", result.message.arguments},
+            {"time", result.time},         {"lastComplete", result.lastComplete}};
 }
 
 void from_json(const Json& json, LastResult& result) {
-    result = {json.at("success").get<bool>(), messageIn(json),
-              json.at("time").get<std::uint64_t>()};
+    const auto success = json.at("success").get<bool>();
+    const auto time = json.at("time").get<std::uint64_t>();
+    result = {success, messageIn(json), time, json.value("lastComplete", success ? time : 0)};
 }
 
 LastResults::LastResults(std::filesystem::path directory) : directory_(std::move(directory)) {

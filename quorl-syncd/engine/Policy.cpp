@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <array>
+#include <string>
 #include <string_view>
 #include <utility>
 
@@ -68,6 +69,11 @@ bool isDue(const Selection& wanted, const Situation& now) {
            (now.now >= now.quietFrom && now.givenUp != wanted && !isSent(wanted, now));
 }
 
+Message upToDate(std::uint64_t leftOut) {
+    return leftOut == 0 ? Message{code::upToDate}
+                        : Message{code::upToDateBut, {std::to_string(leftOut)}};
+}
+
 /// Another revision of the playlist has its turn afterwards.
 bool isRunning(Selection wanted, const Situation& now) {
     wanted.revision = now.running->selection.revision;
@@ -114,7 +120,7 @@ Message statusOf(const Situation& situation, const Message& last) {
     }
     const auto wanted = wantedIn(situation);
     if (isSent(wanted, situation)) {
-        return {code::upToDate};
+        return upToDate(situation.leftOutCount);
     }
     return situation.givenUp == wanted ? last : Message{code::aboutToSync};
 }

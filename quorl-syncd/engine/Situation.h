@@ -46,6 +46,8 @@ struct Situation {
     bool isStartRequested = false;
     /// Did not work, or was cancelled, and is not tried again for now.
     std::optional<wearable::Selection> givenUp;
+    /// Of the chosen playlist: what it names and cannot be sent.
+    std::uint64_t leftOutCount = 0;
 
     Clock::TimePoint now;
     /// From when on the preferences are thought to stay as they are: the app writes several for one

@@ -19,8 +19,8 @@ constexpr std::size_t largestPiece = 1 << 20;
 
 } // namespace
 
-Copier::Copier(const Means& means, const CopyProgress& progress)
-    : means_(means), progress_(progress), rule_(means.ports.clock.now()) {}
+Copier::Copier(const Means& means, CopyProgress progress)
+    : means_(means), progress_(std::move(progress)), rule_(means.ports.clock.now()) {}
 
 std::vector<engine::Message> Copier::copy(std::vector<Entry>& songs) {
     std::vector<engine::Message> problems;
@@ -28,6 +28,7 @@ std::vector<engine::Message> Copier::copy(std::vector<Entry>& songs) {
         if (!song.hash.empty()) {
             continue;
         }
+        progress_.song = song.source;
         try {
             copySong(song);
         } catch (const SongProblem& problem) {
@@ -40,6 +41,7 @@ std::vector<engine::Message> Copier::copy(std::vector<Entry>& songs) {
             commit();
         }
     }
+    progress_.song.clear();
     commit();
     std::erase_if(songs, [](const Entry& song) { return song.hash.empty(); });
     return problems;

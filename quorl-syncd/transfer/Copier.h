@@ -33,7 +33,7 @@ class Copier {
     };
 
     /// @param progress what there is to copy.
-    Copier(const Means& means, const CopyProgress& progress);
+    Copier(const Means& means, CopyProgress progress);
 
     /// Copies those of `songs` that have no hash, under the names that they have, and gives them
     /// their hashes; where a name turns out to be taken, under another one. Those that cannot be

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <string>
 
 namespace quorl::syncd {
 
@@ -10,6 +11,8 @@ struct CopyProgress {
     std::uint64_t totalSongs = 0;
     std::uint64_t bytes = 0;
     std::uint64_t totalBytes = 0;
+    /// That is being copied: its path in the music folder; empty for none.
+    std::string song = {};
 
     bool operator==(const CopyProgress&) const = default;
 };

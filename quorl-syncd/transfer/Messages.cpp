@@ -39,7 +39,12 @@ Message notEnoughSpace(std::uint64_t needed, std::uint64_t available) {
     return {code::notEnoughSpace, {std::to_string(needed), std::to_string(available)}};
 }
 
-Message synced(std::size_t songs) { return {code::synced, {std::to_string(songs)}}; }
+Message synced(std::size_t songs, std::size_t leftOut) {
+    if (leftOut == 0) {
+        return {code::synced, {std::to_string(songs)}};
+    }
+    return {code::syncedBut, {std::to_string(songs), std::to_string(leftOut)}};
+}
 
 Message notAllSent(const std::vector<Message>& problems) {
     Message message{code::songsLeftOut, flat(problems.front())};

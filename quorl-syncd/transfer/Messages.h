@@ -19,7 +19,8 @@ namespace quorl::syncd {
 /// Both in bytes.
 [[nodiscard]] engine::Message notEnoughSpace(std::uint64_t needed, std::uint64_t available);
 
-[[nodiscard]] engine::Message synced(std::size_t songs);
+/// @param leftOut how many songs could not be found or read.
+[[nodiscard]] engine::Message synced(std::size_t songs, std::size_t leftOut);
 
 /// @param problems one for each song that was not sent; at least one.
 [[nodiscard]] engine::Message notAllSent(const std::vector<engine::Message>& problems);

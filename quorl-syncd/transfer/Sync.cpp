@@ -272,7 +272,8 @@ void Sync::keepOnlyWhatIsWished(Device& device) {
 
 Outcome Sync::outcome() const {
     if (plan_.problems.empty()) {
-        return {Outcome::Kind::Sent, synced(plan_.songs.size()), false, false};
+        const auto leftOut = order_.library->leftOutOf(order_.playlist()).size();
+        return {Outcome::Kind::Sent, synced(plan_.songs.size(), leftOut), false, false};
     }
     // A song that can be read again, or stays as it is, tells nobody.
     return {Outcome::Kind::Failed, notAllSent(plan_.problems), true, true, plan_.problems};

@@ -13,6 +13,7 @@
 #include "runtime/services/SizeText.h"
 #include "services/base/Utf8.h"
 #include "services/engine/Client.h"
+#include "services/engine/Message.h"
 #include "services/preferences/SharedPreferences.h"
 
 namespace quorl {
@@ -88,23 +89,53 @@ Json jsonOf(const engine::EngineState& state, const Choice& choice) {
     const auto progress = progressOf(state);
     json["progress"] = progress ? Json(*progress) : Json();
     json["status"] = state.engine.status;
+    json["statusCode"] = state.engine.statusCode;
+    json["leftOut"] = state.engine.leftOutCount;
+    json["beyondLimit"] = state.engine.beyondLimit;
     json["lastSync"] = state.engine.lastTime == 0
                            ? Json()
                            : Json{{"success", state.engine.lastSuccess},
                                   {"message", state.engine.lastMessage},
+                                  {"code", state.engine.lastCode},
                                   {"microsecondsSince1970", state.engine.lastTime}};
+    json["lastComplete"] =
+        state.engine.lastComplete == 0 ? Json() : Json(state.engine.lastComplete);
     json["wearable"] = {{"name", state.wearable.name},
                         {"directory", state.wearable.directory},
                         {"connected", state.wearable.isConnected},
                         {"onCharger", state.wearable.isOnCharger},
                         {"capacityBytes", state.wearable.capacity},
                         {"availableBytes", state.wearable.available},
+                        {"songs", state.wearable.songCount},
                         {"songsBytes", state.wearable.songs}};
     return json;
 }
 
 std::string size(std::uint64_t bytes) {
     return sizeText(static_cast<double>(bytes), environmentLanguages().front());
+}
+
+/// Some other engine may have words that nobody here knows.
+std::string explanationOf(const std::string& code) {
+    const auto explanation = sentence(engine::Message{code});
+    return explanation.empty() ? code : explanation;
+}
+
+void printLeftOut(const engine::EngineStatus& engine) {
+    constexpr std::size_t mostShown = 3;
+    if (engine.leftOutCount == 0) {
+        return;
+    }
+    std::cout << "Left out:   " << engine.leftOutCount << '\n';
+    const auto shown = std::min(mostShown, engine.leftOut.size());
+    for (std::size_t index = 0; index < shown; ++index) {
+        const auto& entry = engine.leftOut[index].get<0>();
+        std::cout << "  " << base::printable(entry) << (entry.empty() ? "" : ": ")
+                  << base::printable(explanationOf(engine.leftOut[index].get<1>())) << '\n';
+    }
+    if (engine.leftOutCount > shown) {
+        std::cout << "  and " << engine.leftOutCount - shown << " more; see quorl --library\n";
+    }
 }
 
 void printText(const engine::EngineState& state, const Choice& choice) {
@@ -134,6 +165,7 @@ void printText(const engine::EngineState& state, const Choice& choice) {
               << (state.engine.lastTime == 0 ? "not yet"
                                              : base::printable(state.engine.lastMessage))
               << '\n';
+    printLeftOut(state.engine);
 }
 
 } // namespace

@@ -5,6 +5,24 @@
 
 namespace quorl::media {
 
+namespace {
+
+std::string_view parentOf(std::string_view path) {
+    const auto slash = path.rfind('/');
+    return slash == std::string_view::npos ? std::string_view() : path.substr(0, slash);
+}
+
+/// A directory has no songs, nor has a file whose songs are those of another one.
+bool isMissedIn(const Playlist& playlist, const LeftOut& leftOut) {
+    if (!playlist.folder) {
+        return leftOut.playlist == playlist.path;
+    }
+    return parentOf(leftOut.playlist) == playlist.path &&
+           leftOut.reason != Reason::DirectoryUnreadable && leftOut.reason != Reason::SameAsAnother;
+}
+
+} // namespace
+
 std::string Song::path() const {
     std::string path(directory);
     if (!path.empty()) {
@@ -39,6 +57,16 @@ std::uint64_t Inventory::bytesOf(const Playlist& playlist) const {
     return std::accumulate(
         playlist.songs.begin(), playlist.songs.end(), std::uint64_t{0},
         [this](std::uint64_t sum, SongIndex song) { return sum + songs[song].size; });
+}
+
+std::vector<const LeftOut*> Inventory::leftOutOf(const Playlist& playlist) const {
+    std::vector<const LeftOut*> found;
+    for (const auto& each : leftOut) {
+        if (isMissedIn(playlist, each)) {
+            found.push_back(&each);
+        }
+    }
+    return found;
 }
 
 std::string Inventory::unwatchedNotice() const {

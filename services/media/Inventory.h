@@ -119,6 +119,10 @@ struct Inventory {
     /// The sizes of its songs together, of one that is listed twice both times.
     [[nodiscard]] std::uint64_t bytesOf(const Playlist& playlist) const;
 
+    /// What `playlist` names and does not have, in the order of `leftOut`. They live as long as
+    /// this is there.
+    [[nodiscard]] std::vector<const LeftOut*> leftOutOf(const Playlist& playlist) const;
+
     /// What to tell a person about `unwatchedDirectories`, in English; empty where there are none.
     [[nodiscard]] std::string unwatchedNotice() const;
 

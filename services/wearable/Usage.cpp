@@ -50,25 +50,28 @@ std::uint64_t bytesBelow(const std::filesystem::path& root) {
 /// What of a manifest is on the device, by the sizes of its files.
 struct Stock {
     std::uint64_t songBytes = 0;
+    std::uint64_t songCount = 0;
     bool isComplete = true;
 };
 
 Stock stockOf(int root, const Manifest& manifest) {
     Stock stock;
-    const auto bytesOf = [root, &stock](const Entry& entry) -> std::uint64_t {
+    const auto look = [root, &stock](const Entry& entry) -> std::optional<std::uint64_t> {
         const auto path = std::string{musicDirectory} + "/" + entry.name;
         base::FileStatus status{};
         const bool isThere = fstatat(root, path.c_str(), &status, AT_SYMLINK_NOFOLLOW) == 0 &&
                              S_ISREG(status.st_mode);
-        const auto bytes = isThere ? base::stateOf(status).size : 0;
-        stock.isComplete = stock.isComplete && isThere && bytes == entry.size;
+        const auto bytes = isThere ? std::optional(base::stateOf(status).size) : std::nullopt;
+        stock.isComplete = stock.isComplete && bytes == entry.size;
         return bytes;
     };
     for (const auto& song : manifest.songs) {
-        stock.songBytes += bytesOf(song);
+        const auto bytes = look(song);
+        stock.songBytes += bytes.value_or(0);
+        stock.songCount += bytes ? 1 : 0;
     }
     if (manifest.playlist) {
-        static_cast<void>(bytesOf(*manifest.playlist));
+        static_cast<void>(look(*manifest.playlist));
     }
     return stock;
 }
@@ -100,7 +103,7 @@ Usage readUsage(const Wearable& wearable) {
         const auto manifest = loadManifest(root.get());
         const auto stock = stockOf(root.get(), manifest);
         return {wearable.capacity.value_or(spaceOf(root.get()).total),
-                availableBytes(wearable, root.get()), stock.songBytes,
+                availableBytes(wearable, root.get()), stock.songBytes, stock.songCount,
                 stock.isComplete ? manifest.sent : std::nullopt};
     } catch (const std::system_error& error) {
         throw std::runtime_error{"The " + std::string{wearableName} + " at " +

@@ -17,9 +17,11 @@ struct Usage {
     std::uint64_t available = 0;
     /// What the songs take that we have put there and that are still there.
     std::uint64_t songs = 0;
+    /// How many songs these are.
+    std::uint64_t songCount = 0;
     /// What was last sent to it in full; nothing where that is not known, or where a file of it is
     /// gone or has another size.
-    std::optional<Selection> sent;
+    std::optional<Selection> sent = {};
 
     bool operator==(const Usage&) const = default;
 };

@@ -258,7 +258,7 @@ class EngineInTurns : public ::testing::Test {
 
     /// The wearable has what was ordered last.
     void answerAsSent() {
-        wearables_.answer(wearable::Usage{100, 50, 50, syncs_.orders.back().selection});
+        wearables_.answer(wearable::Usage{100, 50, 50, 1, syncs_.orders.back().selection});
     }
 
     ManualTurns turns_;
@@ -286,10 +286,45 @@ TEST_F(EngineInTurns, BeginsOnceMusicAndWearableAreKnownAndRemembersWhatItHasSen
 
     EXPECT_EQ(choices_.choices.lastSent, (SentPlaylist{7, 3}));
     EXPECT_THAT(bus_.ends, ElementsAre("+ All sent."));
-    EXPECT_EQ(results_.of("/embedded"), (LastResult{true, engine::other("All sent."), 17}));
+    EXPECT_EQ(results_.of("/embedded"), (LastResult{true, engine::other("All sent."), 17, 17}));
     EXPECT_EQ(status(), upToDate);
     answerAsSent();
     EXPECT_EQ(syncs_.orders.size(), 1);
+}
+
+TEST_F(EngineInTurns, RemembersWhenAllWasLastSent) {
+    startSyncing();
+    syncs_.end(sent);
+    engine_->startNow();
+    syncs_.end(full);
+
+    EXPECT_EQ(results_.of("/embedded").lastComplete, 17);
+    EXPECT_EQ(engine_->status().lastComplete, 17);
+    EXPECT_FALSE(engine_->status().lastSuccess);
+}
+
+TEST_F(EngineInTurns, TellsWhatOfThePlaylistCannotBeSent) {
+    auto inventory = std::make_shared<media::Inventory>();
+    inventory->playlists.push_back({7, 3, "List", "List.m3u8", false, {}, {}});
+    inventory->leftOut = {{"List.m3u8", "gone.mp3", media::Reason::Missing}};
+    start();
+    music_.changed(inventory);
+    wearables_.answer(wearable::Usage{});
+    EXPECT_EQ(engine_->status().leftOutCount, 1);
+
+    syncs_.end({Outcome::Kind::Failed, {}, true, true, {{"song-changed", {"new.mp3"}}}});
+    EXPECT_THAT(engine_->status().leftOut,
+                ElementsAre(engine::LeftOutItem("new.mp3", "song-changed"),
+                            engine::LeftOutItem("gone.mp3", "missing")));
+    turns_.pass(60s);
+    syncs_.end(sent);
+
+    EXPECT_EQ(engine_->status().leftOutCount, 1) << "the other one was sent this time";
+    EXPECT_EQ(status(), "Everything that could be found is on the Velora. 1 song could not be "
+                        "found or read.");
+    choices_.choices.isSyncEnabled = false;
+    engine_->choicesDidChange();
+    EXPECT_EQ(engine_->status().leftOutCount, 0);
 }
 
 TEST_F(EngineInTurns, WaitsUntilTheChoicesStayAsTheyAre) {

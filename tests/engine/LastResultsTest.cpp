@@ -13,8 +13,8 @@ using namespace quorl::syncd;
 using namespace std::chrono_literals;
 using quorl::tests::TemporaryDirectory;
 
-const LastResult sent{true, {"synced", {"3"}}, 1'700'000'000'000'000};
-const LastResult full{false, {"wearable-full"}, 1'700'000'001'000'000};
+const LastResult sent{true, {"synced", {"3"}}, 1'700'000'000'000'000, 1'700'000'000'000'000};
+const LastResult full{false, {"wearable-full"}, 1'700'000'001'000'000, 5};
 
 class Results : public ::testing::Test {
   protected:
@@ -41,10 +41,12 @@ TEST_F(Results, OfEarlierAndOfLaterEnginesAreTheirSentences) {
     folder_.write("state/quorl/last-sync.json",
                   R"({"/one": {"success": false, "message": "It is full.", "time": 5},
                       "/two": {"success": false, "message": "It rains.", "code": "weather",
-                               "arguments": ["rain"], "time": 6}})");
+                               "arguments": ["rain"], "time": 6},
+                      "/three": {"success": true, "message": "All is there.", "time": 7}})");
     const LastResults results{place_};
-    EXPECT_EQ(results.of("/one"), (LastResult{false, quorl::engine::other("It is full."), 5}));
-    EXPECT_EQ(results.of("/two"), (LastResult{false, quorl::engine::other("It rains."), 6}));
+    EXPECT_EQ(results.of("/one"), (LastResult{false, quorl::engine::other("It is full."), 5, 0}));
+    EXPECT_EQ(results.of("/two"), (LastResult{false, quorl::engine::other("It rains."), 6, 0}));
+    EXPECT_EQ(results.of("/three").lastComplete, 7);
 }
 
 TEST_F(Results, AFileThatCannotBeReadIsReplacedByTheNextResult) {

@@ -58,7 +58,7 @@ struct Hanging {
         return [self] {
             self->entered.release();
             self->release.acquire();
-            return Usage{7, 6, 5, {}};
+            return Usage{7, 6, 5, 1, {}};
         };
     }
 };
@@ -74,7 +74,7 @@ TEST(UsageReader, AnswersOnAThreadThatIsNotTheCallers) {
 }
 
 TEST(UsageReader, AnswersQuestionAfterQuestion) {
-    UsageReader reader{[] { return Usage{7, 6, 5, {}}; }, forever};
+    UsageReader reader{[] { return Usage{7, 6, 5, 1, {}}; }, forever};
     for (int questions = 0; questions < 200; ++questions) {
         EXPECT_EQ(std::get<Usage>(Asked{reader}.answer()).songs, 5);
     }
@@ -82,7 +82,7 @@ TEST(UsageReader, AnswersQuestionAfterQuestion) {
 
 /// In a process of its own, of an ordinary user, for whom alone threads run out.
 [[noreturn]] void askWithoutThreads() {
-    UsageReader reader{[] { return Usage{7, 6, 5, {}}; }, forever};
+    UsageReader reader{[] { return Usage{7, 6, 5, 1, {}}; }, forever};
     constexpr uid_t nobody = 65534;
     const rlimit none{1, 1};
     if ((geteuid() == 0 && setresuid(nobody, nobody, nobody) != 0) ||
@@ -137,11 +137,11 @@ TEST(UsageReader, NeverAnswersWithAnEarlierLookAfterALaterOne) {
     const auto device = std::make_shared<Device>();
     UsageReader reader{[device] {
                            if (device->looks++ > 0) {
-                               return Usage{2, 2, 2, {}};
+                               return Usage{2, 2, 2, 1, {}};
                            }
                            device->isLookedAt.count_down();
                            device->release.acquire();
-                           return Usage{1, 1, 1, {}};
+                           return Usage{1, 1, 1, 1, {}};
                        },
                        forever};
     Asked first{reader};

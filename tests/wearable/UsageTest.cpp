@@ -71,6 +71,7 @@ class SentTo : public ::testing::Test {
 
 TEST_F(SentTo, CountsTheSongsThatWeHavePutThereAndSaysWhatWasSent) {
     EXPECT_EQ(usage().songs, 300);
+    EXPECT_EQ(usage().songCount, 2);
     EXPECT_EQ(usage().sent, sent_);
 }
 

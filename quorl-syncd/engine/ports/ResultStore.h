@@ -15,6 +15,8 @@ struct LastResult {
     engine::Message message;
     /// Microseconds since 1970; 0 before the first sync.
     std::uint64_t time = 0;
+    /// Of the last sync that was a success; 0 before the first.
+    std::uint64_t lastComplete = 0;
 
     bool operator==(const LastResult&) const = default;
 };

@@ -45,7 +45,8 @@ TEST(Messages, SayWhatIsWrongWithADeviceAndWhatToDo) {
 
 TEST(Messages, HaveNumbersForPrograms) {
     EXPECT_EQ(notEnoughSpace((1 << 20) + 1, 7), (Message{"not-enough-space", {"1048577", "7"}}));
-    EXPECT_EQ(synced(2), (Message{"synced", {"2"}}));
+    EXPECT_EQ(synced(2, 0), (Message{"synced", {"2"}}));
+    EXPECT_EQ(synced(2, 1), (Message{"synced-but", {"2", "1"}}));
 }
 
 TEST(Messages, TellTheFirstSongThatIsMissingAndHowManyThereAre) {
