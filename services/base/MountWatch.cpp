@@ -1,7 +1,6 @@
 #include "services/base/MountWatch.h"
 
 #include <sstream>
-#include <string_view>
 #include <system_error>
 #include <utility>
 
@@ -11,6 +10,7 @@
 
 #include "services/base/FileContents.h"
 #include "services/base/FileStatus.h"
+#include "services/base/MountTable.h"
 #include "services/base/Paths.h"
 
 namespace quorl::base {
@@ -25,22 +25,6 @@ std::string textOf(const FileDescriptor& table) {
     } catch (const std::system_error&) {
         return {};
     }
-}
-
-/// A field of the mount table, in which blanks and backslashes are written as three octal digits.
-std::string unescaped(std::string_view field) {
-    std::string text;
-    while (!field.empty()) {
-        if (field.front() == '\\' && field.size() >= 4) {
-            const int code = (field[1] - '0') * 64 + (field[2] - '0') * 8 + (field[3] - '0');
-            text += static_cast<char>(code);
-            field.remove_prefix(4);
-        } else {
-            text += field.front();
-            field.remove_prefix(1);
-        }
-    }
-    return text;
 }
 
 } // namespace
@@ -67,13 +51,9 @@ std::string MountWatch::describe() const {
     std::error_code error;
     std::string canonical = std::filesystem::canonical(root_, error).string();
     canonical = canonical == "/" ? "" : canonical;
-    std::istringstream table(textOf(table_));
-    for (std::string line; std::getline(table, line);) {
-        std::istringstream fields(line);
-        std::string id, parent, device, rootInDevice, mountPoint;
-        fields >> id >> parent >> device >> rootInDevice >> mountPoint;
-        if (isWithin(unescaped(mountPoint), canonical)) {
-            description << id << ' ' << device << ' ' << mountPoint << '\n';
+    for (const auto& mount : mountsIn(textOf(table_))) {
+        if (isWithin(mount.directory.native(), canonical)) {
+            description << mount.id << ' ' << mount.device << ' ' << mount.directory << '\n';
         }
     }
     return description.str();
