@@ -65,12 +65,13 @@ class SessionObject::Session final
     void copied(const CopyProgress& progress) {
         if (!published_->isProgressValid) {
             begun_ = Clock::now();
+            bytesAtBegin_ = progress.bytes;
         }
         const std::chrono::duration<double> elapsed = Clock::now() - begun_;
         auto now = *published_;
         now.isProgressValid = true;
         now.bytes = progress.totalBytes;
-        now.rate = static_cast<std::uint64_t>(static_cast<double>(progress.bytes) /
+        now.rate = static_cast<std::uint64_t>(static_cast<double>(progress.bytes - bytesAtBegin_) /
                                               std::max(elapsed.count(), 0.001));
         now.progress = fractionOf(progress);
         now.currentItem = progress.song;
@@ -112,6 +113,7 @@ class SessionObject::Session final
 
     const std::function<void()> cancel_;
     Clock::time_point begun_;
+    std::uint64_t bytesAtBegin_ = 0;
     Published<engine::SessionState> published_;
 };
 

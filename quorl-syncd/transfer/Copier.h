@@ -32,7 +32,7 @@ class Copier {
         const Told& told;
     };
 
-    /// @param progress what there is to copy.
+    /// @param progress how far it has come by what is there already.
     Copier(const Means& means, CopyProgress progress);
 
     /// Copies those of `songs` that have no hash, under the names that they have, and gives them

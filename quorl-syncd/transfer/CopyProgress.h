@@ -5,7 +5,7 @@
 
 namespace quorl::syncd {
 
-/// How far the copying has come. Songs and bytes that were already on the wearable are not counted.
+/// How far the whole choice has come, with what was on the wearable already.
 struct CopyProgress {
     std::uint64_t songs = 0;
     std::uint64_t totalSongs = 0;

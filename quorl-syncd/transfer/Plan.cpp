@@ -103,10 +103,7 @@ class Matching {
 
     void add(Entry song) {
         try {
-            if (!findCopy(song) && !findStray(song)) {
-                ++plan_.progress.totalSongs;
-                plan_.progress.totalBytes = sum(plan_.progress.totalBytes, song.size);
-            }
+            count(song, findCopy(song) || findStray(song));
             plan_.songs.push_back(std::move(song));
         } catch (const SongProblem& problem) {
             plan_.problems.push_back(problem.message());
@@ -125,6 +122,15 @@ class Matching {
     }
 
   private:
+    void count(const Entry& song, bool isThere) {
+        auto& progress = plan_.progress;
+        ++progress.totalSongs;
+        progress.totalBytes = sum(progress.totalBytes, song.size);
+        progress.songs += isThere ? 1 : 0;
+        auto& bytes = isThere ? progress.bytes : plan_.bytesToCopy;
+        bytes = sum(bytes, song.size);
+    }
+
     bool findCopy(Entry& song) const {
         const auto* const copy = findIn(
             songs_, song.source, [&](const Entry& each) { return isCopyOf(song, each, hashes_); });
@@ -240,7 +246,7 @@ Plan planOf(const Order& order, const wearable::Manifest& there,
 Room roomFor(const Plan& plan, std::uint64_t available) {
     // For the playlist and the list of our files, which are written before anything is removed.
     constexpr std::uint64_t beside = 16384;
-    const auto needed = plan.progress.totalBytes;
+    const auto needed = plan.bytesToCopy;
     const auto comfortable = sum(needed, sum(plan.playlist.size, beside));
     if (comfortable <= available || (plan.unwanted.empty() && needed <= available)) {
         return Room::Enough;

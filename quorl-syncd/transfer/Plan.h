@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <map>
 #include <optional>
@@ -59,8 +60,9 @@ struct Plan {
     wearable::Entry playlist;
     /// All names that are there, or are to be.
     TakenNames names;
-    /// What there is to copy; nothing of it is done.
+    /// Of all songs; those that are there already are done.
     CopyProgress progress;
+    std::uint64_t bytesToCopy = 0;
     /// One for each song that cannot be sent.
     std::vector<engine::Message> problems;
 };

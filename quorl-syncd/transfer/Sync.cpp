@@ -155,7 +155,7 @@ void Sync::requireRoom(Device& device) {
     const auto available = device.available() + bytesOf(leftovers_, plan_.useless);
     room_ = roomFor(plan_, available);
     if (room_ == Room::NotEnough) {
-        throw SyncProblem(notEnoughSpace(plan_.progress.totalBytes, available));
+        throw SyncProblem(notEnoughSpace(plan_.bytesToCopy, available));
     }
 }
 

@@ -27,7 +27,7 @@ namespace quorl::syncd {
 /// old ones are removed before.
 class Sync {
   public:
-    /// Called first when it is known what there is to copy, then after each piece. Must not throw.
+    /// Called first when it is known what is there already, then after each piece. Must not throw.
     using Told = Copier::Told;
 
     Sync(Order order, SyncPorts ports, std::stop_token stop, Told told);

@@ -20,7 +20,7 @@ struct TaskState {
     sdbus::ObjectPath session = {};
     std::string groupingKey = {};
     bool isRunning = false;
-    /// Songs to be copied; 0 as long as that is not known.
+    /// Songs of the choice; 0 as long as that is not known.
     std::uint64_t totalItemCount = 0;
     std::uint64_t completedItemCount = 0;
     Fraction progress = {};
@@ -41,9 +41,9 @@ struct SessionState {
     Fraction progress = {};
     /// False as long as it is not known how much there is to copy.
     bool isProgressValid = false;
-    /// To be copied; 0 as long as that is not known.
+    /// Of the choice, on the wearable or not; 0 as long as that is not known.
     std::uint64_t bytes = 0;
-    /// Bytes a second, on average; 0 as long as nothing was copied.
+    /// Bytes a second that this session has copied, on average; 0 as long as nothing was copied.
     std::uint64_t rate = 0;
     /// Microseconds since 1970.
     std::uint64_t startTime = 0;

@@ -145,7 +145,9 @@ TEST_F(Engine, BringsOnlyTheNewSongWhenThePlaylistIsEdited) {
     music_.write("4.mp3", "4");
     music_.list({"4.mp3", "1.mp3"});
 
-    EXPECT_EQ(nextOfAssets(Kind::TaskDidBegin).task.totalItemCount, 1);
+    const auto begun = nextOfAssets(Kind::TaskDidBegin).task;
+    EXPECT_EQ(begun.totalItemCount, 2);
+    EXPECT_EQ(begun.completedItemCount, 1);
     EXPECT_TRUE(sessionEnd().success);
     recorder_.awaitStatus(upToDate);
     EXPECT_EQ(onWearable().size(), 3) << "two songs and the playlist";

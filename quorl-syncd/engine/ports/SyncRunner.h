@@ -29,7 +29,7 @@ class SyncRunner {
 
     virtual ~SyncRunner() = default;
 
-    /// Begins a sync. `copied` is called in a later turn when it is known what there is to copy,
+    /// Begins a sync. `copied` is called in a later turn when it is known what is there already,
     /// then now and then, at the latest with each further song; `ended` is called once, as the
     /// last, and may destroy the running sync. Neither comes before this has returned. A sync that
     /// cannot be begun ends so, too.

@@ -90,6 +90,7 @@ TEST_F(Planning, CopiesEverythingToAnEmptyDevice) {
 
     EXPECT_THAT(namesOf(plan), ElementsAre("(one.mp3)", "(two.mp3)"));
     EXPECT_EQ(plan.progress, (CopyProgress{0, 2, 0, 30}));
+    EXPECT_EQ(plan.bytesToCopy, 30);
     EXPECT_EQ(plan.playlist.name, "List.m3u8");
     EXPECT_EQ(plan.playlist.hash, hashOf("#EXTM3U\n#PLAYLIST:List\none.mp3\ntwo.mp3\n"));
     EXPECT_THAT(asked_, IsEmpty());
@@ -104,7 +105,8 @@ TEST_F(Planning, KeepsWhatIsThereWithoutReadingIt) {
     const auto plan = this->plan();
 
     EXPECT_EQ(plan.songs, there_.songs);
-    EXPECT_EQ(plan.progress, CopyProgress());
+    EXPECT_EQ(plan.progress, (CopyProgress{1, 1, 10, 10}));
+    EXPECT_EQ(plan.bytesToCopy, 0);
     EXPECT_THAT(plan.unwanted, IsEmpty());
     EXPECT_EQ(plan.playlist.name, "List.m3u8");
     EXPECT_THAT(asked_, IsEmpty());
@@ -148,7 +150,8 @@ TEST_F(Planning, AdoptsACompleteCopyThatWasLeftBehindAndRemovesOthers) {
         << "names of what is removed are free";
     EXPECT_EQ(plan.adopted, (std::vector<Entry>{{"whole.mp3", "whole.mp3", 10, second, "1"}}));
     EXPECT_THAT(namesOf(plan.useless), ElementsAre("ruined.mp3", "older.mp3", "nobody's.mp3"));
-    EXPECT_EQ(plan.progress.totalSongs, 2);
+    EXPECT_EQ(plan.progress, (CopyProgress{1, 3, 10, 30}));
+    EXPECT_EQ(plan.bytesToCopy, 20);
 }
 
 TEST_F(Planning, FreesTheNameOfARemovedFileHoweverTheDeviceSpellsIt) {
@@ -249,6 +252,7 @@ TEST_F(Planning, NeverTakesTooMuchForALittle) {
     wish("two.mp3", 2, second, "2");
 
     EXPECT_EQ(plan().progress.totalBytes, largest);
+    EXPECT_EQ(plan().bytesToCopy, largest);
 }
 
 class Stocktaking : public Planning {

@@ -1,5 +1,7 @@
 // What is on the wearable after a sync.
 
+#include <optional>
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <sys/stat.h>
@@ -22,9 +24,11 @@ class SyncedWearable : public ::testing::Test {
     }
 
     Outcome syncAll() {
-        copiedSongs_ = 0;
-        return sync(wishFor(music_, player_),
-                    [this](const CopyProgress& progress) { copiedSongs_ = progress.songs; });
+        std::optional<std::uint64_t> before;
+        return sync(wishFor(music_, player_), [&](const CopyProgress& progress) {
+            before = before.value_or(progress.songs);
+            copiedSongs_ = progress.songs - *before;
+        });
     }
 
     Music music_;
@@ -263,6 +267,49 @@ TEST_F(SyncedWearable, IsToldOfItsProgressPieceByPieceAndNeverBackwardsOrTooMuch
     }
     EXPECT_EQ(steps.back().bytes, size + 3);
     EXPECT_EQ(steps.back().songs, 2);
+    EXPECT_EQ(steps.back().song, "");
+    EXPECT_EQ(steps[steps.size() - 2].song, "large.mp3");
+}
+
+TEST_F(SyncedWearable, GoesOnWithItsProgressWhereAnInterruptedSyncHasEnded) {
+    music_.write("large.mp3", std::string(3'000'000, 'x'));
+    music_.list({"Album/one.mp3", "Album/two.ogg", "large.mp3"});
+    std::stop_source stop;
+    const auto interrupted = sync(
+        wishFor(music_, player_),
+        [&](const CopyProgress& progress) {
+            if (progress.song == "large.mp3") {
+                stop.request_stop();
+            }
+        },
+        stop.get_token());
+    ASSERT_EQ(interrupted.kind, Kind::Stopped);
+    std::vector<CopyProgress> steps;
+
+    ASSERT_EQ(sync(wishFor(music_, player_), [&](const auto& step) { steps.push_back(step); }).kind,
+              Kind::Sent);
+
+    EXPECT_EQ(steps.front(), (CopyProgress{2, 3, 10, 3'000'010}));
+    EXPECT_EQ(steps.back(), (CopyProgress{3, 3, 3'000'010, 3'000'010}));
+}
+
+TEST_F(SyncedWearable, IsDoneFromTheBeginningWhereThereIsNothingToCopy) {
+    ASSERT_EQ(syncAll().kind, Kind::Sent);
+    std::vector<CopyProgress> steps;
+
+    ASSERT_EQ(sync(wishFor(music_, player_), [&](const auto& step) { steps.push_back(step); }).kind,
+              Kind::Sent);
+
+    EXPECT_EQ(steps.front(), (CopyProgress{2, 2, 10, 10}));
+}
+
+TEST_F(SyncedWearable, SaysWhatOfThePlaylistCouldNotBeFound) {
+    music_.list({"Album/one.mp3", "gone.mp3", "gone too.mp3"});
+
+    const auto outcome = syncAll();
+
+    EXPECT_EQ(outcome.kind, Kind::Sent);
+    EXPECT_EQ(outcome.message, (quorl::engine::Message{"synced-but", {"1", "2"}}));
 }
 
 } // namespace
