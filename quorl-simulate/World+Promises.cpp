@@ -220,7 +220,8 @@ std::string World::obstacle() {
     if (!attachment_.connected) {
         return "The wearable is not connected.";
     }
-    return attachment_.onCharger ? "" : "The wearable is not on its charger.";
+    // What was sent needs none any more.
+    return attachment_.onCharger || isSent() ? "" : "The wearable is not on its charger.";
 }
 
 /// Only when everybody has heard of everything.

@@ -82,6 +82,7 @@ void Engine::cancel() {
     if (ongoing_) {
         givenUp_ = ongoing_->order.selection;
         stop({code::cancelled});
+        publish();
     }
 }
 
@@ -152,7 +153,8 @@ Situation Engine::situation() const {
     now.wearableProblem = wearable_.problem();
     now.isWearableLookedFor = wearable_.isLookedFor();
     if (ongoing_) {
-        now.running = {ongoing_->order.selection, ongoing_->order.wearable, ongoing_->charger};
+        now.running = {ongoing_->order.selection, ongoing_->order.wearable, ongoing_->charger,
+                       ongoing_->whyStopped};
     }
     now.isStartRequested = isStartRequested_;
     now.givenUp = givenUp_;
@@ -250,6 +252,7 @@ void Engine::finish(const Outcome& outcome) {
     const auto conclusion = conclusionOf(outcome, problem, ongoing_->whyStopped);
     if (conclusion.success) {
         retry_.reset();
+        givenUp_.reset(); // it was cancelled too late
     }
     if (conclusion.isGivenUp) {
         givenUp_ = selection;

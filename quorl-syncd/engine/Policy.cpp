@@ -27,25 +27,8 @@ struct Obstacle {
 
 constexpr const char* problemOfWearable = nullptr;
 
-bool isChargerNeeded(const Situation& now) {
-    return now.running ? now.running->charger == Charger::Needed : !now.isStartRequested;
-}
-
 /// A sync that is under way finds out by itself whether its wearable is still there.
 bool isWaitingForAnswer(const Situation& now) { return now.running && now.isWearableLookedFor; }
-
-/// The first one that is there is told.
-constexpr std::array obstacles{
-    Obstacle{[](const Situation& now) { return !now.choices.isSyncEnabled; }, code::syncOff},
-    Obstacle{[](const Situation& now) { return !now.choices.playlist; }, code::noPlaylist},
-    Obstacle{[](const Situation& now) { return !now.isMusicRead; }, code::readingMusic},
-    Obstacle{[](const Situation& now) { return !now.revision; }, code::playlistGone},
-    Obstacle{[](const Situation& now) { return !now.usage && !isWaitingForAnswer(now); },
-             problemOfWearable},
-    Obstacle{[](const Situation& now) { return !now.attachment.connected; }, code::notConnected},
-    Obstacle{[](const Situation& now) { return !now.attachment.onCharger && isChargerNeeded(now); },
-             code::notOnCharger},
-};
 
 /// Where a playlist is chosen and in the music folder.
 Selection wantedIn(const Situation& now) {
@@ -57,6 +40,25 @@ bool isSent(const Selection& wanted, const Situation& now) {
     return (!now.usage || now.usage->sent == wanted) &&
            now.choices.lastSent == SentPlaylist{wanted.playlist, wanted.revision};
 }
+
+/// What was sent needs none any more.
+bool isChargerNeeded(const Situation& now) {
+    return now.running ? now.running->charger == Charger::Needed
+                       : !now.isStartRequested && !isSent(wantedIn(now), now);
+}
+
+/// The first one that is there is told; each may rely on those before it.
+constexpr std::array obstacles{
+    Obstacle{[](const Situation& now) { return !now.choices.isSyncEnabled; }, code::syncOff},
+    Obstacle{[](const Situation& now) { return !now.choices.playlist; }, code::noPlaylist},
+    Obstacle{[](const Situation& now) { return !now.isMusicRead; }, code::readingMusic},
+    Obstacle{[](const Situation& now) { return !now.revision; }, code::playlistGone},
+    Obstacle{[](const Situation& now) { return !now.usage && !isWaitingForAnswer(now); },
+             problemOfWearable},
+    Obstacle{[](const Situation& now) { return !now.attachment.connected; }, code::notConnected},
+    Obstacle{[](const Situation& now) { return !now.attachment.onCharger && isChargerNeeded(now); },
+             code::notOnCharger},
+};
 
 /// Where something was claimed and a wearable is there.
 bool hasClaimed(const Situation& now) {
@@ -78,6 +80,12 @@ Message upToDate(std::uint64_t leftOut) {
 bool isRunning(Selection wanted, const Situation& now) {
     wanted.revision = now.running->selection.revision;
     return now.running->selection == wanted && now.running->wearable == now.wearable;
+}
+
+/// A sync that is to end is under way until its device has answered.
+Message statusOf(const Situation::Running& running) {
+    return running.whyStopped ? Message{code::stopping, flat(*running.whyStopped)}
+                              : Message{code::syncing};
 }
 
 } // namespace
@@ -112,11 +120,11 @@ bool isClaimToBeForgotten(const Situation& situation, const Decision& decision) 
 }
 
 Message statusOf(const Situation& situation, const Message& last) {
+    if (situation.running) {
+        return statusOf(*situation.running);
+    }
     if (auto obstacle = obstacleIn(situation)) {
         return std::move(*obstacle);
-    }
-    if (situation.running) {
-        return {code::syncing};
     }
     const auto wanted = wantedIn(situation);
     if (isSent(wanted, situation)) {

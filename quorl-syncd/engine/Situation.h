@@ -22,6 +22,8 @@ struct Situation {
         wearable::Selection selection;
         wearable::Wearable wearable;
         Charger charger = Charger::Needed;
+        /// Nothing as long as nobody has asked it to end.
+        std::optional<engine::Message> whyStopped = {};
 
         bool operator==(const Running&) const = default;
     };

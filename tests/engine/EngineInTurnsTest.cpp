@@ -292,6 +292,31 @@ TEST_F(EngineInTurns, BeginsOnceMusicAndWearableAreKnownAndRemembersWhatItHasSen
     EXPECT_EQ(syncs_.orders.size(), 1);
 }
 
+TEST_F(EngineInTurns, SaysThatASyncIsBeingEnded) {
+    startSyncing();
+    engine_->cancel();
+    EXPECT_EQ(status(), "Ending the sync. The sync was cancelled.");
+    EXPECT_EQ(engine_->status().syncState, "syncing");
+
+    syncs_.end(stopped);
+
+    EXPECT_EQ(status(), "The sync was cancelled.");
+    EXPECT_EQ(engine_->status().syncState, "pending");
+}
+
+TEST_F(EngineInTurns, BringsAgainWhatIsLostAfterACancelThatCameTooLate) {
+    startSyncing();
+    engine_->cancel();
+    syncs_.end(sent);
+    answerAsSent();
+    EXPECT_EQ(status(), upToDate);
+
+    wearables_.notice(WearableNews::MayHaveChanged);
+    wearables_.answer(wearable::Usage{});
+
+    EXPECT_EQ(syncs_.orders.size(), 2);
+}
+
 TEST_F(EngineInTurns, RemembersWhenAllWasLastSent) {
     startSyncing();
     syncs_.end(sent);

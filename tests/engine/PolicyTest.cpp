@@ -84,6 +84,10 @@ void send(Situation& now) {
     now.choices.lastSent = SentPlaylist{7, 3};
 }
 
+void cancel(Situation& now) { now.running->whyStopped = Message{"cancelled"}; }
+
+void leaveOut(Situation& now) { now.leftOutCount = 3; }
+
 void giveUp(Situation& now) { now.givenUp = wanted; }
 
 void giveUpOlder(Situation& now) { now.givenUp = older; }
@@ -268,8 +272,51 @@ TEST(Status, TellsWhatIsDoneOrWhatIsWaitedFor) {
     EXPECT_EQ(statusWith({disconnect}), disconnected);
     EXPECT_EQ(statusWith({giveUp, disconnect}), disconnected);
     EXPECT_EQ(statusWith({run}), Message{"syncing"});
-    EXPECT_EQ(statusWith({run, disconnect}), disconnected) << "it is being stopped";
     EXPECT_EQ(statusWith({run, lookForWearable}), Message{"syncing"});
+    EXPECT_EQ(statusWith({run, cancel}), (Message{"stopping", {"cancelled"}}));
+    EXPECT_EQ(statusWith({runIgnoringCharger, takeOffCharger}), Message{"syncing"});
+    EXPECT_EQ(statusWith({send, takeOffCharger}), Message{"up-to-date"}) << "it waits for nothing";
+    EXPECT_EQ(statusWith({sendWithAnotherLimit, takeOffCharger}), notOnCharger);
+    EXPECT_EQ(statusWith({send, leaveOut}), (Message{"up-to-date-but", {"3"}}));
+}
+
+const std::vector<void (*)(Situation&)> everything{
+    switchOff,  chooseNothing,  read,    losePlaylist,       loseWearable, lookForWearable,
+    disconnect, takeOffCharger, run,     runIgnoringCharger, send,         giveUp,
+    request,    chooseJustNow,  leaveOut};
+
+/// The engine ends what is to end before it tells anything.
+void stopWhatIsToEnd(Situation& now) {
+    const auto decision = decide(now);
+    if (decision.kind == Kind::Stop) {
+        now.running->whyStopped = decision.message;
+    }
+}
+
+bool areOneStory(const Situation& now) {
+    const auto code = statusOf(now, {"last"}).code;
+    const auto state = syncStateOf(now);
+    const bool isBusy = code == "syncing" || code == "stopping";
+    const bool isUpToDate = code.starts_with("up-to-date");
+    const bool isToCome = code == "about-to-sync" || code == "last" || code == "not-on-charger";
+    return isBusy == now.running.has_value() && (state != "syncing" || isBusy) &&
+           (code != "syncing" || state == "syncing") && (!isUpToDate || state == "synced") &&
+           (state != "synced" || !isToCome) && (!isToCome || state == "pending") &&
+           (state != "pending" || !isUpToDate) && (now.choices.isSyncEnabled || state == "off");
+}
+
+TEST(Status, TellsTheSameStoryAsTheSyncStateWhateverHappens) {
+    for (unsigned chosen = 0; chosen < 1U << everything.size(); ++chosen) {
+        auto now = readyToBegin();
+        for (std::size_t at = everything.size(); at-- > 0;) { // what needs a wearable comes first
+            if ((chosen >> at & 1U) != 0) {
+                everything[at](now);
+            }
+        }
+        stopWhatIsToEnd(now);
+        ASSERT_TRUE(areOneStory(now))
+            << chosen << ": " << syncStateOf(now) << ", " << sentence(statusOf(now, {"last"}));
+    }
 }
 
 TEST(Conclusions, FollowFromHowASyncEndedAndWhetherThatCouldBeRemembered) {
