@@ -2,11 +2,14 @@
 
 #include <algorithm>
 #include <csignal>
+#include <fstream>
+#include <limits>
 #include <set>
 
 #include <sdbus-c++/sdbus-c++.h>
 #include <sys/file.h>
 #include <sys/mount.h>
+#include <sys/stat.h>
 
 #include "quorl-syncd/transfer/device/Device.h"
 #include "services/base/AtomicFile.h"
@@ -279,6 +282,57 @@ TEST_F(Engine, DoesNotBeginAgainByItselfAfterItWasCancelled) {
     EXPECT_TRUE(sessionEnd().success);
     recorder_.awaitStatus(upToDate);
     EXPECT_EQ(onWearable().size(), 4);
+}
+
+TEST_F(Engine, BringsSongsOfAnyTimeOnce) {
+    music_.write("before.mp3", "before 1970");
+    music_.write("smallest.mp3", "as early as it goes");
+    static_cast<void>(music_.setTime("before.mp3", -1));
+    static_cast<void>(music_.setTime("smallest.mp3", std::numeric_limits<std::time_t>::min()));
+    music_.list({"before.mp3", "smallest.mp3"});
+    start();
+    choose();
+    EXPECT_TRUE(sessionEnd().success);
+    EXPECT_EQ(onWearable().size(), 3);
+
+    EXPECT_EQ(recorder_.ask(&engine::Client::startNow), "");
+
+    EXPECT_EQ(nextOfAssets(Kind::TaskDidBegin).task.completedItemCount, 2) << "they are there";
+    EXPECT_TRUE(sessionEnd().success);
+}
+
+/// What is in the place of the list on the wearable.
+class StrangeManifest : public EngineTest {
+  protected:
+    StrangeManifest() {
+        listLargeSongs();
+        std::filesystem::create_directories(place_.parent_path());
+    }
+
+    /// Nothing is synced as long as it is there, and what people read says why.
+    void refuse(const std::string& why) {
+        start();
+        choose();
+        recorder_.awaitState(
+            [&](const auto& state) { return state.engine.status.find(why) != std::string::npos; });
+        EXPECT_EQ(recorder_.count(Kind::SessionWillBegin), 0);
+        std::filesystem::remove(place_);
+        EXPECT_EQ(recorder_.ask(&engine::Client::refreshWearable), "");
+        EXPECT_TRUE(sessionEnd().success);
+    }
+
+    const std::filesystem::path place_ = wearable_ / ".quorl/manifest.1";
+};
+
+TEST_F(StrangeManifest, ThatIsAPipeIsNotWaitedFor) {
+    ASSERT_EQ(mkfifo(place_.c_str(), 0600), 0);
+    refuse("it is not a regular file");
+}
+
+TEST_F(StrangeManifest, OfAGigabyteIsNotRead) {
+    std::ofstream file(place_);
+    std::filesystem::resize_file(place_, std::uintmax_t{1} << 30);
+    refuse("it is larger than 64 MiB");
 }
 
 TEST_F(Engine, MovesItsProgressWithinOneLargeSongAndNeverBackwards) {

@@ -1,6 +1,8 @@
 // Devices that do not answer, directories that cannot be used, and means that have run out.
 
 #include <algorithm>
+#include <filesystem>
+#include <fstream>
 #include <set>
 
 #include <sys/resource.h>
@@ -91,6 +93,32 @@ TEST_F(HangingDevice, IsNoMusicFolderToSwitchTo) {
     choose();
     EXPECT_TRUE(sessionEnd().success);
     EXPECT_EQ(recorder_.state().engine.musicFolder, folder);
+}
+
+TEST_F(HangingDevice, ThatHasTheMusicFolderCannotKeepASyncFromBeingCancelledWhileItIsPlanned) {
+    std::filesystem::copy(music_.path(), device_.path(),
+                          std::filesystem::copy_options::overwrite_existing);
+    engine_ = std::make_unique<Process>(
+        std::vector<std::string>{ENGINE_PROGRAM, "--music-folder", device_.path()});
+    recorder_.next(Kind::EngineDidAppear);
+    choose();
+    EXPECT_TRUE(sessionEnd().success);
+    recorder_.awaitStatus("Everything is up to date.");
+    EXPECT_EQ(recorder_.ask(&engine::Client::setOnCharger, false), "");
+    const auto song = std::filesystem::path(device_.path()) / "1.mp3";
+    const auto text = textOf(song);
+    std::ofstream(song) << text; // its contents have to be compared
+    recorder_.awaitStatus("The wearable is not on its charger.");
+    device_.stall();
+    EXPECT_EQ(recorder_.ask(&engine::Client::setOnCharger, true), "");
+    device_.awaitStalled();
+
+    EXPECT_EQ(recorder_.ask(&engine::Client::cancel), "");
+
+    recorder_.awaitStatus("Ending the sync. The sync was cancelled.");
+    device_.goOn();
+    EXPECT_EQ(sessionEnd().message, "The sync was cancelled.");
+    EXPECT_EQ(get(lastFullySentAssetSyncPlaylistVersion), std::nullopt);
 }
 
 TEST_F(HangingDevice, ThatHasTheMusicFolderIsLeftForAnotherOne) {
