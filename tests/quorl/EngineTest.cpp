@@ -189,6 +189,33 @@ TEST_F(WithEngine, statusIsPrintedForScripts) {
     EXPECT_EQ(json["lastSync"]["success"], true);
 }
 
+TEST_F(WithEngine, statusTellsWhatOfThePlaylistIsNotOnItsWay) {
+    music_.folder().write("Gaps.m3u8", "one.flac\ngone.mp3\nhttp://somewhere/radio\n");
+    {
+        QuorlProcess quorl(arguments("--text"));
+        quorl.say("1");
+        quorl.say("1");
+        quorl.readUntil("Gaps: Synced\n");
+        EXPECT_EQ(quorl.end(), 0);
+    }
+    QuorlProcess status({"--status"});
+    ASSERT_EQ(status.end(), 0);
+    EXPECT_THAT(status.output(),
+                HasSubstr("Left out:   2\n"
+                          "  gone.mp3: There is no such file. Put it back, or take it out of the "
+                          "playlist.\n"
+                          "  http://somewhere/radio: It is not on this machine. Download it into "
+                          "the music folder.\n"));
+    QuorlProcess asked({"--status", "--json"});
+    ASSERT_EQ(asked.end(), 0);
+    const auto json = nlohmann::json::parse(asked.output());
+    EXPECT_EQ(json["statusCode"], "up-to-date-but");
+    EXPECT_EQ(json["leftOut"], 2);
+    EXPECT_EQ(json["beyondLimit"], 0);
+    EXPECT_EQ(json["wearable"]["songs"], 1);
+    EXPECT_EQ(json["lastComplete"], json["lastSync"]["microsecondsSince1970"]);
+}
+
 TEST_F(WithEngine, titlesSteerNoTerminalWhenTheStatusIsPrinted) {
     music_.folder().write("Evil.m3u8",
                           "#PLAYLIST:Evil\x1b[2J\u009B1m\u202Ekcab\u2066in\u2028line\none.flac\n");
