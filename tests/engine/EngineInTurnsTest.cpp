@@ -337,7 +337,8 @@ TEST_F(EngineInTurns, TellsWhatOfThePlaylistCannotBeSent) {
     wearables_.answer(wearable::Usage{});
     EXPECT_EQ(engine_->status().leftOutCount, 1);
 
-    syncs_.end({Outcome::Kind::Failed, {}, true, true, {{"song-changed", {"new.mp3"}}}});
+    const Outcome left{Outcome::Kind::Failed, {}, true, true, {{"song-changed", {"new.mp3"}}}};
+    syncs_.end(left);
     EXPECT_THAT(engine_->status().leftOut,
                 ElementsAre(engine::LeftOutItem("new.mp3", "song-changed"),
                             engine::LeftOutItem("gone.mp3", "missing")));
@@ -422,7 +423,7 @@ TEST_F(EngineInTurns, ForgetsWhatWasSentBeforeASyncChangesIt) {
     readMusic(3);
     EXPECT_EQ(choices_.choices.lastSent, (SentPlaylist{7, 2})) << "nothing is known yet";
 
-    wearables_.answer(wearable::Usage{100, 50, 50, wearable::Selection{7, 2, 1, 250}});
+    wearables_.answer(wearable::Usage{100, 50, 50, 1, wearable::Selection{7, 2, 1, 250}});
 
     ASSERT_EQ(syncs_.orders.size(), 1);
     EXPECT_EQ(choices_.choices.lastSent, std::nullopt);
@@ -513,7 +514,7 @@ TEST_F(EngineInTurns, KnowsNothingOfAWearableThatMayBeAnother) {
     wearables_.notice(WearableNews::MayBeAnother);
     EXPECT_EQ(engine_->status().syncState, "unknown");
     before.front()(Sight{
-        wearables_.identity, wearable::Usage{100, 50, 50, syncs_.orders.back().selection}, {}});
+        wearables_.identity, wearable::Usage{100, 50, 50, 1, syncs_.orders.back().selection}, {}});
     EXPECT_EQ(engine_->status().syncState, "unknown") << "it was seen before";
     wearables_.answer(wearable::Usage{});
 

@@ -193,7 +193,7 @@ TEST_F(Planning, LeavesOutASongThatCannotBeRead) {
     const auto plan = this->plan();
 
     EXPECT_THAT(namesOf(plan), ElementsAre("(two.mp3)"));
-    EXPECT_THAT(plan.problems, ElementsAre(engine::Message{"song-gone", {"gone.mp3"}}));
+    EXPECT_THAT(plan.problems, ElementsAre(quorl::engine::Message{"song-gone", {"gone.mp3"}}));
     EXPECT_EQ(plan.progress, (CopyProgress{0, 1, 0, 20}));
     EXPECT_THAT(plan.unwanted, IsEmpty()) << "the old copy is better than none";
 }
