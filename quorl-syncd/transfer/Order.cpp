@@ -1,35 +1,14 @@
 #include "quorl-syncd/transfer/Order.h"
 
-#include <cstdint>
-#include <limits>
-
-#include "services/preferences/Preference.h"
+#include "services/preferences/Limit.h"
 
 namespace quorl::syncd {
 
-namespace {
-
-constexpr std::uint64_t unlimited = std::numeric_limits<std::uint64_t>::max();
-constexpr unsigned megabyteShift = 20;
-
-} // namespace
-
 std::vector<media::SongIndex> songsWithinLimit(const Order& order) {
-    namespace LimitType = preferences::LimitType;
-    const auto [type, amount] = std::pair{order.selection.limitType, order.selection.limit};
-    const auto mostBytes = type == LimitType::Megabytes ? amount << megabyteShift : unlimited;
-    const auto mostSongs = type == LimitType::Songs ? amount : unlimited;
-
-    std::vector<media::SongIndex> songs;
-    std::uint64_t bytes = 0;
-    for (const auto song : order.playlist().songs) {
-        bytes += order.library->songs[song].size;
-        if (bytes > mostBytes || songs.size() == mostSongs) {
-            break;
-        }
-        songs.push_back(song);
-    }
-    return songs;
+    const auto limit = preferences::limitOf(order.selection.limitType, order.selection.limit);
+    const auto& songs = order.playlist().songs;
+    const auto count = order.library->songsWithin(order.playlist(), limit.bytes, limit.songs);
+    return {songs.begin(), songs.begin() + static_cast<std::ptrdiff_t>(count)};
 }
 
 } // namespace quorl::syncd

@@ -23,6 +23,11 @@ class MusicLibrary final : public AnnouncingLibrary {
     /// Whether the folder has been read for the first time. Until then the library is empty.
     [[nodiscard]] bool isRead() const { return inventory_ != nullptr; }
 
+    /// What the folder held when it was last read; null before the first time.
+    [[nodiscard]] const std::shared_ptr<const media::Inventory>& inventory() const {
+        return inventory_;
+    }
+
     [[nodiscard]] bool hasMediaOfType(NSUInteger mask) const override;
     [[nodiscard]] NSArray<MPMediaPlaylist>
     playlistsMatching(const Predicates& predicates) const override;

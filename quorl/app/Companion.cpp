@@ -6,6 +6,13 @@
 
 namespace quorl {
 
+namespace {
+
+/// The plug-in's class that lists what `offeredIn` gives, in that order.
+constexpr std::string_view playlistChooser = "LMQuorlPlaylistChooser";
+
+} // namespace
+
 Companion::Companion(Places places, PaneScreen& screen, Notices& notices)
     : places_(std::move(places)),
       screen_(screen),
@@ -34,6 +41,14 @@ void Companion::makeFrontPage() {
     navigation_->setRootPane(frontPage_);
     (void)frontPage_->specifiers(); // builds the rows before the page is shown
     host_->setEngineObserver([this] { refreshTopPage(); });
+}
+
+std::optional<PlaylistFacts> Companion::factsOfRow(const UIViewController& pane, NSInteger paneRow,
+                                                   const std::string& name) const {
+    const bool offersPlaylists = Class::ofObject(pane).name() == playlistChooser;
+    return offersPlaylists && paneRow >= 0
+               ? host_->factsOfRow(static_cast<std::size_t>(paneRow), name)
+               : std::nullopt;
 }
 
 /// A page that is covered is refreshed when it comes back.

@@ -46,6 +46,11 @@ class Companion final : public QObject {
     /// threads.
     void start();
 
+    /// Of the playlist in a row of `pane`, which shows this name; nothing where the pane does not
+    /// offer playlists, or the row is none.
+    [[nodiscard]] std::optional<PlaylistFacts>
+    factsOfRow(const UIViewController& pane, NSInteger paneRow, const std::string& name) const;
+
     /// Whether the services have given what they were asked for when the panes came on the screen.
     [[nodiscard]] bool hasAllAnswers() const { return host_->hasAllAnswers(); }
 

@@ -2,6 +2,7 @@
 
 #include "quorl/app/EngineTrouble.h"
 #include "quorl/app/FolderTrouble.h"
+#include "quorl/app/OfferedPlaylists.h"
 #include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
@@ -97,6 +98,19 @@ void CompanionHost::chooseMusicFolder() {
 void CompanionHost::openLibrary(std::function<void()> taken) {
     libraryTaken_ = std::move(taken);
     readLibrary();
+}
+
+std::optional<PlaylistFacts> CompanionHost::factsOfRow(std::size_t row,
+                                                       const std::string& name) const {
+    const auto& inventory = library_->inventory();
+    const auto offered = inventory ? offeredIn(*inventory) : std::vector<const media::Playlist*>();
+    if (row >= offered.size() || offered[row]->name != name) {
+        return std::nullopt;
+    }
+    const auto limit =
+        preferences::limitOf(store_.value(SyncPreference::AssetSyncLimitType).value_or(0),
+                             store_.value(SyncPreference::AssetSyncLimit).value_or(0));
+    return factsOf(*inventory, *offered[row], limit);
 }
 
 void CompanionHost::readLibrary() {

@@ -7,6 +7,7 @@
 #include "quorl/adapters/WearableUsage.h"
 #include "quorl/app/Notices.h"
 #include "quorl/app/Places.h"
+#include "quorl/app/PlaylistFacts.h"
 #include "quorl/pages/PageServices.h"
 #include "runtime/host/Host.h"
 #include "runtime/host/Screen.h"
@@ -37,6 +38,11 @@ class CompanionHost final : public Host, public PageServices {
     /// Begins to read the music folder, and does so again when another one is chosen. `taken` is
     /// called after each reading.
     void openLibrary(std::function<void()> taken);
+
+    /// Of the playlist in this row of the playlist chooser; nothing where that row shows another
+    /// name, or is no playlist.
+    [[nodiscard]] std::optional<PlaylistFacts> factsOfRow(std::size_t row,
+                                                          const std::string& name) const;
 
     /// Whether the music folder has been read for the first time, the wearable has answered all
     /// that it was asked, and the sync engine has been heard of.

@@ -3,7 +3,7 @@
 #include <iostream>
 
 #include "quorl/commands/EngineWatch.h"
-#include "quorl/commands/OfferedPlaylists.h"
+#include "quorl/app/OfferedPlaylists.h"
 #include "services/media/MusicFolder.h"
 #include "services/preferences/ChosenPlaces.h"
 

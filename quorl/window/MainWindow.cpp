@@ -1,8 +1,11 @@
 #include "quorl/window/MainWindow.h"
 
+#include <QDesktopServices>
 #include <QFile>
 #include <QFileDialog>
+#include <QMenu>
 #include <QShortcut>
+#include <QUrl>
 #include <QVBoxLayout>
 
 #include "quorl/window/NoticeBar.h"
@@ -66,6 +69,29 @@ void MainWindow::askForFolder(const std::filesystem::path& start,
     connect(dialog, &QFileDialog::fileSelected, this,
             [chosen](const QString& folder) { chosen(QFile::encodeName(folder).toStdString()); });
     dialog->open();
+}
+
+/// What there is to know of a playlist, and the way to its file.
+void MainWindow::showContext(const RowsView& view, NSInteger row, QPoint onScreen) {
+    auto& content = view.content();
+    const auto name = content.cell(row)->textLabel().text().value_or("");
+    const auto facts = companion_.factsOfRow(content.pane(), content.paneRow(row), name);
+    if (!facts) {
+        return;
+    }
+    auto* menu = new QMenu(this);
+    menu->setAttribute(Qt::WA_DeleteOnClose);
+    menu->setAccessibleName(QString::fromStdString(name));
+    for (const auto& fact : {facts->contents, facts->fit}) {
+        if (!fact.empty()) {
+            menu->addAction(QString::fromStdString(fact))->setEnabled(false);
+        }
+    }
+    const auto folder = QFile::decodeName(facts->file.parent_path().c_str());
+    menu->addAction(QFile::decodeName(facts->file.filename().c_str()))->setEnabled(false);
+    connect(menu->addAction(tr("Open Its Folder")), &QAction::triggered, this,
+            [folder] { QDesktopServices::openUrl(QUrl::fromLocalFile(folder)); });
+    menu->popup(onScreen);
 }
 
 void MainWindow::escape() {
@@ -137,6 +163,8 @@ void MainWindow::takeViewsOfStack() {
     for (auto pane = kept.second; pane != stack.end(); ++pane) {
         auto* view = new RowsView(PaneContent::of(*pane, companion_.navigation()), screen_, pages_);
         view->setAccessibleName(titleOf(**pane));
+        connect(view, &RowsView::contextAsked, this,
+                [this, view](NSInteger row, QPoint place) { showContext(*view, row, place); });
         pages_->addWidget(view);
         views_.push_back(view);
     }

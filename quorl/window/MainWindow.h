@@ -32,6 +32,7 @@ class MainWindow final : public QWidget {
     void addShortcuts();
     void askForFolder(const std::filesystem::path& start,
                       const std::function<void(const std::filesystem::path&)>& chosen);
+    void showContext(const RowsView& view, NSInteger row, QPoint onScreen);
     void escape();
     void search();
     void draw();

@@ -69,6 +69,20 @@ std::vector<const LeftOut*> Inventory::leftOutOf(const Playlist& playlist) const
     return found;
 }
 
+std::size_t Inventory::songsWithin(const Playlist& playlist, std::uint64_t mostBytes,
+                                   std::uint64_t mostSongs) const {
+    std::size_t count = 0;
+    std::uint64_t bytes = 0;
+    for (const auto song : playlist.songs) {
+        bytes += songs[song].size;
+        if (bytes > mostBytes || count == mostSongs) {
+            break;
+        }
+        ++count;
+    }
+    return count;
+}
+
 std::string Inventory::unwatchedNotice() const {
     if (unwatchedDirectories == 0) {
         return {};

@@ -123,6 +123,11 @@ struct Inventory {
     /// this is there.
     [[nodiscard]] std::vector<const LeftOut*> leftOutOf(const Playlist& playlist) const;
 
+    /// How many of its songs there are from the top to the first one with which there would be more
+    /// than so many bytes or songs; later ones do not count. One that is listed twice counts twice.
+    [[nodiscard]] std::size_t songsWithin(const Playlist& playlist, std::uint64_t mostBytes,
+                                          std::uint64_t mostSongs) const;
+
     /// What to tell a person about `unwatchedDirectories`, in English; empty where there are none.
     [[nodiscard]] std::string unwatchedNotice() const;
 

@@ -35,6 +35,8 @@ class RowTouch final : public QObject {
 
     [[nodiscard]] bool isDown() const { return press_.has_value(); }
 
+    [[nodiscard]] Row pressedRow() const { return press_ ? Row(press_->row) : std::nullopt; }
+
     /// Shows a row as tapped, until its light fades or ends.
     void light(NSInteger row);
 

@@ -1,7 +1,9 @@
 #include <QApplication>
+#include <QContextMenuEvent>
 #include <QHelpEvent>
 #include <QKeyEvent>
 #include <QScrollBar>
+#include <QStyleHints>
 #include <QToolTip>
 
 #include "quorl/window/cells/CellArrangement.h"
@@ -59,10 +61,25 @@ void RowsView::takeTouch(const QTouchEvent& event) {
     } else if (event.type() == QEvent::TouchBegin) {
         touch_.hover(std::nullopt);
         pressAt(place);
+        longPress_.start(QGuiApplication::styleHints()->mousePressAndHoldInterval());
     } else if (event.type() == QEvent::TouchUpdate) {
         touch_.moveTo(place, rowAt(place));
     } else {
         releaseAt(place);
+    }
+}
+
+void RowsView::askContext(NSInteger row) {
+    const auto place = onViewport(layout_.rowRect(row)).center().toPoint();
+    Q_EMIT contextAsked(row, viewport()->mapToGlobal(place));
+}
+
+void RowsView::contextMenuEvent(QContextMenuEvent* event) {
+    const bool isByKey = event->reason() == QContextMenuEvent::Keyboard;
+    const auto row = isByKey ? currentRow() : rowAt(event->pos());
+    if (row && content_->isCurrent()) {
+        touch_.cancel();
+        askContext(*row);
     }
 }
 

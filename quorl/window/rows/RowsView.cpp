@@ -34,6 +34,13 @@ RowsView::RowsView(std::unique_ptr<PaneContent> content, WindowScreen& screen, Q
     setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     setVerticalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     viewport()->setMouseTracking(true);
+    longPress_.setSingleShot(true);
+    connect(&longPress_, &QTimer::timeout, this, [this] {
+        if (const auto row = touch_.pressedRow(); row && content_->isCurrent()) {
+            touch_.cancel();
+            askContext(*row);
+        }
+    });
     connect(&touch_, &RowTouch::changed, this, &RowsView::updateRow);
     connect(&momentum_, &Momentum::dragged, &touch_, &RowTouch::cancel);
     connect(&fades_, &RowFades::changed, this, &RowsView::updateRow);

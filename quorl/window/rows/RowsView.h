@@ -1,6 +1,7 @@
 #pragma once
 
 #include <QAbstractScrollArea>
+#include <QTimer>
 #include <map>
 #include <memory>
 
@@ -64,6 +65,10 @@ class RowsView final : public QAbstractScrollArea {
     [[nodiscard]] bool isSearched() const { return !search_->isHidden(); }
 
   Q_SIGNALS:
+    /// A person asks what there is to know of a row: by the right button, the menu key or a long
+    /// press there.
+    void contextAsked(NSInteger row, QPoint onScreen);
+
     /// Assistive technology is told this of a line on the screen.
     void told(int line, QAccessible::Event news);
 
@@ -78,6 +83,7 @@ class RowsView final : public QAbstractScrollArea {
     void mouseDoubleClickEvent(QMouseEvent* event) override;
     void mouseMoveEvent(QMouseEvent* event) override;
     void mouseReleaseEvent(QMouseEvent* event) override;
+    void contextMenuEvent(QContextMenuEvent* event) override;
     void keyPressEvent(QKeyEvent* event) override;
     void focusInEvent(QFocusEvent* event) override;
     void focusOutEvent(QFocusEvent* event) override;
@@ -115,6 +121,7 @@ class RowsView final : public QAbstractScrollArea {
     void pressAt(QPointF onViewport);
     void releaseAt(QPointF onViewport);
     void takeTouch(const QTouchEvent& event);
+    void askContext(NSInteger row);
     [[nodiscard]] NSInteger rowsOnPage() const;
     [[nodiscard]] std::optional<NSInteger> rowAt(QPointF onViewport) const;
     [[nodiscard]] QString toolTipAt(QPointF onViewport) const;
@@ -130,6 +137,7 @@ class RowsView final : public QAbstractScrollArea {
     RowPlaces places_;
     NSInteger currentRow_ = 0;
     RowTouch touch_;
+    QTimer longPress_;
     RowFades fades_;
     Momentum momentum_;
     RowFinder finder_;

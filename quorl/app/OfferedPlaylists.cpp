@@ -1,4 +1,4 @@
-#include "quorl/commands/OfferedPlaylists.h"
+#include "quorl/app/OfferedPlaylists.h"
 
 #include <algorithm>
 #include <iterator>
