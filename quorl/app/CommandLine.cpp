@@ -198,7 +198,7 @@ Options::Mode modeOf(const Options& options, const Flags& flags) {
 }
 
 void complete(Places& places) {
-    for (auto* place : {&places.music, &places.wearable}) {
+    for (auto* place : {&places.music, &places.wearable, &places.plugins}) {
         if (!place->empty()) {
             *place = absolute(*place).lexically_normal();
         }

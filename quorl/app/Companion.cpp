@@ -58,6 +58,17 @@ void Companion::refreshTopPage() {
     }
 }
 
+std::string Companion::take(const Places& places) {
+    if (!places.plugins.empty() && places.plugins != places_.plugins) {
+        return "quorl is running already, with other plug-ins. Close its window, then start it "
+               "again.";
+    }
+    if (places.purpose() == base::Purpose::Trial) {
+        host_->takePlaces(places);
+    }
+    return {};
+}
+
 void Companion::start() {
     navigation_->appear(false);
     if (frontPage_ && !navigation_->open(frontPage_->paneRow())) {

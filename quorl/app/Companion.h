@@ -41,6 +41,10 @@ class Companion final : public QObject {
         host_->setFolderChooser(std::move(ask));
     }
 
+    /// Takes what another start of the app brings: a trial goes on with its places. Gives back a
+    /// sentence for the person who started where that cannot be; empty where it is done.
+    [[nodiscard]] std::string take(const Places& places);
+
     /// Brings the Music pane on the screen, over the front page, and begins to read the music
     /// folder. Throws `std::system_error` where the process may open no more files or start no more
     /// threads.

@@ -33,10 +33,14 @@ CompanionHost::CompanionHost(const Places& places, Screen& screen, Notices& noti
       library_(std::make_shared<MusicLibrary>()),
       wearable_(wearableAt(places.wearable, purpose_)),
       engine_(purpose_, [this](const engine::Event& event) { engineDidChange(event); }) {
+    takePlaces(places);
+}
+
+void CompanionHost::takePlaces(const Places& places) {
     if (purpose_ == base::Purpose::Trial) {
         store_.choosePlaces(musicOf(places), places.wearable);
     }
-    wearable_.setWearable(wearableAt(store_.wearableDirectory(), purpose_));
+    placesDidChange();
 }
 
 void CompanionHost::startTrialEngine() {
@@ -47,7 +51,7 @@ void CompanionHost::startTrialEngine() {
     }
 }
 
-/// Another program has chosen another music folder or wearable.
+/// Another music folder or wearable was chosen, mostly by another program.
 void CompanionHost::placesDidChange() {
     wearable_.setWearable(wearableAt(store_.wearableDirectory(), purpose_));
     if (libraryTaken_) {

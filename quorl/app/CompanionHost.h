@@ -35,6 +35,9 @@ class CompanionHost final : public Host, public PageServices {
     /// Who can ask a person for a folder; without it nobody is asked.
     void setFolderChooser(AskForFolder ask);
 
+    /// Makes these the places of a trial, and follows what is chosen now.
+    void takePlaces(const Places& places);
+
     /// Begins to read the music folder, and does so again when another one is chosen. `taken` is
     /// called after each reading.
     void openLibrary(std::function<void()> taken);

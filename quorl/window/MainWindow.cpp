@@ -3,6 +3,7 @@
 #include <QDesktopServices>
 #include <QFile>
 #include <QFileDialog>
+#include <QGuiApplication>
 #include <QMenu>
 #include <QShortcut>
 #include <QUrl>
@@ -114,6 +115,17 @@ void MainWindow::resizeEvent(QResizeEvent* event) {
 }
 
 RowsView* MainWindow::topView() const { return views_.empty() ? nullptr : views_.back(); }
+
+void MainWindow::comeForward(const QByteArray& token) {
+    // The only way to hand a token to Qt.
+    if (!token.isEmpty() && QGuiApplication::platformName() == QStringLiteral("wayland")) {
+        qputenv("XDG_ACTIVATION_TOKEN", token);
+    }
+    setWindowState(windowState() & ~Qt::WindowMinimized);
+    show();
+    raise();
+    activateWindow();
+}
 
 void MainWindow::goBack() {
     companion_.navigation().pop(true);

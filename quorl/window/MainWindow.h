@@ -22,6 +22,10 @@ class MainWindow final : public QWidget {
     /// The view of the top pane; null where the plug-in has a problem.
     [[nodiscard]] RowsView* topView() const;
 
+    /// Comes to the front of all windows, as far as the desktop lets it. `token` is what the
+    /// desktop gave for that; empty for nothing.
+    void comeForward(const QByteArray& token);
+
     /// Leaves the top pane; the root pane stays.
     void goBack();
 

@@ -9,17 +9,19 @@ namespace {
 
 constexpr int patience = 60'000; // milliseconds
 
-QString schemaOf(const QString& key) {
-    return key == QStringLiteral("music-folder") || key == QStringLiteral("wearable-directory")
-               ? QStringLiteral("org.quorl.Velora.Places")
-               : QStringLiteral("org.quorl.Velora.AssetSync");
+QString schemaOf(const QString& key, base::Purpose purpose) {
+    const bool isPlace =
+        key == QStringLiteral("music-folder") || key == QStringLiteral("wearable-directory");
+    return (purpose == base::Purpose::Trial ? QStringLiteral("org.quorl.Velora.Trial.")
+                                            : QStringLiteral("org.quorl.Velora.")) +
+           (isPlace ? QStringLiteral("Places") : QStringLiteral("AssetSync"));
 }
 
-std::string gsettings(const char* command, const QStringList& arguments) {
+std::string gsettings(const char* command, base::Purpose purpose, const QStringList& arguments) {
     QProcess process;
     process.start(QStringLiteral("gsettings"),
                   QStringList{QStringLiteral("--schemadir"), QStringLiteral(SCHEMA_DIRECTORY),
-                              QString::fromLatin1(command), schemaOf(arguments.front())} +
+                              QString::fromLatin1(command), schemaOf(arguments.front(), purpose)} +
                       arguments);
     if (!process.waitForFinished(patience) || process.exitCode() != 0) {
         throw std::runtime_error("gsettings: " + process.readAllStandardError().toStdString());
@@ -29,12 +31,13 @@ std::string gsettings(const char* command, const QStringList& arguments) {
 
 } // namespace
 
-std::string storedPreference(const std::string& key) {
-    return gsettings("get", {QString::fromStdString(key)});
+std::string storedPreference(const std::string& key, base::Purpose purpose) {
+    return gsettings("get", purpose, {QString::fromStdString(key)});
 }
 
 void storePreference(const std::string& key, const std::string& value) {
-    gsettings("set", {QString::fromStdString(key), QString::fromStdString(value)});
+    gsettings("set", base::Purpose::Use,
+              {QString::fromStdString(key), QString::fromStdString(value)});
 }
 
 } // namespace quorl::tests
