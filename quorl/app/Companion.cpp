@@ -11,6 +11,21 @@ namespace {
 /// The plug-in's class that lists what `offeredIn` gives, in that order.
 constexpr std::string_view playlistChooser = "LMQuorlPlaylistChooser";
 
+/// Null where `pane` has no such row.
+std::shared_ptr<PSSpecifier> rowThatOpens(const std::string& name, UIViewController* pane) {
+    auto* list = dynamic_cast<PSListController*>(pane);
+    if (!list) {
+        return nullptr;
+    }
+    for (const auto& row : elements<PSSpecifier>(list->specifiers())) {
+        const auto& detail = row->detailControllerClass();
+        if (detail && detail->name() == name) {
+            return row;
+        }
+    }
+    return nullptr;
+}
+
 } // namespace
 
 Companion::Companion(Places places, PaneScreen& screen, Notices& notices)
@@ -77,6 +92,28 @@ void Companion::start() {
     }
     screen_.scheduleDrawing();
     host_->openLibrary([this] { Q_EMIT libraryRead(); });
+}
+
+std::vector<std::string> Companion::openPanes() const {
+    std::vector<std::string> panes;
+    const auto& stack = navigation_->stack();
+    for (std::size_t at = 1; at < stack.size(); ++at) {
+        panes.push_back(Class::ofObject(*stack[at]).name());
+    }
+    return panes;
+}
+
+void Companion::reopen(const std::vector<std::string>& panes) {
+    while (navigation_->stack().size() > 1) {
+        navigation_->pop(false);
+    }
+    for (const std::string& pane : panes) {
+        const auto row = rowThatOpens(pane, navigation_->top().get());
+        if (!row || !navigation_->open(row)) {
+            break;
+        }
+    }
+    screen_.scheduleDrawing();
 }
 
 void Companion::enterBackground() {

@@ -55,6 +55,13 @@ class Companion final : public QObject {
     [[nodiscard]] std::optional<PlaylistFacts>
     factsOfRow(const UIViewController& pane, NSInteger paneRow, const std::string& name) const;
 
+    /// The classes of the panes that are open over the front page, from below.
+    [[nodiscard]] std::vector<std::string> openPanes() const;
+
+    /// Leaves the panes over the front page for those of these classes, as far as there are rows
+    /// that open them. After `start`.
+    void reopen(const std::vector<std::string>& panes);
+
     /// Whether the services have given what they were asked for when the panes came on the screen.
     [[nodiscard]] bool hasAllAnswers() const { return host_->hasAllAnswers(); }
 

@@ -1,25 +1,29 @@
 #include "quorl/window/WindowMode.h"
 
 #include <QApplication>
+#include <QScreen>
 #include <iostream>
 
 #include "quorl/app/QtSetup.h"
 #include "quorl/window/MainWindow.h"
 #include "quorl/window/desktop/OneApp.h"
+#include "quorl/window/desktop/WindowMemory.h"
 
 namespace quorl {
 
 namespace {
 
-constexpr QSize usualSize(400, 720);
+/// An empty text says nothing.
+void tell(const QString& problem) {
+    if (!problem.isEmpty()) {
+        std::cerr << "quorl: " << problem.toStdString() << '\n';
+    }
+}
 
 /// What another app that has taken the start over, or has not, makes of this one.
 ExitCode endWith(const QString& problem) {
-    if (problem.isEmpty()) {
-        return ExitCode::Success;
-    }
-    std::cerr << "quorl: " << problem.toStdString() << '\n';
-    return ExitCode::Failure;
+    tell(problem);
+    return problem.isEmpty() ? ExitCode::Success : ExitCode::Failure;
 }
 
 } // namespace
@@ -42,15 +46,21 @@ ExitCode runInWindow(char* program, const Places& places) {
     Notices notices;
     Companion companion(places, screen, notices);
     MainWindow window(companion, screen);
-    window.resize(usualSize);
+    const WindowMemory memory = WindowMemory::of(places.purpose());
+    window.resize(memory.size(window.screen()->availableSize()));
     app.setTake([&](const Start& other) {
         window.comeForward(other.token);
         return QString::fromStdString(companion.take(other.places));
     });
     companion.startTrialEngine();
     companion.start();
+    if (const auto panes = memory.panes()) {
+        companion.reopen(*panes);
+    }
     window.show();
-    return static_cast<ExitCode>(QApplication::exec());
+    const auto code = static_cast<ExitCode>(QApplication::exec());
+    tell(memory.keep({window.normalGeometry().size(), companion.openPanes()}));
+    return code;
 }
 
 } // namespace quorl
