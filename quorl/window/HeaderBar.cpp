@@ -30,12 +30,20 @@ void drawLens(QPainter& painter, const QSizeF& size, bool /*isMirrored*/) {
                      QPointF(size.width(), size.height()) - QPointF(2, 2));
 }
 
+void drawDots(QPainter& painter, const QSizeF& size, bool /*isMirrored*/) {
+    painter.setBrush(painter.pen().color());
+    for (const double place : {0.15, 0.5, 0.85}) {
+        painter.drawEllipse(QPointF(size.width() / 2, size.height() * place), 0.8, 0.8);
+    }
+}
+
 } // namespace
 
 HeaderBar::HeaderBar(WindowScreen& screen, QWidget* parent)
     : QWidget(parent),
       back_(new FlatButton(screen, drawChevron, this)),
       search_(new FlatButton(screen, drawLens, this)),
+      menu_(new FlatButton(screen, drawDots, this)),
       label_(new QLabel(this)) {
     back_->setObjectName(QStringLiteral("back"));
     back_->setToolButtonStyle(Qt::ToolButtonTextBesideIcon);
@@ -44,6 +52,11 @@ HeaderBar::HeaderBar(WindowScreen& screen, QWidget* parent)
     search_->setIconSize(lensSize);
     search_->setAccessibleName(tr("Search"));
     search_->setToolTip(tr("Search"));
+    menu_->setObjectName(QStringLiteral("menu"));
+    menu_->setIconSize(lensSize);
+    menu_->setAccessibleName(tr("Menu"));
+    menu_->setToolTip(tr("Menu"));
+    menu_->setPopupMode(QToolButton::InstantPopup);
     label_->setAlignment(Qt::AlignCenter);
     label_->setTextFormat(Qt::PlainText);
     connect(back_, &QToolButton::clicked, this, &HeaderBar::backClicked);
@@ -55,6 +68,7 @@ void HeaderBar::setTitles(const QString& title, const QString& below, Search sea
     below_ = below;
     back_->setVisible(!below.isEmpty());
     search_->setVisible(search == Search::Offered);
+    menu_->setVisible(below.isEmpty());
     if (const auto name = tr("Back to %1").arg(below); name != back_->accessibleName()) {
         back_->setAccessibleName(name);
         back_->setToolTip(name);
@@ -89,11 +103,23 @@ int HeaderBar::backWidth(const QString& text) const {
 /// for that.
 QRect HeaderBar::roomForTitle(int backWidth) const {
     const int start = backWidth > 0 ? backWidth + 2 * gap : margin;
-    const int end = search_->isHidden() ? margin : FlatButton::smallestSide + 2 * gap;
+    const int buttons = static_cast<int>(buttonsAtEnd().size());
+    const int end = buttons == 0 ? margin : buttons * FlatButton::smallestSide + 2 * gap;
     const int side = std::max(start, end);
     const QRect middle = rect().adjusted(side, 0, -side, 0);
     const bool fits = label_->fontMetrics().horizontalAdvance(title_) <= middle.width();
     return fits ? middle : rect().adjusted(start, 0, -end, 0);
+}
+
+/// From the edge inwards.
+std::vector<QWidget*> HeaderBar::buttonsAtEnd() const {
+    std::vector<QWidget*> buttons;
+    for (QWidget* button : {menu_, search_}) {
+        if (!button->isHidden()) {
+            buttons.push_back(button);
+        }
+    }
+    return buttons;
 }
 
 /// The name of the pane below gives way to the title: the chevron alone says enough.
@@ -125,7 +151,11 @@ void HeaderBar::fitTexts() {
     const int side = FlatButton::smallestSide;
     const int top = (height() - side) / 2;
     place(*back_, {gap, top, backWidth(text), side});
-    place(*search_, {width() - gap - side, top, side, side});
+    int end = width() - gap;
+    for (QWidget* button : buttonsAtEnd()) {
+        end -= side;
+        place(*button, {end, top, side, side});
+    }
     const QRect room = roomForTitle(backWidth(text));
     label_->setText(label_->fontMetrics().elidedText(title_, Qt::ElideRight, room.width()));
     label_->setToolTip(label_->text() == title_ ? QString() : title_);

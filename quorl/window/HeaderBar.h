@@ -7,8 +7,8 @@
 
 namespace quorl {
 
-/// The bar above a pane: its title, a button back to the pane below, and one that finds rows. Main
-/// thread.
+/// The bar above a pane: its title, a button back to the pane below, and one that finds rows. Over
+/// the lowest pane there is room for the app's menu. Main thread.
 class HeaderBar final : public QWidget {
     Q_OBJECT
 
@@ -18,6 +18,9 @@ class HeaderBar final : public QWidget {
 
     /// `screen` outlives the bar.
     HeaderBar(WindowScreen& screen, QWidget* parent);
+
+    /// What the button of the menu opens.
+    void setMenu(QMenu* menu) { menu_->setMenu(menu); }
 
     /// `below` names the pane that the button goes back to; empty for no button.
     void setTitles(const QString& title, const QString& below, Search search);
@@ -35,12 +38,14 @@ class HeaderBar final : public QWidget {
     [[nodiscard]] int backWidth(const QString& text) const;
     [[nodiscard]] QString fittingBackText() const;
     [[nodiscard]] QRect roomForTitle(int backWidth) const;
+    [[nodiscard]] std::vector<QWidget*> buttonsAtEnd() const;
     void place(QWidget& widget, const QRect& leftToRight) const;
 
     QString title_;
     QString below_;
     FlatButton* back_;
     FlatButton* search_;
+    FlatButton* menu_;
     QLabel* label_;
 };
 

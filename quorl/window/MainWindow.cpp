@@ -1,16 +1,20 @@
 #include "quorl/window/MainWindow.h"
 
+#include <QApplication>
 #include <QDesktopServices>
 #include <QFile>
 #include <QFileDialog>
 #include <QGuiApplication>
 #include <QMenu>
+#include <QMouseEvent>
 #include <QShortcut>
 #include <QUrl>
 #include <QVBoxLayout>
 
 #include "quorl/window/NoticeBar.h"
 #include "quorl/window/ProblemPage.h"
+#include "quorl/window/desktop/AboutWindow.h"
+#include "quorl/window/desktop/Guide.h"
 
 namespace quorl {
 
@@ -39,6 +43,7 @@ MainWindow::MainWindow(Companion& companion, WindowScreen& screen)
     addShortcuts();
     companion.setFolderChooser(
         [this](const auto& start, const auto& chosen) { askForFolder(start, chosen); });
+    addMenu();
     connect(&screen, &PaneScreen::drawing, this, &MainWindow::draw);
     if (!companion.problem().empty()) {
         pages_->addWidget(new ProblemPage(QString::fromStdString(companion.problem()), pages_));
@@ -57,7 +62,47 @@ void MainWindow::addShortcuts() {
     add(Qt::Key_Escape, &MainWindow::escape);
     add(Qt::Key_Back, &MainWindow::escape);
     add(Qt::ALT | Qt::Key_Left, &MainWindow::goBack);
+    add(Qt::Key_Backspace, &MainWindow::goBack);
     add(QKeySequence::Find, &MainWindow::search);
+    add(Qt::Key_F1, &MainWindow::showGuide);
+    add(Qt::CTRL | Qt::Key_Q, &MainWindow::closeWindow);
+    add(Qt::CTRL | Qt::Key_W, &MainWindow::closeWindow);
+    QCoreApplication::instance()->installEventFilter(this); // the button of a mouse that goes back
+}
+
+void MainWindow::addMenu() {
+    auto* menu = new QMenu(this);
+    menu->addAction(tr("Help"), this, &MainWindow::showGuide);
+    menu->addAction(tr("About Velora"), this, &MainWindow::showAbout);
+    menu->addAction(tr("Close"), this, &MainWindow::closeWindow);
+    header_->setMenu(menu);
+}
+
+bool MainWindow::eventFilter(QObject* watched, QEvent* event) {
+    const bool isPress =
+        event->type() == QEvent::MouseButtonPress || event->type() == QEvent::MouseButtonDblClick;
+    const auto* widget = isPress ? qobject_cast<QWidget*>(watched) : nullptr;
+    if (!widget || widget->window() != this ||
+        static_cast<QMouseEvent*>(event)->button() != Qt::BackButton) {
+        return QWidget::eventFilter(watched, event);
+    }
+    goBack();
+    return true;
+}
+
+void MainWindow::showGuide() {
+    if (!openGuide()) {
+        showAbout();
+    }
+}
+
+void MainWindow::showAbout() {
+    auto* about = findChild<AboutWindow*>();
+    if (!about) {
+        about = new AboutWindow(this);
+    }
+    about->show();
+    about->activateWindow();
 }
 
 /// Does not wait for the answer.

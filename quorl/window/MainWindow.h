@@ -29,6 +29,8 @@ class MainWindow final : public QWidget {
     /// Leaves the top pane; the root pane stays.
     void goBack();
 
+    bool eventFilter(QObject* watched, QEvent* event) override;
+
   protected:
     void resizeEvent(QResizeEvent* event) override;
 
@@ -37,6 +39,12 @@ class MainWindow final : public QWidget {
     void askForFolder(const std::filesystem::path& start,
                       const std::function<void(const std::filesystem::path&)>& chosen);
     void showContext(const RowsView& view, NSInteger row, QPoint onScreen);
+    void addMenu();
+    void showGuide();
+    void showAbout();
+
+    void closeWindow() { close(); }
+
     void escape();
     void search();
     void draw();
