@@ -159,6 +159,15 @@ void MainWindow::resizeEvent(QResizeEvent* event) {
     screen_.scheduleDrawing(); // the title depends on whether all rows are seen
 }
 
+void MainWindow::changeEvent(QEvent* event) {
+    QWidget::changeEvent(event);
+    if (event->type() == QEvent::ApplicationFontChange) {
+        screen_.setFont(QApplication::font());
+        setFont(screen_.font());
+        screen_.scheduleDrawing();
+    }
+}
+
 RowsView* MainWindow::topView() const { return views_.empty() ? nullptr : views_.back(); }
 
 void MainWindow::comeForward(const QByteArray& token) {

@@ -6,6 +6,7 @@
 
 #include "quorl/app/QtSetup.h"
 #include "quorl/window/MainWindow.h"
+#include "quorl/window/desktop/DesktopLook.h"
 #include "quorl/window/desktop/OneApp.h"
 #include "quorl/window/desktop/WindowMemory.h"
 
@@ -43,6 +44,7 @@ ExitCode runInWindow(char* program, const Places& places) {
         return endWith(*problem);
     }
     WindowScreen screen;
+    const DesktopLook look(QDBusConnection::sessionBus(), screen);
     Notices notices;
     Companion companion(places, screen, notices);
     MainWindow window(companion, screen);
