@@ -3,11 +3,13 @@
 #include <QGuiApplication>
 #include <QLocale>
 
+#include "quorl/app/QtMessages.h"
 #include "runtime/plugins/StringTable.h"
 
 namespace quorl {
 
 QtSetup::QtSetup(char* program) : arguments_{program, nullptr} {
+    takeQtMessages();
     QCoreApplication::setApplicationName(QStringLiteral("quorl"));
     QCoreApplication::setApplicationVersion(QStringLiteral(QUORL_VERSION));
     QGuiApplication::setDesktopFileName(QStringLiteral("org.quorl.Velora"));

@@ -1,6 +1,7 @@
 #include "quorl/window/WindowMode.h"
 
 #include <QApplication>
+#include <QIcon>
 #include <QScreen>
 #include <iostream>
 
@@ -27,22 +28,8 @@ ExitCode endWith(const QString& problem) {
     return problem.isEmpty() ? ExitCode::Success : ExitCode::Failure;
 }
 
-} // namespace
-
-ExitCode runInWindow(char* program, const Places& places) {
-    if (!QtSetup::hasDisplay()) {
-        std::cerr << "quorl: There is no display here. Start quorl in a graphical session, or with "
-                     "--text.\n";
-        return ExitCode::Failure;
-    }
-    const Start start = Start::with(places);
-    QtSetup setup(program);
-    const QApplication application(setup.argumentCount(), setup.arguments());
-    QtSetup::followUsersLanguage();
-    OneApp app(QDBusConnection::sessionBus(), places.purpose());
-    if (const auto problem = app.handOver(start)) {
-        return endWith(*problem);
-    }
+/// Until the user closes it.
+ExitCode showWindow(OneApp& app, const Places& places) {
     WindowScreen screen;
     const DesktopLook look(QDBusConnection::sessionBus(), screen);
     Notices notices;
@@ -63,6 +50,26 @@ ExitCode runInWindow(char* program, const Places& places) {
     const auto code = static_cast<ExitCode>(QApplication::exec());
     tell(memory.keep({window.normalGeometry().size(), companion.openPanes()}));
     return code;
+}
+
+} // namespace
+
+ExitCode runInWindow(char* program, const Places& places) {
+    if (!QtSetup::hasDisplay()) {
+        std::cerr << "quorl: There is no display here. Start quorl in a graphical session, or with "
+                     "--text.\n";
+        return ExitCode::Failure;
+    }
+    const Start start = Start::with(places);
+    QtSetup setup(program);
+    const QApplication application(setup.argumentCount(), setup.arguments());
+    QtSetup::followUsersLanguage();
+    QApplication::setWindowIcon(QIcon(QStringLiteral(":/org.quorl.Velora.svg")));
+    OneApp app(QDBusConnection::sessionBus(), places.purpose());
+    if (const auto problem = app.handOver(start)) {
+        return endWith(*problem);
+    }
+    return showWindow(app, places);
 }
 
 } // namespace quorl
