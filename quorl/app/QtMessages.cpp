@@ -27,8 +27,8 @@ void take(QtMsgType type, const QMessageLogContext& context, const QString& text
         endWith(QStringLiteral("The display has gone. Start quorl again when there is one."));
     }
     if (type == QtFatalMsg) {
-        endWith(text.section(u'\n', 0, 0) +
-                QStringLiteral(" Start quorl on a display that works, or with --text."));
+        endWith(text.section(u'.', 0, 0) +
+                QStringLiteral(". Start quorl on a display that works, or with --text."));
     }
     std::cerr << qFormatLogMessage(type, context, text).toStdString() << '\n';
 }

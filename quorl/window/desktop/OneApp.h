@@ -11,9 +11,9 @@ namespace quorl {
 /// name on the session bus, and later ones hand over to it what they bring. Main thread.
 class OneApp final {
   public:
-    static constexpr std::chrono::seconds usualPatience{5};
+    static constexpr std::chrono::seconds usualPatience{15};
 
-    /// A first app that does not answer for so long is taken to hang.
+    /// A first app that does not answer for so long is taken to hang rather than to be starting.
     OneApp(QDBusConnection bus, base::Purpose purpose,
            std::chrono::milliseconds patience = usualPatience);
 

@@ -19,13 +19,6 @@ using testing::Not;
 constexpr int patience = 60'000; // milliseconds
 const QString appName = QStringLiteral("org.quorl.Velora");
 
-/// Returns when the window is on the display: the app answers from its event loop.
-void waitForWindow() {
-    waitForOwner(appName, true);
-    const OtherConnection desktop("desktop");
-    (void)desktop.callApplication(appName, "Activate", {QVariantMap()});
-}
-
 std::string nameOf(const testing::TestParamInfo<DisplayServer::Kind>& tried) {
     return tried.param == DisplayServer::Kind::X11 ? "X11" : "Wayland";
 }
@@ -45,7 +38,7 @@ TEST_P(Display, windowOpensAndPaintsAndEnds) {
 
 TEST_P(Display, thatGoesEndsTheWindowWithASentence) {
     QuorlProcess quorl({}, display_.environment());
-    waitForWindow();
+    waitForWindow(appName);
     display_.end();
     EXPECT_EQ(quorl.end(), 1);
     EXPECT_THAT(quorl.errors(), HasSubstr("quorl: The display has gone. Start"));
@@ -95,7 +88,7 @@ TEST(DesktopEntry, namesTheClassOfTheWindowWhichHasAnIcon) {
     const SampleMusic music;
     const DisplayServer display(DisplayServer::Kind::X11);
     QuorlProcess quorl({}, display.environment());
-    waitForWindow();
+    waitForWindow(appName);
     std::ifstream entry(SOURCE_DIRECTORY "/resources/desktop/org.quorl.Velora.desktop");
     std::string line;
     while (std::getline(entry, line) && !line.starts_with("StartupWMClass=")) {

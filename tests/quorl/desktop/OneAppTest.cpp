@@ -84,7 +84,7 @@ TEST(OneApp, desktopActivatesItByTheUsualCalls) {
 
 TEST(OneApp, reasonOfTheFirstForNotTakingAStartIsToldByTheSecond) {
     QuorlProcess first({}, windowed());
-    waitForOwner(usedName, true);
+    waitForWindow(usedName);
     QuorlProcess second({"--plugins", "/tmp"}, windowed());
     EXPECT_EQ(second.end(), 1);
     EXPECT_THAT(second.errors(), HasSubstr("running already, with other plug-ins. Close"));
@@ -122,7 +122,7 @@ TEST(OneApp, trialIsAnotherOneAndGoesOnWithTheFolderOfItsSecondStart) {
     OneApp used(QDBusConnection::sessionBus(), base::Purpose::Use);
     ASSERT_EQ(used.handOver({}), std::nullopt);
     QuorlProcess trial({"--music", chosen.path()}, windowed());
-    waitForOwner(trialName, true);
+    waitForWindow(trialName);
 
     QuorlProcess second({"--music", other.path()}, windowed());
 

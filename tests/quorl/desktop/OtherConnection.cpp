@@ -1,7 +1,6 @@
 #include "tests/quorl/desktop/OtherConnection.h"
 
 #include <QDBusConnectionInterface>
-#include <QDBusMessage>
 #include <QDBusPendingCall>
 #include <QTest>
 #include <stdexcept>
@@ -41,6 +40,12 @@ void waitForOwner(const QString& name, bool isThere) {
                          patience)) {
         throw std::runtime_error(name.toStdString() + (isThere ? " does not come" : " stays"));
     }
+}
+
+void waitForWindow(const QString& name) {
+    waitForOwner(name, true);
+    // Answered from the event loop, which runs when the window is shown.
+    (void)OtherConnection("desktop").callApplication(name, "Activate", {QVariantMap()});
 }
 
 } // namespace quorl::tests

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <QDBusConnection>
+#include <QDBusMessage>
 #include <QVariant>
 
 namespace quorl::tests {
@@ -29,5 +30,8 @@ class OtherConnection {
 
 /// Runs the event loop until some program owns the name on the session bus, or none does.
 void waitForOwner(const QString& name, bool isThere);
+
+/// Runs the event loop until the app that owns the name, or is about to, serves its window.
+void waitForWindow(const QString& name);
 
 } // namespace quorl::tests
