@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <optional>
 #include <system_error>
 
 #include <gmock/gmock.h>
@@ -61,9 +62,13 @@ class Durability : public ::testing::Test {
 
     std::uint64_t copiedBySync() {
         std::uint64_t copied = 0;
+        std::optional<std::uint64_t> before;
         const auto outcome = observedSync(
             wishFor(music_, player_), [](const Step&) {},
-            [&](const auto& step) { copied = step.songs; });
+            [&](const auto& step) {
+                before = before.value_or(step.songs);
+                copied = step.songs - *before;
+            });
         EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
         return copied;
     }
