@@ -562,7 +562,7 @@ TEST_F(EngineInTurns, SaysThatTheWearableDoesNotAnswerAndGivesUpASyncThatHangs) 
     startSyncing();
     turns_.pass(10s);
     wearables_.beSilent();
-    EXPECT_EQ(status(), "It does not answer.");
+    EXPECT_EQ(status(), "Ending the sync. It does not answer.");
     EXPECT_TRUE(syncs_.isStopped);
     EXPECT_THAT(bus_.ends, IsEmpty()) << "it may still end in order";
 
