@@ -138,7 +138,7 @@ TEST_F(WithEngine, offTheChargerThePlaylistWaits) {
     quorl.readUntil("  2  Simulated Charger: off\n");
     EXPECT_FALSE(std::filesystem::exists(onWearable("Road Trip.m3u8")));
     quorl.say("2");
-    quorl.readUntil("Everything is up to date.");
+    quorl.readUntil("Everything that could be found is on the Velora.");
     EXPECT_TRUE(std::filesystem::exists(onWearable("Road Trip.m3u8")));
     EXPECT_EQ(quorl.end(), 0);
 }
