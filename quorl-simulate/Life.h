@@ -50,6 +50,7 @@ enum class Happening {
     SwapWearable,
     StartNow,
     Cancel,
+    RemoveMusic,
 };
 
 /// Something that happens to the engine from outside.

@@ -11,7 +11,7 @@ using namespace std::chrono_literals;
 
 constexpr auto longestNews = 1s;
 
-constexpr std::string_view success = " synced to ";
+constexpr std::array<std::string_view, 2> successes{" synced to ", " removed from "};
 
 /// What the engine says of each, in part.
 constexpr std::array<std::pair<std::string_view, Trouble>, 20> sentences{{
@@ -43,7 +43,8 @@ bool Troubles::explain(std::string_view sentence) const {
     const auto isTold = [sentence](std::string_view part) {
         return sentence.find(part) != std::string_view::npos;
     };
-    return isTold(success) || std::ranges::any_of(sentences, [&](const auto& each) {
+    return std::ranges::any_of(successes, isTold) ||
+           std::ranges::any_of(sentences, [&](const auto& each) {
                const auto last = last_.at(static_cast<std::size_t>(each.second));
                return isTold(each.first) && last && *last + longestNews >= session_;
            });

@@ -354,6 +354,16 @@ void World::happenToEngine(const Event& event) {
         note(Trouble::Cancelled);
         turns_.call([this] { announcer_.cancel(); });
         break;
+    case RemoveMusic:
+        note(Trouble::OtherChoice);
+        turns_.call([this] {
+            try {
+                engine_->removeMusic();
+            } catch (const syncd::NotReady&) {
+                // The client is told why.
+            }
+        });
+        break;
     default:
         break;
     }

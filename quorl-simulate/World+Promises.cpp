@@ -193,7 +193,8 @@ void World::checkMessage(bool success, const std::string& message) {
     if (isDead_) {
         return;
     }
-    if (success && choices_.now.lastSent == std::nullopt) {
+    const bool isRemoval = message.find(" removed from ") != std::string::npos;
+    if (success && isRemoval == choices_.now.lastSent.has_value()) {
         breach("a success that was not remembered");
     }
     if (!troubles_.explain(message)) {

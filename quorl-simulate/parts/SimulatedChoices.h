@@ -49,6 +49,15 @@ class SimulatedChoices final : public syncd::ChoiceStore {
         return {};
     }
 
+    [[nodiscard]] std::string switchOff() override {
+        if (!write()) {
+            return "The preferences cannot be written.";
+        }
+        now.isSyncEnabled = false;
+        durable_ = now;
+        return {};
+    }
+
     void losePower(Random& random) {
         if (random.onceIn(2)) {
             now = durable_;

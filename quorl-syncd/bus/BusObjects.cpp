@@ -184,6 +184,10 @@ class BusObjects::WearableObject final
 
     void Refresh() override { engine_.refreshWearable(); }
 
+    void RemoveMusic() override {
+        answering(engine::notReadyError, [this] { engine_.removeMusic(); });
+    }
+
     Engine& engine_;
     const PlaceKeeper& keeper_;
     Published<engine::WearableStatus> published_;

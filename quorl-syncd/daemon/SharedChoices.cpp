@@ -33,4 +33,6 @@ std::string SharedChoices::forgetSent() {
                : revision.problem;
 }
 
+std::string SharedChoices::switchOff() { return preferences_.set(assetSyncEnabled, false).problem; }
+
 } // namespace quorl::syncd

@@ -14,6 +14,7 @@ class SharedChoices final : public ChoiceStore {
     [[nodiscard]] Choices read() override;
     [[nodiscard]] std::string rememberSent(const SentPlaylist& sent) override;
     [[nodiscard]] std::string forgetSent() override;
+    [[nodiscard]] std::string switchOff() override;
 
   private:
     preferences::SharedPreferences& preferences_;

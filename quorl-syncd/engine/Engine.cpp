@@ -58,6 +58,7 @@ Engine::~Engine() {
 }
 
 void Engine::choicesDidChange() {
+    isRemovalRequested_ = isRemovalRequested_ && !ports_.choices.read().isSyncEnabled;
     givenUp_.reset();
     quietFrom_ = ports_.turns.now() + quietTime;
     ports_.turns.callAt(quietFrom_, [this] { consider(); });
@@ -86,6 +87,20 @@ void Engine::cancel() {
     }
 }
 
+void Engine::removeMusic() {
+    if (!wearable_.usage()) {
+        throw NotReady(wearable_.problem());
+    }
+    if (!wearable_.attachment().connected) {
+        throw NotReady(engine::Message{code::notConnected});
+    }
+    if (const auto problem = ports_.choices.switchOff(); !problem.empty()) {
+        throw NotReady(problem);
+    }
+    isRemovalRequested_ = true;
+    consider();
+}
+
 void Engine::setMusicFolder(const std::string& path) {
     const auto folder = path.empty() ? ports_.music.usualFolder() : path;
     requireMeans("The music folder", [&] {
@@ -108,6 +123,7 @@ void Engine::setRateLimit(std::uint64_t bytesPerSecond) {
 void Engine::setWearableDirectory(const std::string& path) {
     requireMeans("The wearable", [&] { wearable_.choose(path); });
     givenUp_.reset();
+    isRemovalRequested_ = false; // it was for the other one
     tellLastResult();
     applyRateLimit();
     consider();
@@ -129,6 +145,7 @@ void Engine::wearableDidChange(AttachedWearable::Change change) {
         return;
     case AttachedWearable::Change::IsThereAgain:
         givenUp_.reset();
+        isRemovalRequested_ = false; // it may be another one
         break;
     case AttachedWearable::Change::Figures:
         break;
@@ -157,6 +174,7 @@ Situation Engine::situation() const {
                        ongoing_->whyStopped};
     }
     now.isStartRequested = isStartRequested_;
+    now.isRemovalRequested = isRemovalRequested_;
     now.givenUp = givenUp_;
     now.leftOutCount = shortfall_.leftOutCount;
     now.now = ports_.turns.now();
@@ -172,6 +190,8 @@ void Engine::consider() {
     const auto problem = isClaimToBeForgotten(now, decision) ? ports_.choices.forgetSent() : "";
     switch (decision.kind) {
     case Decision::Kind::Rest:
+        isRemovalRequested_ = false; // the wearable has gone
+        break;
     case Decision::Kind::Continue:
         break;
     case Decision::Kind::Begin:
@@ -191,7 +211,8 @@ void Engine::consider() {
 void Engine::begin(const wearable::Selection& selection) {
     givenUp_.reset();
     const bool isRequested = std::exchange(isStartRequested_, false);
-    const Order order{inventory_, selection, wearable_.identity()};
+    const auto library = inventory_ ? inventory_ : std::make_shared<const media::Inventory>();
+    const Order order{library, selection, wearable_.identity()};
     auto session = ports_.announcer.beginSession(++sessions_, [this] { cancel(); });
     auto sync = ports_.syncs.begin(
         order,
@@ -248,7 +269,8 @@ void Engine::abandon() {
 
 void Engine::finish(const Outcome& outcome) {
     const auto selection = ongoing_->order.selection;
-    const auto problem = outcome.kind == Outcome::Kind::Sent ? remember(ongoing_->order) : "";
+    const bool isSent = outcome.kind == Outcome::Kind::Sent && !ongoing_->order.isRemoval();
+    const auto problem = isSent ? remember(ongoing_->order) : "";
     const auto conclusion = conclusionOf(outcome, problem, ongoing_->whyStopped);
     if (conclusion.success) {
         retry_.reset();
@@ -265,6 +287,9 @@ void Engine::finish(const Outcome& outcome) {
         countedFor_.reset();
     }
     conclude(conclusion.success, conclusion.message);
+    if (ongoing_->order.isRemoval()) {
+        isRemovalRequested_ = false; // whatever became of it
+    }
     ongoing_.reset();
     if (outcome.isLibraryStale) {
         music_->rescan();
@@ -290,6 +315,7 @@ void Engine::conclude(bool success, const engine::Message& message) {
 /// A sync cannot begin as long as it is said that everything was sent.
 void Engine::putOff(const wearable::Selection& selection, const std::string& why) {
     isStartRequested_ = false;
+    isRemovalRequested_ = false;
     givenUp_ = selection;
     tryAgainLater();
     keepResult(wearable_.identity().root, false, engine::other(why));
@@ -298,7 +324,8 @@ void Engine::putOff(const wearable::Selection& selection, const std::string& why
 void Engine::keepResult(const std::string& wearable, bool success, const engine::Message& message) {
     try {
         const auto now = ports_.turns.calendarTime();
-        const auto complete = success ? now : ports_.results.of(wearable).lastComplete;
+        const bool isComplete = success && message.code != code::removed;
+        const auto complete = isComplete ? now : ports_.results.of(wearable).lastComplete;
         ports_.results.remember(wearable, {success, message, now, complete});
     } catch (const std::system_error& error) {
         std::cerr << "quorl-syncd: What became of the sync is forgotten when the engine ends ("

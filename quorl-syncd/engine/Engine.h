@@ -53,6 +53,9 @@ class Engine {
     void startNow();
     void cancel();
 
+    /// Switches sync off, then removes all that is ours from the wearable. Throws `NotReady`.
+    void removeMusic();
+
     /// The next two take a directory that need not be there. They throw `NotReady` where the
     /// process has no more threads or files for it; then all is as it was.
     void setMusicFolder(const std::string& path);
@@ -105,6 +108,7 @@ class Engine {
     AttachedWearable wearable_;
 
     bool isStartRequested_ = false;
+    bool isRemovalRequested_ = false;
     std::optional<wearable::Selection> givenUp_;
     RetryDelay retry_;
     const std::chrono::seconds lookDelay_;

@@ -82,10 +82,38 @@ bool isRunning(Selection wanted, const Situation& now) {
     return now.running->selection == wanted && now.running->wearable == now.wearable;
 }
 
+/// A wearable that is there is all that it takes.
+bool isRemovable(const Situation& now) { return now.usage && now.attachment.connected; }
+
+/// Where it does not go on.
+Message whyRemovalEnds(const Situation& now) {
+    if (now.running->selection != Selection()) {
+        return {code::syncOff};
+    }
+    if (!now.usage) {
+        return now.wearableProblem;
+    }
+    return {now.attachment.connected ? code::somethingElseChosen : code::notConnected};
+}
+
+Decision decideRemoval(const Situation& now) {
+    using Kind = Decision::Kind;
+    if (!now.running) {
+        return isRemovable(now) ? Decision{Kind::Begin, {}, {}} : Decision();
+    }
+    const bool goesOn = now.running->selection == Selection() &&
+                        now.running->wearable == now.wearable &&
+                        (isRemovable(now) || isWaitingForAnswer(now));
+    return goesOn ? Decision{Kind::Continue, {}, {}}
+                  : Decision{Kind::Stop, {}, whyRemovalEnds(now)};
+}
+
 /// A sync that is to end is under way until its device has answered.
 Message statusOf(const Situation::Running& running) {
-    return running.whyStopped ? Message{code::stopping, flat(*running.whyStopped)}
-                              : Message{code::syncing};
+    if (running.whyStopped) {
+        return {code::stopping, flat(*running.whyStopped)};
+    }
+    return {running.selection == Selection() ? code::removing : code::syncing};
 }
 
 } // namespace
@@ -101,6 +129,9 @@ std::optional<Message> obstacleIn(const Situation& situation) {
 
 Decision decide(const Situation& situation) {
     using Kind = Decision::Kind;
+    if (situation.isRemovalRequested) {
+        return decideRemoval(situation);
+    }
     if (auto obstacle = obstacleIn(situation)) {
         return {situation.running ? Kind::Stop : Kind::Rest, {}, std::move(*obstacle)};
     }

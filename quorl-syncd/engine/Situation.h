@@ -46,6 +46,8 @@ struct Situation {
     std::optional<Running> running;
     /// Somebody has asked for a sync now, whether there is a reason for one or not.
     bool isStartRequested = false;
+    /// Somebody has asked for our music to be removed, and sync was switched off for it.
+    bool isRemovalRequested = false;
     /// Did not work, or was cancelled, and is not tried again for now.
     std::optional<wearable::Selection> givenUp;
     /// Of the chosen playlist: what it names and cannot be sent.

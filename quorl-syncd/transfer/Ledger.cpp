@@ -71,6 +71,8 @@ void Ledger::keepOnly(const std::vector<Entry>& songs) {
     manifest_.strays.insert(manifest_.strays.end(), old.begin(), old.end());
 }
 
-void Ledger::wasSent(const wearable::Selection& selection) { manifest_.sent = selection; }
+void Ledger::wasSent(const std::optional<wearable::Selection>& selection) {
+    manifest_.sent = selection;
+}
 
 } // namespace quorl::syncd

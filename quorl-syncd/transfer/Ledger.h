@@ -1,5 +1,6 @@
 #pragma once
 
+#include <optional>
 #include <span>
 #include <string>
 #include <vector>
@@ -58,8 +59,8 @@ class Ledger {
     /// All other songs, and what was announced and never came, are to be removed.
     void keepOnly(const std::vector<wearable::Entry>& songs);
 
-    /// Everything of the selection is there.
-    void wasSent(const wearable::Selection& selection);
+    /// Everything of the selection is there; of none where nothing was sent.
+    void wasSent(const std::optional<wearable::Selection>& selection);
 
   private:
     Device& device_;

@@ -5,6 +5,9 @@
 namespace quorl::syncd {
 
 std::vector<media::SongIndex> songsWithinLimit(const Order& order) {
+    if (order.isRemoval()) {
+        return {};
+    }
     const auto limit = preferences::limitOf(order.selection.limitType, order.selection.limit);
     const auto& songs = order.playlist().songs;
     const auto count = order.library->songsWithin(order.playlist(), limit.bytes, limit.songs);

@@ -13,16 +13,21 @@ namespace quorl::syncd {
 struct Order {
     /// Not null; has the playlist in the revision of the selection.
     std::shared_ptr<const media::Inventory> library;
+    /// Of no playlist where nothing of ours is to be there.
     wearable::Selection selection;
     wearable::Wearable wearable;
 
+    [[nodiscard]] bool isRemoval() const { return selection == wearable::Selection(); }
+
+    /// Where it is no removal.
     [[nodiscard]] const media::Playlist& playlist() const {
         return *library->playlist(selection.playlist);
     }
 };
 
 /// The songs from the top of the playlist to the first one that does not fit, as the pane's footer
-/// counts them; later ones are not tried. A song that is listed twice counts twice.
+/// counts them; later ones are not tried. A song that is listed twice counts twice. None for a
+/// removal.
 [[nodiscard]] std::vector<media::SongIndex> songsWithinLimit(const Order& order);
 
 } // namespace quorl::syncd

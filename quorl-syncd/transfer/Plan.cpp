@@ -186,8 +186,8 @@ void choosePlaylist(Plan& plan, const Order& order, const std::optional<Entry>& 
     const auto& title = order.playlist().name;
     const auto text = playlistText(order, plan.songs);
     const bool isNew = !there || there->source != title;
-    plan.playlist = {isNew ? plan.names.take(title + ".m3u8") : there->name, title, text.size(), 0,
-                     hashOf(text)};
+    plan.playlist = Entry{isNew ? plan.names.take(title + ".m3u8") : there->name, title,
+                          text.size(), 0, hashOf(text)};
 }
 
 } // namespace
@@ -239,7 +239,9 @@ Plan planOf(const Order& order, const wearable::Manifest& there,
             song.name = takeName(plan.names, song);
         }
     }
-    choosePlaylist(plan, order, there.playlist);
+    if (!order.isRemoval()) {
+        choosePlaylist(plan, order, there.playlist);
+    }
     return plan;
 }
 
@@ -247,7 +249,7 @@ Room roomFor(const Plan& plan, std::uint64_t available) {
     // For the playlist and the list of our files, which are written before anything is removed.
     constexpr std::uint64_t beside = 16384;
     const auto needed = plan.bytesToCopy;
-    const auto comfortable = sum(needed, sum(plan.playlist.size, beside));
+    const auto comfortable = sum(needed, sum(plan.playlist ? plan.playlist->size : 0, beside));
     if (comfortable <= available || (plan.unwanted.empty() && needed <= available)) {
         return Room::Enough;
     }

@@ -56,8 +56,8 @@ struct Plan {
     std::vector<wearable::Entry> useless;
     /// Songs that are there and will not be, in the end.
     std::vector<wearable::Entry> unwanted;
-    /// The playlist as it will be if all songs can be copied.
-    wearable::Entry playlist;
+    /// The playlist as it will be if all songs can be copied; nothing where none is to be there.
+    std::optional<wearable::Entry> playlist;
     /// All names that are there, or are to be.
     TakenNames names;
     /// Of all songs; those that are there already are done.

@@ -102,7 +102,7 @@ void Sync::perform(Device& device) {
     beginChanges(device);
     announce();
     copySongs(device);
-    writePlaylist(device);
+    bringPlaylist(device);
     keepOnlyWhatIsWished(device);
 }
 
@@ -159,8 +159,13 @@ void Sync::requireRoom(Device& device) {
     }
 }
 
+/// What the wearable has in the end; nothing is none of it.
+std::optional<wearable::Selection> Sync::claim() const {
+    return order_.isRemoval() ? std::nullopt : std::optional(order_.selection);
+}
+
 bool Sync::isDone() const {
-    const wearable::Manifest wished{plan_.songs, plan_.playlist, {}, order_.selection};
+    const wearable::Manifest wished{plan_.songs, plan_.playlist, {}, claim()};
     return ledger_->isSaved() && ledger_->manifest() == wished && plan_.problems.empty() &&
            leftovers_.empty();
 }
@@ -204,25 +209,34 @@ void Sync::copySongs(Device& device) {
     plan_.problems.insert(plan_.problems.end(), problems.begin(), problems.end());
 }
 
+void Sync::bringPlaylist(Device& device) {
+    if (plan_.playlist) {
+        writePlaylist(device, *plan_.playlist);
+    } else {
+        removePlaylist(device);
+        device.settle();
+        ledger_->playlistIsGone();
+    }
+}
+
 /// It is never renamed over: a loss of power leaves the old one, the new one or none.
-void Sync::writePlaylist(Device& device) {
+void Sync::writePlaylist(Device& device, Entry& playlist) {
     const auto text = playlistText(order_, plan_.songs);
-    plan_.playlist.size = text.size();
-    plan_.playlist.hash = hashOf(text);
-    if (ledger_->manifest().playlist == plan_.playlist) {
+    playlist.size = text.size();
+    playlist.hash = hashOf(text);
+    if (ledger_->manifest().playlist == playlist) {
         return;
     }
     auto file = device.createUnfinished();
     file.write(std::as_bytes(std::span(text)));
     file.sync();
     removePlaylist(device);
-    putPlaylist(device, file);
+    putPlaylist(device, playlist, file);
     device.settle();
-    ledger_->playlistIsThere(plan_.playlist);
+    ledger_->playlistIsThere(playlist);
 }
 
-void Sync::putPlaylist(Device& device, const UnfinishedFile& file) {
-    auto& playlist = plan_.playlist;
+void Sync::putPlaylist(Device& device, Entry& playlist, const UnfinishedFile& file) {
     for (;;) {
         ledger_->announce(std::span(&playlist, 1));
         ledger_->save();
@@ -248,6 +262,9 @@ void Sync::removeStrays(Device& device) {
         return;
     }
     for (const auto& stray : strays) {
+        if (order_.isRemoval()) {
+            stopIf(stop_);
+        }
         if (isOurs(stray, device.find(stray.name), ask)) {
             device.removeMusic(stray.name);
         }
@@ -265,12 +282,15 @@ void Sync::keepOnlyWhatIsWished(Device& device) {
             ledger_->save();
             removeStrays(device);
         }
-        ledger_->wasSent(order_.selection);
+        ledger_->wasSent(claim());
     }
     ledger_->save();
 }
 
 Outcome Sync::outcome() const {
+    if (order_.isRemoval()) {
+        return {Outcome::Kind::Sent, {code::removed}, false, false};
+    }
     if (plan_.problems.empty()) {
         const auto leftOut = order_.library->leftOutOf(order_.playlist()).size();
         return {Outcome::Kind::Sent, synced(plan_.songs.size(), leftOut), false, false};

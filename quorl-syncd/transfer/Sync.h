@@ -41,13 +41,15 @@ class Sync {
 
     void takeStock(Device& device);
     void requireRoom(Device& device);
+    [[nodiscard]] std::optional<wearable::Selection> claim() const;
     [[nodiscard]] bool isDone() const;
     void beginChanges(Device& device);
     [[nodiscard]] bool removesSongsFirst() const;
     void announce();
     void copySongs(Device& device);
-    void writePlaylist(Device& device);
-    void putPlaylist(Device& device, const UnfinishedFile& file);
+    void bringPlaylist(Device& device);
+    void writePlaylist(Device& device, wearable::Entry& playlist);
+    void putPlaylist(Device& device, wearable::Entry& playlist, const UnfinishedFile& file);
     void removePlaylist(Device& device);
     void removeStrays(Device& device);
     void keepOnlyWhatIsWished(Device& device);

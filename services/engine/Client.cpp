@@ -390,4 +390,8 @@ void Client::refreshWearable(Reply reply) {
     connection_->callMethod(wearablePath, wearableInterface, "Refresh", std::move(reply));
 }
 
+void Client::removeMusic(Reply reply) {
+    connection_->callMethod(wearablePath, wearableInterface, "RemoveMusic", std::move(reply));
+}
+
 } // namespace quorl::engine

@@ -47,6 +47,8 @@ class Client {
     void setOnCharger(bool onCharger, Reply reply = {});
     /// Has the byte counts of the wearable looked at again.
     void refreshWearable(Reply reply = {});
+    /// Switches music sync off, and has what was synced to the wearable removed from it.
+    void removeMusic(Reply reply = {});
 
   private:
     class Connection;

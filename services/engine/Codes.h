@@ -15,12 +15,14 @@ inline constexpr auto notOnCharger = "not-on-charger";
 inline constexpr auto syncing = "syncing";
 inline constexpr auto stopping = "stopping"; ///< the message that says why
 inline constexpr auto aboutToSync = "about-to-sync";
+inline constexpr auto removing = "removing";
 inline constexpr auto upToDate = "up-to-date";
 inline constexpr auto upToDateBut = "up-to-date-but"; ///< how many songs were left out
 
 // What became of a sync.
 inline constexpr auto synced = "synced";        ///< how many songs
 inline constexpr auto syncedBut = "synced-but"; ///< how many songs, and how many were left out
+inline constexpr auto removed = "removed";
 /// How many songs, the code of what is the matter with the first one, and that code's arguments.
 inline constexpr auto songsLeftOut = "songs-left-out";
 inline constexpr auto cancelled = "cancelled";

@@ -39,6 +39,7 @@ constexpr std::array wordings{
     Wording{code::syncing, "Syncing music."},
     Wording{code::stopping, "Ending the sync. {message 0}"},
     Wording{code::aboutToSync, "About to sync music."},
+    Wording{code::removing, "Removing the music."},
     Wording{code::upToDate, "Everything is up to date."},
     Wording{code::upToDateBut,
             "Everything that could be found is on the {wearable}. {songs 0} could "
@@ -46,6 +47,7 @@ constexpr std::array wordings{
     Wording{code::synced, "{songs 0} synced to {wearable}."},
     Wording{code::syncedBut,
             "{songs 0} synced to {wearable}. {songs 1} could not be found or read."},
+    Wording{code::removed, "The music was removed from the {wearable}."},
     Wording{code::songsLeftOut, "{message 1}{others 0}"},
     Wording{code::cancelled, "The sync was cancelled."},
     Wording{code::ended, "The sync engine was ended."},

@@ -1,5 +1,5 @@
-// The engine without a bus, a device or a thread: everything that it touches is made of values, and
-// time passes only where a test lets it.
+// The engine without a bus, a device or a thread: everything that it touches is
+// made of values, and time passes only where a test lets it.
 
 #include <map>
 
@@ -55,6 +55,11 @@ struct FixedChoices final : ChoiceStore {
         if (problem.empty()) {
             choices.lastSent.reset();
         }
+        return problem;
+    }
+
+    [[nodiscard]] std::string switchOff() override {
+        choices.isSyncEnabled = choices.isSyncEnabled && !problem.empty();
         return problem;
     }
 
@@ -315,6 +320,76 @@ TEST_F(EngineInTurns, BringsAgainWhatIsLostAfterACancelThatCameTooLate) {
     wearables_.answer(wearable::Usage{});
 
     EXPECT_EQ(syncs_.orders.size(), 2);
+}
+
+const Outcome removed{Outcome::Kind::Sent, {"removed"}, false, false};
+
+TEST_F(EngineInTurns, RemovesTheMusicOnceTheSyncThatIsUnderWayHasEnded) {
+    startSyncing();
+    engine_->removeMusic();
+    EXPECT_TRUE(syncs_.isStopped);
+    EXPECT_FALSE(choices_.choices.isSyncEnabled);
+    EXPECT_EQ(syncs_.orders.size(), 1);
+
+    syncs_.end(stopped);
+    ASSERT_EQ(syncs_.orders.size(), 2);
+    EXPECT_TRUE(syncs_.orders.back().isRemoval());
+    EXPECT_EQ(status(), "Removing the music.");
+    wearables_.answer(wearable::Usage{});
+    EXPECT_FALSE(syncs_.isStopped);
+    syncs_.end(removed);
+
+    EXPECT_THAT(bus_.ends, ElementsAre("- Music sync is switched off.",
+                                       "+ The music was removed from the Velora."));
+    EXPECT_EQ(choices_.choices.lastSent, std::nullopt);
+    EXPECT_EQ(engine_->status().lastComplete, 0);
+    EXPECT_EQ(status(), "Music sync is switched off.");
+    wearables_.answer(wearable::Usage{});
+    EXPECT_EQ(syncs_.orders.size(), 2);
+}
+
+TEST_F(EngineInTurns, RemovesNothingWhereTheWearableIsAwayOrSyncStaysOn) {
+    start();
+    EXPECT_THROW(engine_->removeMusic(), NotReady);
+    EXPECT_TRUE(choices_.choices.isSyncEnabled);
+    wearables_.answer(wearable::Usage{});
+    choices_.problem = "No store.";
+
+    EXPECT_THROW(engine_->removeMusic(), NotReady);
+
+    EXPECT_THAT(syncs_.orders, IsEmpty());
+}
+
+TEST_F(EngineInTurns, StopsRemovingWhereItIsCancelledOrSomethingIsChosen) {
+    start();
+    wearables_.answer(wearable::Usage{});
+    engine_->removeMusic();
+    engine_->cancel();
+    syncs_.end(stopped);
+    EXPECT_EQ(syncs_.orders.size(), 1) << "it was cancelled";
+
+    engine_->removeMusic();
+    choices_.choices.isSyncEnabled = true;
+    readMusic(3);
+    engine_->choicesDidChange();
+
+    EXPECT_TRUE(syncs_.isStopped);
+    syncs_.end(stopped);
+    turns_.pass(200ms);
+    ASSERT_EQ(syncs_.orders.size(), 3);
+    EXPECT_FALSE(syncs_.orders.back().isRemoval());
+}
+
+TEST_F(EngineInTurns, DoesNotRemoveFromAWearableThatWentAwayMeanwhile) {
+    startSyncing();
+    engine_->removeMusic();
+    wearables_.answer("It is away.");
+    syncs_.end(stopped);
+    EXPECT_EQ(syncs_.orders.size(), 1);
+
+    wearables_.answer(wearable::Usage{});
+
+    EXPECT_EQ(syncs_.orders.size(), 1);
 }
 
 TEST_F(EngineInTurns, RemembersWhenAllWasLastSent) {

@@ -284,6 +284,22 @@ TEST_F(Engine, DoesNotBeginAgainByItselfAfterItWasCancelled) {
     EXPECT_EQ(onWearable().size(), 4);
 }
 
+TEST_F(Engine, RemovesItsMusicWhenItIsToldToAndDoesNotBringItAgain) {
+    listLargeSongs();
+    start();
+    choose();
+    EXPECT_TRUE(sessionEnd().success);
+
+    EXPECT_EQ(recorder_.ask(&engine::Client::removeMusic), "");
+
+    EXPECT_TRUE(sessionEnd().success);
+    EXPECT_FALSE(get(assetSyncEnabled));
+    EXPECT_EQ(get(lastFullySentAssetSyncPlaylistVersion), std::nullopt);
+    recorder_.awaitStatus("Music sync is switched off.");
+    recorder_.awaitState([](const auto& state) { return state.wearable.songCount == 0; });
+    EXPECT_TRUE(onWearable().empty());
+}
+
 TEST_F(Engine, BringsSongsOfAnyTimeOnce) {
     music_.write("before.mp3", "before 1970");
     music_.write("smallest.mp3", "as early as it goes");

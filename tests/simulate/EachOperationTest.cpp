@@ -1,4 +1,4 @@
-// Three syncs, each cut short at every single operation, and each with every single operation
+// Four syncs, each cut short at every single operation, and each with every single operation
 // failing: all promises are kept meanwhile, and in the end the wearable holds what is chosen.
 
 #include <array>
@@ -26,6 +26,7 @@ constexpr std::uint64_t later = 2'000;
 const std::array stories{
     Story{"FirstSync", 4, {}},
     Story{"ChangedChoice", 4, {{Happening::Choose, later, 2}}},
+    Story{"RemovedMusic", 4, {{Happening::RemoveMusic, later, 2}}},
     Story{"SameFilesInAnotherOrder", 4, {{Happening::ReorderList, later, 3}}},
 };
 

@@ -24,6 +24,10 @@ class ChoiceStore {
     /// loss of power. Gives back an empty text, or a sentence that says why it could not be done;
     /// then one or both may still be there.
     [[nodiscard]] virtual std::string forgetSent() = 0;
+
+    /// Has nothing be synced any more. Gives back an empty text, or a sentence that says why it
+    /// could not be done; then all is as it was.
+    [[nodiscard]] virtual std::string switchOff() = 0;
 };
 
 } // namespace quorl::syncd

@@ -91,8 +91,8 @@ TEST_F(Planning, CopiesEverythingToAnEmptyDevice) {
     EXPECT_THAT(namesOf(plan), ElementsAre("(one.mp3)", "(two.mp3)"));
     EXPECT_EQ(plan.progress, (CopyProgress{0, 2, 0, 30}));
     EXPECT_EQ(plan.bytesToCopy, 30);
-    EXPECT_EQ(plan.playlist.name, "List.m3u8");
-    EXPECT_EQ(plan.playlist.hash, hashOf("#EXTM3U\n#PLAYLIST:List\none.mp3\ntwo.mp3\n"));
+    EXPECT_EQ(plan.playlist->name, "List.m3u8");
+    EXPECT_EQ(plan.playlist->hash, hashOf("#EXTM3U\n#PLAYLIST:List\none.mp3\ntwo.mp3\n"));
     EXPECT_THAT(asked_, IsEmpty());
 }
 
@@ -108,7 +108,7 @@ TEST_F(Planning, KeepsWhatIsThereWithoutReadingIt) {
     EXPECT_EQ(plan.progress, (CopyProgress{1, 1, 10, 10}));
     EXPECT_EQ(plan.bytesToCopy, 0);
     EXPECT_THAT(plan.unwanted, IsEmpty());
-    EXPECT_EQ(plan.playlist.name, "List.m3u8");
+    EXPECT_EQ(plan.playlist->name, "List.m3u8");
     EXPECT_THAT(asked_, IsEmpty());
 }
 
@@ -169,7 +169,7 @@ TEST_F(Planning, LeavesFilesOfOthersTheirNames) {
     const auto plan = this->plan();
 
     EXPECT_THAT(namesOf(plan), ElementsAre("(one (2).mp3)"));
-    EXPECT_EQ(plan.playlist.name, "List (2).m3u8");
+    EXPECT_EQ(plan.playlist->name, "List (2).m3u8");
 }
 
 TEST_F(Planning, ListsASongOnceThatIsListedTwice) {
@@ -206,7 +206,7 @@ TEST_F(Planning, FindsRoomWithoutSongsThatAreNoLongerWanted) {
     auto plan = this->plan();
 
     EXPECT_THAT(namesOf(plan.unwanted), ElementsAre("old.mp3"));
-    const auto beside = plan.playlist.size + 16384;
+    const auto beside = plan.playlist->size + 16384;
     EXPECT_EQ(roomFor(plan, 30 + beside), Room::Enough);
     EXPECT_EQ(roomFor(plan, 29 + beside), Room::EnoughWithoutUnwanted);
     EXPECT_EQ(roomFor(plan, 10), Room::EnoughWithoutUnwanted);
@@ -242,8 +242,8 @@ TEST_F(Planning, ReplacesAPlaylistOfAnotherTitle) {
 
     const auto plan = this->plan();
 
-    EXPECT_EQ(plan.playlist.name, "List.m3u8");
-    EXPECT_EQ(plan.playlist.source, "List");
+    EXPECT_EQ(plan.playlist->name, "List.m3u8");
+    EXPECT_EQ(plan.playlist->source, "List");
 }
 
 TEST_F(Planning, NeverTakesTooMuchForALittle) {

@@ -303,6 +303,36 @@ TEST_F(SyncedWearable, IsDoneFromTheBeginningWhereThereIsNothingToCopy) {
     EXPECT_EQ(steps.front(), (CopyProgress{2, 2, 10, 10}));
 }
 
+TEST_F(SyncedWearable, HasOnlyWhatOthersPutThereOnceItsMusicWasRemoved) {
+    player_.write("Music/foreign.mp3", "of others");
+    ASSERT_EQ(syncAll().kind, Kind::Sent);
+    const Order removal{std::make_shared<media::Inventory>(), {}, player_.wearable()};
+
+    const auto outcome = sync(removal);
+
+    EXPECT_EQ(outcome.kind, Kind::Sent);
+    EXPECT_EQ(sentence(outcome.message), "The music was removed from the Velora.");
+    EXPECT_EQ(player_.music(), (Contents{{"foreign.mp3", "of others"}}));
+    EXPECT_EQ(player_.manifest(), quorl::wearable::Manifest());
+    EXPECT_EQ(sync(removal).kind, Kind::Sent) << "of nothing";
+    EXPECT_EQ(syncAll().kind, Kind::Sent);
+    EXPECT_EQ(player_.music().size(), 4);
+}
+
+TEST_F(SyncedWearable, StopsBeingEmptiedWhereItIsAskedTo) {
+    ASSERT_EQ(syncAll().kind, Kind::Sent);
+    const Order removal{std::make_shared<media::Inventory>(), {}, player_.wearable()};
+    std::stop_source stop;
+    const auto stopAtOnce = [&](const CopyProgress& /*progress*/) { stop.request_stop(); };
+
+    EXPECT_EQ(sync(removal, stopAtOnce, stop.get_token()).kind, Kind::Stopped);
+
+    EXPECT_FALSE(player_.manifest().sent);
+    EXPECT_EQ(whatIsWrongWith(player_.path()), "");
+    EXPECT_EQ(sync(removal).kind, Kind::Sent);
+    EXPECT_TRUE(player_.music().empty());
+}
+
 TEST_F(SyncedWearable, SaysWhatOfThePlaylistCouldNotBeFound) {
     music_.list({"Album/one.mp3", "gone.mp3", "gone too.mp3"});
 
