@@ -5,6 +5,7 @@
 
 #include "platform/SizeFormatter.h"
 #include "quorl/pages/LeftOutPage.h"
+#include "quorl/pages/RemovePage.h"
 #include "quorl/pages/TimeLeft.h"
 #include "services/base/Utf8.h"
 
@@ -106,6 +107,9 @@ void SyncPage::addWearable(Rows& rows) {
     }
     if (engine.beyondLimit > 0) {
         rows.push_back(value("Beyond the Limit", countOfSongs(engine.beyondLimit)));
+    }
+    if (wearable.songCount > 0) {
+        rows.push_back(link("Remove Music", {}, Class::of<RemovePage>()));
     }
 }
 

@@ -547,7 +547,7 @@ TEST_F(EngineInTurns, TriesAgainWhereItCannotRememberThatAllWasSent) {
 
 TEST_F(EngineInTurns, HasTheMusicFolderReadAgainThatWasNotAsItWasThought) {
     startSyncing();
-    syncs_.end({Outcome::Kind::Failed, "A song is gone.", true, false});
+    syncs_.end({Outcome::Kind::Failed, engine::other("A song is gone."), true, false});
 
     EXPECT_EQ(music_.rescans, 1);
     turns_.pass(24h);

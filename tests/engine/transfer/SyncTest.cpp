@@ -306,7 +306,7 @@ TEST_F(SyncedWearable, IsDoneFromTheBeginningWhereThereIsNothingToCopy) {
 TEST_F(SyncedWearable, HasOnlyWhatOthersPutThereOnceItsMusicWasRemoved) {
     player_.write("Music/foreign.mp3", "of others");
     ASSERT_EQ(syncAll().kind, Kind::Sent);
-    const Order removal{std::make_shared<media::Inventory>(), {}, player_.wearable()};
+    const Order removal{std::make_shared<quorl::media::Inventory>(), {}, player_.wearable()};
 
     const auto outcome = sync(removal);
 
@@ -321,7 +321,7 @@ TEST_F(SyncedWearable, HasOnlyWhatOthersPutThereOnceItsMusicWasRemoved) {
 
 TEST_F(SyncedWearable, StopsBeingEmptiedWhereItIsAskedTo) {
     ASSERT_EQ(syncAll().kind, Kind::Sent);
-    const Order removal{std::make_shared<media::Inventory>(), {}, player_.wearable()};
+    const Order removal{std::make_shared<quorl::media::Inventory>(), {}, player_.wearable()};
     std::stop_source stop;
     const auto stopAtOnce = [&](const CopyProgress& /*progress*/) { stop.request_stop(); };
 

@@ -170,6 +170,18 @@ TEST_F(Pages, whatCouldNotBeSentIsListedUnderItsReason) {
                               HasSubstr(missing.substr(0, 20)), HasSubstr("And 3 more.\n")));
 }
 
+TEST_F(Pages, musicIsRemovedOnlyAfterAQuestion) {
+    services_.state.wearable.songCount = 3;
+    open<SyncPage>();
+    tap("Remove Music");
+    EXPECT_TRUE(services_.requests.empty());
+    EXPECT_THAT(text(), HasSubstr("All other files on the Velora stay"));
+    tap("Remove All Synced Music");
+    EXPECT_THAT(services_.requests, ElementsAre(&engine::Client::removeMusic));
+    services_.state.wearable.songCount = 0;
+    EXPECT_THAT(text(), HasSubstr("There is no synced music on the Velora."));
+}
+
 } // namespace
 
 } // namespace quorl::tests
