@@ -79,6 +79,7 @@ RULES = {
     "services/preferences": services("services/base"),
     "services/wearable": services("services/base"),
     "services/engine": services("services/base", "services/media/playlists", "services/wearable"),
+    "services/finding": services("services/base", "services/engine", "services/wearable"),
     "doubles": program("platform", "runtime"),
     "quorl/content": program("platform", "runtime"),
     "quorl/adapters": program("platform", "runtime", "services"),

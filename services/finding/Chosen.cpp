@@ -1,0 +1,103 @@
+#include "services/finding/Chosen.h"
+
+#include "services/base/Paths.h"
+#include "services/base/Utf8.h"
+#include "services/wearable/Wearable.h"
+
+namespace quorl::finding {
+
+namespace {
+
+std::string theChosenOne() {
+    return std::string("The ") + wearable::wearableName + " that was chosen";
+}
+
+std::string notPluggedIn() { return theChosenOne() + " is not plugged in. Plug it in."; }
+
+std::string anotherIsThere(const std::filesystem::path& directory, const Drive* drive) {
+    const auto name = drive == nullptr || drive->label.empty()
+                          ? std::string("Another drive")
+                          : "Another drive, “" + base::printable(drive->label) + "”,";
+    return theChosenOne() + " is not connected. " + name + " is at " +
+           base::printable(directory.string()) +
+           " in its place. Plug in the one that was chosen, or choose this one.";
+}
+
+/// Where all of the file system is mounted rather than a part of it; null where none is.
+const base::Mount* mountWith(const std::string& uuid, const Surroundings& surroundings) {
+    const base::Mount* found = nullptr;
+    for (const auto& mount : surroundings.mounts) {
+        const auto* const drive = driveOf(mount, surroundings.drives);
+        const bool isIt = drive != nullptr && drive->uuid == uuid;
+        if (isIt && (found == nullptr || (found->root != "/" && mount.root == "/"))) {
+            found = &mount;
+        }
+    }
+    return found;
+}
+
+std::filesystem::path onMount(const base::Mount& mount, const Chosen& chosen) {
+    const auto within = chosen.directory.lexically_relative(chosen.identity->mountPoint);
+    return within == "." ? mount.directory : mount.directory / within;
+}
+
+/// Where the drive is not mounted.
+Whereabouts missing(const Chosen& chosen, const Surroundings& surroundings) {
+    const auto* const mount = base::mountOver(chosen.directory, surroundings.mounts);
+    const auto* const drive = mount == nullptr ? nullptr : driveOf(*mount, surroundings.drives);
+    const auto& before = chosen.identity->mountPoint;
+    if (mount == nullptr || !base::isWithin(mount->directory.native(), before.native())) {
+        return {chosen.directory, notPluggedIn()};
+    }
+    const bool isUnknown = drive == nullptr || drive->uuid.empty();
+    const bool isDevice = !mount->device.starts_with("0:") || mount->source.starts_with("/dev/");
+    return {chosen.directory, isUnknown && isDevice ? "" : anotherIsThere(mount->directory, drive)};
+}
+
+} // namespace
+
+std::string toText(const std::optional<Identity>& identity) {
+    return identity ? identity->uuid + ':' + identity->mountPoint.string() : std::string();
+}
+
+std::optional<Identity> parseIdentity(std::string_view text) {
+    const auto separator = text.find(":/");
+    return separator == 0 || separator == std::string_view::npos
+               ? std::nullopt
+               : std::optional(Identity{std::string(text.substr(0, separator)),
+                                        base::normal(text.substr(separator + 1))});
+}
+
+Chosen chosenIn(const std::filesystem::path& directory, std::string_view identity) {
+    Chosen chosen{directory.empty() ? directory : base::normal(directory), parseIdentity(identity)};
+    if (chosen.identity &&
+        !base::isWithin(chosen.directory.native(), chosen.identity->mountPoint.native())) {
+        chosen.identity.reset();
+    }
+    return chosen;
+}
+
+Chosen chosenAt(const std::filesystem::path& directory, const Surroundings& surroundings) {
+    const auto* const mount =
+        directory.empty() ? nullptr : base::mountOver(directory, surroundings.mounts);
+    const auto* const drive = mount == nullptr ? nullptr : driveOf(*mount, surroundings.drives);
+    if (drive == nullptr || !drive->isPluggable || drive->uuid.empty()) {
+        return {directory, {}};
+    }
+    return {directory, Identity{drive->uuid, mount->directory}};
+}
+
+Whereabouts whereaboutsOf(const Chosen& chosen, const Surroundings& surroundings) {
+    if (!chosen.identity) {
+        return {chosen.directory};
+    }
+    const auto* const over = base::mountOver(chosen.directory, surroundings.mounts);
+    const auto* const drive = over == nullptr ? nullptr : driveOf(*over, surroundings.drives);
+    if (drive != nullptr && drive->uuid == chosen.identity->uuid) {
+        return {chosen.directory};
+    }
+    const auto* const mount = mountWith(chosen.identity->uuid, surroundings);
+    return mount == nullptr ? missing(chosen, surroundings) : Whereabouts{onMount(*mount, chosen)};
+}
+
+} // namespace quorl::finding
