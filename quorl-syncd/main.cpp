@@ -15,6 +15,7 @@
 #include "quorl-syncd/bus/BusAnnouncer.h"
 #include "quorl-syncd/bus/BusObjects.h"
 #include "quorl-syncd/bus/SleepInhibitor.h"
+#include "quorl-syncd/daemon/ChosenWearable.h"
 #include "quorl-syncd/daemon/DirectoryCheck.h"
 #include "quorl-syncd/daemon/LocalMusic.h"
 #include "quorl-syncd/daemon/LocalWearables.h"
@@ -87,17 +88,33 @@ syncd::EngineSettings complete(syncd::EngineSettings settings,
 }
 
 /// Where another place cannot be taken, the engine goes on with the one that it has.
-void followPlaces(syncd::Engine& engine, const preferences::SharedPreferences& preferences,
-                  const preferences::KeySet& keys) {
+template <class Take>
+void follow(Take take) {
     try {
-        if (keys.contains(preferences::musicFolder.key)) {
-            engine.setMusicFolder(preferences::chosenMusicFolder(preferences));
-        }
-        if (keys.contains(preferences::wearableDirectory.key)) {
-            engine.setWearableDirectory(preferences::chosenWearable(preferences));
-        }
+        take();
     } catch (const syncd::NotReady& error) {
         std::cerr << "quorl-syncd: " << error.what() << '\n';
+    }
+}
+
+void followPlaces(syncd::Engine& engine, syncd::ChosenWearable& wearable,
+                  const preferences::SharedPreferences& preferences,
+                  const preferences::KeySet& keys) {
+    if (keys.contains(preferences::musicFolder.key)) {
+        follow([&] { engine.setMusicFolder(preferences::chosenMusicFolder(preferences)); });
+    }
+    if (keys.contains(preferences::wearableDirectory.key) ||
+        keys.contains(preferences::wearableIdentity.key)) {
+        wearable.readAgain();
+    }
+}
+
+void followWearable(syncd::Engine& engine, const std::string& directory) {
+    const auto now = engine.wearable();
+    if (directory != (now.isEmbedded ? "" : now.directory)) {
+        follow([&] { engine.setWearableDirectory(directory); });
+    } else {
+        engine.refreshWearable();
     }
 }
 
@@ -127,7 +144,9 @@ int serve(const Options& options) {
     syncd::LoopTurns turns(loop);
     syncd::SharedChoices choices(*opened.preferences);
     syncd::LocalMusic music(loop);
-    syncd::LocalWearables wearables(loop, options.purpose, options.embeddedCapacity);
+    syncd::ChosenWearable wearable(loop, *opened.preferences, options.engine.wearableDirectory);
+    syncd::LocalWearables wearables(loop, options.purpose, options.embeddedCapacity,
+                                    wearable.objection());
     syncd::SyncThreads syncs(loop, [] { return std::make_shared<syncd::SleepInhibitor>(); });
     syncd::LastResults results(std::filesystem::path(g_get_user_state_dir()) / "quorl" /
                                (isTrial ? "trial" : ""));
@@ -139,17 +158,17 @@ int serve(const Options& options) {
     const syncd::EnginePorts ports{turns, choices, music, wearables, syncs, results, announcer};
     syncd::Engine engine(ports, complete(options.engine, *opened.preferences));
     preferencesDidChange = [&](const preferences::KeySet& keys) {
-        followPlaces(engine, *opened.preferences, keys);
+        followPlaces(engine, wearable, *opened.preferences, keys);
         engine.choicesDidChange();
     };
+    wearable.watch([&](const std::string& directory) { followWearable(engine, directory); });
     syncd::DirectoryCheck check;
-    const auto remember = [&](const auto& place) {
-        return
-            [&](const std::string& path) { return opened.preferences->set(place, path).problem; };
-    };
     const syncd::BusObjects::PlaceKeeper keeper{
         [&](const std::string& directory) { return check.objectionTo(directory); },
-        remember(preferences::musicFolder), remember(preferences::wearableDirectory)};
+        [&](const std::string& folder) {
+            return opened.preferences->set(preferences::musicFolder, folder).problem;
+        },
+        [&](const std::string& directory) { return wearable.remember(directory); }};
     objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine, keeper);
     try {
         loop.bus().requestName(engine::busNameFor(options.purpose));

@@ -3,6 +3,7 @@
 #include <filesystem>
 #include <mutex>
 #include <optional>
+#include <stdexcept>
 #include <system_error>
 #include <utility>
 
@@ -21,9 +22,11 @@ namespace {
 /// What is known of a wearable. Shared with the threads that look at it.
 class Known {
   public:
-    explicit Known(const wearable::Wearable& wearable) : lookout_(wearable) {}
+    Known(const wearable::Wearable& wearable, LocalWearables::Objection objection)
+        : objection_(std::move(objection)), lookout_(wearable) {}
 
     [[nodiscard]] wearable::Usage look() {
+        requireTheWearable();
         const auto usage = lookout_.look();
         if (identity().isEmbedded()) {
             const auto attachment = wearable::loadAttachment(open(identity()).get());
@@ -58,10 +61,20 @@ class Known {
     }
 
   private:
+    /// Throws `std::runtime_error` where another one is there.
+    void requireTheWearable() const {
+        const auto wearable = identity();
+        const auto problem = wearable.isEmbedded() ? std::string() : objection_(wearable.root);
+        if (!problem.empty()) {
+            throw std::runtime_error(problem);
+        }
+    }
+
     [[nodiscard]] static base::FileDescriptor open(const wearable::Wearable& wearable) {
         return base::openRoot(wearable.root.c_str());
     }
 
+    const LocalWearables::Objection objection_;
     wearable::Lookout lookout_;
     mutable std::mutex mutex_;
     wearable::Attachment attachment_;
@@ -70,9 +83,9 @@ class Known {
 class LocalWearable final : public WatchedWearable {
   public:
     LocalWearable(engine::BusLoop& loop, const wearable::Wearable& wearable,
-                  const WearablePort::Noticed& noticed)
+                  const WearablePort::Noticed& noticed, const LocalWearables::Objection& objection)
         : loop_(loop),
-          known_(std::make_shared<Known>(wearable)),
+          known_(std::make_shared<Known>(wearable, objection)),
           watch_(wearable.root,
                  [mailbox = loop.mailbox(), tell = lifeline_.whileThere(noticed)](
                      WearableNews news) { mailbox->post([tell, news] { tell(news); }); }),
@@ -121,7 +134,7 @@ std::unique_ptr<WatchedWearable> LocalWearables::watch(const std::string& direct
     const auto wearable = directory.empty()
                               ? wearable::Wearable::embedded(purpose_, embeddedCapacity_)
                               : wearable::Wearable{base::normal(directory), {}, false};
-    return std::make_unique<LocalWearable>(loop_, wearable, noticed);
+    return std::make_unique<LocalWearable>(loop_, wearable, noticed, objection_);
 }
 
 } // namespace quorl::syncd

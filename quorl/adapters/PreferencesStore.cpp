@@ -42,7 +42,8 @@ T stored(const Preference<T>& /*preference*/, std::optional<std::uint64_t> value
 /// What another program has changed. Any thread.
 void announce(const KeySet& keys,
               const std::weak_ptr<const PreferencesStore::PlacesChanged>& tell) {
-    const auto places = keys.count(musicFolder.key) + keys.count(wearableDirectory.key);
+    const auto places = keys.count(musicFolder.key) + keys.count(wearableDirectory.key) +
+                        keys.count(wearableIdentity.key);
     if (places < keys.size()) {
         SyncDefaults::announceChange();
     }
@@ -77,6 +78,10 @@ std::filesystem::path PreferencesStore::wearableDirectory() const {
     return preferences_ ? chosenWearable(*preferences_) : std::filesystem::path();
 }
 
+std::string PreferencesStore::wearableIdentity() const {
+    return preferences_ ? preferences_->get(preferences::wearableIdentity) : std::string();
+}
+
 void PreferencesStore::chooseMusicFolder(const std::filesystem::path& folder) {
     if (preferences_) {
         store(preferences::musicFolder, folder.string());
@@ -87,6 +92,7 @@ void PreferencesStore::choosePlaces(const std::filesystem::path& music,
                                     const std::filesystem::path& wearable) {
     chooseMusicFolder(music);
     if (preferences_) {
+        store(preferences::wearableIdentity, std::string());
         store(preferences::wearableDirectory, wearable.string());
     }
 }

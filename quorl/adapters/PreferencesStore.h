@@ -27,6 +27,9 @@ class PreferencesStore final : public SyncPreferencesStore {
     /// Where the chosen wearable is mounted; empty for the embedded one.
     [[nodiscard]] std::filesystem::path wearableDirectory() const;
 
+    /// Which drive that is on, as it stands in the settings; empty where the path alone counts.
+    [[nodiscard]] std::string wearableIdentity() const;
+
     /// Chooses the music folder.
     void chooseMusicFolder(const std::filesystem::path& folder);
 
