@@ -3,6 +3,7 @@
 #include "quorl/app/CommandLine.h"
 #include "quorl/commands/PlaylistList.h"
 #include "quorl/commands/RunCommands.h"
+#include "quorl/commands/WearableList.h"
 #include "quorl/reports/LibraryReport.h"
 #include "quorl/reports/Screenshot.h"
 #include "quorl/reports/StatusReport.h"
@@ -26,6 +27,8 @@ ExitCode run(char* program, const Options& options) {
         return printLibrary(options.places.music);
     case Options::Mode::Playlists:
         return printPlaylists(options);
+    case Options::Mode::Wearables:
+        return printWearables(options);
     case Options::Mode::Commands:
         return runCommands(options.commands);
     case Options::Mode::Status:

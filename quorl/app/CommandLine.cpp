@@ -58,6 +58,7 @@ struct Flags {
     bool text = false;
     bool library = false;
     bool playlists = false;
+    bool wearables = false;
     bool status = false;
 };
 
@@ -80,10 +81,20 @@ void addModes(CLI::App& app, Options& options, Flags& flags) {
     auto* playlists = app.add_flag("--playlists", flags.playlists,
                                    "Print the playlists that can be chosen, one a line: id, songs, "
                                    "bytes, name, separated by tabs; and end");
+    auto* wearables = app.add_flag(
+        "--wearables", flags.wearables,
+        "Print the wearables that can be chosen, one a line: * for the one that is chosen, bytes "
+        "free, bytes in all, name, directory, separated by tabs; and end");
     auto* status = app.add_flag("--status", flags.status,
                                 "Print how the sync and the wearable stand, and end");
-    excludeEachOther({text, screenshot, library, playlists, status});
-    app.add_flag("--json", options.json, "Print the status or the playlists as JSON");
+    excludeEachOther({text, screenshot, library, playlists, wearables, status});
+    app.add_flag("--json", options.json, "Print the status or a list as JSON");
+}
+
+constexpr auto usualMusic = "usual";
+
+std::filesystem::path full(const std::filesystem::path& path) {
+    return absolute(path).lexically_normal();
 }
 
 /// What a unit of a limit counts; nothing where it is none.
@@ -113,6 +124,20 @@ std::string takeLimit(const std::string& text, Commands& commands) {
 
 void addCommands(CLI::App& app, Commands& commands) {
     std::vector<CLI::Option*> all{
+        app.add_option("--use-wearable", commands.wearable,
+                       "Choose this wearable for good, by its name, the path of its directory, or "
+                       "\"this-device\" for the one in this machine")
+            ->type_name("WEARABLE"),
+        app.add_option_function<std::string>(
+               "--use-music",
+               [&commands](const std::string& folder) {
+                   if (folder.empty()) {
+                       throw CLI::ValidationError("--use-music", "name a folder");
+                   }
+                   commands.music = folder == usualMusic ? std::string() : full(folder).string();
+               },
+               "Choose this music folder for good, or \"usual\" for the user's own")
+            ->type_name("DIR"),
         app.add_option("--choose", commands.playlist,
                        "Choose this playlist, by its name or its id, or \"none\"")
             ->type_name("PLAYLIST"),
@@ -134,8 +159,8 @@ void addCommands(CLI::App& app, Commands& commands) {
     };
     app.get_option("--sync")->excludes(app.get_option("--cancel"));
     for (auto* command : all) {
-        for (const auto* other : {"--text", "--screenshot", "--library", "--playlists", "--status",
-                                  "--json", "--music", "--wearable"}) {
+        for (const auto* other : {"--text", "--screenshot", "--library", "--playlists",
+                                  "--wearables", "--status", "--json", "--music", "--wearable"}) {
             command->excludes(app.get_option(other));
         }
     }
@@ -144,11 +169,11 @@ void addCommands(CLI::App& app, Commands& commands) {
 void addPlaces(CLI::App& app, Places& places) {
     app.add_option(
            "--music", places.music,
-           "For a trial with this music folder: with a sync engine and settings of its own, "
-           "so that nothing of what is chosen changes")
+           "For this run only, a trial with this music folder: with a sync engine and settings of "
+           "its own, so that nothing of what is chosen changes")
         ->type_name("DIR");
     app.add_option("--wearable", places.wearable,
-                   "For a trial with the Velora that is mounted in this directory")
+                   "For this run only, a trial with the Velora that is mounted in this directory")
         ->type_name("DIR");
     app.add_option("--plugins", places.plugins, "Look for plug-ins here before all other places")
         ->type_name("DIR")
@@ -186,11 +211,12 @@ void addPictureOptions(CLI::App& app, Picture& picture) {
 
 Options::Mode modeOf(const Options& options, const Flags& flags) {
     const auto& commands = options.commands;
-    const bool isCommanded =
-        commands.playlist || commands.limit || commands.sync || commands.cancel || commands.wait;
+    const bool isCommanded = commands.wearable || commands.music || commands.playlist ||
+                             commands.limit || commands.sync || commands.cancel || commands.wait;
     return flags.text                      ? Options::Mode::Text
            : flags.library                 ? Options::Mode::Library
            : flags.playlists               ? Options::Mode::Playlists
+           : flags.wearables               ? Options::Mode::Wearables
            : flags.status                  ? Options::Mode::Status
            : isCommanded                   ? Options::Mode::Commands
            : !options.picture.file.empty() ? Options::Mode::Screenshot
@@ -200,7 +226,7 @@ Options::Mode modeOf(const Options& options, const Flags& flags) {
 void complete(Places& places) {
     for (auto* place : {&places.music, &places.wearable, &places.plugins}) {
         if (!place->empty()) {
-            *place = absolute(*place).lexically_normal();
+            *place = full(*place);
         }
     }
 }
@@ -210,8 +236,13 @@ void requireStorable(const Options& options) {
     const bool isKept = options.mode == Options::Mode::Window ||
                         options.mode == Options::Mode::Text ||
                         options.mode == Options::Mode::Screenshot;
-    for (const auto& place : {options.places.music.native(), options.places.wearable.native()}) {
-        if (isKept && base::validUtf8(place) != place) {
+    const auto& commands = options.commands;
+    std::vector<std::string> kept{commands.music.value_or(""), commands.wearable.value_or("")};
+    if (isKept) {
+        kept.insert(kept.end(), {options.places.music.string(), options.places.wearable.string()});
+    }
+    for (const auto& place : kept) {
+        if (base::validUtf8(place) != place) {
             throw CLI::ValidationError(base::printable(place),
                                        "the name of this folder is not in UTF-8, rename it");
         }
@@ -233,8 +264,8 @@ std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* ar
     addPictureOptions(app, options.picture);
     try {
         app.parse(argc, argv);
-        if (options.json && !flags.status && !flags.playlists) {
-            throw CLI::RequiresError("--json", "--status or --playlists");
+        if (options.json && !flags.status && !flags.playlists && !flags.wearables) {
+            throw CLI::RequiresError("--json", "--status, --playlists or --wearables");
         }
         options.mode = modeOf(options, flags);
         complete(options.places);

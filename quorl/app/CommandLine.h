@@ -19,6 +19,8 @@ struct LimitChoice {
 
 /// What is to be done without showing anything, in this order.
 struct Commands {
+    std::optional<std::string> wearable; ///< for good: its name, its path, or "this-device"
+    std::optional<std::string> music;    ///< the music folder, for good; empty for the usual one
     std::optional<std::string> playlist; ///< to be chosen: its name, its id, or "none"
     std::optional<LimitChoice> limit;    ///< to be chosen
     bool cancel = false;                 ///< the running sync
@@ -28,13 +30,13 @@ struct Commands {
 
 /// What the command line asks for.
 struct Options {
-    enum class Mode { Window, Text, Screenshot, Library, Playlists, Status, Commands };
+    enum class Mode { Window, Text, Screenshot, Library, Playlists, Wearables, Status, Commands };
 
     Mode mode = Mode::Window;
     Places places;
     Picture picture; ///< of the screenshot
     Commands commands;
-    bool json = false; ///< of the status and the playlists
+    bool json = false; ///< of the status and the lists
 };
 
 /// What the arguments ask for, or what to end with at once: after `--help` and `--version`, which

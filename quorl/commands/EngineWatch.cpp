@@ -29,4 +29,12 @@ std::string EngineWatch::ask(void (engine::Client::*what)(engine::Client::Reply)
     return answer.get_future().get();
 }
 
+std::string EngineWatch::tell(void (engine::Client::*what)(const std::string&,
+                                                           engine::Client::Reply),
+                              const std::string& text) {
+    std::promise<std::string> answer;
+    (client_.*what)(text, [&answer](const std::string& problem) { answer.set_value(problem); });
+    return answer.get_future().get();
+}
+
 } // namespace quorl

@@ -28,6 +28,11 @@ class EngineWatch {
     /// done.
     [[nodiscard]] std::string ask(void (engine::Client::*what)(engine::Client::Reply));
 
+    /// The same with what it is to be given.
+    [[nodiscard]] std::string tell(void (engine::Client::*what)(const std::string&,
+                                                                engine::Client::Reply),
+                                   const std::string& text);
+
   private:
     void take(const engine::Event& event);
 

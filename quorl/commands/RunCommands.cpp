@@ -2,8 +2,9 @@
 
 #include <iostream>
 
-#include "quorl/commands/EngineWatch.h"
 #include "quorl/app/OfferedPlaylists.h"
+#include "quorl/commands/EngineWatch.h"
+#include "quorl/commands/OfferedWearables.h"
 #include "services/media/MusicFolder.h"
 #include "services/preferences/ChosenPlaces.h"
 
@@ -103,7 +104,35 @@ Problem instruct(SharedPreferences& preferences, const Commands& commands) {
     return problem.empty() && commands.wait ? wait(engine, preferences, sync, before) : problem;
 }
 
+Problem useWearable(EngineWatch& engine, const std::string& wanted) {
+    const auto found = findOffered(finding::findNow(finding::homeDirectory()), wanted);
+    if (const auto* problem = std::get_if<std::string>(&found)) {
+        return *problem;
+    }
+    return engine.tell(&engine::Client::setWearableDirectory,
+                       std::get<std::filesystem::path>(found).string());
+}
+
+/// The engine takes a place before it writes it into the settings.
+Problem usePlaces(const Commands& commands) {
+    if (!commands.wearable && !commands.music) {
+        return {};
+    }
+    EngineWatch engine;
+    const auto there = engine.waitUntil([](const engine::EngineState& /*state*/) { return true; });
+    if (const auto* problem = std::get_if<std::string>(&there)) {
+        return *problem;
+    }
+    const auto problem = commands.wearable ? useWearable(engine, *commands.wearable) : Problem();
+    return problem.empty() && commands.music
+               ? engine.tell(&engine::Client::setMusicFolder, *commands.music)
+               : problem;
+}
+
 Problem run(const Commands& commands) {
+    if (const auto problem = usePlaces(commands); !problem.empty()) {
+        return problem;
+    }
     const auto opened = SharedPreferences::open({});
     if (!opened.problem.empty()) {
         return opened.problem;

@@ -1,6 +1,7 @@
 // What is done from the command line without showing anything.
 
 #include <filesystem>
+#include <fstream>
 
 #include <gmock/gmock.h>
 #include <nlohmann/json.hpp>
@@ -113,6 +114,53 @@ TEST_F(Commands, limitThatIsNoneIsAMistake) {
     EXPECT_EQ(storedPreference("asset-sync-limit"), "@mt 500");
 }
 
+/// A directory of the home to which music was synced before.
+class KnownWearable {
+  public:
+    explicit KnownWearable(const std::string& name)
+        : directory_(std::filesystem::path(qgetenv("HOME").toStdString()) / name) {
+        create_directories(directory_ / ".quorl");
+        std::ofstream(directory_ / ".quorl/manifest.1") << "anything";
+    }
+
+    ~KnownWearable() { remove_all(directory_); }
+
+    KnownWearable(const KnownWearable&) = delete;
+    KnownWearable& operator=(const KnownWearable&) = delete;
+
+    [[nodiscard]] std::string path() const { return directory_.string(); }
+
+  private:
+    std::filesystem::path directory_;
+};
+
+TEST_F(Commands, wearablesAreThoseThatWereFoundWithTheChosenOneMarked) {
+    const KnownWearable velora("Velora");
+
+    EXPECT_EQ(run({"--wearables"}), 0) << errors_;
+    EXPECT_THAT(output_, AllOf(HasSubstr("\tVelora\t" + velora.path() + "\n"),
+                               HasSubstr("*\t\t\tOn this device (for trying out)\t\n")));
+
+    EXPECT_EQ(run({"--wearables", "--json"}), 0) << errors_;
+    const auto list = nlohmann::json::parse(output_);
+    EXPECT_EQ(list.front()["directory"], velora.path());
+    EXPECT_TRUE(list.front()["hasMusic"]);
+    EXPECT_GT(list.front()["capacityBytes"], 0);
+    EXPECT_TRUE(list.back()["embedded"]);
+    EXPECT_TRUE(list.back()["chosen"]);
+}
+
+TEST_F(Commands, withoutAnEngineNoWearableIsChosen) {
+    EXPECT_EQ(run({"--use-wearable", "this-device"}), 1);
+    EXPECT_THAT(errors_, HasSubstr("Start quorl-syncd"));
+}
+
+TEST_F(Commands, placesForGoodAreNotForATrial) {
+    EXPECT_EQ(run({"--use-music", ""}), 2);
+    EXPECT_EQ(run({"--use-music", "/a", "--music", "/b"}), 2);
+    EXPECT_EQ(run({"--use-wearable", "/a", "--wearable", "/b"}), 2);
+}
+
 TEST_F(Commands, withoutAnEngineWaitingSaysWhatToDo) {
     EXPECT_EQ(run({"--wait"}), 1);
     EXPECT_THAT(errors_, HasSubstr("Start quorl-syncd"));
@@ -145,6 +193,34 @@ TEST_F(CommandsWithEngine, waitingEndsWhenTheChoiceIsOnTheWearable) {
 
     EXPECT_EQ(run({"--choose", "Long Run", "--wait"}), 0) << errors_;
     EXPECT_TRUE(std::filesystem::exists(wearable / "Long Run.m3u8"));
+}
+
+TEST_F(CommandsWithEngine, wearableIsChosenForGoodByNameByPathOrAsThisDevice) {
+    const KnownWearable velora("Velora");
+    const KnownWearable other("Other");
+
+    EXPECT_EQ(run({"--use-wearable", "Velora"}), 0) << errors_;
+    EXPECT_EQ(storedPreference("wearable-directory"), "'" + velora.path() + "'");
+    EXPECT_EQ(run({"--use-wearable", other.path() + "/"}), 0) << errors_;
+    EXPECT_EQ(storedPreference("wearable-directory"), "'" + other.path() + "'");
+    EXPECT_EQ(storedPreference("wearable-identity"), "''") << "it is on no drive";
+    EXPECT_EQ(run({"--use-wearable", "this-device"}), 0) << errors_;
+    EXPECT_EQ(storedPreference("wearable-directory"), "''");
+}
+
+TEST_F(CommandsWithEngine, wearableThatNobodyKnowsChangesNothing) {
+    EXPECT_EQ(run({"--use-wearable", "Nothing"}), 1);
+    EXPECT_THAT(errors_, HasSubstr("quorl --wearables"));
+    EXPECT_EQ(storedPreference("wearable-directory"), "''");
+}
+
+TEST_F(CommandsWithEngine, musicFolderIsChosenForGood) {
+    const TemporaryDirectory folder;
+
+    EXPECT_EQ(run({"--use-music", folder.path().string()}), 0) << errors_;
+    EXPECT_EQ(storedPreference("music-folder"), "'" + folder.path().string() + "'");
+    EXPECT_EQ(run({"--use-music", "usual"}), 0) << errors_;
+    EXPECT_EQ(storedPreference("music-folder"), "''");
 }
 
 TEST_F(CommandsWithEngine, waitingForNothingIsAFailure) {

@@ -11,7 +11,7 @@ constexpr int patience = 60'000; // milliseconds
 
 QString schemaOf(const QString& key, base::Purpose purpose) {
     const bool isPlace =
-        key == QStringLiteral("music-folder") || key == QStringLiteral("wearable-directory");
+        key == QStringLiteral("music-folder") || key.startsWith(QStringLiteral("wearable-"));
     return (purpose == base::Purpose::Trial ? QStringLiteral("org.quorl.Velora.Trial.")
                                             : QStringLiteral("org.quorl.Velora.")) +
            (isPlace ? QStringLiteral("Places") : QStringLiteral("AssetSync"));
