@@ -81,14 +81,21 @@ NSArray<DVSession> EngineLink::sessions(const std::string& type) const {
 }
 
 void EngineLink::ask(Request request, Done done) {
-    (client_.*
-     request)([inbox = std::weak_ptr(inbox_), done = std::move(done)](const std::string& problem) {
+    (client_.*request)(onMainQueue(std::move(done)));
+}
+
+void EngineLink::chooseWearable(const std::filesystem::path& directory, Done done) {
+    client_.setWearableDirectory(directory.string(), onMainQueue(std::move(done)));
+}
+
+engine::Client::Reply EngineLink::onMainQueue(Done done) const {
+    return [inbox = std::weak_ptr(inbox_), done = std::move(done)](const std::string& problem) {
         dispatch_async(dispatch_get_main_queue(), [inbox, done, problem] {
             if (!inbox.expired()) {
                 done(problem);
             }
         });
-    });
+    };
 }
 
 void EngineLink::fetch() {

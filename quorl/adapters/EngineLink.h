@@ -1,5 +1,6 @@
 #pragma once
 
+#include <filesystem>
 #include <functional>
 
 #include "quorl/adapters/EngineSession.h"
@@ -37,6 +38,9 @@ class EngineLink final {
     /// `done` is called once, unless the link is gone by then.
     void ask(Request request, Done done);
 
+    /// The same; an empty directory stands for the embedded wearable.
+    void chooseWearable(const std::filesystem::path& directory, Done done);
+
     void setConnected(bool connected) { client_.setConnected(connected); }
 
     void setOnCharger(bool onCharger) { client_.setOnCharger(onCharger); }
@@ -44,6 +48,7 @@ class EngineLink final {
   private:
     struct Inbox;
 
+    [[nodiscard]] engine::Client::Reply onMainQueue(Done done) const;
     void fetch();
     void take(const engine::Event& event);
     void tellObservers(const engine::Event& event) const;

@@ -1,5 +1,7 @@
 #include "quorl/app/CompanionHost.h"
 
+#include <algorithm>
+
 #include "quorl/app/EngineTrouble.h"
 #include "quorl/app/FolderTrouble.h"
 #include "quorl/app/OfferedPlaylists.h"
@@ -32,6 +34,7 @@ CompanionHost::CompanionHost(const Places& places, Screen& screen, Notices& noti
       syncDefaults_(std::make_shared<SyncDefaults>(store_)),
       library_(std::make_shared<MusicLibrary>()),
       wearable_(wearableAt(places.wearable, purpose_)),
+      wearableDirectory_(places.wearable),
       engine_(purpose_, [this](const engine::Event& event) { engineDidChange(event); }) {
     takePlaces(places);
 }
@@ -53,7 +56,8 @@ void CompanionHost::startTrialEngine() {
 
 /// Another music folder or wearable was chosen, mostly by another program.
 void CompanionHost::placesDidChange() {
-    wearable_.setWearable(wearableAt(store_.wearableDirectory(), purpose_));
+    followWearable();
+    tellObserver();
     if (libraryTaken_) {
         readLibrary();
     }
@@ -68,8 +72,24 @@ void CompanionHost::engineDidChange(const engine::Event& event) {
     } else {
         noticeEngine();
     }
+    followWearable();
+    tellObserver();
+}
+
+void CompanionHost::tellObserver() const {
     if (engineChanged_) {
         engineChanged_();
+    }
+}
+
+/// The engine knows where the chosen drive is mounted now; without it, where it was chosen.
+void CompanionHost::followWearable() {
+    const auto& now = engine_.state().wearable;
+    const std::filesystem::path ofEngine = now.isEmbedded ? std::string() : now.directory;
+    const auto directory = engine_.state().isThere ? ofEngine : store_.wearableDirectory();
+    if (directory != wearableDirectory_) {
+        wearableDirectory_ = directory;
+        wearable_.setWearable(wearableAt(directory, purpose_));
     }
 }
 
@@ -97,6 +117,57 @@ void CompanionHost::chooseMusicFolder() {
         store_.chooseMusicFolder(folder);
         placesDidChange(); // the store announces the changes of others only
     });
+}
+
+void CompanionHost::findWearables(Finding finding) {
+    if (finding == Finding::Wanted && !found_) {
+        found_.emplace([this] { tellObserver(); });
+    } else if (finding == Finding::Over && found_ && !found_->isEjecting()) {
+        found_.reset();
+    }
+}
+
+WearableShelf CompanionHost::wearables() const {
+    if (!found_ || !found_->found()) {
+        return {};
+    }
+    const auto& now = *found_->found();
+    const auto chosen = finding::chosenIn(store_.wearableDirectory(), store_.wearableIdentity());
+    const auto* const offer = finding::chosenOf(now.offers, chosen, now.surroundings);
+    WearableShelf shelf{true, now.offers, {}, {}, found_->safeToRemove()};
+    if (offer != nullptr) {
+        shelf.chosen = static_cast<std::size_t>(offer - now.offers.data());
+    } else {
+        shelf.missing = chosen.directory.filename().string();
+    }
+    return shelf;
+}
+
+void CompanionHost::chooseWearable(const std::filesystem::path& directory) {
+    engine_.chooseWearable(directory, [this](const std::string& problem) {
+        notices_.set(Notices::Topic::Request, problem);
+    });
+}
+
+void CompanionHost::ejectWearable(const std::filesystem::path& directory) {
+    const auto& sessions = engine_.state().sessions;
+    if (std::ranges::any_of(sessions, [](const auto& session) { return !session.isFinished; })) {
+        notices_.set(Notices::Topic::Request,
+                     "Music is being synced. Stop that or wait for its end, then eject the drive.");
+        return;
+    }
+    const auto offers = wearables().offers;
+    const auto offer = std::ranges::find(offers, directory, &finding::Offer::directory);
+    if (offer != offers.end()) {
+        found_->eject(*offer, [this](const std::string& problem) {
+            notices_.set(Notices::Topic::Request, problem);
+        });
+    }
+}
+
+void CompanionHost::chooseOtherWearable() {
+    askForFolder_(wearableDirectory_,
+                  [this](const std::filesystem::path& folder) { chooseWearable(folder); });
 }
 
 void CompanionHost::openLibrary(std::function<void()> taken) {

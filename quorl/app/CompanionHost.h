@@ -1,6 +1,7 @@
 #pragma once
 
 #include "quorl/adapters/EngineLink.h"
+#include "quorl/adapters/FoundWearables.h"
 #include "quorl/adapters/MusicLibrary.h"
 #include "quorl/adapters/PreferencesStore.h"
 #include "quorl/adapters/TrialEngine.h"
@@ -68,11 +69,22 @@ class CompanionHost final : public Host, public PageServices {
 
     void setOnCharger(bool isOnCharger) override { engine_.setOnCharger(isOnCharger); }
 
+    void findWearables(Finding finding) override;
+    [[nodiscard]] WearableShelf wearables() const override;
+    void chooseWearable(const std::filesystem::path& directory) override;
+    void ejectWearable(const std::filesystem::path& directory) override;
+
+    [[nodiscard]] bool canAskForFolder() const override { return askForFolder_ != nullptr; }
+
+    void chooseOtherWearable() override;
+
   private:
     void noticeProblems(const media::Inventory& inventory);
     void noticeEngine();
     void chooseMusicFolder();
     void engineDidChange(const engine::Event& event);
+    void tellObserver() const;
+    void followWearable();
     void placesDidChange();
     void readLibrary();
 
@@ -84,6 +96,9 @@ class CompanionHost final : public Host, public PageServices {
     std::shared_ptr<MusicLibrary> library_;
     std::function<void()> libraryTaken_;
     WearableUsage wearable_;
+    /// The directory of that; empty for the embedded one.
+    std::filesystem::path wearableDirectory_;
+    std::optional<FoundWearables> found_; ///< nothing while nobody wants to know
     std::function<void()> engineChanged_;
     AskForFolder askForFolder_;
     bool isEngineHeardOf_ = false;           ///< or of there being none

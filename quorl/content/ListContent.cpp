@@ -6,6 +6,7 @@
 
 #include "platform/HostApp.h"
 #include "quorl/content/ButtonCell.h"
+#include "quorl/content/ChoiceRow.h"
 #include "quorl/content/ProgressCell.h"
 #include "quorl/content/SwitchCell.h"
 #include "runtime/lists/ListView.h"
@@ -58,6 +59,8 @@ std::shared_ptr<UITableViewCell> makeCell(const ListView::Row& row, UITableViewC
     cell->detailTextLabel().setText(row.value);
     if (row.specifier->detailControllerClass()) {
         cell->setAccessoryType(UITableViewCellAccessoryType::DisclosureIndicator);
+    } else if (row.specifier->propertyForKey(RowChosenKey) == "yes") {
+        cell->setAccessoryType(UITableViewCellAccessoryType::Checkmark);
     }
     cell->layoutSubviews();
     return cell;
@@ -74,7 +77,8 @@ std::shared_ptr<UITableViewCell> cellOf(const ListView::Row& row) {
     if (row.specifier->cellType() == PSCellType::Switch) {
         return switchOf(row);
     }
-    if (row.specifier->cellType() == PSCellType::Button) {
+    const bool isChoice = row.specifier->propertyForKey(RowChosenKey).has_value();
+    if (row.specifier->cellType() == PSCellType::Button && !isChoice) {
         return buttonOf(row);
     }
     if (const auto progress = row.specifier->propertyForKey(RowProgressKey)) {

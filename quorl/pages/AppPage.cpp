@@ -4,6 +4,7 @@
 #include <array>
 #include <charconv>
 
+#include "quorl/content/ChoiceRow.h"
 #include "quorl/content/ProgressCell.h"
 
 namespace quorl {
@@ -19,8 +20,9 @@ bool isAlike(const std::shared_ptr<PSSpecifier>& one, const std::shared_ptr<PSSp
 }
 
 /// Takes over all in which rows of one name and kind can differ.
-void takeLooks(PSSpecifier& row, const PSSpecifier& from) {
-    for (const auto key : {RowValueKey, RowProgressKey, PSFooterTextGroupKey}) {
+void takeLooks(PSSpecifier& row, const PSSpecifier& from, std::string_view subjectKey) {
+    for (const auto key :
+         {RowValueKey, RowProgressKey, RowChosenKey, PSFooterTextGroupKey, subjectKey}) {
         row.setProperty_forKey(from.propertyForKey(key), key);
     }
 }
@@ -58,7 +60,7 @@ void AppPage::refresh() {
     const auto now = std::make_shared<Rows>(rows());
     if (std::equal(shown->begin(), shown->end(), now->begin(), now->end(), isAlike)) {
         for (std::size_t index = 0; index < shown->size(); ++index) {
-            takeLooks(*(*shown)[index], *(*now)[index]);
+            takeLooks(*(*shown)[index], *(*now)[index], RowSubjectKey);
         }
     } else {
         _specifiers = now;
@@ -91,6 +93,13 @@ AppPage::Row AppPage::toggle(std::string name, bool isOn, PSSetter set) {
 
 AppPage::Row AppPage::button(std::string name, PSSetter act) {
     return make(std::move(name), PSCellType::Button, "", act);
+}
+
+AppPage::Row AppPage::choice(std::string name, const std::string& text, Chosen chosen,
+                             PSSetter act) {
+    auto row = make(std::move(name), PSCellType::Button, text, act);
+    row->setProperty_forKey(chosen == Chosen::Yes ? "yes" : "no", RowChosenKey);
+    return row;
 }
 
 AppPage::Row AppPage::link(std::string name, const std::string& text, const Class& page) {

@@ -46,6 +46,15 @@ class AppPage : public PSListController {
 
     [[nodiscard]] Row button(std::string name, PSSetter act);
 
+    enum class Chosen { No, Yes };
+
+    /// One of several of which one is chosen.
+    [[nodiscard]] Row choice(std::string name, const std::string& text, Chosen chosen,
+                             PSSetter act);
+
+    /// The property of a row that tells the page what the row is about.
+    static constexpr std::string_view RowSubjectKey = "subject";
+
     /// Opens a page.
     [[nodiscard]] Row link(std::string name, const std::string& text, const Class& page);
 

@@ -5,6 +5,7 @@
 
 #include "platform/SizeFormatter.h"
 #include "quorl/pages/SyncPage.h"
+#include "quorl/pages/WearablesPage.h"
 
 namespace quorl {
 
@@ -66,6 +67,7 @@ void FrontPage::addWearable(Rows& rows) {
     rows.push_back(value("Last Complete Sync",
                          engine.lastComplete == 0 ? "Not yet" : timeText(engine.lastComplete)));
     rows.push_back(group(std::nullopt, {}));
+    rows.push_back(link("Wearable", "", Class::of<WearablesPage>()));
     rows.push_back(link("Sync", SyncPage::summaryOf(state()), Class::of<SyncPage>()));
 }
 

@@ -128,7 +128,7 @@ TEST_F(WithEngine, offTheChargerThePlaylistWaits) {
     quorl.readUntil("  2  Simulated Charger: on\n");
     quorl.say("2");
     quorl.readUntil("  2  Simulated Charger: off\n");
-    quorl.say("6");
+    quorl.say("7");
     quorl.say("1");
     quorl.readUntil("  3  ✓ None\n");
     quorl.say("2");

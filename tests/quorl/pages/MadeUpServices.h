@@ -19,7 +19,26 @@ class MadeUpServices final : public PageServices {
 
     void setOnCharger(bool isOnCharger) override { state.wearable.isOnCharger = isOnCharger; }
 
+    void findWearables(Finding finding) override { isFinding = finding == Finding::Wanted; }
+
+    [[nodiscard]] WearableShelf wearables() const override { return shelf; }
+
+    void chooseWearable(const std::filesystem::path& directory) override {
+        asked.push_back("choose " + directory.string());
+    }
+
+    void ejectWearable(const std::filesystem::path& directory) override {
+        asked.push_back("eject " + directory.string());
+    }
+
+    [[nodiscard]] bool canAskForFolder() const override { return true; }
+
+    void chooseOtherWearable() override { asked.emplace_back("choose another"); }
+
     engine::EngineState state;
+    bool isFinding = false;
+    WearableShelf shelf;
+    std::vector<std::string> asked;
     std::vector<EngineLink::Request> requests;
 };
 

@@ -1,0 +1,120 @@
+#include "quorl/pages/WearablesPage.h"
+
+#include <algorithm>
+
+#include "platform/SizeFormatter.h"
+#include "services/base/Utf8.h"
+
+namespace quorl {
+
+namespace {
+
+std::string sizeText(std::uint64_t bytes) { return CPFSSizeStrings(static_cast<float>(bytes)); }
+
+/// The embedded one has as much room as the front page says.
+std::string textOf(const finding::Offer& offer) {
+    if (offer.isEmbedded()) {
+        return {};
+    }
+    if (!offer.space) {
+        return "Does not answer";
+    }
+    return sizeText(offer.space->available) + " of " + sizeText(offer.space->capacity) + " free";
+}
+
+/// Not a directory of it, which goes with it.
+bool isEjectable(const finding::Offer& offer) {
+    return offer.removal && offer.identity && offer.identity->mountPoint == offer.directory;
+}
+
+bool isSyncing(const engine::EngineState& state) {
+    return std::ranges::any_of(state.sessions,
+                               [](const auto& session) { return !session.isFinished; });
+}
+
+constexpr auto explanation =
+    "Drives that are plugged in, and folders that music was synced to before. Music is only ever "
+    "put on the one that is chosen; what else is on it stays as it is.";
+
+} // namespace
+
+bool WearablesPage::init() {
+    setTitle("Wearable");
+    return AppPage::init();
+}
+
+void WearablesPage::viewWillAppear(bool animated) {
+    services().findWearables(PageServices::Finding::Wanted);
+    AppPage::viewWillAppear(animated);
+}
+
+void WearablesPage::viewDidDisappear(bool animated) {
+    AppPage::viewDidDisappear(animated);
+    services().findWearables(PageServices::Finding::Over);
+}
+
+AppPage::Rows WearablesPage::rows() {
+    const auto shelf = services().wearables();
+    Rows rows{group(std::nullopt, shelf.isComplete ? explanation : "Looking for wearables…")};
+    addMissing(rows);
+    addOffers(rows);
+    if (services().canAskForFolder()) {
+        rows.push_back(group(std::nullopt, {}));
+        rows.push_back(
+            button("Other Directory…", PSSetter::of<&WearablesPage::chooseOther>("chooseOther::")));
+    }
+    addRemovals(rows);
+    return rows;
+}
+
+void WearablesPage::addOffers(Rows& rows) {
+    const auto shelf = services().wearables();
+    for (std::size_t index = 0; index < shelf.offers.size(); ++index) {
+        const auto& offer = shelf.offers[index];
+        rows.push_back(choice(base::printable(offer.name), textOf(offer),
+                              shelf.chosen == index ? Chosen::Yes : Chosen::No,
+                              PSSetter::of<&WearablesPage::choose>("choose::")));
+        rows.back()->setProperty_forKey(offer.directory.string(), RowSubjectKey);
+    }
+}
+
+/// The chosen one is shown also where it is away.
+void WearablesPage::addMissing(Rows& rows) {
+    const auto missing = services().wearables().missing;
+    if (!missing.empty()) {
+        rows.push_back(choice(base::printable(missing),
+                              state().wearable.isConnected ? "Connected" : "Not connected",
+                              Chosen::Yes, PSSetter::of<&WearablesPage::choose>("choose::")));
+    }
+}
+
+/// A drive to which music is being synced stays where it is.
+void WearablesPage::addRemovals(Rows& rows) {
+    const auto shelf = services().wearables();
+    for (const auto& name : shelf.safeToRemove) {
+        rows.push_back(value(base::printable(name), "Safe to remove"));
+    }
+    for (const auto& offer : shelf.offers) {
+        if (isEjectable(offer) && !isSyncing(state())) {
+            rows.push_back(button("Eject “" + base::printable(offer.name) + "”",
+                                  PSSetter::of<&WearablesPage::eject>("eject::")));
+            rows.back()->setProperty_forKey(offer.directory.string(), RowSubjectKey);
+        }
+    }
+}
+
+void WearablesPage::choose(const std::shared_ptr<NSObject>& /*nothing*/, const Row& row) {
+    if (const auto directory = row->propertyForKey(RowSubjectKey)) {
+        services().chooseWearable(*directory);
+    }
+}
+
+void WearablesPage::eject(const std::shared_ptr<NSObject>& /*nothing*/, const Row& row) {
+    services().ejectWearable(row->propertyForKey(RowSubjectKey).value_or(""));
+}
+
+void WearablesPage::chooseOther(const std::shared_ptr<NSObject>& /*nothing*/, const Row& /*row*/) {
+    services().chooseOtherWearable();
+}
+
+} // namespace quorl
