@@ -37,8 +37,8 @@ _quorl() {
         ;;
     --limit | --size | --scale) ;;
     *)
-        mapfile -t COMPREPLY < <(compgen -W '--text --screenshot --library --playlists --status --json
-            --choose --limit --sync --cancel --wait --music --wearable --plugins --size --scale --dark
+        mapfile -t COMPREPLY < <(compgen -W '--text --screenshot --library --playlists --wearables --status
+            --json --use-wearable --use-music --choose --limit --sync --cancel --wait --music --wearable --plugins --size --scale --dark
             --pane --help -h --version' -- "$current")
         ;;
     esac
