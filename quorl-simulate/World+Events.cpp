@@ -163,8 +163,7 @@ void World::happenToChoices(Happening what, Random& random) {
 }
 
 void World::plug(bool isPlugged, bool isOther, Random& random) {
-    device().disk.losePower(random);
-    device().takeFilesOfOthers();
+    device().losePower(random);
     current_ = isOther ? 1 - current_ : current_;
     isPlugged_ = isPlugged;
     ++pluggings_;
@@ -313,6 +312,7 @@ void World::happenToFiles(Happening what, Random& random) {
             disk.sync(file);
             others[ours] = {disk.read(file), disk.status(file).modified};
         }
+        device().rereadFilesOfOthers(); // it may have been a second name of one
     } else if (!others.empty()) {
         const auto [name, contents] =
             *std::next(others.begin(), static_cast<std::ptrdiff_t>(random.below(others.size())));

@@ -250,8 +250,7 @@ void World::revive() {
         const Quiet quiet(isQuiet_);
         Random random(seedOfEnd_);
         for (auto& wearable : wearables_) {
-            wearable.disk.losePower(random);
-            wearable.takeFilesOfOthers();
+            wearable.losePower(random);
         }
         choices_.losePower(random);
     }
@@ -313,6 +312,7 @@ syncd::WatchedWearable::Answer World::look() {
     try {
         return syncd::Sight{identity(), device().usage(), attachment_};
     } catch (const wearable::BadManifest& error) {
+        note(Trouble::BadManifest);
         return wearable::Unseen{error.what(), false};
     }
 }

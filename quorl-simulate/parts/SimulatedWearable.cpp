@@ -141,6 +141,19 @@ void SimulatedWearable::loseList() {
     excuse();
 }
 
+/// What had been removed may be there again, and nobody knows it any more where the list was lost.
+void SimulatedWearable::losePower(Random& random) {
+    const auto before = disk.names(music());
+    disk.losePower(random);
+    takeFilesOfOthers();
+    for (const auto& name : disk.names(music())) {
+        const bool isBack = std::ranges::find(before, name) == before.end();
+        if (isDamaged && isBack) {
+            orphans.insert(name);
+        }
+    }
+}
+
 void SimulatedWearable::takeOrphans() {
     const auto names = disk.names(music());
     orphans.insert(names.begin(), names.end());

@@ -92,14 +92,16 @@ struct SimulatedWearable {
     /// What the others have is as they have left it just now.
     void rereadFilesOfOthers();
 
-    /// What the others have is what there is now.
-    void takeFilesOfOthers();
+    /// What is left of what was not durable follows from `random`.
+    void losePower(Random& random);
 
     /// In several lines.
     [[nodiscard]] std::string text() const;
 
     [[nodiscard]] bool isManifestAsExcused() const;
     void rememberExcused();
+    /// What the others have is what there is now.
+    void takeFilesOfOthers();
     void takeOrphans();
     void takePossibleTwins();
 };

@@ -193,8 +193,10 @@ Conclusion conclusionOf(const Outcome& outcome, const std::string& rememberProbl
     if (outcome.kind == Kind::Stopped) {
         return {false, whyStopped.value_or(outcome.message), false, false};
     }
-    return {false, isSent ? engine::other(rememberProblem) : outcome.message, true,
-            !whyStopped && (isSent || outcome.mayPass)};
+    // Whoever has cancelled it has given it up, and may have taken that back since.
+    const bool isCancelled = whyStopped && whyStopped->code == code::cancelled;
+    return {false, isSent ? engine::other(rememberProblem) : outcome.message, !isCancelled,
+            !isCancelled && (isSent || outcome.mayPass)};
 }
 
 } // namespace quorl::syncd

@@ -259,9 +259,9 @@ Room roomFor(const Plan& plan, std::uint64_t available) {
     return needed <= available ? Room::EnoughWithoutUnwanted : Room::NotEnough;
 }
 
-Files removable(Files unfinished, const Files& ours) {
+Files removable(Files unfinished, const Files& finished) {
     std::erase_if(unfinished, [&](const auto& file) {
-        return std::ranges::any_of(ours,
+        return std::ranges::any_of(finished,
                                    [&](const auto& other) { return other.second == file.second; });
     });
     return unfinished;

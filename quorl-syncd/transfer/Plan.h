@@ -84,8 +84,8 @@ enum class Room { Enough, EnoughWithoutUnwanted, NotEnough };
 /// Which of the unfinished files that earlier syncs have left behind may be removed: on FAT, what
 /// has the size and time of a finished one may be a second name of that, and both share what one of
 /// them would give away.
-/// @param ours the files that the manifest names.
-[[nodiscard]] Files removable(Files unfinished, const Files& ours);
+/// @param finished whoever's they are: a hand may have changed one of ours since.
+[[nodiscard]] Files removable(Files unfinished, const Files& finished);
 
 /// The playlist file of the order, with those of its songs that are among `songs`, under the names
 /// that they have on the device.

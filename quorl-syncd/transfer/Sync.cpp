@@ -36,15 +36,26 @@ Files filesOf(const wearable::Manifest& manifest, Device& device) {
     return files;
 }
 
-Files unfinishedAmong(const std::vector<std::string>& names, Device& device) {
+enum class Stage { Finished, Unfinished };
+
+Files filesAmong(const std::vector<std::string>& names, Stage stage, Device& device) {
     Files files;
     for (const auto& name : names) {
-        const auto file = Device::isUnfinished(name) ? device.find(name) : std::nullopt;
+        const bool isWanted = Device::isUnfinished(name) == (stage == Stage::Unfinished);
+        const auto file = isWanted ? device.find(name) : std::nullopt;
         if (file) {
             files.emplace(name, *file);
         }
     }
     return files;
+}
+
+/// Unfinished files that may be removed.
+Files leftoversAmong(const std::vector<std::string>& names, Device& device) {
+    auto unfinished = filesAmong(names, Stage::Unfinished, device);
+    return unfinished.empty()
+               ? unfinished
+               : removable(std::move(unfinished), filesAmong(names, Stage::Finished, device));
 }
 
 /// What there will be to write on once these are gone.
@@ -126,7 +137,7 @@ void Sync::takeStock(Device& device) {
     const auto ask = hashes(device);
     ledger_->replaceByWhatIsThere(whatIsThere(ledger_->manifest(), files, ask));
     plan_ = planOf(order_, ledger_->manifest(), names, ask);
-    leftovers_ = removable(unfinishedAmong(names, device), files);
+    leftovers_ = leftoversAmong(names, device);
     ledger_->adopt(plan_.adopted);
 }
 
