@@ -2,17 +2,15 @@
 
 #include <QApplication>
 #include <QDBusArgument>
-#include <QDBusMessage>
 #include <QDBusMetaType>
 #include <QDBusPendingCallWatcher>
 #include <QDBusPendingReply>
 #include <QDBusServiceWatcher>
+#include <QDBusVariant>
 
 namespace quorl {
 
 namespace {
-
-using Settings = QMap<QString, QVariantMap>;
 
 const QString portalName = QStringLiteral("org.freedesktop.portal.Desktop");
 const QString portalPath = QStringLiteral("/org/freedesktop/portal/desktop");
@@ -37,7 +35,7 @@ DesktopLook::DesktopLook(QDBusConnection bus, WindowScreen& screen)
     qDBusRegisterMetaType<Settings>();
     // Before the question, so that no change falls in between.
     bus_.connect(portalName, portalPath, settingsInterface, QStringLiteral("SettingChanged"), this,
-                 SLOT(takeChange(QString, QString, QDBusVariant)));
+                 SLOT(takeChange(QDBusMessage)));
     auto* portal =
         new QDBusServiceWatcher(portalName, bus_, QDBusServiceWatcher::WatchForRegistration, this);
     connect(portal, &QDBusServiceWatcher::serviceRegistered, this, &DesktopLook::ask);
@@ -45,6 +43,7 @@ DesktopLook::DesktopLook(QDBusConnection bus, WindowScreen& screen)
 }
 
 void DesktopLook::ask() {
+    changed_.clear();
     auto* answer = new QDBusPendingCallWatcher(bus_.asyncCall(question()), this);
     connect(answer, &QDBusPendingCallWatcher::finished, this, [this, answer] {
         const QDBusPendingReply<Settings> reply = *answer;
@@ -52,19 +51,29 @@ void DesktopLook::ask() {
         if (reply.isError()) {
             return; // there is no portal, or it knows no settings: as without one
         }
-        const Settings settings = reply.value();
         appearance_ = {};
-        for (auto group = settings.begin(); group != settings.end(); ++group) {
-            for (auto value = group->begin(); value != group->end(); ++value) {
-                appearance_.take(group.key(), value.key(), value.value());
-            }
-        }
+        takeAll(reply.value());
+        takeAll(changed_); // Qt may bring the answer after changes that were told later
         show();
     });
 }
 
-void DesktopLook::takeChange(const QString& group, const QString& key, const QDBusVariant& value) {
-    appearance_.take(group, key, value.variant());
+void DesktopLook::takeAll(const Settings& settings) {
+    for (auto group = settings.begin(); group != settings.end(); ++group) {
+        for (auto value = group->begin(); value != group->end(); ++value) {
+            appearance_.take(group.key(), value.key(), value.value());
+        }
+    }
+}
+
+void DesktopLook::takeChange(const QDBusMessage& news) {
+    if (news.signature() != QStringLiteral("ssv")) {
+        return; // no setting that a portal tells of
+    }
+    const QVariantList told = news.arguments();
+    const QVariant value = told[2].value<QDBusVariant>().variant();
+    changed_[told[0].toString()].insert(told[1].toString(), value);
+    appearance_.take(told[0].toString(), told[1].toString(), value);
     show();
 }
 

