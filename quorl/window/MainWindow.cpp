@@ -159,13 +159,13 @@ void MainWindow::resizeEvent(QResizeEvent* event) {
     screen_.scheduleDrawing(); // the title depends on whether all rows are seen
 }
 
-void MainWindow::changeEvent(QEvent* event) {
-    QWidget::changeEvent(event);
-    if (event->type() == QEvent::ApplicationFontChange) {
+bool MainWindow::event(QEvent* event) {
+    if (event->type() == QEvent::ApplicationFontChange) { // never comes to `changeEvent`
         screen_.setFont(QApplication::font());
         setFont(screen_.font());
         screen_.scheduleDrawing();
     }
+    return QWidget::event(event);
 }
 
 RowsView* MainWindow::topView() const { return views_.empty() ? nullptr : views_.back(); }

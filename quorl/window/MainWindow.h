@@ -33,7 +33,7 @@ class MainWindow final : public QWidget {
 
   protected:
     void resizeEvent(QResizeEvent* event) override;
-    void changeEvent(QEvent* event) override;
+    bool event(QEvent* event) override;
 
   private:
     void addShortcuts();
