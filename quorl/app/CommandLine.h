@@ -5,9 +5,9 @@
 #include <string>
 #include <variant>
 
-#include "quorl/app/ExitCode.h"
 #include "quorl/app/Picture.h"
 #include "quorl/app/Places.h"
+#include "quorl/process/ExitCode.h"
 
 namespace quorl {
 

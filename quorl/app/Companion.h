@@ -1,10 +1,10 @@
 #pragma once
 
 #include "quorl/app/CompanionHost.h"
-#include "quorl/app/MainQueueNotifier.h"
 #include "quorl/app/Notices.h"
 #include "quorl/app/PaneScreen.h"
 #include "quorl/app/Places.h"
+#include "quorl/process/MainQueueNotifier.h"
 #include "runtime/lists/NavigationController.h"
 
 namespace quorl {

@@ -2,9 +2,9 @@
 
 #include <algorithm>
 
-#include "quorl/app/EngineTrouble.h"
-#include "quorl/app/FolderTrouble.h"
-#include "quorl/app/OfferedPlaylists.h"
+#include "quorl/facts/EngineTrouble.h"
+#include "quorl/facts/FolderTrouble.h"
+#include "quorl/facts/OfferedPlaylists.h"
 #include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
@@ -108,6 +108,14 @@ void CompanionHost::ask(EngineLink::Request request) {
     engine_.ask(request, [this](const std::string& problem) {
         notices_.set(Notices::Topic::Request, problem);
     });
+}
+
+std::optional<bool> CompanionHost::startsAtLogin() const {
+    return purpose_ == base::Purpose::Use ? std::optional(loginStart_.isOn()) : std::nullopt;
+}
+
+void CompanionHost::setStartAtLogin(bool starts) {
+    notices_.set(Notices::Topic::Request, loginStart_.set(starts));
 }
 
 void CompanionHost::setFolderChooser(AskForFolder ask) { askForFolder_ = std::move(ask); }

@@ -2,13 +2,14 @@
 
 #include "quorl/adapters/EngineLink.h"
 #include "quorl/adapters/FoundWearables.h"
+#include "quorl/adapters/LoginStart.h"
 #include "quorl/adapters/MusicLibrary.h"
 #include "quorl/adapters/PreferencesStore.h"
 #include "quorl/adapters/TrialEngine.h"
 #include "quorl/adapters/WearableUsage.h"
 #include "quorl/app/Notices.h"
 #include "quorl/app/Places.h"
-#include "quorl/app/PlaylistFacts.h"
+#include "quorl/facts/PlaylistFacts.h"
 #include "quorl/pages/PageServices.h"
 #include "runtime/host/Host.h"
 #include "runtime/host/Screen.h"
@@ -69,6 +70,9 @@ class CompanionHost final : public Host, public PageServices {
 
     void setOnCharger(bool isOnCharger) override { engine_.setOnCharger(isOnCharger); }
 
+    [[nodiscard]] std::optional<bool> startsAtLogin() const override;
+    void setStartAtLogin(bool starts) override;
+
     void findWearables(Finding finding) override;
     [[nodiscard]] WearableShelf wearables() const override;
     void chooseWearable(const std::filesystem::path& directory) override;
@@ -89,6 +93,7 @@ class CompanionHost final : public Host, public PageServices {
     void readLibrary();
 
     const base::Purpose purpose_;
+    const LoginStart loginStart_;
     Screen& screen_;
     Notices& notices_;
     PreferencesStore store_;

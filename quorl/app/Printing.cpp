@@ -2,7 +2,7 @@
 
 #include <iostream>
 
-#include "quorl/app/FolderTrouble.h"
+#include "quorl/facts/FolderTrouble.h"
 
 namespace quorl {
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "quorl/app/ExitCode.h"
+#include "quorl/process/ExitCode.h"
 #include "services/media/Inventory.h"
 
 namespace quorl {

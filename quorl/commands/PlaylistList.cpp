@@ -5,7 +5,7 @@
 #include <nlohmann/json.hpp>
 
 #include "quorl/app/Printing.h"
-#include "quorl/app/OfferedPlaylists.h"
+#include "quorl/facts/OfferedPlaylists.h"
 #include "services/base/Utf8.h"
 #include "services/media/MusicFolder.h"
 #include "services/preferences/ChosenPlaces.h"

@@ -2,9 +2,9 @@
 
 #include <iostream>
 
-#include "quorl/app/OfferedPlaylists.h"
 #include "quorl/commands/EngineWatch.h"
 #include "quorl/commands/OfferedWearables.h"
+#include "quorl/facts/OfferedPlaylists.h"
 #include "services/media/MusicFolder.h"
 #include "services/preferences/ChosenPlaces.h"
 

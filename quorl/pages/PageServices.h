@@ -38,6 +38,13 @@ class PageServices {
     /// Whether the embedded wearable is to be taken for one on its charger.
     virtual void setOnCharger(bool isOnCharger) = 0;
 
+    /// Whether the engine is started when the person logs in; nothing in a trial, whose engine is
+    /// not.
+    [[nodiscard]] virtual std::optional<bool> startsAtLogin() const = 0;
+
+    /// Why it was not done becomes a notice.
+    virtual void setStartAtLogin(bool starts) = 0;
+
     enum class Finding { Over, Wanted };
 
     /// Whether wearables are to be looked for, which goes on until it is over.

@@ -69,6 +69,11 @@ AppPage::Rows SyncPage::rows() {
     Rows rows{group(title, engine.status)};
     addSession(rows);
     addWearable(rows);
+    if (const auto starts = services().startsAtLogin()) {
+        rows.push_back(group(std::nullopt, "Without it, syncing begins when this app is opened."));
+        rows.push_back(toggle("Start at Login", *starts,
+                              PSSetter::of<&SyncPage::setLoginStart>("setLoginStart::")));
+    }
     return rows;
 }
 
@@ -115,6 +120,12 @@ void SyncPage::addWearable(Rows& rows) {
 
 void SyncPage::syncNow(const std::shared_ptr<NSObject>& /*nothing*/, const Row& /*row*/) {
     services().ask(&engine::Client::startNow);
+}
+
+void SyncPage::setLoginStart(const std::shared_ptr<NSObject>& isOn, const Row& /*row*/) {
+    const auto* number = dynamic_cast<const NSNumber*>(isOn.get());
+    services().setStartAtLogin(number && number->boolValue());
+    refresh();
 }
 
 void SyncPage::stop(const std::shared_ptr<NSObject>& /*nothing*/, const Row& /*row*/) {

@@ -21,6 +21,7 @@ class SyncPage final : public AppPage {
 
     void syncNow(const std::shared_ptr<NSObject>& nothing, const Row& row);
     void stop(const std::shared_ptr<NSObject>& nothing, const Row& row);
+    void setLoginStart(const std::shared_ptr<NSObject>& isOn, const Row& row);
 };
 
 } // namespace quorl

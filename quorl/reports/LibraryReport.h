@@ -2,7 +2,7 @@
 
 #include <filesystem>
 
-#include "quorl/app/ExitCode.h"
+#include "quorl/process/ExitCode.h"
 
 namespace quorl {
 

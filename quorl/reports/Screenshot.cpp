@@ -6,7 +6,7 @@
 #include <QPixmap>
 #include <iostream>
 
-#include "quorl/app/QtSetup.h"
+#include "quorl/process/QtSetup.h"
 #include "quorl/window/MainWindow.h"
 
 namespace quorl {

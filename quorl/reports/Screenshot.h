@@ -1,8 +1,8 @@
 #pragma once
 
-#include "quorl/app/ExitCode.h"
 #include "quorl/app/Picture.h"
 #include "quorl/app/Places.h"
+#include "quorl/process/ExitCode.h"
 
 namespace quorl {
 

@@ -5,7 +5,7 @@
 
 #include <unistd.h>
 
-#include "quorl/app/QtSetup.h"
+#include "quorl/process/QtSetup.h"
 #include "quorl/terminal/TextScreen.h"
 #include "quorl/terminal/TextSession.h"
 

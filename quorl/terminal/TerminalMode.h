@@ -1,7 +1,7 @@
 #pragma once
 
-#include "quorl/app/ExitCode.h"
 #include "quorl/app/Places.h"
+#include "quorl/process/ExitCode.h"
 
 namespace quorl {
 

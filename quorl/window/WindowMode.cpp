@@ -5,7 +5,7 @@
 #include <QScreen>
 #include <iostream>
 
-#include "quorl/app/QtSetup.h"
+#include "quorl/process/QtSetup.h"
 #include "quorl/window/MainWindow.h"
 #include "quorl/window/desktop/DesktopLook.h"
 #include "quorl/window/desktop/OneApp.h"

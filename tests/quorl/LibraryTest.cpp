@@ -3,7 +3,7 @@
 #include <gmock/gmock.h>
 
 #include "quorl/adapters/MusicLibrary.h"
-#include "quorl/app/MainQueueNotifier.h"
+#include "quorl/process/MainQueueNotifier.h"
 #include "tests/quorl/SampleMusic.h"
 
 namespace quorl::tests {

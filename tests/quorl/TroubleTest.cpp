@@ -1,7 +1,7 @@
 #include <gmock/gmock.h>
 
-#include "quorl/app/EngineTrouble.h"
-#include "quorl/app/FolderTrouble.h"
+#include "quorl/facts/EngineTrouble.h"
+#include "quorl/facts/FolderTrouble.h"
 #include "services/engine/Codes.h"
 
 namespace quorl::tests {

@@ -19,6 +19,10 @@ class MadeUpServices final : public PageServices {
 
     void setOnCharger(bool isOnCharger) override { state.wearable.isOnCharger = isOnCharger; }
 
+    [[nodiscard]] std::optional<bool> startsAtLogin() const override { return isLoginStart; }
+
+    void setStartAtLogin(bool starts) override { isLoginStart = starts; }
+
     void findWearables(Finding finding) override { isFinding = finding == Finding::Wanted; }
 
     [[nodiscard]] WearableShelf wearables() const override { return shelf; }
@@ -36,6 +40,7 @@ class MadeUpServices final : public PageServices {
     void chooseOtherWearable() override { asked.emplace_back("choose another"); }
 
     engine::EngineState state;
+    std::optional<bool> isLoginStart = false;
     bool isFinding = false;
     WearableShelf shelf;
     std::vector<std::string> asked;

@@ -160,6 +160,15 @@ TEST_F(Pages, syncCountsWhatIsThereAndWhatIsNot) {
                               HasSubstr("Beyond the Limit: 12 songs\n")));
 }
 
+TEST_F(Pages, syncSwitchesTheStartAtLoginButNotForATrial) {
+    open<SyncPage>();
+    EXPECT_THAT(text(), HasSubstr("Start at Login: off\n"));
+    tap("Start at Login");
+    EXPECT_THAT(text(), HasSubstr("Start at Login: on\n"));
+    services_.isLoginStart.reset();
+    EXPECT_THAT(text(), Not(HasSubstr("Start at Login")));
+}
+
 TEST_F(Pages, whatCouldNotBeSentIsListedUnderItsReason) {
     services_.state.engine.leftOut = {{"gone.mp3", "missing"}, {"a/note.txt", "not-music"}};
     services_.state.engine.leftOutCount = 5;

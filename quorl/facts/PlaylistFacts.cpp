@@ -1,4 +1,4 @@
-#include "quorl/app/PlaylistFacts.h"
+#include "quorl/facts/PlaylistFacts.h"
 
 #include "platform/SizeFormatter.h"
 

@@ -1,4 +1,4 @@
-#include "quorl/app/FolderTrouble.h"
+#include "quorl/facts/FolderTrouble.h"
 
 #include <algorithm>
 

@@ -1,10 +1,10 @@
-#include "quorl/app/QtMessages.h"
+#include "quorl/process/QtMessages.h"
 
 #include <QString>
 #include <cstdlib>
 #include <iostream>
 
-#include "quorl/app/ExitCode.h"
+#include "quorl/process/ExitCode.h"
 
 namespace quorl {
 

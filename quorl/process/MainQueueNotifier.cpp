@@ -1,4 +1,4 @@
-#include "quorl/app/MainQueueNotifier.h"
+#include "quorl/process/MainQueueNotifier.h"
 
 #include "runtime/objects/MainQueue.h"
 

@@ -1,4 +1,4 @@
-#include "quorl/app/EngineTrouble.h"
+#include "quorl/facts/EngineTrouble.h"
 
 #include <algorithm>
 #include <array>

@@ -1,9 +1,9 @@
-#include "quorl/app/QtSetup.h"
+#include "quorl/process/QtSetup.h"
 
 #include <QGuiApplication>
 #include <QLocale>
 
-#include "quorl/app/QtMessages.h"
+#include "quorl/process/QtMessages.h"
 #include "runtime/plugins/StringTable.h"
 
 namespace quorl {

@@ -1,4 +1,4 @@
-#include "quorl/app/OfferedPlaylists.h"
+#include "quorl/facts/OfferedPlaylists.h"
 
 #include <algorithm>
 #include <iterator>
