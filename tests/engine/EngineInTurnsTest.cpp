@@ -383,6 +383,7 @@ TEST_F(EngineInTurns, StopsRemovingWhereItIsCancelledOrSomethingIsChosen) {
 TEST_F(EngineInTurns, DoesNotRemoveFromAWearableThatWentAwayMeanwhile) {
     startSyncing();
     engine_->removeMusic();
+    wearables_.notice(WearableNews::MayBeAnother);
     wearables_.answer("It is away.");
     syncs_.end(stopped);
     EXPECT_EQ(syncs_.orders.size(), 1);
