@@ -123,10 +123,11 @@ Problem usePlaces(const Commands& commands) {
     if (const auto* problem = std::get_if<std::string>(&there)) {
         return *problem;
     }
-    const auto problem = commands.wearable ? useWearable(engine, *commands.wearable) : Problem();
-    return problem.empty() && commands.music
-               ? engine.tell(&engine::Client::setMusicFolder, *commands.music)
-               : problem;
+    auto problem = commands.wearable ? useWearable(engine, *commands.wearable) : Problem();
+    if (problem.empty() && commands.music) {
+        problem = engine.tell(&engine::Client::setMusicFolder, *commands.music);
+    }
+    return problem;
 }
 
 Problem run(const Commands& commands) {

@@ -96,8 +96,7 @@ TEST_F(HangingDevice, IsNoMusicFolderToSwitchTo) {
 }
 
 TEST_F(HangingDevice, ThatHasTheMusicFolderCannotKeepASyncFromBeingCancelledWhileItIsPlanned) {
-    std::filesystem::copy(music_.path(), device_.path(),
-                          std::filesystem::copy_options::recursive);
+    std::filesystem::copy(music_.path(), device_.path(), std::filesystem::copy_options::recursive);
     engine_ = std::make_unique<Process>(
         std::vector<std::string>{ENGINE_PROGRAM, "--music-folder", device_.path()});
     recorder_.next(Kind::EngineDidAppear);

@@ -18,13 +18,11 @@ class DesktopLook final : public QObject {
     /// `screen` outlives the look.
     DesktopLook(QDBusConnection bus, WindowScreen& screen);
 
-  private Q_SLOTS:
-    /// The portal tells that a setting has changed.
-    void takeChange(const QDBusMessage& news);
-
   private:
     using Settings = QMap<QString, QVariantMap>; ///< by group and key
 
+    /// The portal tells that a setting has changed.
+    Q_SLOT void takeChange(const QDBusMessage& news);
     void ask();
     void takeAll(const Settings& settings);
     void show();
