@@ -109,8 +109,8 @@ AppPage::Row AppPage::link(std::string name, const std::string& text, const Clas
 AppPage::Row AppPage::make(std::string name, PSCellType cell, const std::string& text,
                            std::optional<PSSetter> set, std::optional<Class> page) {
     auto row = PSSpecifier::preferenceSpecifierNamed_target_set_get_detail_cell_edit(
-        std::move(name), strong(this), set, PSGetter::of<&AppPage::valueOf>("valueOf:"),
-        std::move(page), cell, {});
+        std::move(name), strong(this), set, PSGetter::of<&AppPage::valueOf>("valueOf:"), page, cell,
+        {});
     row->setProperty_forKey(text, RowValueKey);
     return row;
 }
