@@ -93,9 +93,12 @@ void CompanionHost::followWearable() {
     }
 }
 
+/// That of a trial is started with it, and says itself where it cannot start.
 void CompanionHost::noticeEngine() {
+    wasEngineThere_ = wasEngineThere_ || engine_.state().isThere;
+    const bool isStarting = purpose_ == base::Purpose::Trial && !wasEngineThere_;
     const auto trouble = troubleIn(engine_.state());
-    if (!trouble) {
+    if (!trouble || isStarting) {
         notices_.set(Notices::Topic::Engine, "");
         return;
     }

@@ -106,7 +106,8 @@ class CompanionHost final : public Host, public PageServices {
     std::optional<FoundWearables> found_; ///< nothing while nobody wants to know
     std::function<void()> engineChanged_;
     AskForFolder askForFolder_;
-    bool isEngineHeardOf_ = false;           ///< or of there being none
+    bool isEngineHeardOf_ = false; ///< or of there being none
+    bool wasEngineThere_ = false;
     std::optional<TrialEngine> trialEngine_; ///< nothing where this is no trial
     EngineLink engine_;
 };

@@ -72,6 +72,7 @@ TEST_F(Trial, syncsItsOwnChoiceToAWearableOfItsOwn) {
     EXPECT_TRUE(std::filesystem::exists(onWearable("trial-wearable")));
     EXPECT_FALSE(std::filesystem::exists(onWearable("wearable")));
     EXPECT_EQ(quorl.end(), 0);
+    EXPECT_EQ(quorl.errors(), "") << "nothing is the matter";
 }
 
 TEST_F(Trial, leavesWhatIsChosenAsItIs) {
