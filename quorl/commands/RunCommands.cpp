@@ -131,7 +131,7 @@ Problem usePlaces(const Commands& commands) {
 }
 
 Problem run(const Commands& commands) {
-    if (const auto problem = usePlaces(commands); !problem.empty()) {
+    if (auto problem = usePlaces(commands); !problem.empty()) {
         return problem;
     }
     const auto opened = SharedPreferences::open({});
