@@ -6,9 +6,11 @@
 #include <gmock/gmock.h>
 #include <nlohmann/json.hpp>
 
+#include "services/engine/Names.h"
 #include "tests/quorl/QuorlProcess.h"
 #include "tests/quorl/SampleMusic.h"
 #include "tests/quorl/StoredPreferences.h"
+#include "tests/quorl/desktop/OtherConnection.h"
 
 namespace quorl::tests {
 
@@ -173,6 +175,7 @@ class CommandsWithEngine : public Commands {
         if (!engine_.waitForStarted()) {
             throw std::runtime_error("the engine does not start");
         }
+        waitForOwner(QString::fromLatin1(engine::busName), true);
     }
 
     ~CommandsWithEngine() override {
