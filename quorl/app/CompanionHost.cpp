@@ -5,6 +5,7 @@
 #include "quorl/facts/EngineTrouble.h"
 #include "quorl/facts/FolderTrouble.h"
 #include "quorl/facts/OfferedPlaylists.h"
+#include "services/engine/RunningSession.h"
 #include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
@@ -161,8 +162,7 @@ void CompanionHost::chooseWearable(const std::filesystem::path& directory) {
 }
 
 void CompanionHost::ejectWearable(const std::filesystem::path& directory) {
-    const auto& sessions = engine_.state().sessions;
-    if (std::ranges::any_of(sessions, [](const auto& session) { return !session.isFinished; })) {
+    if (engine::runningSession(engine_.state())) {
         notices_.set(Notices::Topic::Request,
                      "Music is being synced. Stop that or wait for its end, then eject the drive.");
         return;

@@ -14,6 +14,7 @@
 #include "services/base/Utf8.h"
 #include "services/engine/Client.h"
 #include "services/engine/Message.h"
+#include "services/engine/RunningSession.h"
 #include "services/preferences/SharedPreferences.h"
 
 namespace quorl {
@@ -75,10 +76,8 @@ std::optional<Choice> choiceWithoutEngine() {
 
 /// Of the running session; nothing where none is running.
 std::optional<double> progressOf(const engine::EngineState& state) {
-    const auto running = std::find_if(state.sessions.begin(), state.sessions.end(),
-                                      [](const auto& session) { return !session.isFinished; });
-    return running == state.sessions.end() ? std::nullopt
-                                           : std::optional<double>(running->progress);
+    const auto* const running = engine::runningSession(state);
+    return running ? std::optional<double>(running->progress) : std::nullopt;
 }
 
 Json jsonOf(const engine::EngineState& state, const Choice& choice) {
