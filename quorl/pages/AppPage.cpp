@@ -14,15 +14,18 @@ namespace {
 /// Where a row keeps the text that it shows.
 constexpr std::string_view RowValueKey = "value";
 
+/// Where a row keeps what it is about, which need not be seen in it.
+constexpr std::string_view RowSubjectKey = "subject";
+
 bool isAlike(const std::shared_ptr<PSSpecifier>& one, const std::shared_ptr<PSSpecifier>& other) {
     return one->name() == other->name() && one->cellType() == other->cellType() &&
-           one->detailControllerClass() == other->detailControllerClass();
+           one->detailControllerClass() == other->detailControllerClass() &&
+           one->propertyForKey(RowSubjectKey) == other->propertyForKey(RowSubjectKey);
 }
 
-/// Takes over all in which rows of one name and kind can differ.
-void takeLooks(PSSpecifier& row, const PSSpecifier& from, std::string_view subjectKey) {
-    for (const auto key :
-         {RowValueKey, RowProgressKey, RowChosenKey, PSFooterTextGroupKey, subjectKey}) {
+/// Takes over all in which rows that are alike can differ.
+void takeLooks(PSSpecifier& row, const PSSpecifier& from) {
+    for (const auto key : {RowValueKey, RowProgressKey, RowChosenKey, PSFooterTextGroupKey}) {
         row.setProperty_forKey(from.propertyForKey(key), key);
     }
 }
@@ -60,7 +63,7 @@ void AppPage::refresh() {
     const auto now = std::make_shared<Rows>(rows());
     if (std::equal(shown->begin(), shown->end(), now->begin(), now->end(), isAlike)) {
         for (std::size_t index = 0; index < shown->size(); ++index) {
-            takeLooks(*(*shown)[index], *(*now)[index], RowSubjectKey);
+            takeLooks(*(*shown)[index], *(*now)[index]);
         }
     } else {
         _specifiers = now;
@@ -113,6 +116,15 @@ AppPage::Row AppPage::make(std::string name, PSCellType cell, const std::string&
         {});
     row->setProperty_forKey(text, RowValueKey);
     return row;
+}
+
+AppPage::Row AppPage::about(std::string subject, Row row) {
+    row->setProperty_forKey(std::move(subject), RowSubjectKey);
+    return row;
+}
+
+std::optional<std::string> AppPage::subjectOf(const Row& row) {
+    return row->propertyForKey(RowSubjectKey);
 }
 
 std::optional<std::string> AppPage::valueOf(const Row& row) {

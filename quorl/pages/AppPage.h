@@ -26,8 +26,8 @@ class AppPage : public PSListController {
     using Row = std::shared_ptr<PSSpecifier>;
     using Rows = std::vector<Row>;
 
-    /// What the page is to show now. A row that has the name and the kind of the one that was in
-    /// its place takes on its looks only.
+    /// What the page is to show now. A row that has the name, the kind and the subject of the one
+    /// that was in its place takes on its looks only.
     [[nodiscard]] virtual Rows rows() = 0;
 
     [[nodiscard]] PageServices& services() const { return *services_; }
@@ -52,11 +52,15 @@ class AppPage : public PSListController {
     [[nodiscard]] Row choice(std::string name, const std::string& text, Chosen chosen,
                              PSSetter act);
 
-    /// The property of a row that tells the page what the row is about.
-    static constexpr std::string_view RowSubjectKey = "subject";
-
     /// Opens a page.
     [[nodiscard]] Row link(std::string name, const std::string& text, const Class& page);
+
+    /// The row, made to be about `subject`, so that it is another row than one of the same name
+    /// that is about something else.
+    [[nodiscard]] static Row about(std::string subject, Row row);
+
+    /// Null: the row is about nothing.
+    [[nodiscard]] static std::optional<std::string> subjectOf(const Row& row);
 
   private:
     [[nodiscard]] std::optional<std::string> valueOf(const Row& row);

@@ -8,16 +8,11 @@
 #include "quorl/pages/RemovePage.h"
 #include "quorl/pages/TimeLeft.h"
 #include "services/base/Utf8.h"
+#include "services/engine/RunningSession.h"
 
 namespace quorl {
 
 namespace {
-
-/// The session that is under way; null: none is.
-const engine::SessionState* sessionIn(const engine::EngineState& state) {
-    const auto found = std::ranges::find(state.sessions, false, &engine::SessionState::isFinished);
-    return found == state.sessions.end() ? nullptr : &*found;
-}
 
 /// The task that carries the songs; null: it has not begun.
 const engine::TaskState* songsOf(const engine::SessionState& session) {
@@ -48,7 +43,7 @@ std::string nameOf(const std::string& path) {
 } // namespace
 
 std::string SyncPage::summaryOf(const engine::EngineState& state) {
-    const auto* const session = sessionIn(state);
+    const auto* const session = engine::runningSession(state);
     const auto& word = state.engine.syncState;
     return session                       ? percentOf(*session)
            : word == engine::syncSynced  ? "Up to date"
@@ -62,6 +57,11 @@ bool SyncPage::init() {
     return AppPage::init();
 }
 
+void SyncPage::viewWillAppear(bool animated) {
+    startsAtLogin_ = services().startsAtLogin();
+    AppPage::viewWillAppear(animated);
+}
+
 AppPage::Rows SyncPage::rows() {
     const auto& engine = state().engine;
     const auto title =
@@ -69,16 +69,16 @@ AppPage::Rows SyncPage::rows() {
     Rows rows{group(title, engine.status)};
     addSession(rows);
     addWearable(rows);
-    if (const auto starts = services().startsAtLogin()) {
+    if (startsAtLogin_) {
         rows.push_back(group(std::nullopt, "Without it, syncing begins when this app is opened."));
-        rows.push_back(toggle("Start at Login", *starts,
+        rows.push_back(toggle("Start at Login", *startsAtLogin_,
                               PSSetter::of<&SyncPage::setLoginStart>("setLoginStart::")));
     }
     return rows;
 }
 
 void SyncPage::addSession(Rows& rows) {
-    const auto* const session = sessionIn(state());
+    const auto* const session = engine::runningSession(state());
     if (!session) {
         if (state().isThere && state().engine.syncState != engine::syncOff) {
             rows.push_back(button("Sync Now", PSSetter::of<&SyncPage::syncNow>("syncNow::")));
@@ -125,6 +125,7 @@ void SyncPage::syncNow(const std::shared_ptr<NSObject>& /*nothing*/, const Row& 
 void SyncPage::setLoginStart(const std::shared_ptr<NSObject>& isOn, const Row& /*row*/) {
     const auto* number = dynamic_cast<const NSNumber*>(isOn.get());
     services().setStartAtLogin(number && number->boolValue());
+    startsAtLogin_ = services().startsAtLogin();
     refresh();
 }
 

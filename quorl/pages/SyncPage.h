@@ -11,6 +11,7 @@ class SyncPage final : public AppPage {
     [[nodiscard]] static std::string summaryOf(const engine::EngineState& state);
 
     [[nodiscard]] bool init() override;
+    void viewWillAppear(bool animated) override;
 
   protected:
     [[nodiscard]] Rows rows() override;
@@ -22,6 +23,9 @@ class SyncPage final : public AppPage {
     void syncNow(const std::shared_ptr<NSObject>& nothing, const Row& row);
     void stop(const std::shared_ptr<NSObject>& nothing, const Row& row);
     void setLoginStart(const std::shared_ptr<NSObject>& isOn, const Row& row);
+
+    /// Asked for when the page appears, for it stands in a file. Null: it cannot be set here.
+    std::optional<bool> startsAtLogin_;
 };
 
 } // namespace quorl

@@ -1,9 +1,8 @@
 #include "quorl/pages/WearablesPage.h"
 
-#include <algorithm>
-
 #include "platform/SizeFormatter.h"
 #include "services/base/Utf8.h"
+#include "services/engine/RunningSession.h"
 
 namespace quorl {
 
@@ -25,11 +24,6 @@ std::string textOf(const finding::Offer& offer) {
 /// Not a directory of it, which goes with it.
 bool isEjectable(const finding::Offer& offer) {
     return offer.removal && offer.identity && offer.identity->mountPoint == offer.directory;
-}
-
-bool isSyncing(const engine::EngineState& state) {
-    return std::ranges::any_of(state.sessions,
-                               [](const auto& session) { return !session.isFinished; });
 }
 
 constexpr auto explanation =
@@ -71,10 +65,10 @@ void WearablesPage::addOffers(Rows& rows) {
     const auto shelf = services().wearables();
     for (std::size_t index = 0; index < shelf.offers.size(); ++index) {
         const auto& offer = shelf.offers[index];
-        rows.push_back(choice(base::printable(offer.name), textOf(offer),
-                              shelf.chosen == index ? Chosen::Yes : Chosen::No,
-                              PSSetter::of<&WearablesPage::choose>("choose::")));
-        rows.back()->setProperty_forKey(offer.directory.string(), RowSubjectKey);
+        rows.push_back(about(offer.directory.string(),
+                             choice(base::printable(offer.name), textOf(offer),
+                                    shelf.chosen == index ? Chosen::Yes : Chosen::No,
+                                    PSSetter::of<&WearablesPage::choose>("choose::"))));
     }
 }
 
@@ -95,22 +89,22 @@ void WearablesPage::addRemovals(Rows& rows) {
         rows.push_back(value(base::printable(name), "Safe to remove"));
     }
     for (const auto& offer : shelf.offers) {
-        if (isEjectable(offer) && !isSyncing(state())) {
-            rows.push_back(button("Eject “" + base::printable(offer.name) + "”",
-                                  PSSetter::of<&WearablesPage::eject>("eject::")));
-            rows.back()->setProperty_forKey(offer.directory.string(), RowSubjectKey);
+        if (isEjectable(offer) && !engine::runningSession(state())) {
+            rows.push_back(about(offer.directory.string(),
+                                 button("Eject “" + base::printable(offer.name) + "”",
+                                        PSSetter::of<&WearablesPage::eject>("eject::"))));
         }
     }
 }
 
 void WearablesPage::choose(const std::shared_ptr<NSObject>& /*nothing*/, const Row& row) {
-    if (const auto directory = row->propertyForKey(RowSubjectKey)) {
+    if (const auto directory = subjectOf(row)) {
         services().chooseWearable(*directory);
     }
 }
 
 void WearablesPage::eject(const std::shared_ptr<NSObject>& /*nothing*/, const Row& row) {
-    services().ejectWearable(row->propertyForKey(RowSubjectKey).value_or(""));
+    services().ejectWearable(subjectOf(row).value_or(""));
 }
 
 void WearablesPage::chooseOther(const std::shared_ptr<NSObject>& /*nothing*/, const Row& /*row*/) {

@@ -19,7 +19,10 @@ class MadeUpServices final : public PageServices {
 
     void setOnCharger(bool isOnCharger) override { state.wearable.isOnCharger = isOnCharger; }
 
-    [[nodiscard]] std::optional<bool> startsAtLogin() const override { return isLoginStart; }
+    [[nodiscard]] std::optional<bool> startsAtLogin() const override {
+        ++loginStartReads;
+        return isLoginStart;
+    }
 
     void setStartAtLogin(bool starts) override { isLoginStart = starts; }
 
@@ -41,6 +44,7 @@ class MadeUpServices final : public PageServices {
 
     engine::EngineState state;
     std::optional<bool> isLoginStart = false;
+    mutable int loginStartReads = 0;
     bool isFinding = false;
     WearableShelf shelf;
     std::vector<std::string> asked;

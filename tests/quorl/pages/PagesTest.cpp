@@ -1,13 +1,9 @@
 #include <gmock/gmock.h>
 
-#include "quorl/content/PaneContent.h"
 #include "quorl/pages/FrontPage.h"
 #include "quorl/pages/LeftOutPage.h"
 #include "quorl/pages/SyncPage.h"
-#include "quorl/terminal/PaneText.h"
-#include "runtime/lists/NavigationController.h"
-#include "tests/quorl/pages/MadeUpServices.h"
-#include "tests/quorl/window/Window.h"
+#include "tests/quorl/pages/ShownPage.h"
 
 namespace quorl::tests {
 
@@ -35,49 +31,17 @@ engine::SessionState session() {
     return session;
 }
 
-class Pages : public testing::Test {
+class Pages : public ShownPage {
   protected:
-    /// What the page on the top shows, as the terminal prints it.
-    std::string text() {
-        const auto top = navigation_->top();
-        if (!content_ || &content_->pane() != top.get()) {
-            content_ = PaneContent::of(top, *navigation_);
-        }
-        if (auto* page = dynamic_cast<AppPage*>(top.get())) {
-            page->refresh();
-        }
-        content_->draw(0, 100);
-        return textOf(*content_, 80);
-    }
-
+    /// Opens the page from the front page, or the front page itself.
     template <class Page>
     void open() {
-        front_ = FrontPage::over(services_, Class::of<LeftOutPage>(), "Music");
-        navigation_->setRootPane(front_);
-        navigation_->appear(false);
+        show(FrontPage::over(services_, Class::of<LeftOutPage>(), "Music"));
         if constexpr (!std::is_same_v<Page, FrontPage>) {
             navigation_->open(PSSpecifier::preferenceSpecifierNamed_target_set_get_detail_cell_edit(
                 "a page", nullptr, {}, {}, Class::of<Page>(), PSCellType::LinkList, {}));
         }
     }
-
-    /// Taps the row that begins so.
-    void tap(const std::string& title) {
-        static_cast<void>(text());
-        for (NSInteger row = 0; row < content_->rowCount(); ++row) {
-            if (content_->cell(row)->textLabel().text() == title) {
-                ASSERT_TRUE(content_->tap(row));
-                return;
-            }
-        }
-        FAIL() << "there is no row " << title;
-    }
-
-    Window window_; // its host
-    MadeUpServices services_;
-    std::shared_ptr<NavigationController> navigation_ = ::create<NavigationController>();
-    std::shared_ptr<FrontPage> front_;
-    std::unique_ptr<PaneContent> content_;
 };
 
 TEST_F(Pages, frontSaysOneSentence) {
@@ -144,7 +108,7 @@ TEST_F(Pages, rowThatIsNotThereAnyMoreCannotBeTapped) {
     open<SyncPage>();
     static_cast<void>(text());
     services_.state.sessions = {session()};
-    dynamic_cast<AppPage&>(*navigation_->top()).refresh();
+    refresh();
     EXPECT_FALSE(content_->tap(0));
     EXPECT_TRUE(services_.requests.empty());
 }
@@ -160,13 +124,25 @@ TEST_F(Pages, syncCountsWhatIsThereAndWhatIsNot) {
                               HasSubstr("Beyond the Limit: 12 songs\n")));
 }
 
-TEST_F(Pages, syncSwitchesTheStartAtLoginButNotForATrial) {
+TEST_F(Pages, syncSwitchesTheStartAtLogin) {
     open<SyncPage>();
     EXPECT_THAT(text(), HasSubstr("Start at Login: off\n"));
     tap("Start at Login");
     EXPECT_THAT(text(), HasSubstr("Start at Login: on\n"));
+}
+
+TEST_F(Pages, syncOffersNoStartAtLoginWhereThereIsNone) {
     services_.isLoginStart.reset();
+    open<SyncPage>();
     EXPECT_THAT(text(), Not(HasSubstr("Start at Login")));
+}
+
+TEST_F(Pages, syncAsksForTheStartAtLoginOnceForAllThatIsToldWhileItIsShown) {
+    open<SyncPage>();
+    for (int news = 0; news < 10; ++news) {
+        refresh();
+    }
+    EXPECT_EQ(services_.loginStartReads, 1);
 }
 
 TEST_F(Pages, whatCouldNotBeSentIsListedUnderItsReason) {

@@ -4,11 +4,7 @@
 
 #include <gmock/gmock.h>
 
-#include "quorl/content/PaneContent.h"
-#include "quorl/terminal/PaneText.h"
-#include "runtime/lists/NavigationController.h"
-#include "tests/quorl/pages/MadeUpServices.h"
-#include "tests/quorl/window/Window.h"
+#include "tests/quorl/pages/ShownPage.h"
 
 namespace quorl::tests {
 
@@ -20,7 +16,7 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::Not;
 
-class Wearables : public testing::Test {
+class Wearables : public ShownPage {
   protected:
     Wearables() {
         services_.shelf = {
@@ -35,35 +31,8 @@ class Wearables : public testing::Test {
             0,
             {},
             {}};
-        page_->setServices(services_);
-        navigation_->setRootPane(page_);
-        navigation_->appear(false);
-        content_ = PaneContent::of(page_, *navigation_);
+        show(::create<WearablesPage>());
     }
-
-    /// What the page shows, as the terminal prints it.
-    std::string text() {
-        page_->refresh();
-        content_->draw(0, 100);
-        return textOf(*content_, 80);
-    }
-
-    void tap(const std::string& title) {
-        static_cast<void>(text());
-        for (NSInteger row = 0; row < content_->rowCount(); ++row) {
-            if (content_->cell(row)->textLabel().text() == title) {
-                ASSERT_TRUE(content_->tap(row));
-                return;
-            }
-        }
-        FAIL() << "no row " << title;
-    }
-
-    Window window_;
-    MadeUpServices services_;
-    std::shared_ptr<NavigationController> navigation_ = ::create<NavigationController>();
-    std::shared_ptr<WearablesPage> page_ = ::create<WearablesPage>();
-    std::unique_ptr<PaneContent> content_;
 };
 
 TEST_F(Wearables, areListedWithTheChosenOneChecked) {
@@ -88,6 +57,19 @@ TEST_F(Wearables, areChosenByATap) {
     tap("Other Directory…");
 
     EXPECT_THAT(services_.asked, ElementsAre("choose /media/b", "choose ", "choose another"));
+}
+
+TEST_F(Wearables, ofOneNameAreNotTakenForEachOther) {
+    services_.shelf.offers = {{.name = "NO NAME", .directory = "/media/a"},
+                              {.name = "NO NAME", .directory = "/media/b"}};
+    static_cast<void>(text());
+    std::swap(services_.shelf.offers[0], services_.shelf.offers[1]);
+    refresh();
+    EXPECT_FALSE(content_->tap(0)) << "another drive than the one that was drawn";
+
+    static_cast<void>(text());
+    EXPECT_TRUE(content_->tap(0));
+    EXPECT_THAT(services_.asked, ElementsAre("choose /media/b"));
 }
 
 TEST_F(Wearables, thatAreChosenButAwayAreShownAsThat) {
