@@ -1,5 +1,7 @@
 #include "quorl/app/Companion.h"
 
+#include <QTimer>
+
 #include "quorl/app/PaneLoader.h"
 #include "quorl/pages/FrontPage.h"
 #include "runtime/plugins/PluginBundle.h"
@@ -41,7 +43,10 @@ Companion::Companion(Places places, PaneScreen& screen, Notices& notices)
 
 Companion::~Companion() {
     host_->setEngineObserver({});
-    navigation_->disappear(false);
+    host_->setRefusalObserver({});
+    if (isOnScreen_) {
+        navigation_->disappear(false);
+    }
     navigation_->clear();
     Host::install(nullptr);
 }
@@ -56,6 +61,7 @@ void Companion::makeFrontPage() {
     navigation_->setRootPane(frontPage_);
     (void)frontPage_->specifiers(); // builds the rows before the page is shown
     host_->setEngineObserver([this] { refreshTopPage(); });
+    host_->setRefusalObserver([this] { QTimer::singleShot(0, this, &Companion::showChosen); });
 }
 
 std::optional<PlaylistFacts> Companion::factsOfRow(const UIViewController& pane, NSInteger paneRow,
@@ -73,6 +79,15 @@ void Companion::refreshTopPage() {
     }
 }
 
+/// A pane shows what was tapped at once. Where that could not be stored, it is to read what is.
+void Companion::showChosen() {
+    if (isOnScreen_) {
+        navigation_->disappear(false);
+        navigation_->appear(false);
+        screen_.scheduleDrawing();
+    }
+}
+
 std::string Companion::take(const Places& places) {
     if (!places.plugins.empty() && places.plugins != places_.plugins) {
         return "quorl is running already, with other plug-ins. Close its window, then start it "
@@ -85,6 +100,7 @@ std::string Companion::take(const Places& places) {
 }
 
 void Companion::start() {
+    isOnScreen_ = true;
     navigation_->appear(false);
     if (frontPage_ && !navigation_->open(frontPage_->paneRow())) {
         notices_.set(Notices::Topic::Pane,
@@ -125,6 +141,8 @@ void Companion::enterBackground() {
     }
     NSNotificationCenter::defaultCenter().postNotificationName_object(
         UIApplicationDidEnterBackgroundNotification, nullptr);
+    navigation_->disappear(false);
+    isOnScreen_ = false;
 }
 
 void Companion::enterForeground() {
@@ -135,6 +153,9 @@ void Companion::enterForeground() {
             controller->willBecomeActive();
         }
     }
+    isOnScreen_ = true;
+    navigation_->appear(false);
+    screen_.scheduleDrawing();
 }
 
 } // namespace quorl

@@ -65,7 +65,8 @@ class Companion final : public QObject {
     /// Whether the services have given what they were asked for when the panes came on the screen.
     [[nodiscard]] bool hasAllAnswers() const { return host_->hasAllAnswers(); }
 
-    /// Tells the panes, and whoever else listens, that the app leaves the screen, or comes back.
+    /// Tells the panes, and whoever else listens, that the app leaves the screen, or comes back,
+    /// and takes the top pane off the screen in between: what it shows then is how things stand.
     void enterBackground();
     void enterForeground();
 
@@ -79,6 +80,7 @@ class Companion final : public QObject {
   private:
     void makeFrontPage();
     void refreshTopPage();
+    void showChosen();
 
     const Places places_;
     PaneScreen& screen_;
@@ -88,6 +90,7 @@ class Companion final : public QObject {
     std::shared_ptr<NavigationController> navigation_;
     std::shared_ptr<FrontPage> frontPage_; ///< null where the plug-in has a problem
     std::string problem_;
+    bool isOnScreen_ = false;
 };
 
 } // namespace quorl

@@ -29,8 +29,7 @@ CompanionHost::CompanionHost(const Places& places, Screen& screen, Notices& noti
       screen_(screen),
       notices_(notices),
       store_(
-          purpose_,
-          [&notices](const std::string& text) { notices.set(Notices::Topic::Preferences, text); },
+          purpose_, [this](const std::string& problem) { noticeStore(problem); },
           [this] { placesDidChange(); }),
       syncDefaults_(std::make_shared<SyncDefaults>(store_)),
       library_(std::make_shared<MusicLibrary>()),
@@ -45,6 +44,13 @@ void CompanionHost::takePlaces(const Places& places) {
         store_.choosePlaces(musicOf(places), places.wearable);
     }
     placesDidChange();
+}
+
+void CompanionHost::noticeStore(const std::string& problem) {
+    notices_.set(Notices::Topic::Preferences, problem);
+    if (!problem.empty() && refused_) {
+        refused_();
+    }
 }
 
 void CompanionHost::startTrialEngine() {

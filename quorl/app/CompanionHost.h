@@ -26,6 +26,10 @@ class CompanionHost final : public Host, public PageServices {
     /// nobody.
     void setEngineObserver(std::function<void()> changed) { engineChanged_ = std::move(changed); }
 
+    /// `refused` is called after a choice could not be stored, within the call that made it; empty
+    /// for nobody.
+    void setRefusalObserver(std::function<void()> refused) { refused_ = std::move(refused); }
+
     /// Starts the engine of a trial, where this is one. Where a trial has none, nothing is synced.
     void startTrialEngine();
 
@@ -83,6 +87,7 @@ class CompanionHost final : public Host, public PageServices {
     void chooseOtherWearable() override;
 
   private:
+    void noticeStore(const std::string& problem);
     void noticeProblems(const media::Inventory& inventory);
     void noticeEngine();
     void chooseMusicFolder();
@@ -96,6 +101,7 @@ class CompanionHost final : public Host, public PageServices {
     const LoginStart loginStart_;
     Screen& screen_;
     Notices& notices_;
+    std::function<void()> refused_;
     PreferencesStore store_;
     std::shared_ptr<SyncDefaults> syncDefaults_;
     std::shared_ptr<MusicLibrary> library_;

@@ -2,6 +2,7 @@
 
 #include <gmock/gmock.h>
 
+#include "tests/quorl/StoredPreferences.h"
 #include "tests/quorl/window/Window.h"
 
 namespace quorl::tests {
@@ -27,6 +28,24 @@ class Listener : public NSObject {
     std::vector<NSNotificationName> names;
 };
 
+/// Notes when it comes on the screen and leaves it.
+class Pane : public PSListController {
+  public:
+    NSArray<PSSpecifier> specifiers() override { return nullptr; }
+
+    void viewWillAppear(bool animated) override {
+        PSListController::viewWillAppear(animated);
+        calls->emplace_back("appears");
+    }
+
+    void viewDidDisappear(bool animated) override {
+        PSListController::viewDidDisappear(animated);
+        calls->emplace_back("disappears");
+    }
+
+    std::vector<std::string>* calls = nullptr;
+};
+
 TEST(Foreground, minimisedWindowIsInTheBackgroundUntilItComesBack) {
     Window window;
     const auto listener = create<Listener>();
@@ -46,6 +65,30 @@ TEST(Foreground, hiddenWindowIsInTheBackgroundUntilItIsShown) {
     EXPECT_THAT(listener->names,
                 testing::ElementsAre(UIApplicationDidEnterBackgroundNotification,
                                      UIApplicationWillEnterForegroundNotification));
+}
+
+TEST(Foreground, paneShowsHowThingsStandWhenTheWindowComesBack) {
+    Window window;
+    window.press(Qt::Key_End);
+    window.press(Qt::Key_Return);
+    ASSERT_TRUE(window.waitForRow("✓ 500 MB"));
+    window.widget().showMinimized();
+    storePreference("asset-sync-limit", "1024");
+    window.widget().showNormal();
+    EXPECT_TRUE(window.waitForRow("✓ 1 GB"));
+    EXPECT_THAT(window.rows(), testing::Not(testing::Contains("✓ 500 MB")));
+}
+
+TEST(Foreground, paneIsTakenOffTheScreenOnceWhereTheWindowIsClosedInTheBackground) {
+    std::vector<std::string> calls;
+    {
+        Window window;
+        const auto pane = create<Pane>();
+        pane->calls = &calls;
+        window.companion().navigation().pushController_animated(pane, false);
+        window.widget().showMinimized();
+    }
+    EXPECT_THAT(calls, testing::ElementsAre("appears", "disappears"));
 }
 
 TEST(Foreground, anotherWindowInFrontIsNoBackground) {

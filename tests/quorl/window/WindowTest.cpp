@@ -3,6 +3,8 @@
 #include <QScrollBar>
 #include <QTest>
 #include <QToolButton>
+#include <filesystem>
+#include <fstream>
 
 #include <gmock/gmock.h>
 
@@ -11,6 +13,9 @@
 namespace quorl::tests {
 
 namespace {
+
+using testing::Contains;
+using testing::HasSubstr;
 
 constexpr int patience = 60'000; // milliseconds
 
@@ -31,6 +36,36 @@ TEST(Window, clickOnAPlaylistChecksItAndStoresIt) {
     EXPECT_TRUE(window.waitForRow("✓ Road Trip: Sync Pending…"));
     EXPECT_TRUE(window.waitForRow("None"));
     EXPECT_EQ(storedPreference("asset-sync-enabled"), "true");
+}
+
+/// The settings of this session can be read, but not written any more.
+void breakSettings() {
+    const auto settings = std::filesystem::path(qgetenv("XDG_CONFIG_HOME").constData()) / "dconf";
+    std::filesystem::remove_all(settings);
+    std::ofstream(settings) << "in the way";
+}
+
+TEST(Window, playlistThatCouldNotBeStoredIsNotShownAsChosen) {
+    Window window;
+    window.click(0);
+    ASSERT_TRUE(window.waitForRow("✓ None"));
+    breakSettings();
+    window.click(1);
+    EXPECT_TRUE(window.waitForRow("✓ None"));
+    EXPECT_THAT(window.rows(), Contains("Road Trip"));
+    EXPECT_THAT(window.companion().notices().texts(), Contains(HasSubstr("was not changed")));
+}
+
+TEST(Window, limitThatCouldNotBeStoredIsNotShownAsChosen) {
+    Window window;
+    window.press(Qt::Key_End);
+    window.press(Qt::Key_Return);
+    ASSERT_TRUE(window.waitForRow("✓ 500 MB"));
+    breakSettings();
+    window.press(Qt::Key_End);
+    window.press(Qt::Key_Space);
+    EXPECT_TRUE(window.waitForRow("✓ 500 MB"));
+    EXPECT_THAT(window.rows(), Contains("2 GB"));
 }
 
 TEST(Window, keysAloneChooseALimit) {
@@ -95,7 +130,7 @@ TEST(Window, fingerReachesNoPlaylistThatTheUserHasNotSeen) {
     EXPECT_EQ(storedPreference("asset-sync-enabled"), "false");
     window.screen().scheduleDrawing();
     ASSERT_TRUE(window.waitForRow("Above All"));
-    EXPECT_THAT(window.rows(), testing::Contains("✓ None"));
+    EXPECT_THAT(window.rows(), Contains("✓ None"));
     window.click(0);
     EXPECT_TRUE(window.waitForRow("✓ Above All: Sync Pending…"));
 }
