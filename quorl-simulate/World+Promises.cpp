@@ -6,6 +6,7 @@
 
 #include "quorl-simulate/World.h"
 #include "quorl-simulate/parts/SimulatedVolume.h"
+#include "services/engine/Message.h"
 
 namespace quorl::simulation {
 
@@ -216,7 +217,7 @@ std::string World::obstacle() {
     }
     const auto answer = look();
     if (const auto* const unseen = std::get_if<wearable::Unseen>(&answer)) {
-        return unseen->sentence;
+        return engine::sentence(unseen->message);
     }
     if (!attachment_.connected) {
         return "The wearable is not connected.";

@@ -307,13 +307,13 @@ void World::wasLookedAt() {
 syncd::WatchedWearable::Answer World::look() {
     const Quiet quiet(isQuiet_);
     if (!isPlugged_) {
-        return wearable::Unseen{"The Velora at /device cannot be reached: No such device.", false};
+        return wearable::Unseen{{wearable::unseen::unreachable, {"/device", "No such device"}}};
     }
     try {
         return syncd::Sight{identity(), device().usage(), attachment_};
     } catch (const wearable::BadManifest& error) {
         note(Trouble::BadManifest);
-        return wearable::Unseen{error.what(), false};
+        return wearable::Unseen{error.message()};
     }
 }
 

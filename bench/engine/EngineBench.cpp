@@ -85,7 +85,7 @@ double secondsOfSync(const std::filesystem::path& music, const std::filesystem::
     return secondsOf([&] {
         const auto outcome = syncd::Sync(order, ports, {}, [](const syncd::CopyProgress&) {}).run();
         if (outcome.kind != syncd::Outcome::Kind::Sent) {
-            throw std::runtime_error{sentence(outcome.message)};
+            throw std::runtime_error{engine::sentence(outcome.message)};
         }
     });
 }

@@ -4,6 +4,8 @@
 #include <utility>
 
 #include "services/base/Paths.h"
+#include "services/engine/Codes.h"
+#include "services/engine/Message.h"
 #include "services/finding/Chosen.h"
 #include "services/finding/SystemFiles.h"
 #include "services/preferences/ChosenPlaces.h"
@@ -43,7 +45,7 @@ class ChosenWearable::Expected {
     }
 
     /// A directory that has nothing to do with the chosen drive is somebody's own business.
-    [[nodiscard]] std::string objectionTo(const std::filesystem::path& directory) const {
+    [[nodiscard]] engine::Message objectionTo(const std::filesystem::path& directory) const {
         const auto chosen = get();
         if (!chosen.identity) {
             return {};
@@ -52,7 +54,8 @@ class ChosenWearable::Expected {
         if (now.directory == directory) {
             return now.problem;
         }
-        return chosen.directory == directory ? "Looking for the wearable…" : std::string();
+        return chosen.directory == directory ? engine::Message{engine::code::lookingForWearable}
+                                             : engine::Message{};
     }
 
   private:

@@ -61,12 +61,15 @@ class Known {
     }
 
   private:
-    /// Throws `std::runtime_error` where another one is there.
+    /// Throws `wearable::CannotBeSeen` where another one is there.
     void requireTheWearable() const {
         const auto wearable = identity();
-        const auto problem = wearable.isEmbedded() ? std::string() : objection_(wearable.root);
-        if (!problem.empty()) {
-            throw std::runtime_error(problem);
+        if (wearable.isEmbedded()) {
+            return;
+        }
+        if (auto problem = objection_(wearable.root); !problem.code.empty()) {
+            const auto words = engine::sentence(problem);
+            throw wearable::CannotBeSeen(std::move(problem), words);
         }
     }
 

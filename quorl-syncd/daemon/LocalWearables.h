@@ -8,6 +8,7 @@
 #include "quorl-syncd/engine/ports/WearablePort.h"
 #include "services/base/Purpose.h"
 #include "services/engine/BusLoop.h"
+#include "services/engine/Message.h"
 
 namespace quorl::syncd {
 
@@ -17,7 +18,7 @@ class LocalWearables final : public WearablePort {
     /// Says why what is in the directory of a mounted wearable is not that wearable, as a sentence;
     /// empty where it may be. Called before each look, on any thread, also when this is gone
     /// already, so it must own all that it uses.
-    using Objection = std::function<std::string(const std::filesystem::path& directory)>;
+    using Objection = std::function<engine::Message(const std::filesystem::path& directory)>;
 
     /// @param embeddedCapacity of the embedded wearable, in bytes.
     LocalWearables(engine::BusLoop& loop, base::Purpose purpose, std::uint64_t embeddedCapacity,

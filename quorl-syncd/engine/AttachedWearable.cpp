@@ -104,8 +104,7 @@ engine::WearableStatus AttachedWearable::status() const {
 }
 
 engine::Message AttachedWearable::problem() const {
-    return isLookedFor_ ? engine::Message{engine::code::lookingForWearable}
-                        : engine::other(problem_.sentence);
+    return isLookedFor_ ? engine::Message{engine::code::lookingForWearable} : problem_.message;
 }
 
 void AttachedWearable::forget() {

@@ -309,7 +309,7 @@ std::string Engine::remember(const Order& order) {
 /// Tells the result of the sync that has ended, here and to clients.
 void Engine::conclude(bool success, const engine::Message& message) {
     keepResult(ongoing_->order.wearable.root, success, message);
-    ongoing_->session->finish(success, sentence(message));
+    ongoing_->session->finish(success, engine::sentence(message));
 }
 
 /// A sync cannot begin as long as it is said that everything was sent.
@@ -337,7 +337,7 @@ void Engine::keepResult(const std::string& wearable, bool success, const engine:
 void Engine::tellLastResult() {
     const auto result = ports_.results.of(wearable_.identity().root);
     status_.lastSuccess = result.success;
-    status_.lastMessage = sentence(result.message);
+    status_.lastMessage = engine::sentence(result.message);
     status_.lastCode = result.message.code;
     status_.lastArguments = result.message.arguments;
     status_.lastTime = result.time;
@@ -402,7 +402,7 @@ void Engine::publish() {
     countShortfall();
     const auto now = situation();
     const auto status = statusOf(now, {status_.lastCode, status_.lastArguments});
-    status_.status = sentence(status);
+    status_.status = engine::sentence(status);
     status_.statusCode = status.code;
     status_.statusArguments = status.arguments;
     status_.syncState = syncStateOf(now);

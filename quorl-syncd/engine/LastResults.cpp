@@ -23,7 +23,7 @@ engine::Message messageIn(const Json& json) {
     engine::Message message{json.value("code", ""),
                             json.value("arguments", std::vector<std::string>())};
     auto text = json.at("message").get<std::string>();
-    const bool isKnown = text.empty() || !sentence(message).empty();
+    const bool isKnown = text.empty() || !engine::sentence(message).empty();
     return isKnown ? message : engine::other(std::move(text));
 }
 
@@ -31,7 +31,7 @@ engine::Message messageIn(const Json& json) {
 
 /// With the sentence, for earlier engines.
 void to_json(Json& json, const LastResult& result) {
-    json = {{"success", result.success},   {"message", sentence(result.message)},
+    json = {{"success", result.success},   {"message", engine::sentence(result.message)},
             {"code", result.message.code}, {"arguments", result.message.arguments},
             {"time", result.time},         {"lastComplete", result.lastComplete}};
 }

@@ -11,7 +11,8 @@ class NotReady : public std::runtime_error {
   public:
     using std::runtime_error::runtime_error;
 
-    explicit NotReady(const engine::Message& message) : std::runtime_error(sentence(message)) {}
+    explicit NotReady(const engine::Message& message)
+        : std::runtime_error(engine::sentence(message)) {}
 };
 
 } // namespace quorl::syncd

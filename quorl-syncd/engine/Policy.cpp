@@ -111,7 +111,7 @@ Decision decideRemoval(const Situation& now) {
 /// A sync that is to end is under way until its device has answered.
 Message statusOf(const Situation::Running& running) {
     if (running.whyStopped) {
-        return {code::stopping, flat(*running.whyStopped)};
+        return {code::stopping, engine::flat(*running.whyStopped)};
     }
     return {running.selection == Selection() ? code::removing : code::syncing};
 }

@@ -47,7 +47,7 @@ Message synced(std::size_t songs, std::size_t leftOut) {
 }
 
 Message notAllSent(const std::vector<Message>& problems) {
-    Message message{code::songsLeftOut, flat(problems.front())};
+    Message message{code::songsLeftOut, engine::flat(problems.front())};
     message.arguments.insert(message.arguments.begin(), std::to_string(problems.size()));
     return message;
 }

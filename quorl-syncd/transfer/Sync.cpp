@@ -12,6 +12,7 @@
 #include "quorl-syncd/transfer/Stopped.h"
 #include "quorl-syncd/transfer/SyncProblem.h"
 #include "services/engine/Codes.h"
+#include "services/engine/Message.h"
 
 namespace quorl::syncd {
 
@@ -96,6 +97,8 @@ Outcome Sync::run() {
     } catch (const std::bad_alloc&) {
         return {Kind::Failed, {code::notEnoughMemory}, false, true};
     } catch (const SyncProblem& problem) {
+        return {Kind::Failed, problem.message(), false, true};
+    } catch (const wearable::CannotBeSeen& problem) {
         return {Kind::Failed, problem.message(), false, true};
     } catch (const std::exception& error) {
         return {Kind::Failed, engine::other(error.what()), false, true};

@@ -11,7 +11,7 @@ namespace quorl::syncd {
 class SyncProblem : public std::runtime_error {
   public:
     explicit SyncProblem(engine::Message message)
-        : std::runtime_error(sentence(message)), message_(std::move(message)) {}
+        : std::runtime_error(engine::sentence(message)), message_(std::move(message)) {}
 
     [[nodiscard]] const engine::Message& message() const { return message_; }
 

@@ -6,8 +6,12 @@
 
 #include "services/base/AtomicFile.h"
 #include "services/base/Utf8.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
+
+using language::filled;
+using language::translated;
 
 namespace {
 
@@ -64,8 +68,9 @@ std::string LoginStart::set(bool isOn) const {
     const auto file = directory_ / fileName;
     const auto text = contents();
     if (!text.empty() && text.find(mark) == std::string::npos) {
-        return "The file " + base::printable(file.string()) +
-               " was not written by this app, so it stays as it is. Change or remove it yourself.";
+        return filled(translated("The file {file} was not written by this app, so it stays as it "
+                                 "is. Change or remove it yourself."),
+                      {{"file", base::printable(file.string())}});
     }
     try {
         if (isOn) {
@@ -76,8 +81,9 @@ std::string LoginStart::set(bool isOn) const {
         }
         return {};
     } catch (const std::system_error& error) {
-        return "The file " + base::printable(file.string()) +
-               " cannot be written: " + error.code().message() + ".";
+        return filled(
+            translated("The file {file} cannot be written: {reason}."),
+            {{"file", base::printable(file.string())}, {"reason", error.code().message()}});
     }
 }
 

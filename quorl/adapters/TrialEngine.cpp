@@ -2,7 +2,11 @@
 
 #include <QCoreApplication>
 
+#include "services/language/Translated.h"
+
 namespace quorl {
+
+using language::translated;
 
 namespace {
 
@@ -15,17 +19,18 @@ constexpr int alreadyRunning = 3;
 
 TrialEngine::TrialEngine(const Problem& problem) {
     process_.setProcessChannelMode(QProcess::ForwardedChannels);
-    QObject::connect(&process_, &QProcess::errorOccurred, &process_,
-                     [this, problem](QProcess::ProcessError error) {
-                         if (error == QProcess::FailedToStart) {
-                             problem("The sync engine of this trial does not start (" +
-                                     process_.errorString().toStdString() +
-                                     "). Install quorl-syncd again.");
-                         }
-                     });
+    QObject::connect(
+        &process_, &QProcess::errorOccurred, &process_,
+        [this, problem](QProcess::ProcessError error) {
+            if (error == QProcess::FailedToStart) {
+                problem(language::filled(translated("The sync engine of this trial does not start "
+                                                    "({reason}). Install quorl-syncd again."),
+                                         {{"reason", process_.errorString().toStdString()}}));
+            }
+        });
     QObject::connect(&process_, &QProcess::finished, &process_, [problem](int code) {
         if (code == alreadyRunning) {
-            problem("Another trial is running. End that one first.");
+            problem(translated("Another trial is running. End that one first."));
         }
     });
     process_.start(QCoreApplication::applicationDirPath() + QStringLiteral("/quorl-syncd"),

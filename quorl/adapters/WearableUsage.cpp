@@ -1,6 +1,7 @@
 #include "quorl/adapters/WearableUsage.h"
 
 #include "platform/Dispatch.h"
+#include "services/engine/Message.h"
 #include "services/wearable/UsageReader.h"
 
 namespace quorl {
@@ -19,7 +20,8 @@ void pass(const wearable::UsageReader::Answer& answer, const LSSManager::UsageHa
     if (const auto* usage = std::get_if<wearable::Usage>(&answer)) {
         reply(usageOf(*usage), nullptr);
     } else {
-        reply(nullptr, std::make_shared<NSError>(std::get<wearable::Unseen>(answer).sentence));
+        reply(nullptr, std::make_shared<NSError>(
+                           engine::sentence(std::get<wearable::Unseen>(answer).message)));
     }
 }
 

@@ -5,8 +5,11 @@
 #include "quorl/app/PaneLoader.h"
 #include "quorl/pages/FrontPage.h"
 #include "runtime/plugins/PluginBundle.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
+
+using language::translated;
 
 namespace {
 
@@ -57,7 +60,7 @@ void Companion::makeFrontPage() {
         problem_ = problem->text;
         return;
     }
-    frontPage_ = FrontPage::over(*host_, std::get<Class>(loaded), "Music");
+    frontPage_ = FrontPage::over(*host_, std::get<Class>(loaded), translated("Music"));
     navigation_->setRootPane(frontPage_);
     (void)frontPage_->specifiers(); // builds the rows before the page is shown
     host_->setEngineObserver([this] { refreshTopPage(); });
@@ -90,8 +93,8 @@ void Companion::showChosen() {
 
 std::string Companion::take(const Places& places) {
     if (!places.plugins.empty() && places.plugins != places_.plugins) {
-        return "quorl is running already, with other plug-ins. Close its window, then start it "
-               "again.";
+        return translated("quorl is running already, with other plug-ins. Close its window, then "
+                          "start it again.");
     }
     if (places.purpose() == base::Purpose::Trial) {
         host_->takePlaces(places);
@@ -104,7 +107,7 @@ void Companion::start() {
     navigation_->appear(false);
     if (frontPage_ && !navigation_->open(frontPage_->paneRow())) {
         notices_.set(Notices::Topic::Pane,
-                     "The Music pane cannot be shown. Install its plug-in again.");
+                     translated("The Music pane cannot be shown. Install its plug-in again."));
     }
     screen_.scheduleDrawing();
     host_->openLibrary([this] { Q_EMIT libraryRead(); });

@@ -6,9 +6,13 @@
 #include "quorl/facts/FolderTrouble.h"
 #include "quorl/facts/OfferedPlaylists.h"
 #include "services/engine/RunningSession.h"
+#include "services/language/Languages.h"
+#include "services/language/Translated.h"
 #include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
+
+using language::translated;
 
 namespace {
 
@@ -170,7 +174,8 @@ void CompanionHost::chooseWearable(const std::filesystem::path& directory) {
 void CompanionHost::ejectWearable(const std::filesystem::path& directory) {
     if (engine::runningSession(engine_.state())) {
         notices_.set(Notices::Topic::Request,
-                     "Music is being synced. Stop that or wait for its end, then eject the drive.");
+                     translated("Music is being synced. Stop that or wait for its end, then eject "
+                                "the drive."));
         return;
     }
     const auto offers = wearables().offers;
@@ -215,7 +220,7 @@ void CompanionHost::readLibrary() {
 void CompanionHost::noticeProblems(const media::Inventory& inventory) {
     Notice folder{troubleIn(inventory)};
     if (askForFolder_) {
-        folder.actionName = "Choose Folder…";
+        folder.actionName = translated("Choose Folder…");
         folder.act = [this] { chooseMusicFolder(); };
     }
     notices_.set(Notices::Topic::MusicFolder, std::move(folder));
@@ -235,5 +240,8 @@ std::shared_ptr<WearableConnection> CompanionHost::connectToWearable(dispatch_qu
 }
 
 Screen& CompanionHost::screen() { return screen_; }
+
+/// That of the app's own texts comes first, so that all on the screen is in one.
+std::vector<std::string> CompanionHost::languages() { return language::followedLanguages(); }
 
 } // namespace quorl

@@ -65,6 +65,7 @@ class CompanionHost final : public Host, public PageServices {
     [[nodiscard]] std::shared_ptr<WearableConnection>
     connectToWearable(dispatch_queue_t queue) override;
     [[nodiscard]] Screen& screen() override;
+    [[nodiscard]] std::vector<std::string> languages() override;
 
     [[nodiscard]] const engine::EngineState& engineState() const override {
         return engine_.state();

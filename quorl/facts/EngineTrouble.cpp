@@ -4,8 +4,12 @@
 #include <array>
 
 #include "services/engine/Codes.h"
+#include "services/language/Translated.h"
+#include "services/wearable/Unseen.h"
 
 namespace quorl {
+
+using language::translated;
 
 namespace {
 
@@ -13,6 +17,12 @@ namespace {
 constexpr std::array<std::string_view, 4> wished{engine::code::cancelled, engine::code::ended,
                                                  engine::code::stopped,
                                                  engine::code::somethingElseChosen};
+
+/// Whether the wearable cannot be looked at.
+bool isUnseen(const std::string& code) {
+    using wearable::unseen::all;
+    return code == engine::code::other || std::ranges::find(all, code) != all.end();
+}
 
 /// Whether the last sync has failed and is not about to be tried again.
 bool hasGivenUp(const engine::EngineStatus& engine) {
@@ -26,12 +36,12 @@ bool hasGivenUp(const engine::EngineStatus& engine) {
 std::string nameOf(Remedy remedy) {
     switch (remedy) {
     case Remedy::StartEngine:
-        return "Start";
+        return translated("Start");
     case Remedy::LookAgain:
     case Remedy::TryAgain:
         break;
     }
-    return "Try Again";
+    return translated("Try Again");
 }
 
 EngineLink::Request requestOf(Remedy remedy) {
@@ -42,7 +52,7 @@ EngineLink::Request requestOf(Remedy remedy) {
 
 std::optional<EngineTrouble> troubleIn(const engine::EngineState& state) {
     if (!state.isThere) {
-        return EngineTrouble{"The sync engine is not running, so nothing is synced.",
+        return EngineTrouble{translated("The sync engine is not running, so nothing is synced."),
                              Remedy::StartEngine};
     }
     const auto& engine = state.engine;
@@ -52,8 +62,7 @@ std::optional<EngineTrouble> troubleIn(const engine::EngineState& state) {
     if (hasGivenUp(engine)) {
         return EngineTrouble{engine.lastMessage, Remedy::TryAgain};
     }
-    // What is the matter with the wearable has no code but this one.
-    return engine.statusCode == engine::code::other
+    return isUnseen(engine.statusCode)
                ? std::optional(EngineTrouble{engine.status, Remedy::LookAgain})
                : std::nullopt;
 }

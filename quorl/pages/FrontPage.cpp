@@ -3,11 +3,14 @@
 #include <QDateTime>
 #include <QLocale>
 
-#include "platform/SizeFormatter.h"
+#include "quorl/facts/SizeWords.h"
 #include "quorl/pages/SyncPage.h"
 #include "quorl/pages/WearablesPage.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
+
+using language::translated;
 
 namespace {
 
@@ -16,20 +19,22 @@ std::string timeText(std::uint64_t microseconds) {
     return QLocale().toString(time, QLocale::ShortFormat).toStdString();
 }
 
-std::string sizeText(std::uint64_t bytes) { return CPFSSizeStrings(static_cast<float>(bytes)); }
-
 std::string storageOf(const engine::WearableStatus& wearable) {
-    return wearable.capacity == 0
-               ? "Unknown"
-               : sizeText(wearable.available) + " of " + sizeText(wearable.capacity) + " free";
+    return wearable.capacity == 0 ? translated("Unknown")
+                                  : freeSpaceWords(wearable.available, wearable.capacity);
+}
+
+std::string connectionOf(const engine::WearableStatus& wearable) {
+    return wearable.isEmbedded    ? translated("On this device (for trying out)")
+           : wearable.isConnected ? translated("Connected")
+                                  : translated("Not connected");
 }
 
 /// Nothing but the engine's own sentence, so that there is one truth.
 std::string statusOf(const engine::EngineState& state) {
-    return state.isThere
-               ? state.engine.status
-               : "The sync engine is not running, so nothing is synced. Start quorl-syncd, or log "
-                 "in again.";
+    return state.isThere ? state.engine.status
+                         : translated("The sync engine is not running, so nothing is synced. Start "
+                                      "quorl-syncd, or log in again.");
 }
 
 } // namespace
@@ -59,25 +64,26 @@ AppPage::Rows FrontPage::rows() {
 void FrontPage::addWearable(Rows& rows) {
     const auto& wearable = state().wearable;
     const auto& engine = state().engine;
-    rows.push_back(value("Connection", wearable.isEmbedded    ? "On this device (for trying out)"
-                                       : wearable.isConnected ? "Connected"
-                                                              : "Not connected"));
+    rows.push_back(value(translated("Connection"), connectionOf(wearable)));
     rows.push_back(chargerRow());
-    rows.push_back(value("Storage", storageOf(wearable)));
-    rows.push_back(value("Last Complete Sync",
-                         engine.lastComplete == 0 ? "Not yet" : timeText(engine.lastComplete)));
+    rows.push_back(value(translated("Storage"), storageOf(wearable)));
+    rows.push_back(value(translated("Last Complete Sync"), engine.lastComplete == 0
+                                                               ? translated("Not yet")
+                                                               : timeText(engine.lastComplete)));
     rows.push_back(group(std::nullopt, {}));
-    rows.push_back(link("Wearable", "", Class::of<WearablesPage>()));
-    rows.push_back(link("Sync", SyncPage::summaryOf(state()), Class::of<SyncPage>()));
+    rows.push_back(link(translated("Wearable"), "", Class::of<WearablesPage>()));
+    rows.push_back(link(translated("Sync"), SyncPage::summaryOf(state()), Class::of<SyncPage>()));
 }
 
 /// That of the embedded wearable is a pretence.
 AppPage::Row FrontPage::chargerRow() {
     const auto& wearable = state().wearable;
     if (!wearable.isEmbedded) {
-        return value("Charger", wearable.isOnCharger ? "On its charger" : "Not on its charger");
+        return value(translated("Charger"), wearable.isOnCharger
+                                                ? translated("On its charger")
+                                                : translated("Not on its charger"));
     }
-    return toggle("Simulated Charger", wearable.isOnCharger,
+    return toggle(translated("Simulated Charger"), wearable.isOnCharger,
                   PSSetter::of<&FrontPage::setOnCharger>("setOnCharger::"));
 }
 

@@ -4,11 +4,14 @@
 
 #include "services/base/Utf8.h"
 #include "services/engine/Message.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
 
+using language::translated;
+
 bool LeftOutPage::init() {
-    setTitle("Could Not Be Sent");
+    setTitle(translated("Could Not Be Sent"));
     return AppPage::init();
 }
 
@@ -22,16 +25,18 @@ AppPage::Rows LeftOutPage::rows() {
     for (const auto& [reason, entries] : entriesByReason) {
         rows.push_back(group(std::nullopt, engine::sentence({reason, {}})));
         for (const auto& entry : entries) {
-            rows.push_back(
-                value(entry.empty() ? "An entry without a name" : base::printable(entry), {}));
+            rows.push_back(value(entry.empty() ? translated("An entry without a name")
+                                               : base::printable(entry),
+                                 {}));
         }
     }
     const auto others =
         engine.leftOutCount - std::min<std::uint64_t>(engine.leftOutCount, engine.leftOut.size());
     if (rows.empty()) {
-        rows.push_back(group(std::nullopt, "Every song of the playlist can be sent."));
+        rows.push_back(group(std::nullopt, translated("Every song of the playlist can be sent.")));
     } else if (others > 0) {
-        rows.push_back(group(std::nullopt, "And " + std::to_string(others) + " more."));
+        rows.push_back(group(std::nullopt, language::translatedCount("And {count} more.",
+                                                                     "And {count} more.", others)));
     }
     return rows;
 }

@@ -3,14 +3,21 @@
 #include <algorithm>
 #include <filesystem>
 
-#include "platform/SizeFormatter.h"
+#include "quorl/facts/SizeWords.h"
 #include "quorl/pages/LeftOutPage.h"
 #include "quorl/pages/RemovePage.h"
 #include "quorl/pages/TimeLeft.h"
 #include "services/base/Utf8.h"
 #include "services/engine/RunningSession.h"
+#include "services/language/Numbers.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
+
+using language::filled;
+using language::numberText;
+using language::percentText;
+using language::translated;
 
 namespace {
 
@@ -25,15 +32,12 @@ const engine::TaskState* songsOf(const engine::SessionState& session) {
 /// "Song 3 of 50" while the third is under way.
 std::string placeOf(const engine::TaskState& songs) {
     const auto place = std::min(songs.completedItemCount + 1, songs.totalItemCount);
-    return "Song " + std::to_string(place) + " of " + std::to_string(songs.totalItemCount);
+    return filled(translated("Song {place} of {count}"),
+                  {{"place", numberText(place)}, {"count", numberText(songs.totalItemCount)}});
 }
 
 std::string percentOf(const engine::SessionState& session) {
-    return std::to_string(static_cast<int>(double(session.progress) * 100)) + "%";
-}
-
-std::string countOfSongs(std::uint64_t count) {
-    return std::to_string(count) + (count == 1 ? " song" : " songs");
+    return percentText(double(session.progress));
 }
 
 std::string nameOf(const std::string& path) {
@@ -46,14 +50,14 @@ std::string SyncPage::summaryOf(const engine::EngineState& state) {
     const auto* const session = engine::runningSession(state);
     const auto& word = state.engine.syncState;
     return session                       ? percentOf(*session)
-           : word == engine::syncSynced  ? "Up to date"
-           : word == engine::syncPending ? "Waiting"
-           : word == engine::syncOff     ? "Off"
+           : word == engine::syncSynced  ? translated("Up to date")
+           : word == engine::syncPending ? translated("Waiting")
+           : word == engine::syncOff     ? translated("Off")
                                          : "";
 }
 
 bool SyncPage::init() {
-    setTitle("Sync");
+    setTitle(translated("Sync"));
     return AppPage::init();
 }
 
@@ -70,8 +74,9 @@ AppPage::Rows SyncPage::rows() {
     addSession(rows);
     addWearable(rows);
     if (startsAtLogin_) {
-        rows.push_back(group(std::nullopt, "Without it, syncing begins when this app is opened."));
-        rows.push_back(toggle("Start at Login", *startsAtLogin_,
+        rows.push_back(
+            group(std::nullopt, translated("Without it, syncing begins when this app is opened.")));
+        rows.push_back(toggle(translated("Start at Login"), *startsAtLogin_,
                               PSSetter::of<&SyncPage::setLoginStart>("setLoginStart::")));
     }
     return rows;
@@ -81,40 +86,41 @@ void SyncPage::addSession(Rows& rows) {
     const auto* const session = engine::runningSession(state());
     if (!session) {
         if (state().isThere && state().engine.syncState != engine::syncOff) {
-            rows.push_back(button("Sync Now", PSSetter::of<&SyncPage::syncNow>("syncNow::")));
+            rows.push_back(
+                button(translated("Sync Now"), PSSetter::of<&SyncPage::syncNow>("syncNow::")));
         }
         return;
     }
     const auto* const songs = songsOf(*session);
-    rows.push_back(progress("Progress",
-                            songs ? placeOf(*songs) + ", " + percentOf(*session) : "Preparing",
-                            session->progress));
+    rows.push_back(
+        progress(translated("Progress"),
+                 songs ? filled(translated("{place}, {percent}"),
+                                {{"place", placeOf(*songs)}, {"percent", percentOf(*session)}})
+                       : translated("Preparing"),
+                 session->progress));
     if (const auto left = timeLeft(*session); !left.empty()) {
-        rows.push_back(value("Time Left", left));
+        rows.push_back(value(translated("Time Left"), left));
     }
     if (!session->currentItem.empty()) {
-        rows.push_back(value("Now", nameOf(session->currentItem)));
+        rows.push_back(value(translated("Now"), nameOf(session->currentItem)));
     }
-    rows.push_back(button("Stop", PSSetter::of<&SyncPage::stop>("stop::")));
+    rows.push_back(button(translated("Stop"), PSSetter::of<&SyncPage::stop>("stop::")));
 }
 
 void SyncPage::addWearable(Rows& rows) {
     const auto& engine = state().engine;
     const auto& wearable = state().wearable;
-    rows.push_back(group("On the Velora", {}));
-    rows.push_back(value("Music", wearable.songCount == 0
-                                      ? "None"
-                                      : countOfSongs(wearable.songCount) + ", " +
-                                            CPFSSizeStrings(static_cast<float>(wearable.songs))));
+    rows.push_back(group(translated("On the Velora"), {}));
+    rows.push_back(value(translated("Music"), songsWords(wearable.songCount, wearable.songs)));
     if (engine.leftOutCount > 0) {
-        rows.push_back(
-            link("Could Not Be Sent", countOfSongs(engine.leftOutCount), Class::of<LeftOutPage>()));
+        rows.push_back(link(translated("Could Not Be Sent"), songsWords(engine.leftOutCount),
+                            Class::of<LeftOutPage>()));
     }
     if (engine.beyondLimit > 0) {
-        rows.push_back(value("Beyond the Limit", countOfSongs(engine.beyondLimit)));
+        rows.push_back(value(translated("Beyond the Limit"), songsWords(engine.beyondLimit)));
     }
     if (wearable.songCount > 0) {
-        rows.push_back(link("Remove Music", {}, Class::of<RemovePage>()));
+        rows.push_back(link(translated("Remove Music"), {}, Class::of<RemovePage>()));
     }
 }
 

@@ -1,8 +1,14 @@
 #include "quorl/pages/TimeLeft.h"
 
 #include <cmath>
+#include <cstdint>
+
+#include "services/language/Translated.h"
 
 namespace quorl {
+
+using language::translated;
+using language::translatedCount;
 
 namespace {
 
@@ -12,10 +18,7 @@ constexpr double hour = 60 * minute;
 /// A machine that copies so slowly has stopped.
 constexpr double longest = 100 * hour;
 
-std::string about(double count, const std::string& unit) {
-    const auto number = static_cast<int>(std::lround(count));
-    return "About " + std::to_string(number) + " " + unit + (number == 1 ? "" : "s");
-}
+std::uint64_t rounded(double count) { return static_cast<std::uint64_t>(std::lround(count)); }
 
 } // namespace
 
@@ -28,9 +31,11 @@ std::string timeLeft(const engine::SessionState& session) {
     if (seconds > longest) {
         return {};
     }
-    return seconds < minute       ? "Less than a minute"
-           : seconds < 1.5 * hour ? about(seconds / minute, "minute")
-                                  : about(seconds / hour, "hour");
+    return seconds < minute       ? translated("Less than a minute")
+           : seconds < 1.5 * hour ? translatedCount("About {count} minute", "About {count} minutes",
+                                                    rounded(seconds / minute))
+                                  : translatedCount("About {count} hour", "About {count} hours",
+                                                    rounded(seconds / hour));
 }
 
 } // namespace quorl

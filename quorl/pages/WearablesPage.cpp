@@ -1,24 +1,29 @@
 #include "quorl/pages/WearablesPage.h"
 
-#include "platform/SizeFormatter.h"
+#include "quorl/facts/SizeWords.h"
 #include "services/base/Utf8.h"
 #include "services/engine/RunningSession.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
 
-namespace {
+using language::filled;
+using language::toTranslate;
+using language::translated;
 
-std::string sizeText(std::uint64_t bytes) { return CPFSSizeStrings(static_cast<float>(bytes)); }
+namespace {
 
 /// The embedded one has as much room as the front page says.
 std::string textOf(const finding::Offer& offer) {
     if (offer.isEmbedded()) {
         return {};
     }
-    if (!offer.space) {
-        return "Does not answer";
-    }
-    return sizeText(offer.space->available) + " of " + sizeText(offer.space->capacity) + " free";
+    return offer.space ? freeSpaceWords(offer.space->available, offer.space->capacity)
+                       : translated("Does not answer");
+}
+
+std::string nameOf(const finding::Offer& offer) {
+    return offer.isEmbedded() ? translated(finding::embeddedName) : base::printable(offer.name);
 }
 
 /// Not a directory of it, which goes with it.
@@ -26,14 +31,14 @@ bool isEjectable(const finding::Offer& offer) {
     return offer.removal && offer.identity && offer.identity->mountPoint == offer.directory;
 }
 
-constexpr auto explanation =
+constexpr auto explanation = toTranslate(
     "Drives that are plugged in, and folders that music was synced to before. Music is only ever "
-    "put on the one that is chosen; what else is on it stays as it is.";
+    "put on the one that is chosen; what else is on it stays as it is.");
 
 } // namespace
 
 bool WearablesPage::init() {
-    setTitle("Wearable");
+    setTitle(translated("Wearable"));
     return AppPage::init();
 }
 
@@ -49,13 +54,15 @@ void WearablesPage::viewDidDisappear(bool animated) {
 
 AppPage::Rows WearablesPage::rows() {
     const auto shelf = services().wearables();
-    Rows rows{group(std::nullopt, shelf.isComplete ? explanation : "Looking for wearables…")};
+    Rows rows{
+        group(std::nullopt,
+              translated(shelf.isComplete ? explanation : toTranslate("Looking for wearables…")))};
     addMissing(rows);
     addOffers(rows);
     if (services().canAskForFolder()) {
         rows.push_back(group(std::nullopt, {}));
-        rows.push_back(
-            button("Other Directory…", PSSetter::of<&WearablesPage::chooseOther>("chooseOther::")));
+        rows.push_back(button(translated("Other Directory…"),
+                              PSSetter::of<&WearablesPage::chooseOther>("chooseOther::")));
     }
     addRemovals(rows);
     return rows;
@@ -66,7 +73,7 @@ void WearablesPage::addOffers(Rows& rows) {
     for (std::size_t index = 0; index < shelf.offers.size(); ++index) {
         const auto& offer = shelf.offers[index];
         rows.push_back(about(offer.directory.string(),
-                             choice(base::printable(offer.name), textOf(offer),
+                             choice(nameOf(offer), textOf(offer),
                                     shelf.chosen == index ? Chosen::Yes : Chosen::No,
                                     PSSetter::of<&WearablesPage::choose>("choose::"))));
     }
@@ -76,9 +83,11 @@ void WearablesPage::addOffers(Rows& rows) {
 void WearablesPage::addMissing(Rows& rows) {
     const auto missing = services().wearables().missing;
     if (!missing.empty()) {
-        rows.push_back(choice(base::printable(missing),
-                              state().wearable.isConnected ? "Connected" : "Not connected",
-                              Chosen::Yes, PSSetter::of<&WearablesPage::choose>("choose::")));
+        rows.push_back(
+            choice(base::printable(missing),
+                   translated(state().wearable.isConnected ? toTranslate("Connected")
+                                                           : toTranslate("Not connected")),
+                   Chosen::Yes, PSSetter::of<&WearablesPage::choose>("choose::")));
     }
 }
 
@@ -86,12 +95,13 @@ void WearablesPage::addMissing(Rows& rows) {
 void WearablesPage::addRemovals(Rows& rows) {
     const auto shelf = services().wearables();
     for (const auto& name : shelf.safeToRemove) {
-        rows.push_back(value(base::printable(name), "Safe to remove"));
+        rows.push_back(value(base::printable(name), translated("Safe to remove")));
     }
     for (const auto& offer : shelf.offers) {
         if (isEjectable(offer) && !engine::runningSession(state())) {
             rows.push_back(about(offer.directory.string(),
-                                 button("Eject “" + base::printable(offer.name) + "”",
+                                 button(filled(translated("Eject “{name}”"),
+                                               {{"name", base::printable(offer.name)}}),
                                         PSSetter::of<&WearablesPage::eject>("eject::"))));
         }
     }

@@ -1,15 +1,19 @@
 #include "quorl/process/QtSetup.h"
 
 #include <QGuiApplication>
+#include <QLibraryInfo>
 #include <QLocale>
 
 #include "quorl/process/QtMessages.h"
+#include "quorl/process/QtTexts.h"
 #include "runtime/plugins/StringTable.h"
+#include "services/language/Languages.h"
 
 namespace quorl {
 
 QtSetup::QtSetup(char* program) : arguments_{program, nullptr} {
     takeQtMessages();
+    language::followLanguages(environmentLanguages());
     QCoreApplication::setApplicationName(QStringLiteral("quorl"));
     QCoreApplication::setApplicationVersion(QStringLiteral(QUORL_VERSION));
     QGuiApplication::setDesktopFileName(QStringLiteral("org.quorl.Velora"));
@@ -21,9 +25,15 @@ bool QtSetup::hasDisplay() {
 }
 
 void QtSetup::followUsersLanguage() {
-    const QLocale locale(QString::fromStdString(environmentLanguages().front()));
+    const QLocale locale(QString::fromStdString(language::followedLanguages().front()));
     QLocale::setDefault(locale);
     QGuiApplication::setLayoutDirection(locale.textDirection());
+    auto* ofQt = new QTranslator(qGuiApp);
+    if (ofQt->load(locale, QStringLiteral("qtbase"), QStringLiteral("_"),
+                   QLibraryInfo::path(QLibraryInfo::TranslationsPath))) {
+        QCoreApplication::installTranslator(ofQt);
+    }
+    QCoreApplication::installTranslator(new QtTexts(qGuiApp));
 }
 
 } // namespace quorl

@@ -8,7 +8,8 @@ namespace quorl {
 /// and outlives it. Main thread.
 class QtSetup {
   public:
-    /// Names the program to Qt. `program` is how it was called.
+    /// Names the program to Qt, and follows the user's languages. `program` is how it was called.
+    /// Before other threads are started.
     explicit QtSetup(char* program);
 
     QtSetup(const QtSetup&) = delete;
@@ -17,7 +18,7 @@ class QtSetup {
     /// Whether there is a display to show a window on.
     [[nodiscard]] static bool hasDisplay();
 
-    /// Has Qt write and lay out as the user's language does. Wants an application object with a
+    /// Has Qt write and lay out as the followed language does. Wants an application object with a
     /// display.
     static void followUsersLanguage();
 

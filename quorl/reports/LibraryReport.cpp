@@ -3,9 +3,9 @@
 #include <iostream>
 
 #include "quorl/app/Printing.h"
-#include "runtime/plugins/StringTable.h"
 #include "runtime/services/SizeText.h"
 #include "services/base/Utf8.h"
+#include "services/language/Languages.h"
 #include "services/media/MusicFolder.h"
 #include "services/preferences/ChosenPlaces.h"
 
@@ -43,7 +43,7 @@ std::string describe(const media::Playlist& playlist, const media::Inventory& in
 }
 
 void printPlaylists(const media::Inventory& inventory) {
-    const std::string language = environmentLanguages().front();
+    const std::string language = language::followedLanguages().front();
     std::cout << base::printable(inventory.root.string()) << ": "
               << countOf(inventory.playlists.size(), "playlist") << ", "
               << countOf(inventory.songs.size(), "song") << " listed\n";

@@ -9,12 +9,12 @@
 
 #include <nlohmann/json.hpp>
 
-#include "runtime/plugins/StringTable.h"
 #include "runtime/services/SizeText.h"
 #include "services/base/Utf8.h"
 #include "services/engine/Client.h"
 #include "services/engine/Message.h"
 #include "services/engine/RunningSession.h"
+#include "services/language/Languages.h"
 #include "services/preferences/SharedPreferences.h"
 
 namespace quorl {
@@ -111,12 +111,12 @@ Json jsonOf(const engine::EngineState& state, const Choice& choice) {
 }
 
 std::string size(std::uint64_t bytes) {
-    return sizeText(static_cast<double>(bytes), environmentLanguages().front());
+    return sizeText(static_cast<double>(bytes), language::followedLanguages().front());
 }
 
 /// Some other engine may have words that nobody here knows.
 std::string explanationOf(const std::string& code) {
-    const auto explanation = sentence(engine::Message{code});
+    const auto explanation = engine::sentence(engine::Message{code});
     return explanation.empty() ? code : explanation;
 }
 

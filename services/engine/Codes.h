@@ -49,6 +49,8 @@ inline constexpr auto songNotAFile = "song-not-a-file";
 inline constexpr auto songChanged = "song-changed";
 inline constexpr auto songTooLarge = "song-too-large";
 
+// Those of a wearable that cannot be looked at are in services/wearable/Unseen.h.
+
 inline constexpr auto other = "other"; ///< a sentence
 
 } // namespace quorl::engine::code

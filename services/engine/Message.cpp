@@ -10,10 +10,18 @@
 
 #include "services/base/Utf8.h"
 #include "services/engine/Codes.h"
+#include "services/language/Numbers.h"
+#include "services/language/Translated.h"
 #include "services/media/playlists/LeftOut.h"
+#include "services/wearable/Unseen.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl::engine {
+
+using language::filled;
+using language::toTranslate;
+using language::translated;
+using language::translatedCount;
 
 namespace {
 
@@ -25,55 +33,79 @@ constexpr std::size_t mostArguments = 8;
 struct Wording {
     std::string_view code;
     /// With blanks in braces: the name of one of `blanks`, and the number of an argument.
-    std::string_view pattern;
+    const char* pattern;
 };
 
 constexpr std::array wordings{
-    Wording{code::syncOff, "Music sync is switched off."},
-    Wording{code::noPlaylist, "No playlist is chosen."},
-    Wording{code::readingMusic, "Reading the music folder…"},
-    Wording{code::playlistGone, "The chosen playlist is not in the music folder."},
-    Wording{code::lookingForWearable, "Looking for the wearable…"},
-    Wording{code::notConnected, "The wearable is not connected."},
-    Wording{code::notOnCharger, "The wearable is not on its charger."},
-    Wording{code::syncing, "Syncing music."},
-    Wording{code::stopping, "Ending the sync. {message 0}"},
-    Wording{code::aboutToSync, "About to sync music."},
-    Wording{code::removing, "Removing the music."},
-    Wording{code::upToDate, "Everything is up to date."},
+    Wording{code::syncOff, toTranslate("Music sync is switched off.")},
+    Wording{code::noPlaylist, toTranslate("No playlist is chosen.")},
+    Wording{code::readingMusic, toTranslate("Reading the music folder…")},
+    Wording{code::playlistGone, toTranslate("The chosen playlist is not in the music folder.")},
+    Wording{code::lookingForWearable, toTranslate("Looking for the wearable…")},
+    Wording{code::notConnected, toTranslate("The wearable is not connected.")},
+    Wording{code::notOnCharger, toTranslate("The wearable is not on its charger.")},
+    Wording{code::syncing, toTranslate("Syncing music.")},
+    Wording{code::stopping, toTranslate("Ending the sync. {message 0}")},
+    Wording{code::aboutToSync, toTranslate("About to sync music.")},
+    Wording{code::removing, toTranslate("Removing the music.")},
+    Wording{code::upToDate, toTranslate("Everything is up to date.")},
     Wording{code::upToDateBut,
-            "Everything that could be found is on the {wearable}. {songs 0} could "
-            "not be found or read."},
-    Wording{code::synced, "{songs 0} synced to {wearable}."},
+            toTranslate("Everything that could be found is on the {wearable}. {songs 0} could "
+                        "not be found or read.")},
+    Wording{code::synced, toTranslate("{songs 0} synced to {wearable}.")},
     Wording{code::syncedBut,
-            "{songs 0} synced to {wearable}. {songs 1} could not be found or read."},
-    Wording{code::removed, "The music was removed from the {wearable}."},
-    Wording{code::songsLeftOut, "{message 1}{others 0}"},
-    Wording{code::cancelled, "The sync was cancelled."},
-    Wording{code::ended, "The sync engine was ended."},
-    Wording{code::stopped, "The sync was stopped."},
-    Wording{code::somethingElseChosen, "Something else was chosen."},
-    Wording{code::anotherProgram, "Another program is syncing to this {wearable}. Wait until it is "
-                                  "done, or end it."},
-    Wording{code::notEnoughMemory, "The {wearable} could not be synced, for there is not enough "
-                                   "memory. Close some programs."},
+            toTranslate("{songs 0} synced to {wearable}. {songs 1} could not be found or read.")},
+    Wording{code::removed, toTranslate("The music was removed from the {wearable}.")},
+    Wording{code::songsLeftOut, toTranslate("{message 1}{others 0}")},
+    Wording{code::cancelled, toTranslate("The sync was cancelled.")},
+    Wording{code::ended, toTranslate("The sync engine was ended.")},
+    Wording{code::stopped, toTranslate("The sync was stopped.")},
+    Wording{code::somethingElseChosen, toTranslate("Something else was chosen.")},
+    Wording{code::anotherProgram,
+            toTranslate("Another program is syncing to this {wearable}. Wait until it is "
+                        "done, or end it.")},
+    Wording{code::notEnoughMemory,
+            toTranslate("The {wearable} could not be synced, for there is not enough "
+                        "memory. Close some programs.")},
     Wording{code::notEnoughSpace,
-            "The {wearable} has not enough space: {megabytes 0} are needed for new songs, "
-            "{megabytes 1} are available. Remove something from it, or choose a lower limit."},
-    Wording{code::wearableFull,
-            "The {wearable} is full. Remove something from it, or choose a lower limit."},
-    Wording{code::writeProtected, "The {wearable} cannot be written to{detail 0}. Check that it is "
-                                  "not write-protected."},
-    Wording{code::wentAway, "The {wearable} went away{detail 0}. Connect it again."},
-    Wording{code::obstructed, "On the {wearable}, “{music}” or “{own}” is not a directory. Give it "
-                              "another name, or remove it."},
-    Wording{code::notSynced, "The {wearable} could not be synced{detail 0}."},
-    Wording{code::songGone, "{song 0} is no longer in the music folder."},
-    Wording{code::songUnreadable, "{song 0} cannot be read{detail 1}."},
-    Wording{code::songNotAFile, "{song 0} is not a file any more."},
+            toTranslate(
+                "The {wearable} has not enough space: {megabytes 0} are needed for new songs, "
+                "{megabytes 1} are available. Remove something from it, or choose a lower limit.")},
+    Wording{
+        code::wearableFull,
+        toTranslate("The {wearable} is full. Remove something from it, or choose a lower limit.")},
+    Wording{code::writeProtected,
+            toTranslate("The {wearable} cannot be written to{detail 0}. Check that it is "
+                        "not write-protected.")},
+    Wording{code::wentAway, toTranslate("The {wearable} went away{detail 0}. Connect it again.")},
+    Wording{code::obstructed,
+            toTranslate("On the {wearable}, “{music}” or “{own}” is not a directory. Give it "
+                        "another name, or remove it.")},
+    Wording{code::notSynced, toTranslate("The {wearable} could not be synced{detail 0}.")},
+    Wording{code::songGone, toTranslate("{song 0} is no longer in the music folder.")},
+    Wording{code::songUnreadable, toTranslate("{song 0} cannot be read{detail 1}.")},
+    Wording{code::songNotAFile, toTranslate("{song 0} is not a file any more.")},
     Wording{code::songChanged,
-            "{song 0} has just been changed. It will be sent once it stays as it is."},
-    Wording{code::songTooLarge, "{song 0} is larger than a file on the {wearable} can be."},
+            toTranslate("{song 0} has just been changed. It will be sent once it stays as it is.")},
+    Wording{code::songTooLarge,
+            toTranslate("{song 0} is larger than a file on the {wearable} can be.")},
+    Wording{wearable::unseen::unreachable,
+            toTranslate("The {wearable} at {path 0} cannot be reached: {text 1}.")},
+    Wording{wearable::unseen::silent,
+            toTranslate("The {wearable} does not answer. Check its connection.")},
+    Wording{wearable::unseen::noThreads,
+            toTranslate("The {wearable} cannot be looked at, for no more threads can be started. "
+                        "Close some programs.")},
+    Wording{
+        wearable::unseen::badManifest,
+        toTranslate(
+            "The list of the music on the {wearable} cannot be used ({text 0}). Remove the files "
+            "{own}/manifest.* from it to begin anew; the music that is on it then stays.")},
+    Wording{wearable::unseen::notPluggedIn,
+            toTranslate("The {wearable} that was chosen is not plugged in. Plug it in.")},
+    Wording{wearable::unseen::otherDrive,
+            toTranslate("The {wearable} that was chosen is not connected. {drive 1} is at {path 0} "
+                        "in its place. Plug in the one that was chosen, or choose this one.")},
     Wording{code::other, "{text 0}"},
 };
 
@@ -90,7 +122,7 @@ std::optional<std::uint64_t> numberIn(const std::string& text) {
 }
 
 std::string countOfSongs(std::uint64_t count) {
-    return count == 1 ? "1 song" : std::to_string(count) + " songs";
+    return translatedCount("{count} song", "{count} songs", count);
 }
 
 std::string songs(const Arguments& arguments, std::size_t place) {
@@ -101,20 +133,38 @@ std::string songs(const Arguments& arguments, std::size_t place) {
 /// Of several songs those that are not named.
 std::string others(const Arguments& arguments, std::size_t place) {
     const auto count = numberIn(at(arguments, place)).value_or(0);
-    return count < 2 ? "" : " " + countOfSongs(count - 1) + " more could not be sent.";
+    return count < 2 ? ""
+                     : " " + translatedCount("{count} song more could not be sent.",
+                                             "{count} songs more could not be sent.", count - 1);
 }
 
 /// Rounded up.
 std::string megabytes(const Arguments& arguments, std::size_t place) {
     constexpr std::uint64_t megabyte = 1 << 20;
     const auto bytes = numberIn(at(arguments, place));
-    return bytes ? std::to_string(*bytes / megabyte + (*bytes % megabyte == 0 ? 0 : 1)) + " MB"
+    return bytes ? language::megabyteText(*bytes / megabyte + (*bytes % megabyte == 0 ? 0 : 1))
                  : at(arguments, place);
 }
 
 std::string song(const Arguments& arguments, std::size_t place) {
     const auto path = at(arguments, place);
-    return path.empty() ? "It" : "“" + base::printable(path) + "”";
+    return path.empty() ? translated("It")
+                        : filled(translated("“{name}”"), {{"name", base::printable(path)}});
+}
+
+/// A sentence from elsewhere, which may be one that is known here.
+std::string text(const Arguments& arguments, std::size_t place) {
+    return translated(at(arguments, place).c_str());
+}
+
+std::string path(const Arguments& arguments, std::size_t place) {
+    return base::printable(at(arguments, place));
+}
+
+std::string drive(const Arguments& arguments, std::size_t place) {
+    const auto name = path(arguments, place);
+    return name.empty() ? translated("Another drive")
+                        : filled(translated("Another drive, “{name}”,"), {{"name", name}});
 }
 
 std::string detail(const Arguments& arguments, std::size_t place) {
@@ -153,29 +203,17 @@ constexpr std::array blanks{
     Blank{"own", ownDirectoryIn},  Blank{"songs", songs},
     Blank{"others", others},       Blank{"megabytes", megabytes},
     Blank{"song", song},           Blank{"detail", detail},
-    Blank{"message", message},     Blank{"text", at},
+    Blank{"message", message},     Blank{"text", text},
+    Blank{"path", path},           Blank{"drive", drive},
 };
 
-/// @param blank as it is between the braces.
-std::string filled(std::string_view blank, const Arguments& arguments) {
-    const auto space = std::min(blank.find(' '), blank.size());
-    const auto place = space < blank.size() ? blank[space + 1] - '0' : 0;
-    const auto* const found = std::ranges::find(blanks, blank.substr(0, space), &Blank::name);
-    return found->fill(arguments, static_cast<std::size_t>(place));
-}
-
-std::string worded(std::string_view pattern, const Arguments& arguments) {
-    std::string text;
-    for (;;) {
-        const auto open = pattern.find('{');
-        text += pattern.substr(0, open);
-        if (open == std::string_view::npos) {
-            return text;
-        }
-        const auto close = pattern.find('}', open);
-        text += filled(pattern.substr(open + 1, close - open - 1), arguments);
-        pattern.remove_prefix(close + 1);
-    }
+std::string worded(const char* pattern, const Arguments& arguments) {
+    return filled(translated(pattern), [&arguments](std::string_view blank) {
+        const auto space = std::min(blank.find(' '), blank.size());
+        const auto place = space < blank.size() ? blank[space + 1] - '0' : 0;
+        const auto* const found = std::ranges::find(blanks, blank.substr(0, space), &Blank::name);
+        return found->fill(arguments, static_cast<std::size_t>(place));
+    });
 }
 
 } // namespace
@@ -189,7 +227,7 @@ std::string sentence(const Message& message) {
         return worded(wording->pattern, message.arguments);
     }
     const auto reason = media::reasonOf(message.code);
-    return reason ? std::string(media::sentence(*reason)) : std::string();
+    return reason ? translated(media::sentence(*reason)) : std::string();
 }
 
 Message other(std::string sentence) { return {code::other, {std::move(sentence)}}; }

@@ -3,21 +3,16 @@
 #include <string>
 #include <vector>
 
+#include "services/language/CodedMessage.h"
+
 namespace quorl::engine {
 
-/// Something to tell a person: for programs that go by it, and for wording in any language.
-struct Message {
-    /// One of Codes.h; empty for nothing to tell. Another engine may have others.
-    std::string code = {};
-    /// As its code says. Counts are decimal numbers, paths any bytes; what the system says is in
-    /// its own words.
-    std::vector<std::string> arguments = {};
+/// What an engine tells; its code is one of Codes.h. Another engine may have others.
+using Message = language::CodedMessage;
 
-    bool operator==(const Message&) const = default;
-};
-
-/// In English, in a sentence or several; empty for a code that is not known. Arguments that are
-/// missing leave a gap, and too many are ignored. Control characters in paths are replaced.
+/// In the language that is followed, in a sentence or several; empty for a code that is not known.
+/// Arguments that are missing leave a gap, and too many are ignored. Control characters in paths
+/// are replaced.
 [[nodiscard]] std::string sentence(const Message& message);
 
 /// A message of which nothing but its sentence is known.

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "services/engine/Interface.h"
+#include "services/engine/Message.h"
 
 namespace quorl::engine {
 
@@ -24,6 +25,21 @@ auto* findSessionOf(Sessions& sessions, const std::string& path) {
     const auto found = std::ranges::find_if(
         sessions, [&](auto& session) { return find(session.tasks, path) != nullptr; });
     return found == sessions.end() ? nullptr : &*found;
+}
+
+/// In the words of this program, which knows what language it is read in; those of the engine for
+/// what is not known here.
+void word(std::string& sentence, const std::string& code,
+          const std::vector<std::string>& arguments) {
+    if (auto own = engine::sentence({code, arguments}); !own.empty()) {
+        sentence = std::move(own);
+    }
+}
+
+void updateEngine(EngineStatus& engine, const Properties& properties) {
+    update(engine, properties);
+    word(engine.status, engine.statusCode, engine.statusArguments);
+    word(engine.lastMessage, engine.lastCode, engine.lastArguments);
 }
 
 Reduced nothing(const StatePointer& state) { return {state}; }
@@ -71,7 +87,7 @@ Reduced take(const StatePointer& /*before*/, const ObjectsListed& message) {
     state->isThere = true;
     for (const auto& [path, interfaces] : message.objects) {
         if (const auto* const properties = propertiesOf<EngineStatus>(interfaces)) {
-            update(state->engine, *properties);
+            updateEngine(state->engine, *properties);
         }
         if (const auto* const properties = propertiesOf<WearableStatus>(interfaces)) {
             update(state->wearable, *properties);
@@ -145,7 +161,7 @@ Reduced take(const StatePointer& before, const PropertiesChanged& message) {
         return nothing(state);
     }
     if (message.interface == engineInterface) {
-        update(state->engine, message.properties);
+        updateEngine(state->engine, message.properties);
     } else if (message.interface == wearableInterface) {
         update(state->wearable, message.properties);
     } else {

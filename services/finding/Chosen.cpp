@@ -1,27 +1,11 @@
 #include "services/finding/Chosen.h"
 
 #include "services/base/Paths.h"
-#include "services/base/Utf8.h"
-#include "services/wearable/Wearable.h"
+#include "services/wearable/Unseen.h"
 
 namespace quorl::finding {
 
 namespace {
-
-std::string theChosenOne() {
-    return std::string("The ") + wearable::wearableName + " that was chosen";
-}
-
-std::string notPluggedIn() { return theChosenOne() + " is not plugged in. Plug it in."; }
-
-std::string anotherIsThere(const std::filesystem::path& directory, const Drive* drive) {
-    const auto name = drive == nullptr || drive->label.empty()
-                          ? std::string("Another drive")
-                          : "Another drive, “" + base::printable(drive->label) + "”,";
-    return theChosenOne() + " is not connected. " + name + " is at " +
-           base::printable(directory.string()) +
-           " in its place. Plug in the one that was chosen, or choose this one.";
-}
 
 /// Where all of the file system is mounted rather than a part of it; null where none is.
 const base::Mount* mountWith(const std::string& uuid, const Surroundings& surroundings) {
@@ -47,11 +31,15 @@ Whereabouts missing(const Chosen& chosen, const Surroundings& surroundings) {
     const auto* const drive = mount == nullptr ? nullptr : driveOf(*mount, surroundings.drives);
     const auto& before = chosen.identity->mountPoint;
     if (mount == nullptr || !base::isWithin(mount->directory.native(), before.native())) {
-        return {chosen.directory, notPluggedIn()};
+        return {chosen.directory, {wearable::unseen::notPluggedIn}};
     }
     const bool isUnknown = drive == nullptr || drive->uuid.empty();
     const bool isDevice = !mount->device.starts_with("0:") || mount->source.starts_with("/dev/");
-    return {chosen.directory, isUnknown && isDevice ? "" : anotherIsThere(mount->directory, drive)};
+    if (isUnknown && isDevice) {
+        return {chosen.directory};
+    }
+    const auto name = drive == nullptr ? std::string() : drive->label;
+    return {chosen.directory, {wearable::unseen::otherDrive, {mount->directory.string(), name}}};
 }
 
 } // namespace

@@ -6,6 +6,7 @@
 #include <string_view>
 
 #include "services/finding/Drive.h"
+#include "services/language/CodedMessage.h"
 
 namespace quorl::finding {
 
@@ -48,9 +49,8 @@ struct Chosen {
 struct Whereabouts {
     /// Where it was chosen as long as it is nowhere else.
     std::filesystem::path directory;
-    /// Why it is not there, as a sentence that says what to do; empty where nothing is known
-    /// against it.
-    std::string problem = {};
+    /// Why it is not there, as in `wearable::Unseen`; no code where nothing is known against it.
+    language::CodedMessage problem = {};
 
     bool operator==(const Whereabouts&) const = default;
 };

@@ -67,7 +67,7 @@ const Offer* chosenOf(const std::vector<Offer>& offers, const Chosen& chosen,
                       const Surroundings& surroundings) {
     const auto whereabouts = whereaboutsOf(chosen, surroundings);
     const auto found = std::ranges::find(offers, whereabouts.directory, &Offer::directory);
-    return found == offers.end() || !whereabouts.problem.empty() ? nullptr : &*found;
+    return found == offers.end() || !whereabouts.problem.code.empty() ? nullptr : &*found;
 }
 
 } // namespace quorl::finding

@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <numeric>
 
+#include "services/language/Translated.h"
+
 namespace quorl::media {
 
 namespace {
@@ -87,12 +89,12 @@ std::string Inventory::unwatchedNotice() const {
     if (unwatchedDirectories == 0) {
         return {};
     }
-    const std::string count = unwatchedDirectories == 1
-                                  ? "1 directory"
-                                  : std::to_string(unwatchedDirectories) + " directories";
-    return "Changes in " + count +
-           " of the music folder go unnoticed, because the system watches no more directories. "
-           "Raise fs.inotify.max_user_watches, or rescan after a change.";
+    return language::translatedCount(
+        "Changes in {count} directory of the music folder go unnoticed, because the system watches "
+        "no more directories. Raise fs.inotify.max_user_watches, or rescan after a change.",
+        "Changes in {count} directories of the music folder go unnoticed, because the system "
+        "watches no more directories. Raise fs.inotify.max_user_watches, or rescan after a change.",
+        unwatchedDirectories);
 }
 
 } // namespace quorl::media

@@ -12,6 +12,11 @@ namespace quorl::wearable {
 
 namespace {
 
+/// What we have never written.
+struct Wrong : std::runtime_error {
+    using std::runtime_error::runtime_error;
+};
+
 using nlohmann::json;
 
 constexpr int format = 1;
@@ -47,7 +52,7 @@ std::string decoded(std::string_view text) {
         const auto* const end = digits.data() + digits.size();
         const auto read = std::from_chars(digits.data(), end, value, hexadecimal);
         if (digits.size() != 2 || read.ec != std::errc{} || read.ptr != end) {
-            throw BadManifest{"a path is not well-formed"};
+            throw Wrong{"a path is not well-formed"};
         }
         bytes += static_cast<char>(value);
         text.remove_prefix(3);
@@ -77,7 +82,7 @@ std::string checkedName(std::string name) {
                                 name.find('/') != std::string::npos ||
                                 name.find('\0') != std::string::npos;
     if (leadsElsewhere) {
-        throw BadManifest{"a name leads out of the music directory"};
+        throw Wrong{"a name leads out of the music directory"};
     }
     return name;
 }
@@ -89,7 +94,7 @@ Number numberOf(const json& value) {
             ? std::in_range<Number>(value.get<std::uint64_t>())
             : value.is_number_integer() && std::in_range<Number>(value.get<std::int64_t>());
     if (!fits) {
-        throw BadManifest{"a number in it is not a whole one, or out of range"};
+        throw Wrong{"a number in it is not a whole one, or out of range"};
     }
     return value.get<Number>();
 }
@@ -116,7 +121,7 @@ std::vector<Entry> entriesOf(const json& list) {
 
 Manifest manifestOf(const json& value) {
     if (value.at("format") != format) {
-        throw BadManifest{"a later version has written it"};
+        throw Wrong{"a later version has written it"};
     }
     Manifest manifest{entriesOf(value.at("songs")), {}, entriesOf(value.at("strays")), {}};
     if (value.contains("playlist")) {
@@ -133,7 +138,7 @@ json parsed(std::string_view text) {
     constexpr int deepest = 8;
     return json::parse(text, [](int depth, json::parse_event_t /*event*/, const json& /*value*/) {
         if (depth > deepest) {
-            throw BadManifest{"it is nested too deeply"};
+            throw Wrong{"it is nested too deeply"};
         }
         return true;
     });
@@ -142,9 +147,10 @@ json parsed(std::string_view text) {
 } // namespace
 
 void rejectManifest(const std::string& why) {
-    throw BadManifest{"The list of the music on the " + std::string{wearableName} +
-                      " cannot be used (" + why + "). Remove the files " + ownDirectory +
-                      "/manifest.* from it to begin anew; the music that is on it then stays."};
+    throw BadManifest{{unseen::badManifest, {why}},
+                      "The list of the music on the " + std::string{wearableName} +
+                          " cannot be used (" + why + "). Remove the files " + ownDirectory +
+                          "/manifest.* from it to begin anew; the music that is on it then stays."};
 }
 
 std::string toText(const Manifest& manifest) {
@@ -170,7 +176,7 @@ Manifest parseManifest(std::string_view text) {
         return manifestOf(parsed(text));
     } catch (const json::exception&) {
         rejectManifest("it is not well-formed");
-    } catch (const BadManifest& error) {
+    } catch (const Wrong& error) {
         rejectManifest(error.what());
     }
 }

@@ -2,10 +2,11 @@
 
 #include <cstdint>
 #include <optional>
-#include <stdexcept>
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "services/wearable/Unseen.h"
 
 namespace quorl::wearable {
 
@@ -54,9 +55,9 @@ struct Manifest {
 };
 
 /// The list on a wearable says something that we have never written.
-class BadManifest : public std::runtime_error {
+class BadManifest : public CannotBeSeen {
   public:
-    using std::runtime_error::runtime_error;
+    using CannotBeSeen::CannotBeSeen;
 };
 
 /// Throws `BadManifest` with a sentence that says what to do.

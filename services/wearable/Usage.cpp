@@ -106,9 +106,10 @@ Usage readUsage(const Wearable& wearable) {
                 availableBytes(wearable, root.get()), stock.songBytes, stock.songCount,
                 stock.isComplete ? manifest.sent : std::nullopt};
     } catch (const std::system_error& error) {
-        throw std::runtime_error{"The " + std::string{wearableName} + " at " +
-                                 wearable.root.string() +
-                                 " cannot be reached: " + error.code().message() + "."};
+        const auto why = error.code().message();
+        throw CannotBeSeen{{unseen::unreachable, {wearable.root.string(), why}},
+                           "The " + std::string{wearableName} + " at " + wearable.root.string() +
+                               " cannot be reached: " + why + "."};
     }
 }
 

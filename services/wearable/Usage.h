@@ -5,6 +5,7 @@
 #include <string>
 
 #include "services/wearable/Manifest.h"
+#include "services/wearable/Unseen.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
@@ -26,21 +27,10 @@ struct Usage {
     bool operator==(const Usage&) const = default;
 };
 
-/// Why a wearable could not be looked at.
-struct Unseen {
-    /// For the user.
-    std::string sentence;
-    /// It has not answered in time; it may be there all the same.
-    bool isSilence = false;
-
-    bool operator==(const Unseen&) const = default;
-};
-
 /// Looks at the wearable. Takes as long as the device takes; see UsageReader for callers that
 /// cannot wait. The one that is embedded is made where it does not exist.
 ///
-/// Throws `std::runtime_error` with a sentence for the user when the wearable is not there or
-/// cannot be read.
+/// Throws `CannotBeSeen` when the wearable is not there or cannot be read.
 [[nodiscard]] Usage readUsage(const Wearable& wearable);
 
 /// What may still be written to the wearable whose top directory is open as `root`, in bytes.

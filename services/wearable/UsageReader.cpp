@@ -32,20 +32,16 @@ struct Answered {
 UsageReader::Answer answerOf(const UsageReader::Look& look) {
     try {
         return look();
+    } catch (const CannotBeSeen& error) {
+        return Unseen{error.message()};
     } catch (const std::exception& error) {
-        return Unseen{error.what(), false};
+        return Unseen{{"other", {error.what()}}};
     }
 }
 
-std::string velora() { return std::string("The ") + wearableName; }
+Unseen silence() { return {{unseen::silent}, true}; }
 
-Unseen silence() { return {velora() + " does not answer. Check its connection.", true}; }
-
-Unseen noThreadLeft() {
-    return {velora() + " cannot be looked at, for no more threads can be started. Close some "
-                       "programs.",
-            false};
-}
+Unseen noThreadLeft() { return {{unseen::noThreads}}; }
 
 } // namespace
 
@@ -116,7 +112,7 @@ class UsageReader::Questions : public std::enable_shared_from_this<Questions> {
         while (!questions_.empty() && (closed_ || questions_.front().deadline <= now)) {
             answered_.push_back(
                 {std::move(questions_.front().reply),
-                 closed_ ? Unseen{"The question was given up.", false} : silence()});
+                 closed_ ? Unseen{{"other", {"The question was given up."}}} : silence()});
             questions_.pop_front();
         }
     }

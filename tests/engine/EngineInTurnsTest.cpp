@@ -130,10 +130,10 @@ struct FixedWearables final : WearablePort {
 
     void answer(const wearable::Usage& usage) { answer(Sight{identity, usage, attachment}); }
 
-    void answer(const char* problem) { answer(wearable::Unseen{problem, false}); }
+    void answer(const char* problem) { answer(wearable::Unseen{engine::other(problem)}); }
 
     /// It hangs.
-    void beSilent() { answer(wearable::Unseen{"It does not answer.", true}); }
+    void beSilent() { answer(wearable::Unseen{engine::other("It does not answer."), true}); }
 
     void notice(WearableNews news) const {
         const auto call = noticed;

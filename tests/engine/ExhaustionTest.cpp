@@ -45,7 +45,7 @@ void runOutOfThreads() {
             loop.stop();
         });
     static_cast<void>(loop.run());
-    std::cerr << sentence(outcome.message);
+    std::cerr << engine::sentence(outcome.message);
     _exit(outcome.kind == Outcome::Kind::Failed && outcome.mayPass ? 0 : 2);
 }
 

@@ -13,12 +13,13 @@ void PrintTo(const Decision& decision, std::ostream* out) {
     constexpr std::array names{"Rest", "Begin", "Continue", "Stop"};
     *out << names.at(static_cast<std::size_t>(decision.kind)) << " playlist "
          << decision.selection.playlist << " revision " << decision.selection.revision << ": \""
-         << sentence(decision.message) << '"';
+         << engine::sentence(decision.message) << '"';
 }
 
 void PrintTo(const Conclusion& conclusion, std::ostream* out) {
-    *out << (conclusion.success ? "success" : "failure") << " \"" << sentence(conclusion.message)
-         << '"' << (conclusion.isGivenUp ? ", given up" : "")
+    *out << (conclusion.success ? "success" : "failure") << " \""
+         << engine::sentence(conclusion.message) << '"'
+         << (conclusion.isGivenUp ? ", given up" : "")
          << (conclusion.isTriedAgain ? ", tried again" : "");
 }
 
@@ -314,8 +315,8 @@ TEST(Status, TellsTheSameStoryAsTheSyncStateWhateverHappens) {
             }
         }
         stopWhatIsToEnd(now);
-        ASSERT_TRUE(areOneStory(now))
-            << chosen << ": " << syncStateOf(now) << ", " << sentence(statusOf(now, {"last"}));
+        ASSERT_TRUE(areOneStory(now)) << chosen << ": " << syncStateOf(now) << ", "
+                                      << engine::sentence(statusOf(now, {"last"}));
     }
 }
 

@@ -5,6 +5,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "services/engine/Message.h"
+#include "services/wearable/Unseen.h"
 #include "tests/finding/Surroundings.h"
 
 namespace quorl::finding::test {
@@ -83,20 +85,21 @@ TEST(Whereabouts, DoNotTakeAnotherDriveForTheOneThatWasChosen) {
         whereaboutsOf(chosen, {{systemMount, mountOf("8:33", "/media/me/MINE")}, {other}});
 
     EXPECT_EQ(found.directory, chosen.directory);
-    EXPECT_THAT(found.problem, HasSubstr("not connected"));
-    EXPECT_THAT(found.problem, HasSubstr("“OTHER”"));
+    EXPECT_THAT(engine::sentence(found.problem), HasSubstr("not connected"));
+    EXPECT_THAT(engine::sentence(found.problem), HasSubstr("“OTHER”"));
 }
 
 TEST(Whereabouts, DoNotTakeWhatIsNoDeviceForTheDriveThatWasChosen) {
     const auto found =
         whereaboutsOf(chosen, {{systemMount, mountOf("0:44", "/media/me/MINE", "tmpfs")}, {}});
 
-    EXPECT_THAT(found.problem, HasSubstr("Another drive is at /media/me/MINE"));
+    EXPECT_THAT(engine::sentence(found.problem), HasSubstr("Another drive is at /media/me/MINE"));
 }
 
 TEST(Whereabouts, SayThatTheDriveIsNotPluggedIn) {
-    EXPECT_THAT(whereaboutsOf(chosen, {{systemMount}, {}}).problem, HasSubstr("not plugged in"));
-    EXPECT_THAT(whereaboutsOf(chosen, {}).problem, HasSubstr("not plugged in"));
+    EXPECT_EQ(whereaboutsOf(chosen, {{systemMount}, {}}).problem.code,
+              wearable::unseen::notPluggedIn);
+    EXPECT_EQ(whereaboutsOf(chosen, {}).problem.code, wearable::unseen::notPluggedIn);
 }
 
 TEST(Whereabouts, TrustThePathWhereNobodyKnowsWhichDriveIsThere) {

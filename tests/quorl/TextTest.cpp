@@ -38,6 +38,16 @@ TEST_F(Text, footersAreWrappedToEightyColumnsWithoutATerminal) {
     }
 }
 
+TEST_F(Text, paneAndAppSpeakOneLanguage) {
+    for (const auto* languages : {"de", "xx:de_AT:fr"}) {
+        QuorlProcess quorl(arguments(), {{"LANGUAGE", languages}});
+        quorl.readUntil("Synchronisierte Playlist: Keine\n");
+        quorl.say("b");
+        quorl.readUntil("Der Synchronisierungsdienst läuft nicht");
+        EXPECT_EQ(quorl.end(), 0);
+    }
+}
+
 TEST_F(Text, endOfInputLeaves) {
     QuorlProcess quorl(arguments());
     quorl.closeInput();

@@ -319,9 +319,9 @@ TEST_F(LimitFooter, PutsItsFiguresWhereTheLanguageWantsThem) {
     reply(1'000'000'000, 500'000'000);
 
     EXPECT_EQ(shownFooter("Musikspeicher"),
-              "3 Titel werden auf Velora synchronisiert, 25\u00a0% sind geschafft. Sie "
+              "3 Titel werden mit Velora synchronisiert, 25\u00a0% sind geschafft. Sie "
               "belegen dann " +
-                  size(6) + ", " + size(1'500'000'000) + " sind noch frei.");
+                  size(6) + ". Noch frei: " + size(1'500'000'000) + ".");
 }
 
 // What the wearable has left.

@@ -1,4 +1,4 @@
-"""Keeps the texts of the Music pane and their translations together."""
+"""Keeps the texts of the Music pane and of the app, and their translations, together."""
 
 import json
 import pathlib
@@ -8,13 +8,18 @@ import subprocess
 import tempfile
 import unittest
 
+import polib
+
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 
 PREFIX = "SYNC_SETTINGS_"
 LITERAL = r'"(?:[^"\\\n]|\\.)*"'
 KEY_IN_CODE = re.compile(rf'"{PREFIX}\w*"')
 TEXT_IN_CODE = re.compile(rf'\{{\s*("{PREFIX}\w*")\s*,\s*({LITERAL}(?:\s*{LITERAL})*)\s*\}}')
-ENTRY = re.compile(r'^msgid (".+")\nmsgstr (".*")$', re.MULTILINE)
+BLANK = re.compile(r"\{[^{}]*\}|%\d")
+
+# What marks a text of the app, or of the engine, in its sources.
+KEYWORDS = ("translated:1", "toTranslate:1", "translatedCount:1,2", "tr:1", "translate:2")
 
 
 class UnreadableText(Exception):
@@ -38,12 +43,59 @@ def run(*command):
     return subprocess.run(command, capture_output=True, text=True, encoding="utf-8", check=False)
 
 
+def entries(path):
+    """The entries of a catalogue, without those that are empty or marked as doubtful."""
+    checked = run("msgfmt", "--check-domain", "-o", "/dev/null", str(path))
+    if checked.returncode:
+        raise UnreadableText(checked.stderr)
+    return [entry for entry in polib.pofile(str(path)) if entry.translated()]
+
+
+def is_of_pane(entry):
+    return entry.msgid.startswith(PREFIX)
+
+
 def texts_in_catalogue(path):
-    """The texts of a catalogue by key, without those that are empty or marked as doubtful."""
-    read = run("msgattrib", "--translated", "--no-fuzzy", "--no-obsolete", "--no-wrap", str(path))
+    """The texts of the pane in a catalogue by key."""
+    return {entry.msgid: entry.msgstr for entry in entries(path) if is_of_pane(entry)}
+
+
+def app_texts_in_code(root):
+    """What is marked to be translated in the sources of the app and of the services."""
+    sources = [str(path) for folder in ("quorl", "services") for path in sorted((root / folder).rglob("*.cpp"))]
+    keywords = [f"--keyword={keyword}" for keyword in KEYWORDS]
+    read = run("xgettext", "--from-code=UTF-8", "--language=C++", "--keyword", *keywords, "-o", "-", *sources)
     if read.returncode:
         raise UnreadableText(read.stderr)
-    return {json.loads(key): json.loads(text) for key, text in ENTRY.findall(read.stdout)}
+    return {entry.msgid: entry for entry in polib.pofile(read.stdout)}
+
+
+def blanks(text):
+    return sorted(BLANK.findall(text))
+
+
+def forms(entry):
+    return list(entry.msgstr_plural.values()) or [entry.msgstr]
+
+
+def takes_other_blanks(english, translation):
+    """Whether a translation fills in other things. A form for a certain count need not name it."""
+    wanted = blanks(english.msgid_plural or english.msgid)
+    unnamed = [blank for blank in wanted if blank != "{count}"]
+    allowed = [wanted, unnamed] if english.msgid_plural else [wanted]
+    return any(blanks(form) not in allowed for form in forms(translation))
+
+
+def app_problems(root, path, english):
+    """As `problems`, of the texts of the app in one catalogue. English ones stand in the sources."""
+    translations = {entry.msgid: entry for entry in entries(path) if not is_of_pane(entry)}
+    missing = [] if path.name == "en.po" else sorted(english.keys() - translations.keys())
+    found = [f"{path.name}: misses {text}" for text in missing]
+    found += [f"{path.name}: {text} is in no source" for text in sorted(translations.keys() - english.keys())]
+    for text in sorted(english.keys() & translations.keys()):
+        if takes_other_blanks(english[text], translations[text]):
+            found.append(f"{path.name}: {text} takes other arguments than in English")
+    return found
 
 
 def differing_formats(english, translation):
@@ -73,6 +125,7 @@ def quoted(text):
 def problems(root):
     """One line of text for each text that is missing, left over, or not as it should be."""
     english = texts_in_code(root)
+    of_app = app_texts_in_code(root)
     found = []
     for path in sorted((root / "resources" / "locale").glob("*.po")):
         texts = texts_in_catalogue(path)
@@ -83,6 +136,7 @@ def problems(root):
             found += [f"en.po: {key} is not as in the source" for key in common if english[key] != texts[key]]
         for key in differing_formats(english, texts):
             found.append(f"{path.name}: {key} takes other arguments than in English")
+        found += app_problems(root, path, of_app)
     return found
 
 
@@ -92,6 +146,7 @@ class ThisProject(unittest.TestCase):
 
     def test_has_texts_and_languages_to_look_at(self):
         self.assertGreater(len(texts_in_code(ROOT)), 30)
+        self.assertGreater(len(app_texts_in_code(ROOT)), 140)
         languages = {path.stem for path in (ROOT / "resources" / "locale").glob("*.po")}
         self.assertLessEqual({"en", "de", "fr", "ar"}, languages)
 
@@ -104,7 +159,8 @@ class PlantedError(unittest.TestCase):
         self.addCleanup(self.directory.cleanup)
         self.root = pathlib.Path(self.directory.name)
         shutil.copytree(ROOT / "settings", self.root / "settings")
-        shutil.copytree(ROOT / "resources" / "locale", self.root / "resources" / "locale")
+        for folder in ("quorl", "services", "resources/locale"):
+            shutil.copytree(ROOT / folder, self.root / folder)
 
     def change(self, file, old, new):
         path = self.root / file
@@ -182,6 +238,32 @@ class PlantedError(unittest.TestCase):
     def test_arguments_in_a_text_that_takes_none_are_found(self):
         self.change_text("de", "ROOT_TITLE", "Musik %@")
         self.assert_only_problem(f"de.po: {PREFIX}ROOT_TITLE takes other arguments than in English")
+
+    def change_app_text(self, old, new):
+        self.change("resources/locale/de.po", old, new)
+
+    def test_text_of_the_app_that_is_not_translated_is_found(self):
+        self.change_app_text('msgstr "Unbekannt"', 'msgstr ""')
+        self.assert_only_problem("de.po: misses Unknown")
+
+    def test_text_of_the_app_that_is_gone_is_found(self):
+        self.change("quorl/pages/SyncPage.cpp", "Sync Now", "Sync At Once")
+        self.assertIn("fr.po: misses Sync At Once", problems(self.root))
+        self.assertIn("fr.po: Sync Now is in no source", problems(self.root))
+
+    def test_other_blanks_in_a_text_of_the_app_are_found(self):
+        text = "{available} of {capacity} free"
+        for wrong in ("{available} frei", "{available} von {kapazität} frei", "{available} {available} {capacity}"):
+            with self.subTest(text=wrong):
+                self.setUp()
+                self.change_app_text("{available} von {capacity} frei", wrong)
+                self.assert_only_problem(f"de.po: {text} takes other arguments than in English")
+
+    def test_count_may_be_left_out_of_a_form_but_nothing_else(self):
+        self.change_app_text("{count} weiterer Titel konnte", "Ein weiterer Titel konnte")
+        self.assertEqual(problems(self.root), [])
+        self.change_app_text("Ein weiterer Titel konnte", "{songs} weiterer Titel konnte")
+        self.assert_only_problem("de.po: {count} song more could not be sent. takes other arguments than in English")
 
     def test_the_same_arguments_in_another_order_are_let_pass(self):
         for right in ("%tu %@ %@", "%3$@ %2$@ %1$tu", "100%% %1$tu %2$@ %3$@"):

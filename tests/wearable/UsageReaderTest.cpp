@@ -15,6 +15,7 @@
 #include <sys/resource.h>
 #include <unistd.h>
 
+#include "services/engine/Message.h"
 #include "tests/base/TemporaryDirectory.h"
 
 namespace {
@@ -22,6 +23,11 @@ namespace {
 using namespace quorl::wearable;
 using namespace std::chrono_literals;
 using quorl::tests::TemporaryDirectory;
+
+/// What a person is told.
+std::string sentenceOf(const UsageReader::Answer& answer) {
+    return quorl::engine::sentence(std::get<Unseen>(answer).message);
+}
 
 constexpr auto forever = std::chrono::hours{1};
 
@@ -89,7 +95,7 @@ TEST(UsageReader, AnswersQuestionAfterQuestion) {
         setrlimit(RLIMIT_NPROC, &none) != 0) {
         _exit(1);
     }
-    std::cerr << std::get<Unseen>(Asked{reader}.answer()).sentence;
+    std::cerr << sentenceOf(Asked{reader}.answer());
     _exit(0);
 }
 
@@ -102,8 +108,7 @@ TEST(UsageReader, AnswersWithASentenceWhenTheDeviceIsGone) {
     const TemporaryDirectory device;
     UsageReader reader{Wearable{device.path() / "gone", {}, false}};
 
-    EXPECT_THAT(std::get<Unseen>(Asked{reader}.answer()).sentence,
-                ::testing::HasSubstr("cannot be reached"));
+    EXPECT_THAT(sentenceOf(Asked{reader}.answer()), ::testing::HasSubstr("cannot be reached"));
 }
 
 TEST(UsageReader, AnswersWithASentenceWhenTheDeviceGoesInTheMiddleOfTheQuestion) {
@@ -123,8 +128,7 @@ TEST(UsageReader, AnswersWithASentenceWhenTheDeviceGoesInTheMiddleOfTheQuestion)
     device.reset();
     removed.count_down();
 
-    EXPECT_THAT(std::get<Unseen>(asked.answer()).sentence,
-                ::testing::HasSubstr("cannot be reached"));
+    EXPECT_THAT(sentenceOf(asked.answer()), ::testing::HasSubstr("cannot be reached"));
 }
 
 TEST(UsageReader, NeverAnswersWithAnEarlierLookAfterALaterOne) {
@@ -163,8 +167,7 @@ TEST(UsageReader, AnswersEveryQuestionInTimeThoughTheDeviceHangs) {
     }
 
     for (const auto& asked : many) {
-        EXPECT_THAT(std::get<Unseen>(asked->answer()).sentence,
-                    ::testing::HasSubstr("does not answer"));
+        EXPECT_THAT(sentenceOf(asked->answer()), ::testing::HasSubstr("does not answer"));
         EXPECT_EQ(asked->times(), 1);
     }
     device->release.release(20);

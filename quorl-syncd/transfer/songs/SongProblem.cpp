@@ -30,7 +30,7 @@ Message messageOf(SongTrouble trouble, const std::string& song, const std::strin
 } // namespace
 
 SongProblem::SongProblem(Message message)
-    : std::runtime_error(sentence(message)), message_(std::move(message)) {}
+    : std::runtime_error(engine::sentence(message)), message_(std::move(message)) {}
 
 SongProblem::SongProblem(SongTrouble trouble, const std::string& song, const std::string& detail)
     : SongProblem(messageOf(trouble, song, detail)) {}

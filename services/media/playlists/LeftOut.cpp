@@ -4,51 +4,60 @@
 #include <array>
 
 #include "services/base/Utf8.h"
+#include "services/language/Translated.h"
 
 namespace quorl::media {
+
+using language::toTranslate;
 
 namespace {
 
 struct Explanation {
     Reason reason;
     std::string_view code;
-    std::string_view sentence;
+    const char* sentence;
 };
 
 constexpr std::array explanations{
-    Explanation{Reason::NoAddress, "no-address", "The playlist names no file for this track."},
+    Explanation{Reason::NoAddress, "no-address",
+                toTranslate("The playlist names no file for this track.")},
     Explanation{Reason::RemoteAddress, "remote-address",
-                "It is not on this machine. Download it into the music folder."},
+                toTranslate("It is not on this machine. Download it into the music folder.")},
     Explanation{Reason::OtherSystem, "other-system",
-                "It is a path of another system. Save the playlist again with "
-                "paths relative to it."},
+                toTranslate("It is a path of another system. Save the playlist again with "
+                            "paths relative to it.")},
     Explanation{Reason::OutsideFolder, "outside-folder",
-                "It is outside the music folder. Copy it into the music folder."},
+                toTranslate("It is outside the music folder. Copy it into the music folder.")},
     Explanation{Reason::Missing, "missing",
-                "There is no such file. Put it back, or take it out of the playlist."},
+                toTranslate("There is no such file. Put it back, or take it out of the playlist.")},
     Explanation{Reason::Unreachable, "unreachable",
-                "A directory on the way to it may not be entered. Check the "
-                "permissions."},
+                toTranslate("A directory on the way to it may not be entered. Check the "
+                            "permissions.")},
     Explanation{Reason::Hidden, "hidden",
-                "It is hidden: a name on the way to it begins with a dot. Rename it."},
-    Explanation{Reason::NotRegularFile, "not-regular-file", "It is not a regular file."},
-    Explanation{Reason::NotMusic, "not-music", "It is neither audio nor video."},
+                toTranslate("It is hidden: a name on the way to it begins with a dot. Rename it.")},
+    Explanation{Reason::NotRegularFile, "not-regular-file",
+                toTranslate("It is not a regular file.")},
+    Explanation{Reason::NotMusic, "not-music", toTranslate("It is neither audio nor video.")},
     Explanation{Reason::PlaylistUnreadable, "playlist-unreadable",
-                "The playlist cannot be read. Check its permissions and the disk."},
+                toTranslate("The playlist cannot be read. Check its permissions and the disk.")},
     Explanation{Reason::PlaylistTooLarge, "playlist-too-large",
-                "The playlist is larger than 64 MiB. Split it."},
+                toTranslate("The playlist is larger than 64 MiB. Split it.")},
     Explanation{
         Reason::PlaylistBroken, "playlist-broken",
-        "The playlist is damaged, or not in an encoding that is known. Save it again with the "
-        "program that made it, in UTF-8."},
-    Explanation{Reason::TooManyEntries, "too-many-entries",
-                "The playlist lists more than a million entries, and those after are ignored. "
-                "Split it."},
-    Explanation{Reason::SameAsAnother, "same-as-another",
-                "Another playlist has the same name but for how its accents are stored. Rename one "
-                "of the two."},
+        toTranslate(
+            "The playlist is damaged, or not in an encoding that is known. Save it again with the "
+            "program that made it, in UTF-8.")},
+    Explanation{
+        Reason::TooManyEntries, "too-many-entries",
+        toTranslate("The playlist lists more than a million entries, and those after are ignored. "
+                    "Split it.")},
+    Explanation{
+        Reason::SameAsAnother, "same-as-another",
+        toTranslate(
+            "Another playlist has the same name but for how its accents are stored. Rename one "
+            "of the two.")},
     Explanation{Reason::DirectoryUnreadable, "directory-unreadable",
-                "The directory cannot be read. Check its permissions and the disk."},
+                toTranslate("The directory cannot be read. Check its permissions and the disk.")},
 };
 
 const Explanation& explanationOf(Reason reason) {
@@ -57,7 +66,7 @@ const Explanation& explanationOf(Reason reason) {
 
 } // namespace
 
-std::string_view sentence(Reason reason) { return explanationOf(reason).sentence; }
+const char* sentence(Reason reason) { return explanationOf(reason).sentence; }
 
 std::string_view code(Reason reason) { return explanationOf(reason).code; }
 

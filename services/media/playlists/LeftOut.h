@@ -29,7 +29,7 @@ enum class Reason : std::uint8_t {
 
 /// What to tell a person about `reason`: one or two English sentences that say what is the matter
 /// and, where something can be done about it, what.
-[[nodiscard]] std::string_view sentence(Reason reason);
+[[nodiscard]] const char* sentence(Reason reason);
 
 /// The word for programs, in small letters and dashes.
 [[nodiscard]] std::string_view code(Reason reason);

@@ -36,7 +36,7 @@ TEST(Message, RoundsSpaceUp) {
     EXPECT_THAT(sentence({code::notEnoughSpace, {"1048577", "1048576"}}),
                 HasSubstr("2 MB are needed for new songs, 1 MB are available"));
     EXPECT_THAT(sentence({code::notEnoughSpace, {"18446744073709551615", "0"}}),
-                HasSubstr("17592186044416 MB are needed for new songs, 0 MB are available"));
+                HasSubstr("17,592,186,044,416 MB are needed for new songs, 0 MB are available"));
 }
 
 TEST(Message, NamesASongWhereItIsGiven) {

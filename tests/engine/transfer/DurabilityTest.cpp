@@ -69,7 +69,7 @@ class Durability : public ::testing::Test {
                 before = before.value_or(step.songs);
                 copied = step.songs - *before;
             });
-        EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+        EXPECT_EQ(outcome.kind, Kind::Sent) << engine::sentence(outcome.message);
         return copied;
     }
 
@@ -214,7 +214,7 @@ TEST_P(FailingOnce, NothingIsLostWhicheverStepFailsAndTheNextSyncMendsIt) {
         }
         EXPECT_EQ(player.music().at("foreign.mp3"), "not ours") << where;
         const auto after = observedSync(wishFor(music_, player), [](const Step&) {});
-        ASSERT_EQ(after.kind, Kind::Sent) << where << ": " << sentence(after.message);
+        ASSERT_EQ(after.kind, Kind::Sent) << where << ": " << engine::sentence(after.message);
         ASSERT_EQ(player.music(), expected_) << where;
     }
 }
@@ -284,7 +284,8 @@ TEST_F(Durability, WhatASongTooLargeHasLeftIsRemovedAtOnce) {
     });
 
     EXPECT_EQ(outcome.kind, Kind::Failed);
-    EXPECT_THAT(sentence(outcome.message), HasSubstr("larger than a file on the Velora can be"));
+    EXPECT_THAT(engine::sentence(outcome.message),
+                HasSubstr("larger than a file on the Velora can be"));
     const auto failed = find(steps, {"write", "Music/QUORL001.TMP", ""});
     ASSERT_NE(failed, steps.end());
     EXPECT_TRUE(isSame(*std::next(failed), {"remove", "Music/QUORL001.TMP", ""}));
@@ -298,7 +299,7 @@ TEST_F(Durability, ANameThatIsTakenThoughNobodySeesItIsLeftToItsOwner) {
         }
     });
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(outcome.kind, Kind::Sent) << engine::sentence(outcome.message);
     EXPECT_EQ(player_.music().at("three (3).mp3"), "three");
     EXPECT_EQ(player_.music().at("List (2).m3u8"),
               "#EXTM3U\n#PLAYLIST:List\nthree (3).mp3\ntwo.mp3\nfour.mp3\n");
@@ -352,7 +353,7 @@ TEST_F(Durability, ASongOfSomebodyElseThatComesWhileASyncIsUnderWayIsKept) {
         }
     });
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(outcome.kind, Kind::Sent) << engine::sentence(outcome.message);
     EXPECT_EQ(player_.music().at("one.mp3"), "eno");
 }
 
@@ -391,7 +392,7 @@ TEST_F(Durability, AWearableWithBothListsDamagedIsNotTouched) {
     const auto outcome = observedSync(wishFor(music_, player_), [](const Step&) {});
 
     EXPECT_EQ(outcome.kind, Kind::Failed);
-    EXPECT_THAT(sentence(outcome.message), HasSubstr("Remove the files .quorl/manifest.*"));
+    EXPECT_THAT(engine::sentence(outcome.message), HasSubstr("Remove the files .quorl/manifest.*"));
     EXPECT_EQ(contentsOf(player_.path()), before);
 }
 
@@ -428,7 +429,7 @@ TEST_F(FullWearable, GetsAnotherChoiceInThePlaceOfTheOldOne) {
     const auto outcome =
         observedSync(wishFor(music_, player_), [&](const Step& step) { steps.push_back(step); });
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(outcome.kind, Kind::Sent) << engine::sentence(outcome.message);
     EXPECT_EQ(player_.music(),
               (Contents{{"new.mp3", std::string(800'000, 'n')},
                         {"small.mp3", "small"},
@@ -454,7 +455,7 @@ TEST_F(FullWearable, LosesNoSongBeforeItsPlaylistAlsoAfterASyncThatWasCutOff) {
     const auto outcome =
         observedSync(wishFor(music_, player_), [&](const Step& step) { steps.push_back(step); });
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(outcome.kind, Kind::Sent) << engine::sentence(outcome.message);
     EXPECT_LT(find(steps, {"remove", "Music/List.m3u8", ""}),
               find(steps, {"remove", "Music/old.mp3", ""}));
 }
@@ -466,7 +467,8 @@ TEST_F(FullWearable, IsNotTouchedWhereEvenThenThereIsNoRoom) {
 
     const auto outcome = sync(wishFor(music_, player_));
 
-    EXPECT_THAT(sentence(outcome.message), HasSubstr("has not enough space: 2 MB are needed"));
+    EXPECT_THAT(engine::sentence(outcome.message),
+                HasSubstr("has not enough space: 2 MB are needed"));
     EXPECT_EQ(contentsOf(player_.path()), before);
 }
 

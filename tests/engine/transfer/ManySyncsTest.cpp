@@ -119,7 +119,7 @@ TEST(ManySyncs, CopyManySongsUnderALimitOf64Descriptors) {
 
     const auto outcome = quickSync(order);
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(outcome.kind, Kind::Sent) << quorl::engine::sentence(outcome.message);
     EXPECT_EQ(player.music().size(), songs + 1);
 }
 

@@ -17,7 +17,7 @@ using ::testing::HasSubstr;
 using ::testing::StartsWith;
 
 std::string sentenceFor(int number) {
-    return sentence(messageOf(std::error_code(number, std::generic_category())));
+    return quorl::engine::sentence(messageOf(std::error_code(number, std::generic_category())));
 }
 
 TEST(Messages, SayWhatIsWrongWithADeviceAndWhatToDo) {

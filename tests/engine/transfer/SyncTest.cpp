@@ -39,8 +39,8 @@ class SyncedWearable : public ::testing::Test {
 TEST_F(SyncedWearable, HasTheSongsByteForByteAndAPlaylistThatPlaysThem) {
     const auto outcome = syncAll();
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
-    EXPECT_EQ(sentence(outcome.message), "2 songs synced to Velora.");
+    EXPECT_EQ(outcome.kind, Kind::Sent) << quorl::engine::sentence(outcome.message);
+    EXPECT_EQ(quorl::engine::sentence(outcome.message), "2 songs synced to Velora.");
     EXPECT_EQ(player_.music(),
               (Contents{{"one.mp3", "one"},
                         {"two.ogg", "two two"},
@@ -121,7 +121,7 @@ TEST_F(SyncedWearable, GetsASongFromTheFarFutureOnce) {
 
     const auto outcome = syncAll();
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(outcome.kind, Kind::Sent) << quorl::engine::sentence(outcome.message);
     EXPECT_EQ(copiedSongs_, 2);
     EXPECT_EQ(syncAll().kind, Kind::Sent);
     EXPECT_EQ(copiedSongs_, 0);
@@ -197,7 +197,7 @@ TEST_F(SyncedWearable, GetsTheSongsThatLinksInTheFolderLeadTo) {
 
     const auto outcome = syncAll();
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(outcome.kind, Kind::Sent) << quorl::engine::sentence(outcome.message);
     EXPECT_EQ(player_.music().at("relative.mp3"), "one");
     EXPECT_EQ(player_.music().at("absolute.ogg"), "two two");
 }
@@ -231,7 +231,7 @@ TEST_F(SyncedWearable, IsSyncedWithAnEmptyPlaylist) {
     const auto outcome = syncAll();
 
     EXPECT_EQ(outcome.kind, Kind::Sent);
-    EXPECT_EQ(sentence(outcome.message), "0 songs synced to Velora.");
+    EXPECT_EQ(quorl::engine::sentence(outcome.message), "0 songs synced to Velora.");
     EXPECT_EQ(player_.music(), (Contents{{"List.m3u8", "#EXTM3U\n#PLAYLIST:List\n"}}));
 }
 
@@ -245,7 +245,7 @@ TEST_F(SyncedWearable, CountsOnlyWhatIsNewAgainstItsSpace) {
 
     const auto outcome = sync(wishFor(music_, small));
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(outcome.kind, Kind::Sent) << quorl::engine::sentence(outcome.message);
 }
 
 TEST_F(SyncedWearable, IsToldOfItsProgressPieceByPieceAndNeverBackwardsOrTooMuch) {
@@ -311,7 +311,7 @@ TEST_F(SyncedWearable, HasOnlyWhatOthersPutThereOnceItsMusicWasRemoved) {
     const auto outcome = sync(removal);
 
     EXPECT_EQ(outcome.kind, Kind::Sent);
-    EXPECT_EQ(sentence(outcome.message), "The music was removed from the Velora.");
+    EXPECT_EQ(quorl::engine::sentence(outcome.message), "The music was removed from the Velora.");
     EXPECT_EQ(player_.music(), (Contents{{"foreign.mp3", "of others"}}));
     EXPECT_EQ(player_.manifest(), quorl::wearable::Manifest());
     EXPECT_EQ(sync(removal).kind, Kind::Sent) << "of nothing";

@@ -51,7 +51,8 @@ TEST_F(Trouble, ASongThatVanishesIsLeftOutAndTheOthersAreSent) {
     const auto outcome = syncWhile([&] { music_.remove("second.mp3"); });
 
     EXPECT_EQ(outcome.kind, Kind::Failed);
-    EXPECT_EQ(sentence(outcome.message), "“second.mp3” is no longer in the music folder.");
+    EXPECT_EQ(quorl::engine::sentence(outcome.message),
+              "“second.mp3” is no longer in the music folder.");
     EXPECT_TRUE(outcome.isLibraryStale);
     EXPECT_TRUE(outcome.mayPass) << "a song that is there again may be as it was";
     EXPECT_EQ(player_.music().at("List.m3u8"), "#EXTM3U\n#PLAYLIST:List\nfirst.mp3\nthird.mp3\n");
@@ -64,7 +65,8 @@ TEST_F(Trouble, ASongThatIsChangedWhileItIsCopiedIsNotTakenForComplete) {
     const auto outcome = syncWhile([&] { music_.write("first.mp3", std::string(3'000'000, '2')); });
 
     EXPECT_EQ(outcome.kind, Kind::Failed);
-    EXPECT_THAT(sentence(outcome.message), HasSubstr("“first.mp3” has just been changed"));
+    EXPECT_THAT(quorl::engine::sentence(outcome.message),
+                HasSubstr("“first.mp3” has just been changed"));
     EXPECT_THAT(player_.music(), Not(Contains(Key("first.mp3"))));
     EXPECT_FALSE(player_.manifest().sent);
 
@@ -81,7 +83,7 @@ TEST_F(Trouble, ASongThatGrowsWithoutEndDoesNotFillTheWearable) {
     });
 
     EXPECT_EQ(outcome.kind, Kind::Failed);
-    EXPECT_THAT(sentence(outcome.message), HasSubstr("has just been changed"));
+    EXPECT_THAT(quorl::engine::sentence(outcome.message), HasSubstr("has just been changed"));
 }
 
 TEST_F(Trouble, AnOldCopyStaysWhereTheSongCannotBeReadNow) {
@@ -176,7 +178,7 @@ TEST_F(Trouble, AFileOfSomebodyElseThatTookTheNameOfAnUnfinishedCopyIsKept) {
 TEST_F(Trouble, AFileThatAppearsUnderTheNameOfASongMeanwhileIsNotOverwritten) {
     const auto outcome = syncWhile([&] { player_.write("Music/first.mp3", "not ours"); });
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(outcome.kind, Kind::Sent) << quorl::engine::sentence(outcome.message);
     EXPECT_EQ(player_.music().at("first.mp3"), "not ours");
     EXPECT_EQ(player_.music().at("first (2).mp3"), std::string(3'000'000, '1'));
     EXPECT_EQ(player_.music().at("List.m3u8"),
@@ -189,7 +191,7 @@ TEST_F(Trouble, AWearableWithoutEnoughSpaceGetsNothingHalf) {
     const auto outcome = sync(wishFor(music_, small));
 
     EXPECT_EQ(outcome.kind, Kind::Failed);
-    EXPECT_THAT(sentence(outcome.message),
+    EXPECT_THAT(quorl::engine::sentence(outcome.message),
                 HasSubstr("The Velora has not enough space: 3 MB are needed"));
     EXPECT_TRUE(small.music().empty());
     EXPECT_FALSE(small.manifest().sent);
@@ -210,7 +212,7 @@ TEST_F(Trouble, AWearableThatFillsUpInTheMiddleSaysSoAndKeepsNothingHalf) {
     });
 
     EXPECT_EQ(outcome.kind, Kind::Failed);
-    EXPECT_THAT(sentence(outcome.message), HasSubstr("is full"));
+    EXPECT_THAT(quorl::engine::sentence(outcome.message), HasSubstr("is full"));
     EXPECT_EQ(whatIsWrongWith(player.path()), "");
     for (const auto& [name, text] : player.music()) {
         EXPECT_FALSE(Device::isUnfinished(name)) << name;
@@ -232,7 +234,7 @@ TEST_F(Trouble, AWearableWithoutAByteLeftTakesASmallerChoice) {
 
     const auto outcome = sync(wishFor(music_, player));
 
-    EXPECT_EQ(outcome.kind, Kind::Sent) << sentence(outcome.message);
+    EXPECT_EQ(outcome.kind, Kind::Sent) << quorl::engine::sentence(outcome.message);
     EXPECT_EQ(player.music(),
               (Contents{{"second.mp3", "second"},
                         {"third.mp3", "third"},
@@ -250,7 +252,7 @@ TEST_F(Trouble, AWriteProtectedWearableSaysSo) {
     const auto outcome = sync(wishFor(music_, player));
 
     EXPECT_EQ(outcome.kind, Kind::Failed);
-    EXPECT_THAT(sentence(outcome.message), HasSubstr("write-protected"));
+    EXPECT_THAT(quorl::engine::sentence(outcome.message), HasSubstr("write-protected"));
     ASSERT_EQ(umount(player.path().c_str()), 0);
 }
 
@@ -258,7 +260,7 @@ TEST_F(Trouble, AWearableWhoseDirectoryVanishesInTheMiddleSaysSo) {
     const auto outcome = syncWhile([&] { std::filesystem::remove_all(player_.path()); });
 
     EXPECT_EQ(outcome.kind, Kind::Failed);
-    EXPECT_THAT(sentence(outcome.message), HasSubstr("went away"));
+    EXPECT_THAT(quorl::engine::sentence(outcome.message), HasSubstr("went away"));
     EXPECT_FALSE(std::filesystem::exists(player_.path()));
 }
 
@@ -269,7 +271,8 @@ TEST_F(Trouble, AListThatCannotBeReadSaysWhatToDoAndTouchesNothing) {
     const auto outcome = sync(wishFor(music_, player_));
 
     EXPECT_EQ(outcome.kind, Kind::Failed);
-    EXPECT_THAT(sentence(outcome.message), HasSubstr("Remove the files .quorl/manifest.*"));
+    EXPECT_THAT(quorl::engine::sentence(outcome.message),
+                HasSubstr("Remove the files .quorl/manifest.*"));
     EXPECT_EQ(textOf(player_.path() / ".quorl/manifest.json"), "{\"format\":1,");
     EXPECT_EQ(player_.music().size(), 1);
 }
@@ -277,7 +280,7 @@ TEST_F(Trouble, AListThatCannotBeReadSaysWhatToDoAndTouchesNothing) {
 TEST_F(Trouble, AFileInThePlaceOfTheMusicDirectorySaysWhatToDo) {
     player_.write("Music", "not ours");
     const auto outcome = sync(wishFor(music_, player_));
-    EXPECT_THAT(sentence(outcome.message),
+    EXPECT_THAT(quorl::engine::sentence(outcome.message),
                 HasSubstr("is not a directory. Give it another name, or remove"));
     EXPECT_EQ(textOf(player_.path() / "Music"), "not ours");
 }
@@ -286,7 +289,7 @@ TEST_F(Trouble, AMemoryThatIsUsedUpIsToldInWords) {
     const auto outcome =
         sync(wishFor(music_, player_), {}, {},
              [](const auto&) -> std::unique_ptr<Volume> { throw std::bad_alloc(); });
-    EXPECT_EQ(sentence(outcome.message),
+    EXPECT_EQ(quorl::engine::sentence(outcome.message),
               "The Velora could not be synced, for there is not enough memory. "
               "Close some programs.");
     EXPECT_TRUE(outcome.mayPass);
@@ -307,7 +310,7 @@ TEST_F(Trouble, TwoProgramsDoNotSyncToOneWearableAtATime) {
     EXPECT_EQ(syncWhile([&] { second = sync(wishFor(music_, player_)); }).kind, Kind::Sent);
 
     EXPECT_EQ(second.kind, Kind::Failed);
-    EXPECT_THAT(sentence(second.message), HasSubstr("Another program is syncing"));
+    EXPECT_THAT(quorl::engine::sentence(second.message), HasSubstr("Another program is syncing"));
 }
 
 } // namespace
