@@ -93,9 +93,12 @@ RULES = {
     "quorl/app": program(
         "platform", "runtime", "services", "quorl/adapters", "quorl/content", "quorl/facts",
         "quorl/pages", "quorl/process"),
-    "quorl/window": program("platform", "runtime", "quorl/app", "quorl/content", "quorl/process"),
+    "quorl/search": program("quorl/content"),
+    "quorl/window": program(
+        "platform", "runtime", "quorl/app", "quorl/content", "quorl/process", "quorl/search"),
     "quorl/terminal": program(
-        "platform", "runtime", "services/base", "quorl/app", "quorl/content", "quorl/process"),
+        "platform", "runtime", "services/base", "quorl/app", "quorl/content", "quorl/process",
+        "quorl/search"),
     "quorl/commands": program("services", "quorl/app", "quorl/facts", "quorl/process"),
     "quorl/reports": program("runtime", "services", "quorl/app", "quorl/process", "quorl/window"),
     "quorl/main.cpp": program("services/base", "quorl"),
@@ -389,6 +392,7 @@ class PlantedInclude(PlantedFiles):
         ("quorl/adapters/A.cpp", '"quorl/app/Companion.h"'),
         ("quorl/app/A.cpp", '"quorl/window/MainWindow.h"'),
         ("quorl/terminal/A.cpp", '"services/media/MusicFolder.h"'),
+        ("quorl/search/A.cpp", '"quorl/window/Text.h"'),
         ("quorl/reports/A.cpp", '"quorl/terminal/Text.h"'),
         ("quorl/elsewhere/A.cpp", "<vector>"),
         ("quorl-script/A.cpp", '"quorl/window/MainWindow.h"'),

@@ -7,6 +7,7 @@
 
 #include "quorl/content/PaneContent.h"
 #include "quorl/content/RowPlaces.h"
+#include "quorl/search/RowFinder.h"
 #include "quorl/window/accessible/RowTexts.h"
 #include "quorl/window/look/PaneColors.h"
 #include "quorl/window/look/WindowScreen.h"
@@ -15,7 +16,6 @@
 #include "quorl/window/rows/RowFades.h"
 #include "quorl/window/rows/RowTouch.h"
 #include "quorl/window/rows/RowsLayout.h"
-#include "quorl/window/search/RowFinder.h"
 #include "quorl/window/search/SearchField.h"
 #include "quorl/window/search/TypeAhead.h"
 

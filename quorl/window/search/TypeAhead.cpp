@@ -1,6 +1,6 @@
 #include "quorl/window/search/TypeAhead.h"
 
-#include "quorl/window/search/FoldedText.h"
+#include "quorl/search/FoldedText.h"
 
 namespace quorl {
 

@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-#include "quorl/window/search/FoldedText.h"
+#include "quorl/search/FoldedText.h"
 #include "tests/quorl/window/ShownTable.h"
 #include "tests/quorl/window/Window.h"
 

@@ -1,4 +1,4 @@
-#include "quorl/window/search/FoldedText.h"
+#include "quorl/search/FoldedText.h"
 
 namespace quorl {
 
