@@ -105,7 +105,9 @@ RULES = {
     "quorl-script": program("platform", "runtime", "doubles"),
     "quorl-syncd/transfer": program("services"),
     "quorl-syncd/engine": program("services", "quorl-syncd/transfer"),
-    "quorl-syncd/bus": program("services", "quorl-syncd/transfer", "quorl-syncd/engine"),
+    "quorl-syncd/notices": program("services", "quorl-syncd/transfer", "quorl-syncd/engine"),
+    "quorl-syncd/bus": program(
+        "services", "quorl-syncd/transfer", "quorl-syncd/engine", "quorl-syncd/notices"),
     "quorl-syncd/daemon": program("services", "quorl-syncd/transfer", "quorl-syncd/engine"),
     "quorl-syncd/main.cpp": program("services", "quorl-syncd"),
     "quorl-simulate": program("services", "quorl-syncd/transfer", "quorl-syncd/engine"),
