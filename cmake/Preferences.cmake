@@ -4,7 +4,7 @@
 set(GENERATED_DIRECTORY ${PROJECT_BINARY_DIR}/generated)
 
 # All schemas, by the end of their ids.
-set(PREFERENCES_SCHEMAS AssetSync Places)
+set(PREFERENCES_SCHEMAS AssetSync Places Notices)
 
 # Sets `file` to the file of a schema.
 function(name_schema_file schema)

@@ -14,7 +14,9 @@
 
 #include "quorl-syncd/bus/BusAnnouncer.h"
 #include "quorl-syncd/bus/BusObjects.h"
+#include "quorl-syncd/bus/DesktopNotices.h"
 #include "quorl-syncd/bus/SleepInhibitor.h"
+#include "quorl-syncd/bus/Watchers.h"
 #include "quorl-syncd/daemon/ChosenWearable.h"
 #include "quorl-syncd/daemon/DirectoryCheck.h"
 #include "quorl-syncd/daemon/LocalMusic.h"
@@ -25,6 +27,7 @@
 #include "quorl-syncd/engine/Engine.h"
 #include "quorl-syncd/engine/LastResults.h"
 #include "quorl-syncd/engine/NotReady.h"
+#include "quorl-syncd/notices/NoticeAnnouncer.h"
 #include "services/base/Errand.h"
 #include "services/base/Utf8.h"
 #include "services/engine/BusLoop.h"
@@ -150,16 +153,26 @@ int serve(const Options& options) {
     syncd::SyncThreads syncs(loop, [] { return std::make_shared<syncd::SleepInhibitor>(); });
     syncd::LastResults results(std::filesystem::path(g_get_user_state_dir()) / "quorl" /
                                (isTrial ? "trial" : ""));
-    syncd::BusAnnouncer announcer(loop.bus(), [&] {
+    syncd::BusAnnouncer clients(loop.bus(), [&] {
         if (objects) {
             objects->publish();
         }
     });
+    syncd::DesktopNotices notices(loop.bus());
+    syncd::NoticeAnnouncer announcer(clients, turns, notices);
+    const auto followWishForNotices = [&] {
+        announcer.setWanted(!isTrial && opened.preferences->get(preferences::desktopNotices));
+    };
+    followWishForNotices();
     const syncd::EnginePorts ports{turns, choices, music, wearables, syncs, results, announcer};
     syncd::Engine engine(ports, complete(options.engine, *opened.preferences));
+    announcer.follow([&]() -> const engine::EngineStatus& { return engine.status(); });
     preferencesDidChange = [&](const preferences::KeySet& keys) {
+        followWishForNotices();
         followPlaces(engine, wearable, *opened.preferences, keys);
-        engine.choicesDidChange();
+        if (keys != preferences::KeySet{preferences::desktopNotices.key}) {
+            engine.choicesDidChange();
+        }
     };
     wearable.watch([&](const std::string& directory) { followWearable(engine, directory); });
     syncd::DirectoryCheck check;
@@ -169,7 +182,10 @@ int serve(const Options& options) {
             return opened.preferences->set(preferences::musicFolder, folder).problem;
         },
         [&](const std::string& directory) { return wearable.remember(directory); }};
-    objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine, keeper);
+    syncd::Watchers watchers(loop.bus(), [&](syncd::Watchers::Presence presence) {
+        announcer.setWatched(presence == syncd::Watchers::Presence::Somebody);
+    });
+    objects = std::make_unique<syncd::BusObjects>(loop.bus(), engine, keeper, watchers);
     try {
         loop.bus().requestName(engine::busNameFor(options.purpose));
     } catch (const sdbus::Error& error) {

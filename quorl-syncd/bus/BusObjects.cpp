@@ -6,6 +6,7 @@
 #include <Wearable-adaptor.h>
 
 #include "quorl-syncd/bus/Published.h"
+#include "quorl-syncd/bus/Watchers.h"
 #include "quorl-syncd/engine/Engine.h"
 #include "quorl-syncd/engine/NotReady.h"
 
@@ -46,10 +47,12 @@ class BusObjects::EngineObject final
     : public sdbus::AdaptorInterfaces<org::quorl::Velora::Sync::Engine_adaptor,
                                       sdbus::Properties_adaptor> {
   public:
-    EngineObject(sdbus::IConnection& bus, Engine& engine, const PlaceKeeper& keeper)
+    EngineObject(sdbus::IConnection& bus, Engine& engine, const PlaceKeeper& keeper,
+                 Watchers& watchers)
         : AdaptorInterfaces{bus, engine::enginePath},
           engine_(engine),
           keeper_(keeper),
+          watchers_(watchers),
           published_(engine.status()) {
         registerAdaptor();
     }
@@ -64,6 +67,14 @@ class BusObjects::EngineObject final
     }
 
     void Cancel() override { engine_.cancel(); }
+
+    void Watch() override { watchers_.add(caller()); }
+
+    void Unwatch() override { watchers_.remove(caller()); }
+
+    [[nodiscard]] std::string caller() const {
+        return getObject().getCurrentlyProcessedMessage()->getSender();
+    }
 
     std::string MusicFolder() override { return engine::valueOf<"MusicFolder">(*published_); }
 
@@ -124,6 +135,7 @@ class BusObjects::EngineObject final
 
     Engine& engine_;
     const PlaceKeeper& keeper_;
+    Watchers& watchers_;
     Published<engine::EngineStatus> published_;
 };
 
@@ -193,8 +205,9 @@ class BusObjects::WearableObject final
     Published<engine::WearableStatus> published_;
 };
 
-BusObjects::BusObjects(sdbus::IConnection& bus, Engine& engine, const PlaceKeeper& keeper)
-    : engine_(std::make_unique<EngineObject>(bus, engine, keeper)),
+BusObjects::BusObjects(sdbus::IConnection& bus, Engine& engine, const PlaceKeeper& keeper,
+                       Watchers& watchers)
+    : engine_(std::make_unique<EngineObject>(bus, engine, keeper, watchers)),
       wearable_(std::make_unique<WearableObject>(bus, engine, keeper)) {
     bus.addObjectManager(engine::managerPath, sdbus::floating_slot);
 }

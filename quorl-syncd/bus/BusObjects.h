@@ -9,6 +9,7 @@
 namespace quorl::syncd {
 
 class Engine;
+class Watchers;
 
 /// The engine and its wearable as bus objects, and the manager of these and of the sessions. The
 /// bus loop's thread.
@@ -26,7 +27,8 @@ class BusObjects {
     };
 
     /// All of these outlive the objects.
-    BusObjects(sdbus::IConnection& bus, Engine& engine, const PlaceKeeper& keeper);
+    BusObjects(sdbus::IConnection& bus, Engine& engine, const PlaceKeeper& keeper,
+               Watchers& watchers);
     ~BusObjects();
 
     BusObjects(const BusObjects&) = delete;

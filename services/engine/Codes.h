@@ -53,4 +53,8 @@ inline constexpr auto songTooLarge = "song-too-large";
 
 inline constexpr auto other = "other"; ///< a sentence
 
+// Above what is told on the desktop of a sync.
+inline constexpr auto titleSynced = "title-synced";
+inline constexpr auto titleNotSynced = "title-not-synced";
+
 } // namespace quorl::engine::code
