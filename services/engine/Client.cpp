@@ -102,6 +102,7 @@ class Client::Connection {
     }
 
     void refuse(const std::string& why, Reply reply);
+    void setWatching(bool isWatching, Reply reply);
     void callMethod(const char* path, const char* interface, const char* method, Reply reply);
 
     template <class State, PropertyName name, class T>
@@ -134,6 +135,7 @@ class Client::Connection {
     void open();
     void fetchState();
     void hear(const BusMessage& message);
+    void tellWatching(Reply reply);
     void noteEngineGone(const std::string& reason);
     void answer(std::uint64_t number, const std::string& problem);
     void answerAll(const std::string& problem);
@@ -153,6 +155,7 @@ class Client::Connection {
     std::map<std::string, Setting> settings_;
     std::uint64_t lastRequest_ = 0;
     bool isClosed_ = false;
+    bool isWatching_ = false;
     /// Which answer about all objects is the one that counts.
     std::uint64_t fetches_ = 0;
 
@@ -227,6 +230,24 @@ void Client::Connection::hear(const BusMessage& message) {
     if (reduced.event) {
         listener_(*reduced.event);
     }
+    if (isWatching_ && reduced.event && reduced.event->kind == Event::Kind::EngineDidAppear) {
+        tellWatching({});
+    }
+}
+
+void Client::Connection::tellWatching(Reply reply) {
+    callMethod(enginePath, engineInterface, isWatching_ ? "Watch" : "Unwatch", std::move(reply));
+}
+
+void Client::Connection::setWatching(bool isWatching, Reply reply) {
+    loop_.post([this, isWatching, reply = std::move(reply)]() mutable {
+        const bool isNews = std::exchange(isWatching_, isWatching) != isWatching;
+        if (isNews && state_->isThere) {
+            tellWatching(std::move(reply));
+        } else if (reply) {
+            reply({});
+        }
+    });
 }
 
 void Client::Connection::noteEngineGone(const std::string& reason) {
@@ -388,6 +409,10 @@ void Client::setOnCharger(bool onCharger, Reply reply) {
 
 void Client::refreshWearable(Reply reply) {
     connection_->callMethod(wearablePath, wearableInterface, "Refresh", std::move(reply));
+}
+
+void Client::setWatching(bool isWatching, Reply reply) {
+    connection_->setWatching(isWatching, std::move(reply));
 }
 
 void Client::removeMusic(Reply reply) {

@@ -49,6 +49,10 @@ class Client {
     void refreshWearable(Reply reply = {});
     /// Switches music sync off, and has what was synced to the wearable removed from it.
     void removeMusic(Reply reply = {});
+    /// Whether a person sees by this client how the engine does. Counts for this engine and for
+    /// each that comes after it, as long as this client lives; starts none. Where nothing is to be
+    /// told, the reply is made at once.
+    void setWatching(bool isWatching, Reply reply = {});
 
   private:
     class Connection;

@@ -8,6 +8,7 @@
 #include <sdbus-c++/sdbus-c++.h>
 
 #include "tests/engine/EngineFixture.h"
+#include "tests/engine/client/WatchedEngine.h"
 
 namespace {
 
@@ -126,6 +127,20 @@ class TalkativeEngine {
     std::unique_ptr<sdbus::IObject> object_ = sdbus::createObject(*bus_, engine::enginePath);
     std::jthread thread_;
 };
+
+TEST_F(Client, SaysToEachEngineThatAPersonWatches) {
+    engine::Client client([](const engine::Event&) {});
+    client.setWatching(true);
+    client.setWatching(true);
+    {
+        WatchedEngine first;
+        EXPECT_EQ(first.nextCall(), "Watch");
+    }
+    WatchedEngine second;
+    EXPECT_EQ(second.nextCall(), "Watch");
+    client.setWatching(false);
+    EXPECT_EQ(second.nextCall(), "Unwatch");
+}
 
 TEST_F(Client, LeavesAnEngineThatDoesNotStopTalking) {
     const TalkativeEngine engine;
