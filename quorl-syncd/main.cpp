@@ -32,6 +32,7 @@
 #include "services/base/Utf8.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Names.h"
+#include "services/language/Languages.h"
 #include "services/preferences/ChosenPlaces.h"
 #include "services/preferences/SharedPreferences.h"
 
@@ -122,6 +123,7 @@ void followWearable(syncd::Engine& engine, const std::string& directory) {
 }
 
 int serve(const Options& options) {
+    language::followLanguages(language::usersLanguages());
     const auto signals = blockSignals();
     engine::BusLoop loop(sdbus::createSessionBusConnection());
     loop.watch(signals.get(), POLLIN, [&] { loop.stop(); });

@@ -8,6 +8,7 @@
 
 #include "services/base/Utf8.h"
 #include "services/engine/Codes.h"
+#include "services/language/Translated.h"
 
 namespace quorl::syncd {
 
@@ -128,8 +129,9 @@ void DesktopNotices::send(const Abilities& abilities) {
     isUnderWay_ = true;
     isSettled_ = true;
     const auto body = base::validUtf8(engine::sentence(wanted_->message));
-    const auto actions = has(abilities, "actions") ? std::vector<std::string>{defaultAction, "Open"}
-                                                   : std::vector<std::string>();
+    const auto actions = has(abilities, "actions")
+                             ? std::vector<std::string>{defaultAction, language::translated("Open")}
+                             : std::vector<std::string>();
     service_->callMethodAsync("Notify")
         .onInterface(serviceName)
         .withArguments(std::string(appName), shown_, std::string(appID), titleOf(wanted_->kind),

@@ -7,6 +7,7 @@
 
 #include "services/engine/Codes.h"
 #include "services/engine/Names.h"
+#include "services/wearable/Unseen.h"
 
 namespace quorl::syncd {
 
@@ -31,6 +32,7 @@ constexpr std::array causes{
     Cause{code::writeProtected},
     Cause{code::obstructed},
     Cause{code::notEnoughMemory},
+    Cause{wearable::unseen::badManifest},
     Cause{code::songUnreadable},
     Cause{code::songTooLarge},
     Cause{code::wentAway, Cause::Ends::WithASong},

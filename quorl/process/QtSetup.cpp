@@ -6,14 +6,13 @@
 
 #include "quorl/process/QtMessages.h"
 #include "quorl/process/QtTexts.h"
-#include "runtime/plugins/StringTable.h"
 #include "services/language/Languages.h"
 
 namespace quorl {
 
 QtSetup::QtSetup(char* program) : arguments_{program, nullptr} {
     takeQtMessages();
-    language::followLanguages(environmentLanguages());
+    language::followLanguages(language::usersLanguages());
     QCoreApplication::setApplicationName(QStringLiteral("quorl"));
     QCoreApplication::setApplicationVersion(QStringLiteral(QUORL_VERSION));
     QGuiApplication::setDesktopFileName(QStringLiteral("org.quorl.Velora"));

@@ -107,8 +107,8 @@ constexpr std::array wordings{
             toTranslate("The {wearable} that was chosen is not connected. {drive 1} is at {path 0} "
                         "in its place. Plug in the one that was chosen, or choose this one.")},
     Wording{code::other, "{text 0}"},
-    Wording{code::titleSynced, "Music synced"},
-    Wording{code::titleNotSynced, "Music not synced"},
+    Wording{code::titleSynced, toTranslate("Music synced")},
+    Wording{code::titleNotSynced, toTranslate("Music not synced")},
 };
 
 std::string at(const Arguments& arguments, std::size_t place) {

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstdlib>
 
+#include <glib.h>
 #include <libintl.h>
 
 namespace quorl::language {
@@ -51,6 +52,18 @@ void followLanguages(const std::vector<std::string>& wished,
     bindtextdomain(domain, directory.c_str());
     bind_textdomain_codeset(domain, "UTF-8");
     textdomain(domain); // without it, gettext would go on with what it has found before
+}
+
+/// GLib names each one with its encoding, too, and ends with what stands for none.
+std::vector<std::string> usersLanguages() {
+    std::vector<std::string> languages;
+    for (const char* const* name = g_get_language_names(); *name != nullptr; ++name) {
+        const std::string language = *name;
+        if (language != "C" && language != "POSIX" && language.find('.') == std::string::npos) {
+            languages.push_back(language);
+        }
+    }
+    return languages;
 }
 
 const std::vector<std::string>& followedLanguages() { return followed(); }

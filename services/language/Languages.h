@@ -18,6 +18,9 @@ namespace quorl::language {
 void followLanguages(const std::vector<std::string>& wished,
                      const std::filesystem::path& catalogues = {});
 
+/// What the environment says of the user's languages, by gettext's rules: the preferred one first.
+[[nodiscard]] std::vector<std::string> usersLanguages();
+
 /// What is followed: first the language that texts and digits are in, then those that were wished
 /// for behind it. "en" before anything was followed. Never empty.
 [[nodiscard]] const std::vector<std::string>& followedLanguages();

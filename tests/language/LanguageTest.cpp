@@ -78,6 +78,16 @@ TEST_F(Language, canBeAnotherOneLater) {
     }
 }
 
+TEST_F(Language, isThatOfTheEnvironment) {
+    setenv("LANGUAGE", "de_AT.UTF-8:fr", 1);
+    EXPECT_THAT(usersLanguages(), ElementsAre("de_AT", "de", "fr"));
+    unsetenv("LANGUAGE");
+    setenv("LC_ALL", "C", 1);
+    EXPECT_THAT(usersLanguages(), testing::IsEmpty());
+    setenv("LC_ALL", "fr_FR.UTF-8", 1);
+    EXPECT_THAT(usersLanguages(), ElementsAre("fr_FR", "fr"));
+}
+
 TEST_F(Language, leavesAloneWhatItDoesNotKnow) {
     followLanguages({"de"});
     EXPECT_EQ(translated("Nobody says so."), "Nobody says so.");

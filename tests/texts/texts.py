@@ -62,7 +62,7 @@ def texts_in_catalogue(path):
 
 def app_texts_in_code(root):
     """What is marked to be translated in the sources of the app and of the services."""
-    sources = [str(path) for folder in ("quorl", "services") for path in sorted((root / folder).rglob("*.cpp"))]
+    sources = [str(path) for folder in ("quorl", "quorl-syncd", "services") for path in sorted((root / folder).rglob("*.cpp"))]
     keywords = [f"--keyword={keyword}" for keyword in KEYWORDS]
     read = run("xgettext", "--from-code=UTF-8", "--language=C++", "--keyword", *keywords, "-o", "-", *sources)
     if read.returncode:
@@ -159,7 +159,7 @@ class PlantedError(unittest.TestCase):
         self.addCleanup(self.directory.cleanup)
         self.root = pathlib.Path(self.directory.name)
         shutil.copytree(ROOT / "settings", self.root / "settings")
-        for folder in ("quorl", "services", "resources/locale"):
+        for folder in ("quorl", "quorl-syncd", "services", "resources/locale"):
             shutil.copytree(ROOT / folder, self.root / folder)
 
     def change(self, file, old, new):
