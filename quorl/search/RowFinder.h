@@ -31,6 +31,9 @@ class RowFinder final : public QObject {
     /// The pane has been drawn with other rows.
     void rowsDidChange();
 
+    /// Whether names are still to be read for what is looked for.
+    [[nodiscard]] bool isReading() const;
+
   Q_SIGNALS:
     void checkedFound(NSInteger paneRow);
     void beginningFound(NSInteger paneRow);
@@ -49,7 +52,6 @@ class RowFinder final : public QObject {
     void addMatches();
     void tellChecked();
     void tellBeginning();
-    [[nodiscard]] bool isReading() const;
 
     RowNames names_;
     PaneContent& content_;

@@ -1,10 +1,11 @@
 #include "quorl/terminal/PaneText.h"
 
-#include <QString>
-#include <sstream>
+#include <algorithm>
+#include <limits>
 
 #include "quorl/content/ButtonCell.h"
 #include "quorl/content/SwitchCell.h"
+#include "quorl/terminal/sheets/TerminalText.h"
 #include "services/base/Utf8.h"
 
 namespace quorl {
@@ -13,87 +14,93 @@ namespace {
 
 constexpr const char* rowIndent = "      ";
 
+using Lines = std::vector<TextLine>;
+
+void append(Lines& lines, const Lines& more) {
+    lines.insert(lines.end(), more.begin(), more.end());
+}
+
 std::string textOfLabel(const UILabel& label) { return base::printable(label.text().value_or("")); }
 
-std::string textOfRow(NSInteger row, const UITableViewCell& cell) {
-    const auto number = std::to_string(row + 1);
-    std::string line(number.size() < 3 ? 3 - number.size() : 0, ' ');
-    line += number + "  ";
-    if (cell.accessoryType() == UITableViewCellAccessoryType::Checkmark) {
-        line += "✓ ";
-    }
-    if (dynamic_cast<const ButtonCell*>(&cell)) {
-        return line + '[' + textOfLabel(cell.textLabel()) + "]\n";
-    }
-    line += textOfLabel(cell.textLabel());
-    if (const auto* toggle = dynamic_cast<const SwitchCell*>(&cell)) {
-        return line + (toggle->isOn() ? ": on\n" : ": off\n");
-    }
-    const auto value = textOfLabel(cell.detailTextLabel());
-    return value.empty() ? line + '\n' : line + ": " + value + '\n';
+/// The value gets half the room, and what the name leaves of the rest.
+std::string nameAndValue(const std::string& name, const std::string& value, int room) {
+    constexpr std::string_view separator = ": ";
+    const int forBoth = room - columnsOf(separator);
+    const int forValue =
+        std::min(columnsOf(value), std::max(forBoth / 2, forBoth - columnsOf(name)));
+    return isolated(shortened(name, forBoth - forValue)).append(separator) +
+           isolated(shortened(value, forValue));
 }
 
-std::string textOfSection(const PaneContent& content, const PaneContent::Section& section,
-                          NSInteger firstRow, int width) {
-    std::string text;
+std::string valueOf(const UITableViewCell& cell) {
+    const auto* toggle = dynamic_cast<const SwitchCell*>(&cell);
+    return toggle ? (toggle->isOn() ? "on" : "off") : textOfLabel(cell.detailTextLabel());
+}
+
+std::string beginningOfRow(NSInteger row, const UITableViewCell& cell) {
+    constexpr std::size_t digits = 3;
+    const auto number = std::to_string(row + 1);
+    const bool isChecked = cell.accessoryType() == UITableViewCellAccessoryType::Checkmark;
+    return std::string(digits - std::min(number.size(), digits), ' ') + number +
+           (isChecked ? "  ✓ " : "  ");
+}
+
+std::string textOfRow(NSInteger row, const UITableViewCell& cell, const SheetForm& form) {
+    const auto beginning = beginningOfRow(row, cell);
+    const auto name = textOfLabel(cell.textLabel());
+    const int room = form.kind == SheetForm::Kind::Rewritten ? form.columns - columnsOf(beginning)
+                                                             : std::numeric_limits<int>::max();
+    if (dynamic_cast<const ButtonCell*>(&cell)) {
+        return beginning + '[' + isolated(shortened(name, room - columnsOf("[]"))) + ']';
+    }
+    const auto value = valueOf(cell);
+    return beginning +
+           (value.empty() ? isolated(shortened(name, room)) : nameAndValue(name, value, room));
+}
+
+void addSection(Lines& lines, const PaneContent& content, const PaneContent::Section& section,
+                NSInteger firstRow, const SheetForm& form) {
     if (section.title && !section.title->empty()) {
-        text += base::printable(*section.title) + '\n';
+        lines.push_back({base::printable(*section.title)});
     }
     for (NSInteger row = firstRow; row < firstRow + section.rowCount; ++row) {
-        if (const auto cell = content.cell(row)) {
-            text += textOfRow(row, *cell);
-        }
+        const auto cell = content.cell(row);
+        lines.push_back({cell ? textOfRow(row, *cell, form) : std::string(), row});
     }
-    if (section.footer && !section.footer->empty()) {
-        text += wrapped(base::printable(*section.footer), width, rowIndent);
-    }
-    return text;
-}
-
-/// Which rows are on the screen, empty where all are.
-std::string textOfRange(const PaneContent& content) {
-    const NSInteger count = content.rowCount();
-    NSInteger first = 0;
-    while (first < count && !content.cell(first)) {
-        ++first;
-    }
-    NSInteger end = first;
-    while (end < count && content.cell(end)) {
-        ++end;
-    }
-    return end - first == count
-               ? std::string()
-               : "\nRows " + std::to_string(first + 1) + " to " + std::to_string(end) + " of " +
-                     std::to_string(count) + ": + shows those after, - those before.\n";
+    append(lines, paragraphs(section.footer.value_or(""), form, rowIndent));
 }
 
 } // namespace
 
-std::string wrapped(const std::string& text, int width, const std::string& indent) {
-    std::istringstream words(text);
-    std::string lines;
-    std::string line;
-    for (std::string word; words >> word;) {
-        std::string longer = line.empty() ? indent : line + ' ';
-        longer += word;
-        if (!line.empty() && QString::fromStdString(longer).size() > width) {
-            lines += line + '\n';
-            longer = indent + word;
+Lines paragraphs(const std::string& text, const SheetForm& form, const std::string& indent) {
+    const auto longWords =
+        form.kind == SheetForm::Kind::Rewritten ? LongWords::Broken : LongWords::Whole;
+    Lines lines;
+    for (std::size_t start = 0; start < text.size();) {
+        const auto end = std::min(text.find('\n', start), text.size());
+        const auto paragraph = base::printable(text.substr(start, end - start));
+        bool goesOn = false;
+        for (auto& line : wrapped(paragraph + '\n', form.columns, indent, longWords)) {
+            lines.push_back({std::move(line), {}, std::exchange(goesOn, true)});
         }
-        line.swap(longer);
+        start = end + 1;
     }
-    return line.empty() ? lines : lines + line + '\n';
+    return lines;
 }
 
-std::string textOf(const PaneContent& content, int width) {
-    std::string text = base::printable(content.pane().title().value_or("")) + '\n';
+Lines linesOf(const PaneContent& content, const SheetForm& form) {
+    Lines lines{{base::printable(content.pane().title().value_or(""))}};
     NSInteger row = 0;
     for (const auto& section : content.sections()) {
-        const auto part = textOfSection(content, section, row, width);
-        text += part.empty() ? part : '\n' + part;
+        Lines part;
+        addSection(part, content, section, row, form);
+        if (!part.empty()) {
+            lines.emplace_back();
+            append(lines, part);
+        }
         row += section.rowCount;
     }
-    return text + textOfRange(content);
+    return lines;
 }
 
 } // namespace quorl

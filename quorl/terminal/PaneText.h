@@ -1,18 +1,18 @@
 #pragma once
 
-#include <string>
-
 #include "quorl/content/PaneContent.h"
+#include "quorl/terminal/sheets/Sheet.h"
 
 namespace quorl {
 
-/// A pane as last drawn, as lines of text: its title, then its groups with numbered rows; footers
-/// are wrapped to `width` columns. Of a longer pane, what is on the screen, with a line that says
-/// so. Control characters are replaced.
-[[nodiscard]] std::string textOf(const PaneContent& content, int width);
+/// A text for people, as lines of a page in which each paragraph is a whole. Control characters are
+/// replaced.
+[[nodiscard]] std::vector<TextLine> paragraphs(const std::string& text, const SheetForm& form,
+                                               const std::string& indent);
 
-/// `text` broken at spaces into lines of at the most `width` characters, each after `indent` and
-/// before a line feed. A longer word has a line of its own.
-[[nodiscard]] std::string wrapped(const std::string& text, int width, const std::string& indent);
+/// A pane as last drawn: its title, then its groups with numbered rows. Rows that are not on the
+/// screen say nothing. Footers are wrapped, and rows too on a sheet that is rewritten are made to
+/// fit so that both name and value can be read. Control characters are replaced.
+[[nodiscard]] std::vector<TextLine> linesOf(const PaneContent& content, const SheetForm& form);
 
 } // namespace quorl

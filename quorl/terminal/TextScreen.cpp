@@ -1,6 +1,7 @@
 #include "quorl/terminal/TextScreen.h"
 
-#include <QString>
+#include "quorl/terminal/sheets/TerminalText.h"
+#include "services/base/Utf8.h"
 
 namespace quorl {
 
@@ -15,8 +16,8 @@ CGFloat TextScreen::scale() const { return 1; }
 CGSize TextScreen::rowSize() const { return {columns, 1}; }
 
 CGSize TextScreen::sizeOfText(const UILabel& label) const {
-    const auto text = QString::fromStdString(label.text().value_or(""));
-    return {static_cast<CGFloat>(text.size()), static_cast<CGFloat>(text.isEmpty() ? 0 : 1)};
+    const auto text = base::printable(label.text().value_or(""));
+    return {static_cast<CGFloat>(columnsOf(text)), static_cast<CGFloat>(text.empty() ? 0 : 1)};
 }
 
 } // namespace quorl

@@ -1,83 +1,86 @@
 #include "quorl/terminal/TextSession.h"
 
 #include <QCoreApplication>
+#include <algorithm>
 #include <array>
-#include <charconv>
 #include <iostream>
-#include <sstream>
 
-#include <sys/ioctl.h>
 #include <unistd.h>
 
 #include "quorl/terminal/PaneText.h"
+#include "quorl/terminal/sheets/TerminalText.h"
 #include "services/base/Utf8.h"
 
 namespace quorl {
 
 namespace {
 
-constexpr int usualWidth = 80;
-constexpr NSInteger rowsOnScreen = 200;
-constexpr const char* hint = "A number taps the row, b goes back, q leaves.\n";
-constexpr const char* unseen = "The rows have just changed. Look again before you tap one.\n";
-
-int terminalWidth() {
-    winsize size{};
-    const bool isTerminal = ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_col > 0;
-    return isTerminal ? size.ws_col : usualWidth;
-}
-
-std::optional<NSInteger> numberIn(const std::string& text) {
-    NSInteger number = 0;
-    const char* end = text.data() + text.size();
-    const auto parsed = std::from_chars(text.data(), end, number);
-    return parsed.ec == std::errc() && parsed.ptr == end ? std::optional(number) : std::nullopt;
-}
-
-std::string textOfProblem(const std::string& problem, int width) {
-    std::istringstream lines(problem);
-    std::string text;
-    for (std::string line; std::getline(lines, line);) {
-        text += line.empty() ? "\n" : wrapped(base::printable(line), width, "");
-    }
-    return text;
-}
+constexpr int usualColumns = 80;
+constexpr NSInteger linesBelow = 2; // of a page: a blank one, and which rows it has
 
 void complain(const std::string& text) {
     std::cerr << "quorl: " << base::printable(text) << std::endl;
 }
 
-} // namespace
-
-TextSession::TextSession(Companion& companion, int input, std::ostream& output)
-    : companion_(companion),
-      input_(input),
-      output_(output),
-      notifier_(input, QSocketNotifier::Read) {
-    notifier_.setEnabled(false);
-    connect(&companion, &Companion::libraryRead, this, &TextSession::readOnceDrawn,
-            Qt::SingleShotConnection);
-    connect(&companion.notices(), &Notices::added, this, &complain);
-    for (const std::string& text : companion.notices().texts()) {
-        complain(text);
-    }
-    connect(&companion.screen(), &PaneScreen::drawing, this, &TextSession::show);
-    connect(&notifier_, &QSocketNotifier::activated, this, &TextSession::readInput);
+void append(std::vector<TextLine>& lines, const std::vector<TextLine>& more) {
+    lines.insert(lines.end(), more.begin(), more.end());
 }
 
-void TextSession::readOnceDrawn() {
-    companion_.screen().whenDrawn(*this, [this] { notifier_.setEnabled(true); });
+bool isRewritten(const Sheet& sheet) { return sheet.form().kind == SheetForm::Kind::Rewritten; }
+
+std::string quoted(const std::string& text) {
+    constexpr int columns = 40;
+    return "“" + isolated(shortened(base::printable(text), columns)) + "”";
+}
+
+std::string noSuchRow(NSInteger number, NSInteger count) {
+    const auto wrong = "There is no row " + std::to_string(number) + ". ";
+    return count == 0   ? wrong + "This page has no rows."
+           : count == 1 ? wrong + "There is row 1 alone."
+                        : wrong + "There are rows 1 to " + std::to_string(count) + '.';
+}
+
+} // namespace
+
+TextSession::TextSession(Companion& companion, int input, Sheet& sheet, LineEntry::Keys keys)
+    : companion_(companion),
+      input_(input),
+      sheet_(sheet),
+      notifier_(input, QSocketNotifier::Read),
+      entry_(std::move(keys)) {
+    listenToNotices();
+    connect(&companion.screen(), &PaneScreen::drawing, this, &TextSession::show);
+    connect(&notifier_, &QSocketNotifier::activated, this, &TextSession::readInput);
+    if (isRewritten(sheet_)) {
+        takeNextLineOnceShown(); // whoever types sees what there is
+    } else {
+        connect(&companion, &Companion::libraryRead, this, &TextSession::takeNextLineOnceShown,
+                Qt::SingleShotConnection);
+    }
+}
+
+void TextSession::listenToNotices() {
+    Notices& notices = companion_.notices();
+    if (isRewritten(sheet_)) {
+        connect(&notices, &Notices::changed, &companion_.screen(), &PaneScreen::scheduleDrawing);
+        return;
+    }
+    connect(&notices, &Notices::added, this, &complain);
+    for (const std::string& text : notices.texts()) {
+        complain(text);
+    }
 }
 
 void TextSession::readInput() {
     std::array<char, 4096> buffer; // NOLINT(cppcoreguidelines-pro-type-member-init): read fills it
     const ssize_t length = read(input_, buffer.data(), buffer.size());
     if (length > 0) {
-        unread_.append(buffer.data(), static_cast<std::size_t>(length));
+        entry_.take(std::string_view(buffer.data(), static_cast<std::size_t>(length)));
     } else if (length == 0 || (errno != EINTR && errno != EAGAIN)) {
-        isAtEnd_ = true;
-        notifier_.setEnabled(false);
+        entry_.end();
     }
+    notifier_.setEnabled(!entry_.isAtEnd());
+    sheet_.setTyped(entry_.typed());
     if (!isWaiting_) {
         takeNextLine(); // at once: it was written by somebody who saw the rows of this moment
     }
@@ -85,76 +88,222 @@ void TextSession::readInput() {
 
 /// Each line finds what the one before has led to.
 void TextSession::takeNextLine() {
-    if (isAtEnd_ && !unread_.empty() && unread_.back() != '\n') {
-        unread_ += '\n';
-    }
-    const auto end = unread_.find('\n');
-    if (end != std::string::npos) {
-        const std::string command(base::trimmed(unread_.substr(0, end)));
-        unread_.erase(0, end + 1);
-        take(command);
-        isWaiting_ = true;
-        companion_.screen().whenDrawn(*this, [this] {
-            isWaiting_ = false;
-            takeNextLine();
-        });
-    } else if (isAtEnd_) {
+    isWaiting_ = false;
+    if (const auto line = entry_.takeLine()) {
+        take(*line);
+        takeNextLineOnceShown();
+    } else if (entry_.isAtEnd()) {
         QCoreApplication::quit();
     }
 }
 
-void TextSession::take(const std::string& command) {
-    if (command == "q") {
-        unread_.clear();
-        QCoreApplication::quit();
-    } else if (command == "b" && companion_.navigation().stack().size() > 1) {
-        companion_.navigation().pop(false);
-        firstRow_ = 0;
-        show();
-    } else if (command == "+" || command == "-") {
-        scroll(command == "+" ? rowsOnScreen : -rowsOnScreen);
-    } else if (const auto number = numberIn(command);
-               number && *number > 0 && content_ && content_->cell(*number - 1)) {
-        tap(*number - 1);
+void TextSession::takeNextLineOnceShown() {
+    isWaiting_ = true;
+    companion_.screen().whenDrawn(*this, [this] {
+        finder_ && finder_->isReading() ? takeNextLineOnceShown() : takeNextLine();
+    });
+}
+
+void TextSession::take(const std::string& line) {
+    sheet_.answer("");
+    follow(commandIn(line), line);
+    show();
+}
+
+void TextSession::follow(const TypedCommand& command, const std::string& line) {
+    switch (command.kind) {
+    case TypedCommand::Kind::Choose:
+        return choose(command.number);
+    case TypedCommand::Kind::GoBack:
+        return goBack();
+    case TypedCommand::Kind::Search:
+        return search(command.words);
+    case TypedCommand::Kind::EndSearch:
+        return endSearch();
+    case TypedCommand::Kind::NextPage:
+        return turnPage(Direction::Forward);
+    case TypedCommand::Kind::PreviousPage:
+        return turnPage(Direction::Backward);
+    case TypedCommand::Kind::ShowAgain:
+        return sheet_.showAgain();
+    case TypedCommand::Kind::Explain:
+        return sheet_.answer(explanation());
+    case TypedCommand::Kind::Leave:
+        return leave();
+    case TypedCommand::Kind::Unknown:
+        sheet_.answer(quoted(line) + " is not understood. " + howToGoOn(usualColumns));
+    }
+}
+
+void TextSession::choose(NSInteger number) {
+    const NSInteger count = content_ ? content_->rowCount() : 0;
+    const NSInteger row = number - 1;
+    if (row < 0 || row >= count) {
+        sheet_.answer(noSuchRow(number, count));
+    } else if (row >= shown_.first && row < shown_.end) {
+        tap(row);
     } else {
-        print(hint);
+        const auto lines = allLines(sheet_.form());
+        const auto isRow = [row](const TextLine& line) { return line.row == row; };
+        firstLine_ = std::find_if(lines.begin(), lines.end(), isRow) - lines.begin();
+        const auto name = std::to_string(number);
+        sheet_.answer("Row " + name + " was on another page. Type " + name +
+                      " again to choose it.");
     }
 }
 
 void TextSession::tap(NSInteger row) {
-    const auto* pane = companion_.navigation().top().get();
     if (!content_->tap(row)) {
-        print(unseen); // and the drawing that is due prints the rows
-        return;
+        sheet_.answer("The rows have just changed. Look again before you choose one.");
     }
-    if (pane != companion_.navigation().top().get()) {
-        firstRow_ = 0;
-    }
-    show();
 }
 
-void TextSession::scroll(NSInteger rows) {
-    const NSInteger count = content_ ? content_->rowCount() : 0;
-    firstRow_ = std::clamp<NSInteger>(firstRow_ + rows, 0, std::max<NSInteger>(count - 1, 0));
+void TextSession::goBack() {
+    if (!words_.empty()) {
+        endSearch();
+    } else if (companion_.navigation().stack().size() > 1) {
+        companion_.navigation().pop(false);
+    } else {
+        sheet_.answer("There is no page before this one; q leaves.");
+    }
+}
+
+void TextSession::search(const std::string& words) {
+    if (finder_) {
+        words_ = base::validUtf8(words);
+        firstLine_ = 0;
+        finder_->filter(QString::fromStdString(words_));
+    }
+}
+
+void TextSession::endSearch() {
+    if (words_.empty()) {
+        sheet_.answer("All rows are there. / and some words leave those with the words.");
+        return;
+    }
+    words_.clear();
+    finder_->endFilter();
+    content_->showOnly(std::nullopt);
+}
+
+void TextSession::turnPage(Direction direction) {
+    const NSInteger before = firstLine_;
+    const NSInteger lines = std::max<NSInteger>(sheet_.form().lines - linesBelow, 1);
+    firstLine_ += direction == Direction::Forward ? lines : -lines;
     show();
+    if (firstLine_ == before) {
+        sheet_.answer(direction == Direction::Forward ? "This is the last page."
+                                                      : "This is the first page.");
+    }
+}
+
+void TextSession::leave() {
+    entry_.close();
+    QCoreApplication::quit();
+}
+
+void TextSession::showAgain() {
+    show();
+    sheet_.showAgain();
 }
 
 void TextSession::show() {
+    takeTopPane();
+    sheet_.show(page());
+}
+
+void TextSession::takeTopPane() {
     const auto top = companion_.navigation().top();
-    if (top && (!content_ || &content_->pane() != top.get())) {
-        content_ = PaneContent::of(top, companion_.navigation());
+    if (!top || (content_ && &content_->pane() == top.get())) {
+        return;
     }
-    if (top) {
-        content_->draw(firstRow_, rowsOnScreen);
+    if (!words_.empty()) {
+        endSearch(); // the pane may come back
     }
-    const auto text = top ? textOf(*content_, terminalWidth())
-                          : textOfProblem(companion_.problem(), terminalWidth());
-    if (text != shown_) {
-        shown_ = text;
-        print(text + '\n');
+    firstLine_ = 0;
+    finder_.reset();
+    content_ = PaneContent::of(top, companion_.navigation());
+    finder_ = std::make_unique<RowFinder>(*content_);
+    connect(finder_.get(), &RowFinder::matchesChanged, this,
+            [this](const std::vector<NSInteger>& rows) {
+                content_->showOnly(rows);
+                show(); // at once: no row may be tapped that is not shown
+            });
+}
+
+std::vector<TextLine> TextSession::page() {
+    const SheetForm form = sheet_.form();
+    auto lines = allLines(form);
+    cut(lines, form);
+    shown_ = rowsOf(lines);
+    if (shown_.first != std::exchange(firstDrawnRow_, shown_.first)) {
+        lines = allLines(form);
+        cut(lines, form);
+    }
+    return lines;
+}
+
+std::vector<TextLine> TextSession::allLines(const SheetForm& form) {
+    std::vector<TextLine> lines;
+    if (form.kind == SheetForm::Kind::Rewritten) {
+        for (const auto& text : companion_.notices().texts()) {
+            append(lines, paragraphs(text, form, ""));
+            lines.emplace_back();
+        }
+    }
+    append(lines, content_ ? linesOfPane(form) : paragraphs(companion_.problem(), form, ""));
+    return lines;
+}
+
+std::vector<TextLine> TextSession::linesOfPane(const SheetForm& form) {
+    const bool isReloaded = !content_->isCurrent();
+    content_->draw(firstDrawnRow_, form.lines);
+    if (isReloaded) {
+        finder_->rowsDidChange();
+    }
+    auto lines = linesOf(*content_, form);
+    const auto search = paragraphs(textOfSearch(), form, "");
+    lines.insert(lines.begin() + 1, search.begin(), search.end());
+    return lines;
+}
+
+std::string TextSession::textOfSearch() const {
+    return words_.empty() ? std::string()
+                          : std::to_string(content_->rowCount()) + " of " +
+                                std::to_string(content_->paneRowCount()) + " rows have " +
+                                quoted(words_) + " in their names; / alone shows all.";
+}
+
+/// Leaves what fits from the first line of the page on, and says below it where that is.
+void TextSession::cut(std::vector<TextLine>& lines, const SheetForm& form) {
+    const auto count = static_cast<NSInteger>(lines.size());
+    const NSInteger room =
+        count <= form.lines ? count : std::max<NSInteger>(form.lines - linesBelow, 1);
+    firstLine_ = std::clamp<NSInteger>(firstLine_, 0, count - room);
+    lines.erase(lines.begin() + firstLine_ + room, lines.end());
+    lines.erase(lines.begin(), lines.begin() + firstLine_);
+    if (room < count && form.lines > linesBelow) {
+        lines.emplace_back();
+        lines.push_back({textOfPlace(rowsOf(lines))});
     }
 }
 
-void TextSession::print(const std::string& text) { output_ << text << std::flush; }
+std::string TextSession::textOfPlace(const RowRange& rows) const {
+    constexpr const char* turning = "+ shows what comes after, - what comes before.";
+    return rows.first == rows.end
+               ? turning
+               : "Rows " + std::to_string(rows.first + 1) + " to " + std::to_string(rows.end) +
+                     " of " + std::to_string(content_->rowCount()) + ": " + turning;
+}
+
+TextSession::RowRange TextSession::rowsOf(const std::vector<TextLine>& lines) {
+    RowRange rows;
+    for (const auto& line : lines) {
+        if (line.row) {
+            rows = {rows.end == 0 ? *line.row : rows.first, *line.row + 1};
+        }
+    }
+    return rows;
+}
 
 } // namespace quorl

@@ -13,6 +13,9 @@ namespace {
 using testing::HasSubstr;
 using testing::Not;
 
+constexpr const char* overview =
+    "A number chooses, b goes back, / searches, + - turn pages, ? explains, q leaves.";
+
 class Text : public testing::Test {
   protected:
     [[nodiscard]] std::vector<std::string> arguments() const { return {"--text"}; }
@@ -83,12 +86,54 @@ TEST_F(Text, lastLineWithoutALineFeedCountsToo) {
     EXPECT_THAT(shell.readAllStandardOutput().toStdString(), HasSubstr("✓ 500 MB"));
 }
 
-TEST_F(Text, whatIsNoCommandGetsAHint) {
+TEST_F(Text, beginsWithHowToGoOn) {
     QuorlProcess quorl(arguments());
-    for (const char* line : {"hello", "0", "7", "", "-1", "bb"}) {
+    EXPECT_EQ(quorl.readUntil("\n"), std::string(overview) + '\n');
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST_F(Text, whatIsNoCommandIsToldWhatIs) {
+    QuorlProcess quorl(arguments());
+    quorl.readUntil("Playlist Limit: 500 MB\n");
+    for (const std::string line : {"hello", "-1", "bb"}) {
         quorl.say(line);
-        quorl.readUntil("A number taps the row, b goes back, q leaves.\n");
+        quorl.readUntil("“" + line + "” is not understood. A number chooses");
     }
+    for (const std::string line : {"0", "7"}) {
+        quorl.say(line);
+        quorl.readUntil("There is no row " + line + ". There are rows 1 to ");
+    }
+    quorl.say("?");
+    quorl.readUntil("q leaves.\n");
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST_F(Text, emptyLineShowsThePageAgain) {
+    QuorlProcess quorl(arguments());
+    quorl.readUntil("Playlist Limit: 500 MB\n");
+    quorl.say("");
+    quorl.readUntil("Music\n\nMusic Syncing\n");
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST_F(Text, wordsFindRows) {
+    QuorlProcess quorl(arguments());
+    quorl.say("1");
+    quorl.say("/road");
+    quorl.say("1");
+    quorl.readUntil("1 of 3 rows have “road” in their names; / alone shows all.\n");
+    quorl.readUntil("  1  ✓ Road Trip: Sync Pending…\n");
+    quorl.say("/");
+    quorl.readUntil("  2  ✓ Road Trip: Sync Pending…\n");
+    EXPECT_EQ(quorl.end(), 0);
+}
+
+TEST_F(Text, onlyTheRowThatChangesIsPrinted) {
+    QuorlProcess quorl(arguments());
+    quorl.readUntil("Playlist Limit: 500 MB\n");
+    quorl.readUntil("\n\n");
+    storePreference("asset-sync-limit", "just 1024");
+    EXPECT_EQ(quorl.readUntil("1 GB\n"), "  2  Playlist Limit: 1 GB\n");
     EXPECT_EQ(quorl.end(), 0);
 }
 
