@@ -39,7 +39,11 @@ class ShownPage : public testing::Test {
     std::string text() {
         refresh();
         content_->draw(0, 100);
-        return textOf(*content_, 80);
+        std::string text;
+        for (const auto& line : linesOf(*content_, {80, 100, SheetForm::Kind::Printed})) {
+            text += line.text + '\n';
+        }
+        return text;
     }
 
     void tap(const std::string& title) {
