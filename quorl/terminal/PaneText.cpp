@@ -7,6 +7,7 @@
 #include "quorl/content/SwitchCell.h"
 #include "quorl/terminal/sheets/TerminalText.h"
 #include "services/base/Utf8.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
 
@@ -34,7 +35,8 @@ std::string nameAndValue(const std::string& name, const std::string& value, int 
 
 std::string valueOf(const UITableViewCell& cell) {
     const auto* toggle = dynamic_cast<const SwitchCell*>(&cell);
-    return toggle ? (toggle->isOn() ? "on" : "off") : textOfLabel(cell.detailTextLabel());
+    return toggle ? (toggle->isOn() ? language::translated("on") : language::translated("off"))
+                  : textOfLabel(cell.detailTextLabel());
 }
 
 std::string beginningOfRow(NSInteger row, const UITableViewCell& cell) {

@@ -10,8 +10,12 @@
 #include "quorl/terminal/PaneText.h"
 #include "quorl/terminal/sheets/TerminalText.h"
 #include "services/base/Utf8.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
+
+using language::filled;
+using language::translated;
 
 namespace {
 
@@ -34,10 +38,12 @@ std::string quoted(const std::string& text) {
 }
 
 std::string noSuchRow(NSInteger number, NSInteger count) {
-    const auto wrong = "There is no row " + std::to_string(number) + ". ";
-    return count == 0   ? wrong + "This page has no rows."
-           : count == 1 ? wrong + "There is row 1 alone."
-                        : wrong + "There are rows 1 to " + std::to_string(count) + '.';
+    const auto wrong =
+        filled(translated("There is no row {number}."), {{"number", std::to_string(number)}}) + ' ';
+    return count == 0   ? wrong + translated("This page has no rows.")
+           : count == 1 ? wrong + translated("There is row 1 alone.")
+                        : wrong + filled(translated("There are rows 1 to {last}."),
+                                         {{"last", std::to_string(count)}});
 }
 
 } // namespace
@@ -131,7 +137,8 @@ void TextSession::follow(const TypedCommand& command, const std::string& line) {
     case TypedCommand::Kind::Leave:
         return leave();
     case TypedCommand::Kind::Unknown:
-        sheet_.answer(quoted(line) + " is not understood. " + howToGoOn(usualColumns));
+        sheet_.answer(filled(translated("{typed} is not understood."), {{"typed", quoted(line)}}) +
+                      ' ' + howToGoOn(usualColumns));
     }
 }
 
@@ -147,14 +154,15 @@ void TextSession::choose(NSInteger number) {
         const auto isRow = [row](const TextLine& line) { return line.row == row; };
         firstLine_ = std::find_if(lines.begin(), lines.end(), isRow) - lines.begin();
         const auto name = std::to_string(number);
-        sheet_.answer("Row " + name + " was on another page. Type " + name +
-                      " again to choose it.");
+        sheet_.answer(filled(translated("Row {number} was on another page. Type {number} again to "
+                                        "choose it."),
+                             {{"number", name}}));
     }
 }
 
 void TextSession::tap(NSInteger row) {
     if (!content_->tap(row)) {
-        sheet_.answer("The rows have just changed. Look again before you choose one.");
+        sheet_.answer(translated("The rows have just changed. Look again before you choose one."));
     }
 }
 
@@ -164,7 +172,7 @@ void TextSession::goBack() {
     } else if (companion_.navigation().stack().size() > 1) {
         companion_.navigation().pop(false);
     } else {
-        sheet_.answer("There is no page before this one; q leaves.");
+        sheet_.answer(translated("There is no page before this one; q leaves."));
     }
 }
 
@@ -178,7 +186,8 @@ void TextSession::search(const std::string& words) {
 
 void TextSession::endSearch() {
     if (words_.empty()) {
-        sheet_.answer("All rows are there. / and some words leave those with the words.");
+        sheet_.answer(
+            translated("All rows are there. / and some words leave those with the words."));
         return;
     }
     words_.clear();
@@ -192,8 +201,8 @@ void TextSession::turnPage(Direction direction) {
     firstLine_ += direction == Direction::Forward ? lines : -lines;
     show();
     if (firstLine_ == before) {
-        sheet_.answer(direction == Direction::Forward ? "This is the last page."
-                                                      : "This is the first page.");
+        sheet_.answer(direction == Direction::Forward ? translated("This is the last page.")
+                                                      : translated("This is the first page."));
     }
 }
 
@@ -269,9 +278,11 @@ std::vector<TextLine> TextSession::linesOfPane(const SheetForm& form) {
 
 std::string TextSession::textOfSearch() const {
     return words_.empty() ? std::string()
-                          : std::to_string(content_->rowCount()) + " of " +
-                                std::to_string(content_->paneRowCount()) + " rows have " +
-                                quoted(words_) + " in their names; / alone shows all.";
+                          : filled(translated("{found} of {all} rows have {words} in their names; "
+                                              "/ alone shows all."),
+                                   {{"found", std::to_string(content_->rowCount())},
+                                    {"all", std::to_string(content_->paneRowCount())},
+                                    {"words", quoted(words_)}});
 }
 
 /// Leaves what fits from the first line of the page on, and says below it where that is.
@@ -289,11 +300,14 @@ void TextSession::cut(std::vector<TextLine>& lines, const SheetForm& form) {
 }
 
 std::string TextSession::textOfPlace(const RowRange& rows) const {
-    constexpr const char* turning = "+ shows what comes after, - what comes before.";
+    const auto turning = translated("+ shows what comes after, - what comes before.");
     return rows.first == rows.end
                ? turning
-               : "Rows " + std::to_string(rows.first + 1) + " to " + std::to_string(rows.end) +
-                     " of " + std::to_string(content_->rowCount()) + ": " + turning;
+               : filled(translated("Rows {first} to {last} of {count}: {turning}"),
+                        {{"first", std::to_string(rows.first + 1)},
+                         {"last", std::to_string(rows.end)},
+                         {"count", std::to_string(content_->rowCount())},
+                         {"turning", turning}});
 }
 
 TextSession::RowRange TextSession::rowsOf(const std::vector<TextLine>& lines) {

@@ -7,16 +7,15 @@
 #include <optional>
 
 #include "quorl/terminal/sheets/TerminalText.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
+
+using language::translated;
 
 namespace {
 
 using Kind = TypedCommand::Kind;
-
-constexpr const char* overview =
-    "A number chooses, b goes back, / searches, + - turn pages, ? explains, q leaves.";
-constexpr const char* shortOverview = "? explains, q leaves";
 
 /// A number that is too large for any row is the largest.
 std::optional<NSInteger> numberIn(const std::string& text) {
@@ -47,18 +46,20 @@ TypedCommand commandIn(const std::string& line) {
 }
 
 std::string howToGoOn(int columns) {
-    return columnsOf(overview) <= columns ? overview : shortOverview;
+    const auto overview = translated(
+        "A number chooses, b goes back, / searches, + - turn pages, ? explains, q leaves.");
+    return columnsOf(overview) <= columns ? overview : translated("? explains, q leaves");
 }
 
 std::string explanation() {
-    return "A number chooses the row that begins with it: it opens a page, turns a switch, or "
-           "picks "
-           "what the row offers.\n"
-           "b goes back to the page before, or ends a search.\n"
-           "/words leaves the rows with these words in their names; / alone shows all again.\n"
-           "+ and - turn the pages of what is too long for the terminal.\n"
-           "Enter alone shows the page again.\n"
-           "? shows this, q leaves.\n";
+    return translated("A number chooses the row that begins with it: it opens a page, turns a "
+                      "switch, or picks what the row offers.\n"
+                      "b goes back to the page before, or ends a search.\n"
+                      "/words leaves the rows with these words in their names; / alone shows all "
+                      "again.\n"
+                      "+ and - turn the pages of what is too long for the terminal.\n"
+                      "Enter alone shows the page again.\n"
+                      "? shows this, q leaves.\n");
 }
 
 } // namespace quorl

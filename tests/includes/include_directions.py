@@ -97,8 +97,8 @@ RULES = {
     "quorl/window": program(
         "platform", "runtime", "quorl/app", "quorl/content", "quorl/process", "quorl/search"),
     "quorl/terminal": program(
-        "platform", "runtime", "services/base", "quorl/app", "quorl/content", "quorl/process",
-        "quorl/search"),
+        "platform", "runtime", "services/base", "services/language", "quorl/app", "quorl/content",
+        "quorl/process", "quorl/search"),
     "quorl/commands": program("services", "quorl/app", "quorl/facts", "quorl/process"),
     "quorl/reports": program("runtime", "services", "quorl/app", "quorl/process", "quorl/window"),
     "quorl/main.cpp": program("services/base", "quorl"),
