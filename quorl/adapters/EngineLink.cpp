@@ -88,6 +88,10 @@ void EngineLink::chooseWearable(const std::filesystem::path& directory, Done don
     client_.setWearableDirectory(directory.string(), onMainQueue(std::move(done)));
 }
 
+void EngineLink::setWatching(bool isWatching, Done done) {
+    client_.setWatching(isWatching, onMainQueue(std::move(done)));
+}
+
 engine::Client::Reply EngineLink::onMainQueue(Done done) const {
     return [inbox = std::weak_ptr(inbox_), done = std::move(done)](const std::string& problem) {
         dispatch_async(dispatch_get_main_queue(), [inbox, done, problem] {

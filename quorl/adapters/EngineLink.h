@@ -45,6 +45,9 @@ class EngineLink final {
 
     void setOnCharger(bool onCharger) { client_.setOnCharger(onCharger); }
 
+    /// Whether a person sees how the engine does. `done` is called once that was told.
+    void setWatching(bool isWatching, Done done);
+
   private:
     struct Inbox;
 

@@ -39,33 +39,42 @@ T stored(const Preference<T>& /*preference*/, std::optional<std::uint64_t> value
     }
 }
 
+using Changes = PreferencesStore::Changes;
+
+/// Has the main thread be told. Any thread.
+void tell(const std::weak_ptr<const Changes>& changes, std::function<void()> Changes::*change) {
+    dispatch_async(dispatch_get_main_queue(), [changes, change] {
+        const auto told = changes.lock();
+        if (told && (*told).*change) {
+            ((*told).*change)();
+        }
+    });
+}
+
 /// What another program has changed. Any thread.
-void announce(const KeySet& keys,
-              const std::weak_ptr<const PreferencesStore::PlacesChanged>& tell) {
+void announce(const KeySet& keys, const std::weak_ptr<const Changes>& changes) {
     const auto places = keys.count(musicFolder.key) + keys.count(wearableDirectory.key) +
                         keys.count(wearableIdentity.key);
-    if (places < keys.size()) {
+    const auto notices = keys.count(desktopNotices.key);
+    if (places + notices < keys.size()) {
         SyncDefaults::announceChange();
     }
     if (places > 0) {
-        dispatch_async(dispatch_get_main_queue(), [tell] {
-            if (const auto placesChanged = tell.lock()) {
-                (*placesChanged)();
-            }
-        });
+        tell(changes, &Changes::places);
+    }
+    if (notices > 0) {
+        tell(changes, &Changes::notices);
     }
 }
 
 } // namespace
 
-PreferencesStore::PreferencesStore(base::Purpose purpose, Problem problem,
-                                   PlacesChanged placesChanged)
-    : problem_(std::move(problem)),
-      placesChanged_(std::make_shared<const PlacesChanged>(std::move(placesChanged))) {
-    auto opened = SharedPreferences::open([reference = std::weak_ptr(placesChanged_)](
-                                              const SharedPreferences& /*preferences*/,
+PreferencesStore::PreferencesStore(base::Purpose purpose, Problem problem, Changes changes)
+    : problem_(std::move(problem)), changes_(std::make_shared<const Changes>(std::move(changes))) {
+    auto opened = SharedPreferences::open(
+        [reference = std::weak_ptr(changes_)](const SharedPreferences& /*preferences*/,
                                               const KeySet& keys) { announce(keys, reference); },
-                                          purpose);
+        purpose);
     preferences_ = std::move(opened.preferences);
     problem_(opened.problem);
 }
@@ -80,6 +89,16 @@ std::filesystem::path PreferencesStore::wearableDirectory() const {
 
 std::string PreferencesStore::wearableIdentity() const {
     return preferences_ ? preferences_->get(preferences::wearableIdentity) : std::string();
+}
+
+bool PreferencesStore::hasNotices() const {
+    return preferences_ ? preferences_->get(desktopNotices) : desktopNotices.defaultValue;
+}
+
+void PreferencesStore::setNotices(bool areOn) {
+    if (preferences_) {
+        store(desktopNotices, areOn);
+    }
 }
 
 void PreferencesStore::chooseMusicFolder(const std::filesystem::path& folder) {

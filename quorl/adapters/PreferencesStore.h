@@ -18,8 +18,17 @@ class PreferencesStore final : public SyncPreferencesStore {
     /// Is called on the main thread when another program has chosen other places.
     using PlacesChanged = std::function<void()>;
 
+    /// The same when it has switched notices on or off.
+    using NoticesChanged = std::function<void()>;
+
+    /// Who is told of what others change; empty for nobody.
+    struct Changes {
+        PlacesChanged places;
+        NoticesChanged notices;
+    };
+
     /// Opens the preferences.
-    PreferencesStore(base::Purpose purpose, Problem problem, PlacesChanged placesChanged);
+    PreferencesStore(base::Purpose purpose, Problem problem, Changes changes);
 
     /// The music folder that was chosen, or else the usual one.
     [[nodiscard]] std::filesystem::path musicFolder() const;
@@ -29,6 +38,10 @@ class PreferencesStore final : public SyncPreferencesStore {
 
     /// Which drive that is on, as it stands in the settings; empty where the path alone counts.
     [[nodiscard]] std::string wearableIdentity() const;
+
+    /// Whether syncs are told of on the desktop.
+    [[nodiscard]] bool hasNotices() const;
+    void setNotices(bool areOn);
 
     /// Chooses the music folder.
     void chooseMusicFolder(const std::filesystem::path& folder);
@@ -45,7 +58,7 @@ class PreferencesStore final : public SyncPreferencesStore {
     bool store(const preferences::Preference<T>& preference, const std::type_identity_t<T>& value);
 
     const Problem problem_;
-    const std::shared_ptr<const PlacesChanged> placesChanged_;
+    const std::shared_ptr<const Changes> changes_;
     std::unique_ptr<preferences::SharedPreferences> preferences_; ///< null: nothing can be stored
 };
 

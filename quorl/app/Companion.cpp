@@ -161,4 +161,8 @@ void Companion::enterForeground() {
     screen_.scheduleDrawing();
 }
 
+void Companion::setSeen(bool isSeen, std::function<void()> told) {
+    host_->setSeen(isSeen && navigation_->top(), std::move(told));
+}
+
 } // namespace quorl

@@ -70,6 +70,10 @@ class Companion final : public QObject {
     void enterBackground();
     void enterForeground();
 
+    /// Says whether a person sees the panes now: nothing is told on the desktop then. `told` is
+    /// called some time later, once that counts; empty for nobody.
+    void setSeen(bool isSeen, std::function<void()> told = {});
+
   Q_SIGNALS:
     /// The library has taken what is in the music folder now.
     void libraryRead();

@@ -32,9 +32,8 @@ CompanionHost::CompanionHost(const Places& places, Screen& screen, Notices& noti
     : purpose_(places.purpose()),
       screen_(screen),
       notices_(notices),
-      store_(
-          purpose_, [this](const std::string& problem) { noticeStore(problem); },
-          [this] { placesDidChange(); }),
+      store_(purpose_, [this](const std::string& problem) { noticeStore(problem); },
+             {[this] { placesDidChange(); }, [this] { tellObserver(); }}),
       syncDefaults_(std::make_shared<SyncDefaults>(store_)),
       library_(std::make_shared<MusicLibrary>()),
       wearable_(wearableAt(places.wearable, purpose_)),
@@ -131,6 +130,20 @@ std::optional<bool> CompanionHost::startsAtLogin() const {
 void CompanionHost::setStartAtLogin(bool starts) {
     notices_.set(Notices::Topic::Request, loginStart_.set(starts));
 }
+
+void CompanionHost::setSeen(bool isSeen, std::function<void()> told) {
+    engine_.setWatching(isSeen, [told = std::move(told)](const std::string& /*problem*/) {
+        if (told) {
+            told();
+        }
+    });
+}
+
+std::optional<bool> CompanionHost::hasDesktopNotices() const {
+    return purpose_ == base::Purpose::Use ? std::optional(store_.hasNotices()) : std::nullopt;
+}
+
+void CompanionHost::setDesktopNotices(bool areOn) { store_.setNotices(areOn); }
 
 void CompanionHost::setFolderChooser(AskForFolder ask) { askForFolder_ = std::move(ask); }
 

@@ -33,6 +33,10 @@ class CompanionHost final : public Host, public PageServices {
     /// Starts the engine of a trial, where this is one. Where a trial has none, nothing is synced.
     void startTrialEngine();
 
+    /// Whether a person sees the panes, and with them how the engine does, which then tells nothing
+    /// on the desktop. `told` is called once it knows, or where it cannot; empty for nobody.
+    void setSeen(bool isSeen, std::function<void()> told);
+
     /// Asks a person for a folder, beginning at `start`; calls `chosen` where one was chosen.
     using AskForFolder =
         std::function<void(const std::filesystem::path& start,
@@ -77,6 +81,9 @@ class CompanionHost final : public Host, public PageServices {
 
     [[nodiscard]] std::optional<bool> startsAtLogin() const override;
     void setStartAtLogin(bool starts) override;
+
+    [[nodiscard]] std::optional<bool> hasDesktopNotices() const override;
+    void setDesktopNotices(bool areOn) override;
 
     void findWearables(Finding finding) override;
     [[nodiscard]] WearableShelf wearables() const override;

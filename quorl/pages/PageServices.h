@@ -45,6 +45,12 @@ class PageServices {
     /// Why it was not done becomes a notice.
     virtual void setStartAtLogin(bool starts) = 0;
 
+    /// Whether the engine tells of syncs on the desktop; nothing in a trial, where it never does.
+    [[nodiscard]] virtual std::optional<bool> hasDesktopNotices() const = 0;
+
+    /// Why it was not done becomes a notice.
+    virtual void setDesktopNotices(bool areOn) = 0;
+
     enum class Finding { Over, Wanted };
 
     /// Whether wearables are to be looked for, which goes on until it is over.

@@ -79,6 +79,12 @@ AppPage::Rows SyncPage::rows() {
         rows.push_back(toggle(translated("Start at Login"), *startsAtLogin_,
                               PSSetter::of<&SyncPage::setLoginStart>("setLoginStart::")));
     }
+    if (const auto notices = services().hasDesktopNotices()) {
+        rows.push_back(group(std::nullopt, "When a long sync is done, or you can mend what is in "
+                                           "its way. Not while you look at this app."));
+        rows.push_back(
+            toggle("Notifications", *notices, PSSetter::of<&SyncPage::setNotices>("setNotices::")));
+    }
     return rows;
 }
 
@@ -132,6 +138,12 @@ void SyncPage::setLoginStart(const std::shared_ptr<NSObject>& isOn, const Row& /
     const auto* number = dynamic_cast<const NSNumber*>(isOn.get());
     services().setStartAtLogin(number && number->boolValue());
     startsAtLogin_ = services().startsAtLogin();
+    refresh();
+}
+
+void SyncPage::setNotices(const std::shared_ptr<NSObject>& areOn, const Row& /*row*/) {
+    const auto* number = dynamic_cast<const NSNumber*>(areOn.get());
+    services().setDesktopNotices(number && number->boolValue());
     refresh();
 }
 

@@ -23,6 +23,7 @@ class SyncPage final : public AppPage {
     void syncNow(const std::shared_ptr<NSObject>& nothing, const Row& row);
     void stop(const std::shared_ptr<NSObject>& nothing, const Row& row);
     void setLoginStart(const std::shared_ptr<NSObject>& isOn, const Row& row);
+    void setNotices(const std::shared_ptr<NSObject>& areOn, const Row& row);
 
     /// Asked for when the page appears, for it stands in a file. Null: it cannot be set here.
     std::optional<bool> startsAtLogin_;

@@ -33,6 +33,10 @@ bool ForegroundWatch::eventFilter(QObject* /*watched*/, QEvent* event) {
     case QEvent::WindowStateChange:
         setInBackground(window_.isHidden() || window_.isMinimized());
         break;
+    case QEvent::WindowActivate:
+    case QEvent::WindowDeactivate:
+        tellSeen();
+        break;
     default:
         break;
     }
@@ -49,6 +53,11 @@ void ForegroundWatch::setInBackground(bool isInBackground) {
     } else {
         companion_.enterForeground();
     }
+    tellSeen();
+}
+
+void ForegroundWatch::tellSeen() {
+    companion_.setSeen(window_.isActiveWindow() && !isInBackground_);
 }
 
 } // namespace quorl

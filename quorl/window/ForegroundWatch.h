@@ -7,8 +7,8 @@
 namespace quorl {
 
 /// Tells the companion when its window leaves the screen (hidden, minimised, or the whole app put
-/// aside by the system) and when it is about to come back. Another window in front is neither. Main
-/// thread.
+/// aside by the system) and when it is about to come back. Another window in front is neither, but
+/// then a person may not see the panes. Main thread.
 class ForegroundWatch final : public QObject {
     Q_OBJECT
 
@@ -20,6 +20,7 @@ class ForegroundWatch final : public QObject {
 
   private:
     void setInBackground(bool isInBackground);
+    void tellSeen();
 
     QWidget& window_;
     Companion& companion_;

@@ -26,6 +26,10 @@ class MadeUpServices final : public PageServices {
 
     void setStartAtLogin(bool starts) override { isLoginStart = starts; }
 
+    [[nodiscard]] std::optional<bool> hasDesktopNotices() const override { return hasNotices; }
+
+    void setDesktopNotices(bool areOn) override { hasNotices = areOn; }
+
     void findWearables(Finding finding) override { isFinding = finding == Finding::Wanted; }
 
     [[nodiscard]] WearableShelf wearables() const override { return shelf; }
@@ -45,6 +49,7 @@ class MadeUpServices final : public PageServices {
     engine::EngineState state;
     std::optional<bool> isLoginStart = false;
     mutable int loginStartReads = 0;
+    std::optional<bool> hasNotices = true;
     bool isFinding = false;
     WearableShelf shelf;
     std::vector<std::string> asked;

@@ -145,6 +145,16 @@ TEST_F(Pages, syncAsksForTheStartAtLoginOnceForAllThatIsToldWhileItIsShown) {
     EXPECT_EQ(services_.loginStartReads, 1);
 }
 
+TEST_F(Pages, syncSwitchesNotificationsButNotForATrial) {
+    open<SyncPage>();
+    EXPECT_THAT(text(), HasSubstr("Notifications: on\n"));
+    tap("Notifications");
+    EXPECT_EQ(services_.hasNotices, false);
+    EXPECT_THAT(text(), HasSubstr("Notifications: off\n"));
+    services_.hasNotices.reset();
+    EXPECT_THAT(text(), Not(HasSubstr("Notifications")));
+}
+
 TEST_F(Pages, whatCouldNotBeSentIsListedUnderItsReason) {
     services_.state.engine.leftOut = {{"gone.mp3", "missing"}, {"a/note.txt", "not-music"}};
     services_.state.engine.leftOutCount = 5;
