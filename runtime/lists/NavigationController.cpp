@@ -1,9 +1,26 @@
 #include "runtime/lists/NavigationController.h"
 
+#include <algorithm>
+#include <utility>
+
 #include "runtime/lists/ListView.h"
 #include "runtime/lists/TableView.h"
 
 namespace quorl {
+
+namespace {
+
+void appear(UIViewController& pane, bool animated) {
+    pane.viewWillAppear(animated);
+    pane.viewDidAppear(animated);
+}
+
+void disappear(UIViewController& pane, bool animated) {
+    pane.viewWillDisappear(animated);
+    pane.viewDidDisappear(animated);
+}
+
+} // namespace
 
 void NavigationController::setRootPane(const std::shared_ptr<PSController>& pane) {
     pane->setRootController(this);
@@ -14,17 +31,37 @@ std::shared_ptr<UIViewController> NavigationController::top() const {
     return stack_.empty() ? nullptr : stack_.back();
 }
 
+bool NavigationController::isAlwaysSeen(const UIViewController& pane) const {
+    return rootPlace_ == RootPlace::Beside && &pane == stack_.front().get();
+}
+
+void NavigationController::setRootPlace(RootPlace place) {
+    const bool isChange = std::exchange(rootPlace_, place) != place;
+    if (!isChange || stack_.size() < 2) {
+        return;
+    }
+    if (place == RootPlace::Beside) {
+        quorl::appear(*stack_.front(), false);
+    } else {
+        quorl::disappear(*stack_.front(), false);
+    }
+}
+
+std::vector<std::shared_ptr<UIViewController>> NavigationController::onScreen() const {
+    auto seen = stack_;
+    std::erase_if(seen, [this](const auto& pane) { return pane != top() && !isAlwaysSeen(*pane); });
+    return seen;
+}
+
 void NavigationController::appear(bool animated) {
-    if (const auto pane = top()) {
-        pane->viewWillAppear(animated);
-        pane->viewDidAppear(animated);
+    for (const auto& pane : onScreen()) {
+        quorl::appear(*pane, animated);
     }
 }
 
 void NavigationController::disappear(bool animated) {
-    if (const auto pane = top()) {
-        pane->viewWillDisappear(animated);
-        pane->viewDidDisappear(animated);
+    for (const auto& pane : onScreen()) {
+        quorl::disappear(*pane, animated);
     }
 }
 
@@ -43,7 +80,7 @@ bool NavigationController::open(const std::shared_ptr<PSSpecifier>& specifier) {
 
 void NavigationController::pushController_animated(const std::shared_ptr<PSController>& controller,
                                                    bool animated) {
-    const auto covered = top();
+    const auto covered = top() && !isAlwaysSeen(*top()) ? top() : nullptr;
     const auto shown = std::dynamic_pointer_cast<UIViewController>(controller);
     if (auto* list = dynamic_cast<PSListController*>(shown.get())) {
         (void)list->specifiers(); // builds the rows before the list is shown
@@ -65,11 +102,27 @@ void NavigationController::pop(bool animated) {
     }
     const auto left = std::move(stack_.back());
     stack_.pop_back();
-    const auto shown = top();
+    const auto uncovered = isAlwaysSeen(*top()) ? nullptr : top();
     left->viewWillDisappear(animated);
-    shown->viewWillAppear(animated);
+    if (uncovered) {
+        uncovered->viewWillAppear(animated);
+    }
     left->viewDidDisappear(animated);
-    shown->viewDidAppear(animated);
+    if (uncovered) {
+        uncovered->viewDidAppear(animated);
+    }
+}
+
+void NavigationController::returnTo(const UIViewController& pane) {
+    while (above(pane)) {
+        pop(true);
+    }
+}
+
+std::shared_ptr<UIViewController> NavigationController::above(const UIViewController& pane) const {
+    const auto place =
+        std::ranges::find_if(stack_, [&](const auto& each) { return each.get() == &pane; });
+    return stack_.end() - place > 1 ? *(place + 1) : nullptr;
 }
 
 void NavigationController::clear() {

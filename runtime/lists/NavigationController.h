@@ -18,7 +18,19 @@ class NavigationController : public PSRootController {
     /// The top pane; null for an empty stack.
     [[nodiscard]] std::shared_ptr<UIViewController> top() const;
 
-    /// The whole stack comes on the screen, or leaves it: tells the top pane.
+    /// Where the root pane is while there are panes above it.
+    enum class RootPlace {
+        Below,  ///< They cover it.
+        Beside, ///< It stays on the screen, beside the top pane.
+    };
+
+    /// Tells the root pane where it comes on the screen by that, or leaves it. `Below` at first.
+    void setRootPlace(RootPlace place);
+
+    /// The panes that are seen when the stack is on the screen, the root pane first.
+    [[nodiscard]] std::vector<std::shared_ptr<UIViewController>> onScreen() const;
+
+    /// The whole stack comes on the screen, or leaves it: tells the panes that are seen.
     void appear(bool animated);
     void disappear(bool animated);
 
@@ -32,6 +44,12 @@ class NavigationController : public PSRootController {
     /// Leaves the top pane and lets go of it; the root pane stays.
     void pop(bool animated);
 
+    /// Leaves the panes above one of the stack, the top one first.
+    void returnTo(const UIViewController& pane);
+
+    /// The pane right above one of the stack; null for none.
+    [[nodiscard]] std::shared_ptr<UIViewController> above(const UIViewController& pane) const;
+
     /// Lets go of every pane, the top one first.
     void clear();
 
@@ -39,7 +57,10 @@ class NavigationController : public PSRootController {
     bool openURL(const std::string& url) override;
 
   private:
+    [[nodiscard]] bool isAlwaysSeen(const UIViewController& pane) const;
+
     std::vector<std::shared_ptr<UIViewController>> stack_;
+    RootPlace rootPlace_ = RootPlace::Below;
 };
 
 /// Draws whatever of a pane is marked for drawing: its list or its table.

@@ -187,6 +187,58 @@ TEST_F(Navigation, KeepsTheRootPane) {
     EXPECT_THAT(calls(), IsEmpty());
 }
 
+TEST_F(Navigation, TellsARootPaneThatStaysOnTheScreenNothingOfThoseAboveIt) {
+    openRoot();
+    navigation_->setRootPlace(NavigationController::RootPlace::Beside);
+
+    (void)navigation_->open(rowOpening(Class::of<Detail>()));
+    calls().erase(calls().begin(), calls().begin() + 4); // how it is made
+    navigation_->pop(false);
+
+    EXPECT_THAT(calls(),
+                ElementsAre("detail will appear animated", "detail did appear animated",
+                            "detail will disappear", "detail did disappear", "detail gone"));
+}
+
+TEST_F(Navigation, TellsTheRootPaneThatItComesAndGoesByItsPlace) {
+    openRoot();
+    (void)navigation_->open(rowOpening(Class::of<Detail>()));
+    calls().clear();
+
+    navigation_->setRootPlace(NavigationController::RootPlace::Beside);
+    navigation_->setRootPlace(NavigationController::RootPlace::Beside);
+    navigation_->setRootPlace(NavigationController::RootPlace::Below);
+
+    EXPECT_THAT(calls(), ElementsAre("root will appear", "root did appear", "root will disappear",
+                                     "root did disappear"));
+}
+
+TEST_F(Navigation, TellsAllPanesThatAreSeenThatTheStackComesAndGoes) {
+    openRoot();
+    (void)navigation_->open(rowOpening(Class::of<Detail>()));
+    navigation_->setRootPlace(NavigationController::RootPlace::Beside);
+    calls().clear();
+
+    navigation_->disappear(false);
+
+    EXPECT_THAT(calls(), ElementsAre("root will disappear", "root did disappear",
+                                     "detail will disappear", "detail did disappear"));
+    EXPECT_THAT(navigation_->onScreen(), ElementsAre(root_, navigation_->top()));
+}
+
+TEST_F(Navigation, ReturnsToAPane) {
+    openRoot();
+    (void)navigation_->open(rowOpening(Class::of<Detail>()));
+    (void)navigation_->open(rowOpening(Class::of<Detail>()));
+    EXPECT_EQ(navigation_->above(*navigation_->stack()[1]), navigation_->top());
+    EXPECT_EQ(navigation_->above(*navigation_->top()), nullptr);
+
+    navigation_->returnTo(*root_);
+
+    EXPECT_THAT(navigation_->stack(), ElementsAre(root_));
+    EXPECT_EQ(navigation_->above(*root_), nullptr);
+}
+
 TEST_F(Navigation, LetsGoOfEveryPaneTheTopOneFirst) {
     openRoot();
     (void)navigation_->open(rowOpening(Class::of<Detail>()));
