@@ -63,7 +63,7 @@ void Companion::makeFrontPage() {
     frontPage_ = FrontPage::over(*host_, std::get<Class>(loaded), translated("Music"));
     navigation_->setRootPane(frontPage_);
     (void)frontPage_->specifiers(); // builds the rows before the page is shown
-    host_->setEngineObserver([this] { refreshTopPage(); });
+    host_->setEngineObserver([this] { refreshPages(); });
     host_->setRefusalObserver([this] { QTimer::singleShot(0, this, &Companion::showChosen); });
 }
 
@@ -76,9 +76,11 @@ std::optional<PlaylistFacts> Companion::factsOfRow(const UIViewController& pane,
 }
 
 /// A page that is covered is refreshed when it comes back.
-void Companion::refreshTopPage() {
-    if (auto* page = dynamic_cast<AppPage*>(navigation_->top().get())) {
-        page->refresh();
+void Companion::refreshPages() {
+    for (const auto& pane : navigation_->onScreen()) {
+        if (auto* page = dynamic_cast<AppPage*>(pane.get())) {
+            page->refresh();
+        }
     }
 }
 

@@ -70,6 +70,9 @@ class Companion final : public QObject {
     void enterBackground();
     void enterForeground();
 
+    /// Whether the front page is seen beside the panes over it.
+    void setFrontPlace(NavigationController::RootPlace place) { navigation_->setRootPlace(place); }
+
     /// Says whether a person sees the panes now: nothing is told on the desktop then. `told` is
     /// called some time later, once that counts; empty for nobody.
     void setSeen(bool isSeen, std::function<void()> told = {});
@@ -83,7 +86,7 @@ class Companion final : public QObject {
 
   private:
     void makeFrontPage();
-    void refreshTopPage();
+    void refreshPages();
     void showChosen();
 
     const Places places_;

@@ -177,9 +177,34 @@ bool ListContent::tap(NSInteger row) {
     } else if (specifier->cellType() == PSCellType::Button) {
         specifier->setValue(nullptr);
     } else {
-        navigation_.open(specifier);
+        open(specifier);
     }
     return true;
+}
+
+/// Rows may be made anew while what they have opened stays.
+bool ListContent::isOpen(const PSSpecifier& row) const {
+    const auto above = navigation_.above(*pane_);
+    const auto* const opened = dynamic_cast<const PSController*>(above.get());
+    const auto by = opened ? opened->specifier() : nullptr;
+    return by && by->name() == row.name() &&
+           by->detailControllerClass() == row.detailControllerClass();
+}
+
+/// The panes above this one give way, where they are not what the row has opened itself.
+void ListContent::open(const std::shared_ptr<PSSpecifier>& row) {
+    if (isOpen(*row)) {
+        navigation_.returnTo(*navigation_.above(*pane_));
+    } else if (row->detailControllerClass()) {
+        navigation_.returnTo(*pane_);
+        navigation_.open(row);
+    }
+}
+
+std::optional<NSInteger> ListContent::openRow() const {
+    const auto found =
+        std::ranges::find_if(rows_, [this](const Row& row) { return isOpen(*row.specifier); });
+    return found != rows_.end() ? rowOfPaneRow(found - rows_.begin()) : std::nullopt;
 }
 
 std::optional<NSInteger> ListContent::row(const UITableView& /*table*/,

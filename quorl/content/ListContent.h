@@ -19,6 +19,7 @@ class ListContent final : public PaneContent {
     [[nodiscard]] bool isCurrent() const override;
     [[nodiscard]] std::shared_ptr<UITableViewCell> cell(NSInteger row) const override;
     bool tap(NSInteger row) override;
+    [[nodiscard]] std::optional<NSInteger> openRow() const override;
     [[nodiscard]] std::optional<NSInteger> row(const UITableView& table,
                                                const NSIndexPath& path) const override;
     void showOnly(std::optional<std::vector<NSInteger>> paneRows) override;
@@ -38,6 +39,8 @@ class ListContent final : public PaneContent {
 
     [[nodiscard]] const Row* rowAt(NSInteger paneRow) const;
     void leaveOutHidden();
+    [[nodiscard]] bool isOpen(const PSSpecifier& row) const;
+    void open(const std::shared_ptr<PSSpecifier>& row);
 
     std::shared_ptr<UIViewController> pane_;
     NavigationController& navigation_;

@@ -49,6 +49,10 @@ class PaneContent {
     /// are not current or this one is not on the screen.
     virtual bool tap(NSInteger row) = 0;
 
+    /// The row by which the pane right above this one was opened, or null where that is none of the
+    /// rows that are shown.
+    [[nodiscard]] virtual std::optional<NSInteger> openRow() const { return std::nullopt; }
+
     /// The row at `path` of `table`, or null where that is another pane's table, or not shown.
     [[nodiscard]] virtual std::optional<NSInteger> row(const UITableView& table,
                                                        const NSIndexPath& path) const = 0;

@@ -30,7 +30,7 @@ MainWindow::MainWindow(Companion& companion, WindowScreen& screen)
     : companion_(companion),
       screen_(screen),
       header_(new HeaderBar(screen, this)),
-      pages_(new QStackedWidget(this)),
+      pages_(new PageColumns(screen, this)),
       slide_(new PageSlide(pages_)),
       foreground_(*this, companion) {
     setFont(screen.font());
@@ -45,8 +45,11 @@ MainWindow::MainWindow(Companion& companion, WindowScreen& screen)
         [this](const auto& start, const auto& chosen) { askForFolder(start, chosen); });
     addMenu();
     connect(&screen, &PaneScreen::drawing, this, &MainWindow::draw);
+    connect(pages_, &PageColumns::countChanged, this, &MainWindow::takeColumns);
     if (!companion.problem().empty()) {
-        pages_->addWidget(new ProblemPage(QString::fromStdString(companion.problem()), pages_));
+        auto* page = new ProblemPage(QString::fromStdString(companion.problem()), pages_);
+        pages_->add(page);
+        pages_->showPages(nullptr, page);
         setWindowTitle(tr("Music"));
         header_->setTitles(windowTitle(), QString(), HeaderBar::Search::None);
     }
@@ -65,6 +68,7 @@ void MainWindow::addShortcuts() {
     add(Qt::Key_Backspace, &MainWindow::goBack);
     add(QKeySequence::Find, &MainWindow::search);
     add(Qt::Key_F1, &MainWindow::showGuide);
+    add(Qt::Key_F6, &MainWindow::switchColumn);
     add(Qt::CTRL | Qt::Key_Q, &MainWindow::closeWindow);
     add(Qt::CTRL | Qt::Key_W, &MainWindow::closeWindow);
     QCoreApplication::instance()->installEventFilter(this); // the button of a mouse that goes back
@@ -141,16 +145,16 @@ void MainWindow::showContext(const RowsView& view, NSInteger row, QPoint onScree
 }
 
 void MainWindow::escape() {
-    if (topView() && topView()->isSearched()) {
-        topView()->closeSearch();
+    if (auto* view = viewWithFocus(); view && view->isSearched()) {
+        view->closeSearch();
     } else {
         goBack();
     }
 }
 
 void MainWindow::search() {
-    if (topView()) {
-        topView()->openSearch();
+    if (auto* view = viewWithFocus()) {
+        view->openSearch();
     }
 }
 
@@ -170,6 +174,8 @@ bool MainWindow::event(QEvent* event) {
 
 RowsView* MainWindow::topView() const { return views_.empty() ? nullptr : views_.back(); }
 
+RowsView* MainWindow::frontView() const { return views_.empty() ? nullptr : views_.front(); }
+
 void MainWindow::comeForward(const QByteArray& token) {
     // The only way to hand a token to Qt.
     if (!token.isEmpty() && QGuiApplication::platformName() == QStringLiteral("wayland")) {
@@ -181,14 +187,41 @@ void MainWindow::comeForward(const QByteArray& token) {
     activateWindow();
 }
 
+bool MainWindow::canGoBack() const {
+    return companion_.navigation().stack().size() > (pages_->hasTwo() ? 2U : 1U);
+}
+
 void MainWindow::goBack() {
-    companion_.navigation().pop(true);
+    if (canGoBack()) {
+        companion_.navigation().pop(true);
+        screen_.scheduleDrawing();
+    }
+}
+
+void MainWindow::takeColumns() {
+    using RootPlace = NavigationController::RootPlace;
+    companion_.setFrontPlace(pages_->hasTwo() ? RootPlace::Beside : RootPlace::Below);
     screen_.scheduleDrawing();
+}
+
+void MainWindow::switchColumn() {
+    if (pages_->hasTwo() && topView()) {
+        auto* other = viewWithFocus() == topView() ? frontView() : topView();
+        other->setFocus(Qt::OtherFocusReason);
+    }
+}
+
+/// The top one where neither has.
+RowsView* MainWindow::viewWithFocus() const {
+    const bool isInFront = frontView() && frontView()->isVisible() &&
+                           frontView()->isAncestorOf(QApplication::focusWidget());
+    return isInFront ? frontView() : topView();
 }
 
 void MainWindow::draw() {
     showTopPane();
     for (RowsView* view : views_) {
+        view->setOpenRow(pages_->hasTwo() ? RowsView::OpenRow::Marked : RowsView::OpenRow::Plain);
         view->draw();
     }
     showTitles();
@@ -198,30 +231,31 @@ void MainWindow::draw() {
 void MainWindow::showTopPane() {
     const auto depth = views_.size();
     const bool moves = isVisible() && depth > 0 && screen_.look().motion == Motion::Full;
-    const RowsView* shown = topView();
-    const QPixmap before = moves ? pages_->grab() : QPixmap();
-    takeViewsOfStack();
-    if (!topView() || topView() == shown) {
+    const QPixmap before = moves ? pages_->grab(pages_->placeOfTop()) : QPixmap();
+    if (!takeViewsOfStack() || !topView()) {
         return;
     }
-    pages_->setCurrentWidget(topView());
+    pages_->showPages(frontView(), topView());
     topView()->setFocus(Qt::OtherFocusReason);
     if (moves) {
         topView()->draw();
-        slide_->begin(before, pages_->grab(),
-                      views_.size() > depth ? PageSlide::Direction::Forward
-                                            : PageSlide::Direction::Back,
+        // One pane in place of another is a step forward, too.
+        slide_->begin(pages_->placeOfTop(), before, pages_->grab(pages_->placeOfTop()),
+                      views_.size() < depth ? PageSlide::Direction::Back
+                                            : PageSlide::Direction::Forward,
                       screen_.look().motion);
     }
 }
 
-void MainWindow::takeViewsOfStack() {
+/// Gives back whether they are others now.
+bool MainWindow::takeViewsOfStack() {
     const auto& stack = companion_.navigation().stack();
     const auto shows = [](const RowsView* view, const std::shared_ptr<UIViewController>& pane) {
         return &view->content().pane() == pane.get();
     };
     const auto kept =
         std::mismatch(views_.begin(), views_.end(), stack.begin(), stack.end(), shows);
+    const bool isChange = kept.first != views_.end() || kept.second != stack.end();
     for (auto left = kept.first; left != views_.end(); ++left) {
         delete *left;
     }
@@ -231,9 +265,10 @@ void MainWindow::takeViewsOfStack() {
         view->setAccessibleName(titleOf(**pane));
         connect(view, &RowsView::contextAsked, this,
                 [this, view](NSInteger row, QPoint place) { showContext(*view, row, place); });
-        pages_->addWidget(view);
+        pages_->add(view);
         views_.push_back(view);
     }
+    return isChange;
 }
 
 void MainWindow::showTitles() {
@@ -244,7 +279,7 @@ void MainWindow::showTitles() {
     setWindowTitle(titleOf(*stack.front()));
     const bool isLong = topView() && topView()->canBeSearched();
     header_->setTitles(titleOf(*stack.back()),
-                       stack.size() > 1 ? titleOf(**(stack.end() - 2)) : QString(),
+                       canGoBack() ? titleOf(**(stack.end() - 2)) : QString(),
                        isLong ? HeaderBar::Search::Offered : HeaderBar::Search::None);
 }
 

@@ -1,17 +1,18 @@
 #pragma once
 
-#include <QStackedWidget>
 #include <QWidget>
 
 #include "quorl/app/Companion.h"
 #include "quorl/window/ForegroundWatch.h"
 #include "quorl/window/HeaderBar.h"
+#include "quorl/window/PageColumns.h"
 #include "quorl/window/PageSlide.h"
 #include "quorl/window/rows/RowsView.h"
 
 namespace quorl {
 
-/// The window: a header, notices, and the top pane of the companion's stack. Main thread.
+/// The window: a header, notices, and the top pane of the companion's stack, with the front page
+/// beside it where there is room. Main thread.
 class MainWindow final : public QWidget {
     Q_OBJECT
 
@@ -26,7 +27,10 @@ class MainWindow final : public QWidget {
     /// desktop gave for that; empty for nothing.
     void comeForward(const QByteArray& token);
 
-    /// Leaves the top pane; the root pane stays.
+    /// The view of the front page, which may be the top pane; null as above.
+    [[nodiscard]] RowsView* frontView() const;
+
+    /// Leaves the top pane, where there is one below it that is not seen beside it.
     void goBack();
 
     bool eventFilter(QObject* watched, QEvent* event) override;
@@ -50,13 +54,17 @@ class MainWindow final : public QWidget {
     void search();
     void draw();
     void showTopPane();
-    void takeViewsOfStack();
+    [[nodiscard]] bool takeViewsOfStack();
+    void takeColumns();
+    void switchColumn();
+    [[nodiscard]] RowsView* viewWithFocus() const;
+    [[nodiscard]] bool canGoBack() const;
     void showTitles();
 
     Companion& companion_;
     WindowScreen& screen_;
     HeaderBar* header_;
-    QStackedWidget* pages_;
+    PageColumns* pages_;
     PageSlide* slide_;
     std::vector<RowsView*> views_; ///< of the panes of the stack, in its order; owned by `pages_`
     ForegroundWatch foreground_;

@@ -17,12 +17,12 @@ PageSlide::PageSlide(QWidget* pages) : QWidget(pages), fade_(slideDuration) {
     connect(&fade_, &QVariantAnimation::finished, this, &QWidget::hide);
 }
 
-void PageSlide::begin(const QPixmap& before, const QPixmap& after, Direction direction,
-                      Motion motion) {
+void PageSlide::begin(const QRect& place, const QPixmap& before, const QPixmap& after,
+                      Direction direction, Motion motion) {
     before_ = before;
     after_ = after;
     direction_ = direction;
-    setGeometry(parentWidget()->rect());
+    setGeometry(place);
     show();
     raise();
     fade_.begin(motion);

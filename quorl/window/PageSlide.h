@@ -15,11 +15,13 @@ class PageSlide final : public QWidget {
   public:
     enum class Direction { Forward, Back };
 
-    /// Covers `pages` while it slides.
+    /// Lies above all that is in `pages`.
     explicit PageSlide(QWidget* pages);
 
-    /// From what the page looked like to what it looks like; at once where nothing is to move.
-    void begin(const QPixmap& before, const QPixmap& after, Direction direction, Motion motion);
+    /// From what the page in this place of `pages` looked like to what it looks like; at once where
+    /// nothing is to move.
+    void begin(const QRect& place, const QPixmap& before, const QPixmap& after, Direction direction,
+               Motion motion);
 
     [[nodiscard]] bool isRunning() const { return fade_.isRunning(); }
 

@@ -67,6 +67,9 @@ QAccessible::State LineAccessible::state() const {
         state.focused = isCurrent && view_.hasFocus();
         state.checkable = role() != QAccessible::Button;
         state.checked = textsOf(*cell).isChecked;
+        const auto marked = view_.markedRow();
+        state.selectable = marked.has_value();
+        state.selected = marked == line().row;
     } else {
         state.readOnly = true;
     }

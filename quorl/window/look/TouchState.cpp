@@ -11,8 +11,8 @@ void TouchState::paintGround(QPainter& painter, const QRectF& place, qreal radiu
         painter.setBrush(colors.hover);
         painter.drawRoundedRect(place, radius, radius);
     }
-    if (pressed > 0) {
-        painter.setOpacity(pressed);
+    if (pressed > 0 || isMarked) {
+        painter.setOpacity(isMarked ? 1 : pressed);
         painter.setBrush(colors.pressed);
         painter.drawRoundedRect(place, radius, radius);
     }

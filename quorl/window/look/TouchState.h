@@ -11,6 +11,7 @@ struct TouchState {
     bool isHovered = false;
     double pressed = 0; ///< from 0 to 1, where a press fades
     bool isRinged = false;
+    bool isMarked = false; ///< what it opens is seen beside it
 
     /// Paints what lies behind the text.
     void paintGround(QPainter& painter, const QRectF& place, qreal radius,

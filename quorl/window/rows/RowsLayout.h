@@ -55,6 +55,9 @@ class RowsLayout {
 
     [[nodiscard]] qreal rowHeight() const { return rowHeight_; }
 
+    /// Of the cards.
+    [[nodiscard]] qreal width() const { return width_; }
+
     /// The place of a row; empty for no such row.
     [[nodiscard]] QRectF rowRect(NSInteger row) const;
 

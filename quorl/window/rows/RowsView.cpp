@@ -87,6 +87,8 @@ void RowsView::draw() {
 }
 
 void RowsView::drawRows() {
+    // Another view may be beside this, and have been drawn since.
+    screen_.setGeometry(layout_.width(), devicePixelRatioF());
     // Also right for a pane that has more rows now than when it was laid out.
     const auto onScreen =
         static_cast<NSInteger>(std::ceil(viewport()->height() / screen_.rowHeight())) + 1;
@@ -141,6 +143,9 @@ void RowsView::showChanges(const RowsLayout& before) {
             for (const auto news : newsOf(known->second.texts, shown.texts)) {
                 tell(line, news);
             }
+            if (shown.isMarked && !known->second.isMarked) {
+                tell(line, QAccessible::Selection);
+            }
         }
     }
     shown_ = std::move(now);
@@ -149,9 +154,11 @@ void RowsView::showChanges(const RowsLayout& before) {
 std::map<int, RowsView::ShownLine> RowsView::linesOnScreen() const {
     std::map<int, ShownLine> lines;
     const int top = verticalScrollBar()->value();
+    const auto marked = markedRow();
     for (const int index : layout_.linesBetween(top, top + viewport()->height())) {
         const auto line = layout_.line(index);
-        lines.emplace(index, ShownLine{line.rect, textsOfLine(line)});
+        const bool isMarked = marked && index == layout_.lineOfRow(*marked);
+        lines.emplace(index, ShownLine{line.rect, textsOfLine(line), isMarked});
     }
     return lines;
 }
@@ -203,6 +210,16 @@ void RowsView::makeCurrent(NSInteger row) {
 
 void RowsView::notePlaces() {
     places_.note(layout_.firstRowBelow(verticalScrollBar()->value()), currentRow_);
+}
+
+void RowsView::setOpenRow(OpenRow openRow) {
+    if (std::exchange(openRow_, openRow) != openRow) {
+        viewport()->update();
+    }
+}
+
+std::optional<NSInteger> RowsView::markedRow() const {
+    return openRow_ == OpenRow::Marked ? content_->openRow() : std::nullopt;
 }
 
 void RowsView::setCurrentRow(NSInteger row) {
@@ -265,6 +282,7 @@ bool RowsView::showsFocus() const {
 TouchState RowsView::stateOf(NSInteger row) const {
     TouchState state = touch_.stateOf(row);
     state.isRinged = showsFocus() && currentRow() == row;
+    state.isMarked = markedRow() == row;
     return state;
 }
 

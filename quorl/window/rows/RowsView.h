@@ -47,6 +47,14 @@ class RowsView final : public QAbstractScrollArea {
     /// The row that keys act on; null for an empty pane.
     [[nodiscard]] std::optional<NSInteger> currentRow() const;
 
+    /// Whether the row whose pane is open is marked: where both panes are seen.
+    enum class OpenRow { Plain, Marked };
+
+    void setOpenRow(OpenRow openRow);
+
+    /// The row that is marked; null for none.
+    [[nodiscard]] std::optional<NSInteger> markedRow() const;
+
     /// What a finger on the row does: nothing where that is not the row that was drawn.
     void tap(NSInteger row);
 
@@ -93,6 +101,7 @@ class RowsView final : public QAbstractScrollArea {
     struct ShownLine {
         QRectF place;
         RowTexts texts;
+        bool isMarked = false;
 
         [[nodiscard]] bool operator==(const ShownLine&) const = default;
     };
@@ -144,6 +153,7 @@ class RowsView final : public QAbstractScrollArea {
     TypeAhead typeAhead_;
     SearchField* search_;
     OverlayScrollBar* scrollBar_;
+    OpenRow openRow_ = OpenRow::Plain;
     bool wasPressed_ = false;        ///< ever
     bool isOpened_ = false;          ///< it has been seen
     std::map<int, ShownLine> shown_; ///< as last drawn; what assistive technology knows
