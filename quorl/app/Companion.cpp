@@ -1,7 +1,5 @@
 #include "quorl/app/Companion.h"
 
-#include <QTimer>
-
 #include "quorl/app/PaneLoader.h"
 #include "quorl/pages/FrontPage.h"
 #include "runtime/plugins/PluginBundle.h"
@@ -40,6 +38,7 @@ Companion::Companion(Places places, PaneScreen& screen, Notices& notices)
       host_(std::make_shared<CompanionHost>(places_, screen, notices)),
       navigation_(::create<NavigationController>()) {
     connect(&mainQueue_, &MainQueueNotifier::drained, this, &Companion::idle);
+    connect(this, &Companion::refused, this, &Companion::showChosen, Qt::QueuedConnection);
     Host::install(host_);
     makeFrontPage();
 }
@@ -64,7 +63,7 @@ void Companion::makeFrontPage() {
     navigation_->setRootPane(frontPage_);
     (void)frontPage_->specifiers(); // builds the rows before the page is shown
     host_->setEngineObserver([this] { refreshPages(); });
-    host_->setRefusalObserver([this] { QTimer::singleShot(0, this, &Companion::showChosen); });
+    host_->setRefusalObserver([this] { Q_EMIT refused(); });
 }
 
 std::optional<PlaylistFacts> Companion::factsOfRow(const UIViewController& pane, NSInteger paneRow,

@@ -84,6 +84,9 @@ class Companion final : public QObject {
     /// libdispatch's main queue has just been emptied.
     void idle();
 
+    /// A choice could not be stored. It is still being made.
+    void refused();
+
   private:
     void makeFrontPage();
     void refreshPages();

@@ -27,12 +27,13 @@ void QtSetup::followUsersLanguage() {
     const QLocale locale(QString::fromStdString(language::followedLanguages().front()));
     QLocale::setDefault(locale);
     QGuiApplication::setLayoutDirection(locale.textDirection());
-    auto* ofQt = new QTranslator(qGuiApp);
-    if (ofQt->load(locale, QStringLiteral("qtbase"), QStringLiteral("_"),
-                   QLibraryInfo::path(QLibraryInfo::TranslationsPath))) {
-        QCoreApplication::installTranslator(ofQt);
+    static QTranslator ofQt;
+    if (ofQt.load(locale, QStringLiteral("qtbase"), QStringLiteral("_"),
+                  QLibraryInfo::path(QLibraryInfo::TranslationsPath))) {
+        QCoreApplication::installTranslator(&ofQt);
     }
-    QCoreApplication::installTranslator(new QtTexts(qGuiApp));
+    static QtTexts own;
+    QCoreApplication::installTranslator(&own);
 }
 
 } // namespace quorl

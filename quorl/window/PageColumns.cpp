@@ -1,6 +1,7 @@
 #include "quorl/window/PageColumns.h"
 
 #include <QEvent>
+#include <QPaintEvent>
 #include <QPainter>
 #include <QStyle>
 #include <algorithm>
