@@ -80,10 +80,11 @@ AppPage::Rows SyncPage::rows() {
                               PSSetter::of<&SyncPage::setLoginStart>("setLoginStart::")));
     }
     if (const auto notices = services().hasDesktopNotices()) {
-        rows.push_back(group(std::nullopt, "When a long sync is done, or you can mend what is in "
-                                           "its way. Not while you look at this app."));
-        rows.push_back(
-            toggle("Notifications", *notices, PSSetter::of<&SyncPage::setNotices>("setNotices::")));
+        rows.push_back(group(std::nullopt,
+                             translated("When a long sync is done, or you can mend what is in its "
+                                        "way. Not while you look at this app.")));
+        rows.push_back(toggle(translated("Notifications"), *notices,
+                              PSSetter::of<&SyncPage::setNotices>("setNotices::")));
     }
     return rows;
 }

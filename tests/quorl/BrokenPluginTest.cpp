@@ -99,7 +99,7 @@ TEST_F(BrokenPlugin, commandsGetAHintAndTheAppGoesOn) {
     registerAs("{");
     QuorlProcess quorl({"--text", "--plugins", plugins_.path().string()});
     quorl.say("1");
-    quorl.readUntil("A number taps the row");
+    quorl.readUntil("There is no row 1. This page has no rows.");
     quorl.say("q");
     EXPECT_EQ(quorl.end(), 0);
 }

@@ -104,7 +104,7 @@ TEST(WithBusOfItsOwn, busThatGoesAwayIsToldAndTheAppNeitherEndsNorSpins) {
     do {
         before = quorl.wakeUpsOfSleepingThreads();
         quorl.say("?");
-        quorl.readUntil("A number taps the row");
+        quorl.readUntil("A number chooses the row");
     } while ((!before || before != quorl.wakeUpsOfSleepingThreads()) && ++tries < 1000);
     EXPECT_LT(tries, 1000) << "a thread is still busy";
     quorl.say("2");

@@ -93,8 +93,8 @@ TEST_F(Screenshot, darkLookIsDark) {
 }
 
 TEST_F(Screenshot, widestWindowKeepsTheCardsInTheMiddle) {
-    const auto picture = take({"--size", "1100x700", "--pane", "limit"});
-    EXPECT_LT(tinted(picture, headerHeight(1)).right(), 1100 - 230);
+    const auto picture = take({"--size", "1600x700", "--pane", "limit"});
+    EXPECT_LT(tinted(picture, headerHeight(1)).right(), 1600 - 230);
 }
 
 TEST_F(Screenshot, fileThatCannotBeWrittenIsNamed) {
