@@ -27,7 +27,7 @@ void PageColumns::add(QWidget* page) {
 }
 
 void PageColumns::showPages(QWidget* lowest, QWidget* top) {
-    const QPointer<QWidget> left = top_;
+    QWidget* const left = top_;
     lowest_ = lowest;
     top_ = top;
     placePages();

@@ -70,9 +70,9 @@ std::vector<std::string> ScreenSheet::lines() const {
     }
     auto end = linesOfAnswer();
     end.push_back(prompt + shownOfTyped());
-    const auto room = static_cast<std::size_t>(count) - std::min<std::size_t>(end.size(), count);
-    lines.resize(room);
-    lines.insert(lines.end(), end.end() - (count - static_cast<int>(room)), end.end());
+    const auto shown = std::min(count, static_cast<int>(end.size()));
+    lines.resize(static_cast<std::size_t>(count - shown));
+    lines.insert(lines.end(), end.end() - shown, end.end());
     for (auto& line : lines) {
         line = shortened(line, columns);
     }

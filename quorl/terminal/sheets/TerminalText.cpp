@@ -147,8 +147,8 @@ std::string withoutLastCharacter(const std::string& text) {
 }
 
 std::string isolated(const std::string& text) {
-    constexpr std::string_view firstStrongIsolate = "\u2068";
-    constexpr std::string_view endOfIsolate = "\u2069";
+    constexpr std::string_view firstStrongIsolate = "\xE2\x81\xA8";
+    constexpr std::string_view endOfIsolate = "\xE2\x81\xA9";
     const char* const end = text.data() + text.size();
     for (const char* at = text.data(); at < end; at = g_utf8_next_char(at)) {
         if (runsFromRightToLeft(g_utf8_get_char(at))) {
