@@ -147,6 +147,7 @@ std::string withoutLastCharacter(const std::string& text) {
 }
 
 std::string isolated(const std::string& text) {
+    // NOLINTNEXTLINE(misc-misleading-bidirectional): the other one ends what it begins.
     constexpr std::string_view firstStrongIsolate = "\xE2\x81\xA8";
     constexpr std::string_view endOfIsolate = "\xE2\x81\xA9";
     const char* const end = text.data() + text.size();
