@@ -1,5 +1,6 @@
 #include "quorl/window/MainWindow.h"
 
+#include <QAccessibleWidget>
 #include <QApplication>
 #include <QDesktopServices>
 #include <QFile>
@@ -24,6 +25,12 @@ QString titleOf(const UIViewController& pane) {
     return QString::fromStdString(pane.title().value_or(""));
 }
 
+/// Screen readers follow only what is a window by its role; a plain widget is none.
+QAccessibleInterface* readAsWindow(const QString& /*className*/, QObject* object) {
+    auto* window = qobject_cast<MainWindow*>(object);
+    return window ? new QAccessibleWidget(window, QAccessible::Window) : nullptr;
+}
+
 } // namespace
 
 MainWindow::MainWindow(Companion& companion, WindowScreen& screen)
@@ -33,6 +40,7 @@ MainWindow::MainWindow(Companion& companion, WindowScreen& screen)
       pages_(new PageColumns(screen, this)),
       slide_(new PageSlide(pages_)),
       foreground_(*this, companion) {
+    QAccessible::installFactory(readAsWindow); // more than once does no harm
     setFont(screen.font());
     auto* column = new QVBoxLayout(this);
     column->setContentsMargins(0, 0, 0, 0);

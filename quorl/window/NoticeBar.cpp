@@ -8,7 +8,7 @@
 namespace quorl {
 
 NoticeBar::NoticeBar(Notices& notices, WindowScreen& screen, QWidget* parent)
-    : QFrame(parent), notices_(notices), screen_(screen), column_(new QVBoxLayout(this)) {
+    : QWidget(parent), notices_(notices), screen_(screen), column_(new QVBoxLayout(this)) {
     column_->setContentsMargins(0, 0, 0, 0);
     column_->setSpacing(0);
     connect(&notices_, &Notices::changed, this, &NoticeBar::showNotices);

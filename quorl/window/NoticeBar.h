@@ -1,7 +1,7 @@
 #pragma once
 
-#include <QFrame>
 #include <QVBoxLayout>
+#include <QWidget>
 
 #include "quorl/app/Notices.h"
 #include "quorl/window/look/WindowScreen.h"
@@ -12,8 +12,8 @@ class NoticeRow;
 
 /// Shows the notices at the top of a window, each until it is put away or has become void, with a
 /// button where something can be done. Never takes the focus; a screen reader is told of a new one
-/// as an alert. Main thread.
-class NoticeBar final : public QFrame {
+/// as a notification. Main thread.
+class NoticeBar final : public QWidget {
     Q_OBJECT
 
   public:

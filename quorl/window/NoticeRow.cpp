@@ -11,9 +11,10 @@ namespace {
 
 constexpr int margin = 16;
 
-QAccessibleInterface* readAsAlert(const QString& /*className*/, QObject* object) {
+/// Screen readers speak a notification when it comes, an alert only when the focus gets there.
+QAccessibleInterface* readAsNotification(const QString& /*className*/, QObject* object) {
     auto* row = qobject_cast<NoticeRow*>(object);
-    return row ? new QAccessibleWidget(row, QAccessible::AlertMessage, row->accessibleName())
+    return row ? new QAccessibleWidget(row, QAccessible::Notification, row->accessibleName())
                : nullptr;
 }
 
@@ -21,7 +22,7 @@ QAccessibleInterface* readAsAlert(const QString& /*className*/, QObject* object)
 
 NoticeRow::NoticeRow(const Notice& notice, WindowScreen& screen, QWidget* parent)
     : QWidget(parent) {
-    QAccessible::installFactory(readAsAlert); // more than once does no harm
+    QAccessible::installFactory(readAsNotification); // more than once does no harm
     const auto text = QString::fromStdString(notice.text);
     setAccessibleName(text);
     auto* label = new QLabel(text, this);

@@ -8,7 +8,7 @@
 namespace quorl {
 
 /// One notice in a window, with a button for what can be done and one that puts it away. To a
-/// screen reader it is an alert. Main thread.
+/// screen reader it is a notification. Main thread.
 class NoticeRow final : public QWidget {
     Q_OBJECT
 

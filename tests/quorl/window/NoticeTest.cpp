@@ -105,11 +105,11 @@ TEST_F(NoticesOfAWindow, stayAsTheyAreWhereAnotherComes) {
     EXPECT_EQ(rows().front(), before);
 }
 
-TEST_F(NoticesOfAWindow, areAlertsToAScreenReader) {
+TEST_F(NoticesOfAWindow, areNotificationsToAScreenReader) {
     notices_.set(Topic::Engine, "full");
-    auto* alert = QAccessible::queryAccessibleInterface(rows().front());
-    EXPECT_EQ(alert->role(), QAccessible::AlertMessage);
-    EXPECT_EQ(alert->text(QAccessible::Name), "full");
+    auto* notification = QAccessible::queryAccessibleInterface(rows().front());
+    EXPECT_EQ(notification->role(), QAccessible::Notification);
+    EXPECT_EQ(notification->text(QAccessible::Name), "full");
 }
 
 } // namespace
