@@ -176,6 +176,8 @@ bool RowsView::takeKey(const QKeyEvent& event) {
 void RowsView::focusInEvent(QFocusEvent* event) {
     QAbstractScrollArea::focusInEvent(event);
     updateCurrentRow();
+    // Qt tells of the whole view as soon as this is over.
+    QMetaObject::invokeMethod(this, &RowsView::tellFocus, Qt::QueuedConnection);
 }
 
 void RowsView::focusOutEvent(QFocusEvent* event) {

@@ -188,6 +188,13 @@ void RowsView::tell(int line, QAccessible::Event news) {
     Q_EMIT told(line, news);
 }
 
+void RowsView::tellFocus() {
+    const auto row = currentRow();
+    if (row && hasFocus()) {
+        tell(layout_.lineOfRow(*row), QAccessible::Focus);
+    }
+}
+
 QRectF RowsView::onViewport(const QRectF& place) const {
     return place.translated(0, -verticalScrollBar()->value());
 }

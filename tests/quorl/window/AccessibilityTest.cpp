@@ -157,6 +157,23 @@ TEST(Accessibility, focusFollowsTheKeys) {
     EXPECT_EQ(list->focusChild()->text(QAccessible::Name), "Playlist Limit");
 }
 
+TEST(Accessibility, rowWithTheFocusIsToldAfterTheListThatGotIt) {
+    Window window;
+    window.widget().activateWindow();
+    window.view().clearFocus();
+    QStringList told;
+    noteNews(window.view(), told);
+    window.view().setFocus();
+    EXPECT_EQ(told, QStringList());
+    QCoreApplication::processEvents();
+    EXPECT_EQ(told, QStringList{"Synced Playlist"});
+}
+
+TEST(Accessibility, windowIsOneByItsRole) {
+    Window window;
+    EXPECT_EQ(QAccessible::queryAccessibleInterface(&window.widget())->role(), QAccessible::Window);
+}
+
 } // namespace
 
 } // namespace quorl::tests
