@@ -68,8 +68,8 @@ TEST_F(Values, ComeBackAsTheyWereWritten) {
 
     forEachPreference([&]<class T>(const Preference<T>& preference) {
         if constexpr (std::is_same_v<T, bool>) {
-            comesBack(preference, true);
-            comesBack(preference, false);
+            comesBack(preference, !preference.defaultValue);
+            comesBack(preference, preference.defaultValue);
         } else if constexpr (std::is_same_v<T, std::string>) {
             comesBack(preference, std::string("/a folder/\xC3\xA4;'\n"));
             comesBack(preference, std::string());
@@ -99,12 +99,13 @@ TEST_F(Values, ThatAreNoTextAreRefusedInWords) {
 TEST_F(Values, AreReadAndWrittenWithGsettings) {
     const auto preferences = openShared();
     forEachPreference([&]<class T>(const Preference<T>& preference) {
+        const auto schema = "org.quorl.Velora." + std::string(preference.schema);
         if constexpr (std::is_same_v<T, bool>) {
-            gsettings("set", {preference.key, "true"});
-            EXPECT_TRUE(preferences->get(preference));
+            run({"gsettings", "set", schema, preference.key,
+                 preference.defaultValue ? "false" : "true"});
+            EXPECT_NE(preferences->get(preference), preference.defaultValue);
         } else if constexpr (std::is_same_v<T, std::string>) {
-            run({"gsettings", "set", "org.quorl.Velora." + std::string(preference.schema),
-                 preference.key, "'/Music'"});
+            run({"gsettings", "set", schema, preference.key, "'/Music'"});
             EXPECT_EQ(preferences->get(preference), "/Music");
         } else {
             gsettings("set", {preference.key, textOf(largest)});

@@ -177,7 +177,7 @@ void RowsView::focusInEvent(QFocusEvent* event) {
     QAbstractScrollArea::focusInEvent(event);
     updateCurrentRow();
     // Qt tells of the whole view as soon as this is over.
-    QMetaObject::invokeMethod(this, &RowsView::tellFocus, Qt::QueuedConnection);
+    QMetaObject::invokeMethod(this, "tellFocus", Qt::QueuedConnection);
 }
 
 void RowsView::focusOutEvent(QFocusEvent* event) {

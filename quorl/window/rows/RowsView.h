@@ -115,7 +115,7 @@ class RowsView final : public QAbstractScrollArea {
     [[nodiscard]] std::map<int, ShownLine> linesOnScreen() const;
     [[nodiscard]] RowTexts textsOfLine(const RowsLayout::Line& line) const;
     void tell(int line, QAccessible::Event news);
-    void tellFocus();
+    Q_INVOKABLE void tellFocus();
     void updatePlace(const QRectF& place);
     void updateRow(NSInteger row);
     void updateCurrentRow();

@@ -7,7 +7,7 @@ namespace quorl::syncd::testing {
 
 namespace {
 
-constexpr auto name = "org.freedesktop.Notifications";
+constexpr auto serviceName = "org.freedesktop.Notifications";
 
 /// What answers a call with this value, or with an error.
 template <class Value>
@@ -16,7 +16,8 @@ std::function<void(NotificationService::Manner)> replyTo(sdbus::Result<Value>&& 
     return [kept = std::make_shared<sdbus::Result<Value>>(std::move(result)),
             value](NotificationService::Manner manner) {
         if (manner == NotificationService::Manner::Fails) {
-            kept->returnError(sdbus::Error(std::string(name) + ".Error", "It does not work."));
+            kept->returnError(
+                sdbus::Error(std::string(serviceName) + ".Error", "It does not work."));
         } else {
             kept->returnResults(value);
         }
@@ -30,7 +31,7 @@ NotificationService::NotificationService(std::vector<std::string> abilities)
       connection_(sdbus::createSessionBusConnection()),
       object_(sdbus::createObject(*connection_, "/org/freedesktop/Notifications")) {
     registerMethods();
-    connection_->requestName(name);
+    connection_->requestName(serviceName);
     connection_->enterEventLoopAsync();
 }
 
@@ -38,15 +39,17 @@ NotificationService::~NotificationService() { connection_->leaveEventLoop(); }
 
 void NotificationService::registerMethods() {
     object_->registerMethod("GetCapabilities")
-        .onInterface(name)
+        .onInterface(serviceName)
         .implementedAs([this](sdbus::Result<Abilities>&& result) {
             answer(replyTo(std::move(result), abilities_));
             note("ask");
         });
-    object_->registerMethod("Notify").onInterface(name).implementedAs(
-        [this](sdbus::Result<Number>&& result, std::string app, Number replaced, std::string icon,
-               std::string title, std::string body, std::vector<std::string> actions,
-               std::map<std::string, sdbus::Variant> hints, std::int32_t /*time*/) {
+    object_->registerMethod("Notify")
+        .onInterface(serviceName)
+        .implementedAs([this](sdbus::Result<Number>&& result, std::string app, Number replaced,
+                              std::string icon, std::string title, std::string body,
+                              std::vector<std::string> actions,
+                              std::map<std::string, sdbus::Variant> hints, std::int32_t /*time*/) {
             const auto number = take({replaced, std::move(app), std::move(icon), std::move(title),
                                       std::move(body), std::move(actions), std::move(hints)});
             answer(replyTo(std::move(result), number));
@@ -54,7 +57,7 @@ void NotificationService::registerMethods() {
                  (replaced == 0 ? "" : " for " + std::to_string(replaced)));
         });
     object_->registerMethod("CloseNotification")
-        .onInterface(name)
+        .onInterface(serviceName)
         .implementedAs([this](Number number) { note("close " + std::to_string(number)); });
     object_->finishRegistration();
 }
@@ -119,7 +122,7 @@ Notification NotificationService::shown() {
 
 void NotificationService::tell(const std::string& signal, std::uint32_t number,
                                const sdbus::Variant& detail) {
-    auto message = object_->createSignal(name, signal);
+    auto message = object_->createSignal(serviceName, signal);
     message << number;
     if (detail.containsValueOfType<std::string>()) {
         message << detail.get<std::string>();
