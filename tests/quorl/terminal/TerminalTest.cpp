@@ -11,7 +11,6 @@ namespace quorl::tests {
 
 namespace {
 
-using testing::EndsWith;
 using testing::HasSubstr;
 using testing::Not;
 using testing::StartsWith;
