@@ -33,10 +33,16 @@ bool hasContentsOf(const Entry& entry, const Hashes& hashes) {
     return !entry.hash.empty() && hashes.ofCopy(entry.name) == entry.hash;
 }
 
+/// A playlist has none: a file of 1970 may be anybody's.
+bool hasTime(const Entry& entry) { return entry.modified != 0 || entry.hash.empty(); }
+
 bool isComplete(const Entry& entry, const std::optional<base::FileState>& file,
                 const Hashes& hashes) {
-    return file && file->size == entry.size &&
-           (isSameTime(file->modified, entry.modified) || hasContentsOf(entry, hashes));
+    if (!file || file->size != entry.size) {
+        return false;
+    }
+    return (hasTime(entry) && isSameTime(file->modified, entry.modified)) ||
+           hasContentsOf(entry, hashes);
 }
 
 /// By source, of which there may be an old and a new copy.

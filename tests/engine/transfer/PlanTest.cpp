@@ -334,6 +334,21 @@ TEST_F(Stocktaking, TakesOnlyFilesForOursThatCanBeOurs) {
     EXPECT_THAT(asked_, ElementsAre("copy late but same.mp3", "copy late and other.mp3"));
 }
 
+TEST_F(Stocktaking, KnowsAPlaylistThatWasAboutToComeByItsContentsAlone) {
+    there_.strays = {{"ours.m3u8", "Ours", 30, 0, "p"}, {"theirs.m3u8", "Theirs", 30, 0, "p"}};
+    copyHashes_ = {{"ours.m3u8", "p"}, {"theirs.m3u8", "x"}};
+
+    const auto manifest = taken({{"ours.m3u8", {30, 9 * second}}, {"theirs.m3u8", {30, 0}}});
+
+    EXPECT_THAT(namesOf(manifest.strays), ElementsAre("ours.m3u8"));
+}
+
+TEST_F(Stocktaking, KnowsASongOf1970ThatWasAboutToComeByItsTime) {
+    there_.strays = {{"a.mp3", "a.mp3", 10, 0, ""}};
+
+    EXPECT_THAT(namesOf(taken({{"a.mp3", {10, 0}}}).strays), ElementsAre("a.mp3"));
+}
+
 TEST_F(Stocktaking, ComparesTimesThatAreFurtherApartThanANumberHolds) {
     there_.strays = {{"a.mp3", "", 10, std::numeric_limits<std::int64_t>::min(), ""}};
 

@@ -175,6 +175,19 @@ TEST_F(Trouble, AFileOfSomebodyElseThatTookTheNameOfAnUnfinishedCopyIsKept) {
     EXPECT_EQ(player_.music().at("second (2).mp3"), "second");
 }
 
+TEST_F(Trouble, AFileOf1970ThatTookTheNameOfAnUnfinishedPlaylistIsKept) {
+    quorl::wearable::Manifest manifest;
+    manifest.strays = {{"List.m3u8", "List", 8, 0, "0123456789abcdef"}};
+    player_.write(".quorl/manifest.json", toText(manifest));
+    player_.write("Music/List.m3u8", "not ours");
+    std::filesystem::last_write_time(player_.path() / "Music/List.m3u8",
+                                     std::chrono::file_clock::from_sys(std::chrono::sys_seconds()));
+
+    EXPECT_EQ(sync(wishFor(music_, player_)).kind, Kind::Sent);
+
+    EXPECT_EQ(player_.music().at("List.m3u8"), "not ours");
+}
+
 TEST_F(Trouble, AFileThatAppearsUnderTheNameOfASongMeanwhileIsNotOverwritten) {
     const auto outcome = syncWhile([&] { player_.write("Music/first.mp3", "not ours"); });
 
