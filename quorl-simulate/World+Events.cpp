@@ -217,6 +217,9 @@ void World::happenToDevice(const Event& event, Random& random) {
         disk.setSpaceOfOthers(0);
         break;
     case ToggleReadOnly:
+        if (isCleaningUp_) {
+            break;
+        }
         isReadOnly_ = !isReadOnly_;
         for (auto& wearable : wearables_) {
             wearable.disk.setReadOnly(isReadOnly_);
@@ -298,9 +301,12 @@ void World::happenToFiles(Happening what, Random& random) {
     } else if (what == DamageManifest) {
         damageManifest(random);
     } else if (what == RemoveOurs || what == ChangeOurs) {
-        // A file that is being looked at cannot be told apart from what it becomes meanwhile.
+        // A file that is being looked at cannot be told apart from what it becomes meanwhile; nor
+        // can one that has lost its clusters with another name, where a loss of power brings it
+        // back.
         if (ours.empty() || syncd::Device::isUnfinished(ours) ||
-            (what == ChangeOurs && syncs_.isRunning())) {
+            (what == ChangeOurs && syncs_.isRunning()) ||
+            (what == RemoveOurs && disk.isShared(music, ours))) {
             return;
         }
         device().excuse();
@@ -311,6 +317,7 @@ void World::happenToFiles(Happening what, Random& random) {
             disk.append(file, "x"); // and so it is theirs
             disk.sync(file);
             others[ours] = {disk.read(file), disk.status(file).modified};
+            device().contentsOfOthers.insert(disk.read(file));
         }
         device().rereadFilesOfOthers(); // it may have been a second name of one
     } else if (!others.empty()) {

@@ -140,6 +140,16 @@ SimulatedDisk::Status SimulatedDisk::status(Node node) const {
     return {file.now.bytes.size(), file.now.modified, file.isDirectory};
 }
 
+bool SimulatedDisk::isShared(Node directory, std::string_view name) const {
+    const auto node = existing(directory, name)->second.node;
+    std::ptrdiff_t count = 0;
+    for (const auto& [each, entries] : entries_) {
+        count += std::ranges::count_if(
+            entries, [node](const auto& entry) { return entry.second.node == node; });
+    }
+    return count > 1;
+}
+
 bool SimulatedDisk::isDurable(Node directory, std::string_view name) const {
     const auto found = entry(directory, name);
     if (found == entries_.at(directory).end()) {
@@ -158,6 +168,27 @@ bool SimulatedDisk::isDurable(Node directory, std::string_view name) const {
 const std::string& SimulatedDisk::read(Node file) const {
     begin("read", {});
     return files_.at(file).now.bytes;
+}
+
+std::vector<std::string> SimulatedDisk::possibleContents(Node directory,
+                                                         std::string_view name) const {
+    std::vector<std::string> contents;
+    const auto add = [&](const Entry& entry) {
+        const File& file = files_.at(entry.node);
+        contents.push_back(file.now.bytes);
+        contents.push_back(file.durable.bytes);
+    };
+    for (const auto* names : {&entries_.at(directory), &durableEntries_.at(directory)}) {
+        if (const auto found = names->find(name); found != names->end()) {
+            add(found->second);
+        }
+    }
+    for (const Change& change : changes_) {
+        if (change.directory == directory && change.name == name && change.entry) {
+            add(*change.entry);
+        }
+    }
+    return contents;
 }
 
 /// Sets a name, or takes it away, here and now.
@@ -252,14 +283,10 @@ void SimulatedDisk::remove(Node directory, const std::string& name) {
     beginWriting("unlink", name);
     const auto found = existing(directory, name);
     const Node node = found->second.node;
+    const bool wasShared = isShared(directory, name);
     ++step_;
     note(directory, std::string(found->first), std::nullopt);
-    const bool isShared =
-        rules_ == DiskRules::Fat && std::ranges::any_of(entries_, [node](const auto& each) {
-            return std::ranges::any_of(
-                each.second, [node](const auto& other) { return other.second.node == node; });
-        });
-    if (isShared) { // the clusters are somebody else's now
+    if (wasShared) { // the clusters are somebody else's now
         std::ranges::fill(change(node).bytes, garbage);
         files_[node].durable.bytes = files_[node].now.bytes;
     }

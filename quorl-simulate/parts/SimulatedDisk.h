@@ -78,10 +78,18 @@ class SimulatedDisk {
 
     [[nodiscard]] Status status(Node node) const;
 
+    /// Whether another name has the same file.
+    [[nodiscard]] bool isShared(Node directory, std::string_view name) const;
+
     /// Whether the file has this name, and all of its contents, also after a loss of power.
     [[nodiscard]] bool isDurable(Node directory, std::string_view name) const;
 
     [[nodiscard]] const std::string& read(Node file) const;
+
+    /// All that a file of this name may hold, in full, after a loss of power; there may also be
+    /// less of it, or none.
+    [[nodiscard]] std::vector<std::string> possibleContents(Node directory,
+                                                            std::string_view name) const;
 
     [[nodiscard]] Node makeDirectory(Node directory, const std::string& name);
 

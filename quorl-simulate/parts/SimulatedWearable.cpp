@@ -1,6 +1,7 @@
 #include "quorl-simulate/parts/SimulatedWearable.h"
 
 #include <algorithm>
+#include <iterator>
 
 #include "quorl-simulate/parts/SimulatedVolume.h"
 #include "quorl-syncd/transfer/device/Device.h"
@@ -20,6 +21,32 @@ const std::string* readOwn(const SimulatedDisk& disk, std::string_view name) {
     const auto own = directoryOf(disk, Directory::Own);
     const auto file = own ? disk.find(*own, name) : std::nullopt;
     return file ? &disk.read(*file) : nullptr;
+}
+
+/// What may be left of a generation by a loss of power. One that is damaged counts as none.
+std::vector<std::optional<std::string>> possibleGenerations(const SimulatedDisk& disk,
+                                                            std::size_t index) {
+    std::vector<std::optional<std::string>> generations{std::nullopt};
+    if (const auto own = directoryOf(disk, Directory::Own)) {
+        std::ranges::copy(disk.possibleContents(*own, wearable::generationFiles.at(index)),
+                          std::back_inserter(generations));
+    }
+    return generations;
+}
+
+/// Empty where both are damaged.
+wearable::Manifest newestOf(const std::optional<std::string>& first,
+                            const std::optional<std::string>& second) {
+    const auto read = [&](std::string_view name) {
+        return name == wearable::generationFiles[0]   ? first
+               : name == wearable::generationFiles[1] ? second
+                                                      : std::nullopt;
+    };
+    try {
+        return wearable::newestManifest(read).manifest;
+    } catch (const wearable::BadManifest&) {
+        return {};
+    }
 }
 
 bool isListed(const wearable::Manifest& list, const std::string& name, std::uint64_t size) {
@@ -192,6 +219,11 @@ void SimulatedWearable::rememberExcused() {
     const auto* const list = readableManifest();
     excusedManifests.push_back(list == nullptr ? std::nullopt : std::optional(*list));
     excusedPlaylist = list == nullptr ? std::nullopt : list->playlist;
+    for (const auto& generation : possibleGenerations(disk, 0)) {
+        for (const auto& other : possibleGenerations(disk, 1)) {
+            excusedManifests.emplace_back(newestOf(generation, other));
+        }
+    }
 }
 
 void SimulatedWearable::removeFileOfOthers(const std::string& name) {
@@ -212,8 +244,9 @@ void SimulatedWearable::takeFilesOfOthers() {
     for (const auto& name : disk.names(music())) {
         const auto file = *disk.findExactly(music(), name);
         const auto status = disk.status(file);
-        const bool isTheirs = nodesOfOthers.contains(file) ||
-                              (names.contains(name) && !isListed(list, name, status.size));
+        const bool canBeOurs =
+            isListed(list, name, status.size) && !contentsOfOthers.contains(disk.read(file));
+        const bool isTheirs = nodesOfOthers.contains(file) || (names.contains(name) && !canBeOurs);
         if (isTheirs && status.size > 0) {
             filesOfOthers[name] = {disk.read(file), status.modified};
         } else if (names.contains(name) && status.size == 0) {

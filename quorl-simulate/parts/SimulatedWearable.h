@@ -39,6 +39,8 @@ struct SimulatedWearable {
     Files filesOfOthers = {};
     /// Those that they have made.
     std::set<SimulatedDisk::Node> nodesOfOthers = {};
+    /// What they have made of files of ours.
+    std::set<std::string> contentsOfOthers = {};
     /// What they have removed or renamed, which a loss of power can bring back.
     std::set<std::string> formerFilesOfOthers = {};
     /// Names of files that were ours until somebody damaged the list of them.
@@ -56,7 +58,8 @@ struct SimulatedWearable {
     bool isDamaged = false;
     /// Since then, what a sync has put there that was under way is not known either.
     bool isListLost = false;
-    /// As they were then; a save that fails can bring them back.
+    /// As they were then, or a loss of power would have left them; that can bring them back, and so
+    /// can a save that fails.
     std::vector<std::optional<wearable::Manifest>> excusedManifests = {};
     std::optional<wearable::Entry> excusedPlaylist = {};
 

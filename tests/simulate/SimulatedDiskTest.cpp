@@ -15,6 +15,7 @@ using namespace quorl::simulation;
 using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
+using testing::IsSupersetOf;
 using testing::Not;
 
 constexpr auto top = SimulatedDisk::top;
@@ -166,6 +167,20 @@ TEST_P(AnyDisk, AsksBeforeEachOperation) {
     EXPECT_THAT(each.names(top), IsEmpty());
 }
 
+TEST_P(AnyDisk, KnowsAllThatAFileMayHoldInFullAfterALossOfPower) {
+    auto each = disk(GetParam());
+    const auto file = each.create(top, "file");
+    each.append(file, "old");
+    each.syncAll();
+    each.truncate(file);
+    each.append(file, "new");
+    each.remove(top, "file");
+    each.append(each.create(top, "file"), "newest");
+
+    EXPECT_THAT(each.possibleContents(top, "file"), IsSupersetOf({"old", "new", "newest"}));
+    EXPECT_THAT(each.possibleContents(top, "other"), IsEmpty());
+}
+
 TEST(PosixDisk, HasOneNameAfterARenameWhetherItWasKeptOrNot) {
     const auto found = namesLeft(DiskRules::Posix, [](SimulatedDisk& each) {
         each.sync(each.create(top, "before"));
@@ -226,7 +241,9 @@ TEST(FatDisk, GivesTheClustersOfAFileAwayWithTheFirstOfTwoNamesThatWereLeftForIt
         if (each.names(top).size() == 2 && contents(each, "after") == "la la la") {
             hadBothNames = true;
             EXPECT_EQ(each.find(top, "after"), each.find(top, "before"));
+            EXPECT_TRUE(each.isShared(top, "after"));
             each.remove(top, "before");
+            EXPECT_FALSE(each.isShared(top, "after"));
             EXPECT_NE(contents(each, "after"), "la la la");
         }
     }
