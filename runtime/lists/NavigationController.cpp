@@ -37,7 +37,7 @@ bool NavigationController::isAlwaysSeen(const UIViewController& pane) const {
 
 void NavigationController::setRootPlace(RootPlace place) {
     const bool isChange = std::exchange(rootPlace_, place) != place;
-    if (!isChange || stack_.size() < 2) {
+    if (!isChange || !isOnScreen_ || stack_.size() < 2) {
         return;
     }
     if (place == RootPlace::Beside) {
@@ -54,12 +54,14 @@ std::vector<std::shared_ptr<UIViewController>> NavigationController::onScreen() 
 }
 
 void NavigationController::appear(bool animated) {
+    isOnScreen_ = true;
     for (const auto& pane : onScreen()) {
         quorl::appear(*pane, animated);
     }
 }
 
 void NavigationController::disappear(bool animated) {
+    isOnScreen_ = false;
     for (const auto& pane : onScreen()) {
         quorl::disappear(*pane, animated);
     }

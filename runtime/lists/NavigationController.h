@@ -24,8 +24,11 @@ class NavigationController : public PSRootController {
         Beside, ///< It stays on the screen, beside the top pane.
     };
 
-    /// Tells the root pane where it comes on the screen by that, or leaves it. `Below` at first.
+    /// Tells the root pane where it comes on the screen by that, or leaves it, while the stack is on
+    /// the screen. `Below` at first.
     void setRootPlace(RootPlace place);
+
+    [[nodiscard]] RootPlace rootPlace() const { return rootPlace_; }
 
     /// The panes that are seen when the stack is on the screen, the root pane first.
     [[nodiscard]] std::vector<std::shared_ptr<UIViewController>> onScreen() const;
@@ -33,6 +36,9 @@ class NavigationController : public PSRootController {
     /// The whole stack comes on the screen, or leaves it: tells the panes that are seen.
     void appear(bool animated);
     void disappear(bool animated);
+
+    /// What of the two came last.
+    [[nodiscard]] bool isOnScreen() const { return isOnScreen_; }
 
     /// A tap on a row: opens the row's detail pane. False where the row has none, or where it could
     /// not be made.
@@ -61,6 +67,7 @@ class NavigationController : public PSRootController {
 
     std::vector<std::shared_ptr<UIViewController>> stack_;
     RootPlace rootPlace_ = RootPlace::Below;
+    bool isOnScreen_ = false;
 };
 
 /// Draws whatever of a pane is marked for drawing: its list or its table.

@@ -213,6 +213,20 @@ TEST_F(Navigation, TellsTheRootPaneThatItComesAndGoesByItsPlace) {
                                      "root did disappear"));
 }
 
+TEST_F(Navigation, TellsTheRootPaneNothingOfItsPlaceWhileTheStackIsOffTheScreen) {
+    openRoot();
+    (void)navigation_->open(rowOpening(Class::of<Detail>()));
+    navigation_->disappear(false);
+    calls().clear();
+
+    navigation_->setRootPlace(NavigationController::RootPlace::Beside);
+
+    EXPECT_THAT(calls(), IsEmpty());
+    navigation_->appear(false);
+    EXPECT_THAT(calls(), ElementsAre("root will appear", "root did appear", "detail will appear",
+                                     "detail did appear"));
+}
+
 TEST_F(Navigation, TellsAllPanesThatAreSeenThatTheStackComesAndGoes) {
     openRoot();
     (void)navigation_->open(rowOpening(Class::of<Detail>()));
