@@ -46,7 +46,7 @@ Companion::Companion(Places places, PaneScreen& screen, Notices& notices)
 Companion::~Companion() {
     host_->setEngineObserver({});
     host_->setRefusalObserver({});
-    if (isOnScreen_) {
+    if (navigation_->isOnScreen()) {
         navigation_->disappear(false);
     }
     navigation_->clear();
@@ -85,7 +85,7 @@ void Companion::refreshPages() {
 
 /// A pane shows what was tapped at once. Where that could not be stored, it is to read what is.
 void Companion::showChosen() {
-    if (isOnScreen_) {
+    if (navigation_->isOnScreen()) {
         navigation_->disappear(false);
         navigation_->appear(false);
         screen_.scheduleDrawing();
@@ -104,14 +104,32 @@ std::string Companion::take(const Places& places) {
 }
 
 void Companion::start() {
-    isOnScreen_ = true;
     navigation_->appear(false);
-    if (frontPage_ && !navigation_->open(frontPage_->paneRow())) {
-        notices_.set(Notices::Topic::Pane,
-                     translated("The Music pane cannot be shown. Install its plug-in again."));
+    if (frontPage_) {
+        openMusicPane();
     }
     screen_.scheduleDrawing();
     host_->openLibrary([this] { Q_EMIT libraryRead(); });
+}
+
+void Companion::openMusicPane() {
+    if (!navigation_->open(frontPage_->paneRow())) {
+        notices_.set(Notices::Topic::Pane,
+                     translated("The Music pane cannot be shown. Install its plug-in again."));
+    }
+}
+
+void Companion::setFrontPlace(NavigationController::RootPlace place) {
+    navigation_->setRootPlace(place);
+    fillSecondPlace();
+}
+
+/// Off the screen nothing is opened.
+void Companion::fillSecondPlace() {
+    const bool isBeside = navigation_->rootPlace() == NavigationController::RootPlace::Beside;
+    if (isBeside && navigation_->isOnScreen() && navigation_->stack().size() == 1) {
+        openMusicPane();
+    }
 }
 
 std::vector<std::string> Companion::openPanes() const {
@@ -133,6 +151,7 @@ void Companion::reopen(const std::vector<std::string>& panes) {
             break;
         }
     }
+    fillSecondPlace();
     screen_.scheduleDrawing();
 }
 
@@ -146,7 +165,6 @@ void Companion::enterBackground() {
     NSNotificationCenter::defaultCenter().postNotificationName_object(
         UIApplicationDidEnterBackgroundNotification, nullptr);
     navigation_->disappear(false);
-    isOnScreen_ = false;
 }
 
 void Companion::enterForeground() {
@@ -157,8 +175,8 @@ void Companion::enterForeground() {
             controller->willBecomeActive();
         }
     }
-    isOnScreen_ = true;
     navigation_->appear(false);
+    fillSecondPlace();
     screen_.scheduleDrawing();
 }
 

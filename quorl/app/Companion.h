@@ -70,8 +70,9 @@ class Companion final : public QObject {
     void enterBackground();
     void enterForeground();
 
-    /// Whether the front page is seen beside the panes over it.
-    void setFrontPlace(NavigationController::RootPlace place) { navigation_->setRootPlace(place); }
+    /// Whether the front page is seen beside the panes over it. Then there always is one: the Music
+    /// pane where no other is open.
+    void setFrontPlace(NavigationController::RootPlace place);
 
     /// Says whether a person sees the panes now: nothing is told on the desktop then. `told` is
     /// called some time later, once that counts; empty for nobody.
@@ -91,6 +92,8 @@ class Companion final : public QObject {
     void makeFrontPage();
     void refreshPages();
     void showChosen();
+    void openMusicPane();
+    void fillSecondPlace();
 
     const Places places_;
     PaneScreen& screen_;
@@ -100,7 +103,6 @@ class Companion final : public QObject {
     std::shared_ptr<NavigationController> navigation_;
     std::shared_ptr<FrontPage> frontPage_; ///< null where the plug-in has a problem
     std::string problem_;
-    bool isOnScreen_ = false;
 };
 
 } // namespace quorl

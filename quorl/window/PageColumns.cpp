@@ -88,7 +88,6 @@ void PageColumns::changeEvent(QEvent* event) {
     }
 }
 
-/// The second column is empty while nothing is open.
 void PageColumns::paintEvent(QPaintEvent* event) {
     QPainter(this).fillRect(event->rect(), PaneColors::of(palette(), screen_.look()).page);
 }
