@@ -209,13 +209,18 @@ constexpr std::array blanks{
     Blank{"path", path},           Blank{"drive", drive},
 };
 
+/// A catalogue is somebody else's file: what it has in braces may be anything.
+std::string fill(std::string_view blank, const Arguments& arguments) {
+    const auto space = std::min(blank.find(' '), blank.size());
+    const auto place = numberIn(std::string(blank.substr(std::min(space + 1, blank.size()))));
+    const auto* const found = std::ranges::find(blanks, blank.substr(0, space), &Blank::name);
+    return found == blanks.end() ? '{' + std::string(blank) + '}'
+                                 : found->fill(arguments, place.value_or(0));
+}
+
 std::string worded(const char* pattern, const Arguments& arguments) {
-    return filled(translated(pattern), [&arguments](std::string_view blank) {
-        const auto space = std::min(blank.find(' '), blank.size());
-        const auto place = space < blank.size() ? blank[space + 1] - '0' : 0;
-        const auto* const found = std::ranges::find(blanks, blank.substr(0, space), &Blank::name);
-        return found->fill(arguments, static_cast<std::size_t>(place));
-    });
+    return filled(translated(pattern),
+                  [&arguments](std::string_view blank) { return fill(blank, arguments); });
 }
 
 } // namespace

@@ -149,6 +149,12 @@ TEST_F(Language, wordsWhatTheEngineTells) {
               "„a/b.mp3“ kann nicht gelesen werden.");
 }
 
+TEST_F(Language, isSaidAsItIsWhereACatalogueHasBlanksThatThereAreNot) {
+    followLanguages({"wrong"}, WRONG_CATALOGUE);
+    EXPECT_EQ(engine::sentence({engine::code::synced, {"2"}}),
+              "{titles 0} {} { } 2 songs 2 songs 2 songs Velora");
+}
+
 TEST(Filled, hasWhatStandsForEachBlank) {
     EXPECT_EQ(filled("{b} of {a}", {{"a", "1"}, {"b", "2"}}), "2 of 1");
     EXPECT_EQ(filled("{a}{a}", {{"a", "{a}"}}), "{a}{a}") << "what is filled in is no pattern";
