@@ -12,9 +12,12 @@ constexpr int patience = 60'000; // milliseconds
 QString schemaOf(const QString& key, base::Purpose purpose) {
     const bool isPlace =
         key == QStringLiteral("music-folder") || key.startsWith(QStringLiteral("wearable-"));
+    const bool isNotice = key == QStringLiteral("desktop-notices");
     return (purpose == base::Purpose::Trial ? QStringLiteral("org.quorl.Velora.Trial.")
                                             : QStringLiteral("org.quorl.Velora.")) +
-           (isPlace ? QStringLiteral("Places") : QStringLiteral("AssetSync"));
+           (isPlace    ? QStringLiteral("Places")
+            : isNotice ? QStringLiteral("Notices")
+                       : QStringLiteral("AssetSync"));
 }
 
 std::string gsettings(const char* command, base::Purpose purpose, const QStringList& arguments) {

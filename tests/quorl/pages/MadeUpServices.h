@@ -4,6 +4,16 @@
 
 namespace quorl::tests {
 
+/// A stick that can be taken out, with half of its 2 GB free.
+inline finding::Offer halfFullStick() {
+    constexpr std::uint64_t gigabyte = 1 << 30;
+    return {.name = "Walkman",
+            .directory = "/media/a",
+            .space = finding::Space{2 * gigabyte, gigabyte},
+            .identity = finding::Identity{"ABCD", "/media/a"},
+            .removal = finding::Removal()};
+}
+
 /// A state of the engine that a test makes up, and what pages ask for.
 class MadeUpServices final : public PageServices {
   public:

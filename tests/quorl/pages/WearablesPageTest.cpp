@@ -19,18 +19,13 @@ using testing::Not;
 class Wearables : public ShownPage {
   protected:
     Wearables() {
-        services_.shelf = {
-            true,
-            {{.name = "Walkman",
-              .directory = "/media/a",
-              .space = finding::Space{std::uint64_t{2} << 30U, std::uint64_t{1} << 30U},
-              .identity = finding::Identity{"ABCD", "/media/a"},
-              .removal = finding::Removal()},
-             {.name = "Silent", .directory = "/media/b"},
-             {.name = finding::embeddedName}},
-            0,
-            {},
-            {}};
+        services_.shelf = {true,
+                           {halfFullStick(),
+                            {.name = "Silent", .directory = "/media/b"},
+                            {.name = finding::embeddedName}},
+                           0,
+                           {},
+                           {}};
         show(::create<WearablesPage>());
     }
 };

@@ -118,11 +118,7 @@ engine::EngineState worded(engine::EngineState state) {
 WearableShelf shelf() {
     return {
         true,
-        {{.name = "Walkman",
-          .directory = "/media/a",
-          .space = finding::Space{std::uint64_t{2} << 30U, std::uint64_t{1} << 30U},
-          .identity = finding::Identity{"ABCD", "/media/a"},
-          .removal = finding::Removal()},
+        {halfFullStick(),
          {.name = "An old stick with a name that is longer than its row", .directory = "/media/b"},
          {.name = finding::embeddedName}},
         0,

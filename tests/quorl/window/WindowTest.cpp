@@ -8,6 +8,9 @@
 
 #include <gmock/gmock.h>
 
+#include "quorl/content/SwitchCell.h"
+#include "quorl/pages/SyncPage.h"
+#include "tests/engine/client/WatchedEngine.h"
 #include "tests/quorl/StoredPreferences.h"
 
 namespace quorl::tests {
@@ -151,6 +154,33 @@ TEST(Window, playlistThatArrivesOnDiskIsListedInTheOpenChooser) {
     window.click(0);
     window.music().addPlaylist("Quiet Evening");
     EXPECT_TRUE(window.waitForRow("Quiet Evening"));
+}
+
+TEST(Window, switchOfTheNoticesFollowsOtherPrograms) {
+    const syncd::testing::WatchedEngine engine;
+    Window window;
+    ASSERT_TRUE(QTest::qWaitFor(
+        [&window] {
+            window.companion().reopen({Class::of<SyncPage>().name()});
+            return window.title() == "Sync";
+        },
+        patience));
+    const auto isOn = [&window] {
+        const auto& content = window.view().content();
+        for (NSInteger row = 0; row < content.rowCount(); ++row) {
+            const auto cell = content.cell(row);
+            if (cell && cell->textLabel().text() == "Notifications") {
+                return std::dynamic_pointer_cast<SwitchCell>(cell)->isOn();
+            }
+        }
+        throw std::logic_error("There is no such switch.");
+    };
+    EXPECT_TRUE(isOn());
+
+    storePreference("desktop-notices", "false");
+    EXPECT_TRUE(QTest::qWaitFor([&isOn] { return !isOn(); }, patience));
+    storePreference("desktop-notices", "true");
+    EXPECT_TRUE(QTest::qWaitFor(isOn, patience));
 }
 
 TEST(Window, closedInTheMidstOfEverythingEndsCleanly) {
