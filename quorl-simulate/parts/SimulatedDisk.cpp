@@ -170,13 +170,12 @@ const std::string& SimulatedDisk::read(Node file) const {
     return files_.at(file).now.bytes;
 }
 
-std::vector<std::string> SimulatedDisk::possibleContents(Node directory,
-                                                         std::string_view name) const {
-    std::vector<std::string> contents;
+std::set<std::string> SimulatedDisk::possibleContents(Node directory, std::string_view name) const {
+    std::set<std::string> contents;
     const auto add = [&](const Entry& entry) {
         const File& file = files_.at(entry.node);
-        contents.push_back(file.now.bytes);
-        contents.push_back(file.durable.bytes);
+        contents.insert(file.now.bytes);
+        contents.insert(file.durable.bytes);
     };
     for (const auto* names : {&entries_.at(directory), &durableEntries_.at(directory)}) {
         if (const auto found = names->find(name); found != names->end()) {

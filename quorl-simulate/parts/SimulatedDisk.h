@@ -4,6 +4,7 @@
 #include <functional>
 #include <map>
 #include <optional>
+#include <set>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -88,8 +89,8 @@ class SimulatedDisk {
 
     /// All that a file of this name may hold, in full, after a loss of power; there may also be
     /// less of it, or none.
-    [[nodiscard]] std::vector<std::string> possibleContents(Node directory,
-                                                            std::string_view name) const;
+    [[nodiscard]] std::set<std::string> possibleContents(Node directory,
+                                                         std::string_view name) const;
 
     [[nodiscard]] Node makeDirectory(Node directory, const std::string& name);
 

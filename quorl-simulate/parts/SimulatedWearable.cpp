@@ -1,7 +1,6 @@
 #include "quorl-simulate/parts/SimulatedWearable.h"
 
 #include <algorithm>
-#include <iterator>
 
 #include "quorl-simulate/parts/SimulatedVolume.h"
 #include "quorl-syncd/transfer/device/Device.h"
@@ -23,30 +22,13 @@ const std::string* readOwn(const SimulatedDisk& disk, std::string_view name) {
     return file ? &disk.read(*file) : nullptr;
 }
 
-/// What may be left of a generation by a loss of power. One that is damaged counts as none.
-std::vector<std::optional<std::string>> possibleGenerations(const SimulatedDisk& disk,
-                                                            std::size_t index) {
-    std::vector<std::optional<std::string>> generations{std::nullopt};
-    if (const auto own = directoryOf(disk, Directory::Own)) {
-        std::ranges::copy(disk.possibleContents(*own, wearable::generationFiles.at(index)),
-                          std::back_inserter(generations));
-    }
-    return generations;
-}
-
-/// Empty where both are damaged.
-wearable::Manifest newestOf(const std::optional<std::string>& first,
-                            const std::optional<std::string>& second) {
-    const auto read = [&](std::string_view name) {
-        return name == wearable::generationFiles[0]   ? first
-               : name == wearable::generationFiles[1] ? second
-                                                      : std::nullopt;
-    };
-    try {
-        return wearable::newestManifest(read).manifest;
-    } catch (const wearable::BadManifest&) {
-        return {};
-    }
+/// Empty where this is no generation as it was written.
+wearable::Manifest manifestOf(const std::string& generation) {
+    return wearable::newestManifest([&](std::string_view name) {
+               return name == wearable::generationFiles[0] ? std::optional(generation)
+                                                           : std::nullopt;
+           })
+        .manifest;
 }
 
 bool isListed(const wearable::Manifest& list, const std::string& name, std::uint64_t size) {
@@ -219,9 +201,12 @@ void SimulatedWearable::rememberExcused() {
     const auto* const list = readableManifest();
     excusedManifests.push_back(list == nullptr ? std::nullopt : std::optional(*list));
     excusedPlaylist = list == nullptr ? std::nullopt : list->playlist;
-    for (const auto& generation : possibleGenerations(disk, 0)) {
-        for (const auto& other : possibleGenerations(disk, 1)) {
-            excusedManifests.emplace_back(newestOf(generation, other));
+    excusedManifests.emplace_back(wearable::Manifest());
+    const auto own = directoryOf(disk, Directory::Own);
+    for (const auto* const name : wearable::generationFiles) {
+        for (const auto& contents :
+             own ? disk.possibleContents(*own, name) : std::set<std::string>()) {
+            excusedManifests.emplace_back(manifestOf(contents));
         }
     }
 }
