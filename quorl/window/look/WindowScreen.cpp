@@ -11,7 +11,7 @@ namespace quorl {
 namespace {
 
 constexpr qreal smallestRowHeight = 44;
-constexpr qreal rowPadding = 8;
+constexpr qreal rowPadding = 14;
 constexpr qreal smallestTextHeight = 15; // pixels of the font's size
 constexpr int smallestSmallTextHeight = 13;
 

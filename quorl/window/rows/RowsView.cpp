@@ -79,6 +79,9 @@ void RowsView::draw() {
         keepPlaces(before, scrolled);
         finder_.rowsDidChange();
     }
+    if (isHidden()) { // whoever comes back is on the row that has led on
+        currentRow_ = content_->openRow().value_or(currentRow_);
+    }
     notePlaces();
     showChanges(before);
     if (isVisible() && !std::exchange(isOpened_, true)) {

@@ -134,6 +134,15 @@ void PseudoTerminal::waitUntilGone(const std::string& text) {
     }
 }
 
+void PseudoTerminal::waitForEnding(const std::string& written) {
+    while (!written_.ends_with(written)) {
+        if (!readMore()) {
+            throw std::runtime_error("The terminal never ended with \"" + written + "\":\n" +
+                                     written_);
+        }
+    }
+}
+
 std::vector<std::string> PseudoTerminal::lines() const {
     constexpr std::size_t bytesToCell = 32;
     std::vector<std::string> lines;

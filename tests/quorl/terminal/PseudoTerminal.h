@@ -40,6 +40,9 @@ class PseudoTerminal {
     void waitFor(const std::string& text);
     void waitUntilGone(const std::string& text);
 
+    /// Waits until what was written to the terminal ends with this.
+    void waitForEnding(const std::string& written);
+
     /// The lines of the screen, without blanks at their ends.
     [[nodiscard]] std::vector<std::string> lines() const;
 

@@ -55,6 +55,7 @@ TEST_F(Terminal, saysInItsFirstLineHowToGoOn) {
 TEST_F(Terminal, rewritesOnlyTheLineThatChanges) {
     auto terminal = open(usual);
     terminal.waitFor("  2  Playlist Limit: 500 MB");
+    terminal.waitFor("\n>");
     const auto before = terminal.lines();
     (void)terminal.takeWritten();
     storePreference("asset-sync-limit", "just 1024");
@@ -257,11 +258,12 @@ TEST_F(Terminal, isTheShellsWhileTheAppIsStopped) {
 TEST_F(Terminal, thatOnlyAddsLinesGetsThoseThatChange) {
     auto terminal = open(usual, {{"TERM", "dumb"}});
     terminal.waitFor("  2  Playlist Limit: 500 MB");
+    terminal.waitForEnding("playback.\r\n\r\n");
     EXPECT_TRUE(terminal.hasUsualMode());
     EXPECT_THAT(terminal.screen(), StartsWith(overview));
     (void)terminal.takeWritten();
     storePreference("asset-sync-limit", "just 1024");
-    terminal.waitFor("  2  Playlist Limit: 1 GB");
+    terminal.waitForEnding("\n");
     EXPECT_EQ(terminal.takeWritten(), "  2  Playlist Limit: 1 GB\r\n");
     terminal.type("q\r");
     EXPECT_EQ(terminal.end(), 0);

@@ -42,11 +42,13 @@ TEST(Focus, isOnTheCheckedRowOfAPaneThatOpens) {
     EXPECT_EQ(window.rows()[2], "✓ None");
 }
 
-TEST(Focus, isOnTheFirstRowWhereNoneIsChecked) {
+TEST(Focus, isOnTheRowOfThePaneThatWasOpenFromTheStart) {
     Window window;
     window.pressWithFocus(Qt::Key_Escape);
     ASSERT_EQ(window.title(), "Velora");
     EXPECT_TRUE(window.view().hasFocus());
+    window.pressWithFocus(Qt::Key_Return);
+    EXPECT_EQ(window.title(), "Music");
 }
 
 TEST(Focus, isOnTheRowThatWasEnteredAfterStepBack) {

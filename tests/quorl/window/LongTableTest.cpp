@@ -110,7 +110,7 @@ TEST_F(LongTableView, endKeyShowsTheLastRowAndSpaceTapsIt) {
 }
 
 TEST_F(LongTableView, clickTapsTheRowThatIsPaintedThere) {
-    view_->verticalScrollBar()->setValue(44 * 5000 + 7);
+    view_->verticalScrollBar()->setValue(qRound(view_->layout().rowHeight()) * 5000 + 7);
     const auto row = view_->layout().rowAt(view_->onPane(QPointF(100, 300)));
     ASSERT_TRUE(row);
     QTest::mouseClick(view_->viewport(), Qt::LeftButton, Qt::NoModifier, QPoint(100, 300));
