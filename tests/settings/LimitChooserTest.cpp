@@ -100,6 +100,33 @@ TEST_F(LimitChooser, ShowsStoragePresetsAsSongsForATypeThatIsNeither) {
     EXPECT_THAT(writes(), ElementsAre("write assetSyncLimit 2048", "write assetSyncLimitType 7"));
 }
 
+TEST_F(LimitChooser, LeavesTheCellOfAKindBeyondTheTwoAsItCame) {
+    show(1, 50);
+
+    const auto beyond = table_->tableView_cellForRowAtIndexPath(table_->tableView(), row(2, 0));
+
+    ASSERT_NE(beyond, nullptr);
+    EXPECT_EQ(beyond->textLabel().text(), std::nullopt);
+    EXPECT_FALSE(checked(beyond));
+}
+
+TEST_F(LimitChooser, TakesATapOnAKindBeyondTheTwoForOneOnSongs) {
+    show(0, 500);
+
+    tapRow(row(2, 0));
+
+    EXPECT_THAT(writes(), ElementsAre("write assetSyncLimit 50", "write assetSyncLimitType 1"));
+}
+
+TEST_F(LimitChooser, TakesATapBelowTheKindsForOneOnAnAmount) {
+    show(1, 50);
+
+    tapRow(row(3, 2));
+
+    EXPECT_THAT(writes(), ElementsAre("write assetSyncLimit 250", "write assetSyncLimitType 1"));
+    EXPECT_THAT(checkedRows(), ElementsAre("Songs", "250 Songs"));
+}
+
 TEST_F(LimitChooser, MakesSubtitleCellsOfTheListsTextColour) {
     host_->screen().looks.textColor = "#101010";
     show(0, 100);
