@@ -281,10 +281,31 @@ TEST_P(ShownPercents, StayBetween1And99) {
 INSTANTIATE_TEST_SUITE_P(Table, ShownPercents,
                          testing::Values(Percent{0.0, "1"}, Percent{0.009, "1"},
                                          Percent{0.03125, "3"}, Percent{0.505, "50"},
-                                         Percent{0.98, "98"}, Percent{0.999, "99"},
-                                         Percent{1.0, "99"}, Percent{7.0, "99"}, Percent{-0.5, "1"},
+                                         Percent{0.509, "50"},
+                                         // 0.7 is a little less in single precision.
+                                         Percent{0.7, "69"}, Percent{0.98, "98"},
+                                         Percent{0.999, "99"}, Percent{1.0, "99"},
+                                         Percent{7.0, "99"}, Percent{-0.5, "1"},
                                          Percent{std::numeric_limits<double>::quiet_NaN(), "1"},
                                          Percent{std::numeric_limits<double>::infinity(), "99"}));
+
+TEST_F(PlaylistChooser, ReadsTheSwitchOnceForARowBesideTheSyncedPlaylist) {
+    chooseMorning();
+    beginPreparation(); // the stage then asks no preference
+    rowsOnScreen_ = 1;
+    showChooser();
+    const auto readsOfRow = [this](NSInteger index) {
+        scrollToRow(index);
+        host_->journal.clear();
+        draw();
+        return host_->journal.lines({"read"});
+    };
+
+    EXPECT_THAT(readsOfRow(2), ElementsAre("read assetSyncEnabled"));
+    EXPECT_THAT(readsOfRow(0), ElementsAre("read assetSyncEnabled", "read assetSyncEnabled",
+                                           "read assetSyncPlaylistPersistentID"))
+        << "the second and the third belong to the question for the synced playlist";
+}
 
 TEST_F(PlaylistChooser, ClearsTheStatusOfACellThatAnotherRowUses) {
     chooseMorning();
@@ -359,6 +380,24 @@ TEST_F(PlaylistChooser, WritesBothAgainAndRedrawsTheStatusWhenTheSyncedPlaylistI
     EXPECT_THAT(host_->journal.lines({"write"}),
                 ElementsAre("write assetSyncEnabled 1", "write assetSyncPlaylistPersistentID 7"));
     EXPECT_EQ(status(morningRow), "50% Synced…") << "it does not wait for an old sync to end";
+}
+
+TEST_F(PlaylistChooser, ShowsNoneInWhateverSectionFollowsThePlaylists) {
+    showChooser();
+
+    const auto beyond = table_->tableView_cellForRowAtIndexPath(table_->tableView(), row(1, 2));
+
+    EXPECT_EQ(beyond->textLabel().text(), "None");
+}
+
+TEST_F(PlaylistChooser, TakesATapBelowNoneForOneOnAPlaylist) {
+    showChooser();
+
+    tapRow(row(1, 2));
+
+    EXPECT_EQ(host_->preferences.value(SyncPreference::AssetSyncEnabled), 1U);
+    EXPECT_EQ(host_->preferences.value(SyncPreference::AssetSyncPlaylistPersistentID),
+              0x1'0000'0007U);
 }
 
 TEST_F(PlaylistChooser, TakesTwoRowsWithOneIdForTwoPlaylists) {
