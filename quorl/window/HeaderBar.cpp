@@ -1,8 +1,10 @@
 #include "quorl/window/HeaderBar.h"
 
-#include <QEvent>
+#include <QApplication>
+#include <QMouseEvent>
 #include <QPainter>
 #include <QStyle>
+#include <utility>
 
 namespace quorl {
 
@@ -37,10 +39,39 @@ void drawDots(QPainter& painter, const QSizeF& size, bool /*isMirrored*/) {
     }
 }
 
+void drawDash(QPainter& painter, const QSizeF& size, bool /*isMirrored*/) {
+    const qreal middle = size.height() / 2;
+    painter.drawLine(QPointF(4, middle), QPointF(size.width() - 4, middle));
+}
+
+void drawFrame(QPainter& painter, const QSizeF& size, bool /*isMirrored*/) {
+    painter.drawRect(QRectF(QPointF(), size).adjusted(4, 4, -4, -4));
+}
+
+void drawCross(QPainter& painter, const QSizeF& size, bool /*isMirrored*/) {
+    const QRectF box = QRectF(QPointF(), size).adjusted(4, 4, -4, -4);
+    painter.drawLine(box.topLeft(), box.bottomRight());
+    painter.drawLine(box.bottomLeft(), box.topRight());
+}
+
+FlatButton::Drawing drawingOf(WindowButton button) {
+    return button == WindowButton::Minimize   ? drawDash
+           : button == WindowButton::Maximize ? drawFrame
+                                              : drawCross;
+}
+
+void dropAll(std::vector<FlatButton*>& buttons) {
+    for (FlatButton* button : std::exchange(buttons, {})) {
+        button->hide();
+        button->deleteLater(); // it may be the one that was clicked
+    }
+}
+
 } // namespace
 
 HeaderBar::HeaderBar(WindowScreen& screen, QWidget* parent)
     : QWidget(parent),
+      screen_(screen),
       back_(new FlatButton(screen, drawChevron, this)),
       search_(new FlatButton(screen, drawLens, this)),
       menu_(new FlatButton(screen, drawDots, this)),
@@ -79,6 +110,60 @@ void HeaderBar::setTitles(const QString& title, const QString& below, Search sea
     fitTexts();
 }
 
+void HeaderBar::setWindowButtons(const WindowButtons& buttons) {
+    if (std::exchange(windowButtons_, buttons) == buttons) {
+        return;
+    }
+    dropAll(windowButtonsAtStart_);
+    dropAll(windowButtonsAtEnd_);
+    for (const auto button : buttons.atStart) {
+        windowButtonsAtStart_.push_back(add(button));
+    }
+    for (auto button = buttons.atEnd.rbegin(); button != buttons.atEnd.rend(); ++button) {
+        windowButtonsAtEnd_.push_back(add(*button));
+    }
+    fitTexts();
+}
+
+FlatButton* HeaderBar::add(WindowButton button) {
+    auto* added = new FlatButton(screen_, drawingOf(button), this);
+    added->setIconSize(lensSize);
+    const auto name = button == WindowButton::Minimize   ? tr("Minimize")
+                      : button == WindowButton::Maximize ? tr("Maximize or Restore")
+                                                         : tr("Close");
+    added->setAccessibleName(name);
+    added->setToolTip(name);
+    connect(added, &QToolButton::clicked, this,
+            [this, button] { Q_EMIT windowButtonClicked(button); });
+    added->show();
+    return added;
+}
+
+void HeaderBar::mousePressEvent(QMouseEvent* event) {
+    if (event->button() == Qt::LeftButton) {
+        pressed_ = event->position().toPoint();
+    }
+}
+
+void HeaderBar::mouseMoveEvent(QMouseEvent* event) {
+    const auto isFar = [](QPoint way) {
+        return way.manhattanLength() >= QApplication::startDragDistance();
+    };
+    if (pressed_ && isFar(event->position().toPoint() - *pressed_)) {
+        pressed_.reset(); // the desktop has the mouse from now on
+        Q_EMIT dragged();
+    }
+}
+
+void HeaderBar::mouseReleaseEvent(QMouseEvent* /*event*/) { pressed_.reset(); }
+
+void HeaderBar::mouseDoubleClickEvent(QMouseEvent* event) {
+    if (event->button() == Qt::LeftButton) {
+        pressed_.reset();
+        Q_EMIT doubleClicked();
+    }
+}
+
 void HeaderBar::resizeEvent(QResizeEvent* event) {
     QWidget::resizeEvent(event);
     fitTexts();
@@ -102,7 +187,7 @@ int HeaderBar::backWidth(const QString& text) const {
 /// Between the buttons in the middle of the bar, or beside the first where the title is too long
 /// for that.
 QRect HeaderBar::roomForTitle(int backWidth) const {
-    const int start = backWidth > 0 ? backWidth + 2 * gap : margin;
+    const int start = widthAtStart() + (backWidth > 0 ? backWidth + 2 * gap : margin);
     const int buttons = static_cast<int>(buttonsAtEnd().size());
     const int end = buttons == 0 ? margin : buttons * FlatButton::smallestSide + 2 * gap;
     const int side = std::max(start, end);
@@ -111,9 +196,14 @@ QRect HeaderBar::roomForTitle(int backWidth) const {
     return fits ? middle : rect().adjusted(start, 0, -end, 0);
 }
 
+/// Of the window's buttons.
+int HeaderBar::widthAtStart() const {
+    return static_cast<int>(windowButtonsAtStart_.size()) * FlatButton::smallestSide;
+}
+
 /// From the edge inwards.
 std::vector<QWidget*> HeaderBar::buttonsAtEnd() const {
-    std::vector<QWidget*> buttons;
+    std::vector<QWidget*> buttons(windowButtonsAtEnd_.begin(), windowButtonsAtEnd_.end());
     for (QWidget* button : {menu_, search_}) {
         if (!button->isHidden()) {
             buttons.push_back(button);
@@ -150,7 +240,12 @@ void HeaderBar::fitTexts() {
     back_->setText(text);
     const int side = FlatButton::smallestSide;
     const int top = (height() - side) / 2;
-    place(*back_, {gap, top, backWidth(text), side});
+    int start = gap;
+    for (FlatButton* button : windowButtonsAtStart_) {
+        place(*button, {start, top, side, side});
+        start += side;
+    }
+    place(*back_, {start, top, backWidth(text), side});
     int end = width() - gap;
     for (QWidget* button : buttonsAtEnd()) {
         end -= side;

@@ -16,6 +16,7 @@
 #include "quorl/window/ProblemPage.h"
 #include "quorl/window/desktop/AboutWindow.h"
 #include "quorl/window/desktop/Guide.h"
+#include "quorl/window/frame/WindowFrame.h"
 
 namespace quorl {
 
@@ -63,6 +64,8 @@ MainWindow::MainWindow(Companion& companion, WindowScreen& screen)
     }
     draw();
 }
+
+void MainWindow::takeFrame() { frameByHeader(*this, *header_, screen_); }
 
 void MainWindow::addShortcuts() {
     connect(header_, &HeaderBar::backClicked, this, &MainWindow::goBack);

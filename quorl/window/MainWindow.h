@@ -20,6 +20,9 @@ class MainWindow final : public QWidget {
     /// Both outlive the window.
     MainWindow(Companion& companion, WindowScreen& screen);
 
+    /// Makes the header the window's title bar. Before the window is shown.
+    void takeFrame();
+
     /// The view of the top pane; null where the plug-in has a problem.
     [[nodiscard]] RowsView* topView() const;
 

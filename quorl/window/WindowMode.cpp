@@ -10,6 +10,7 @@
 #include "quorl/window/desktop/DesktopLook.h"
 #include "quorl/window/desktop/OneApp.h"
 #include "quorl/window/desktop/WindowMemory.h"
+#include "quorl/window/frame/WindowFrame.h"
 
 namespace quorl {
 
@@ -35,6 +36,10 @@ ExitCode showWindow(OneApp& app, const Places& places) {
     Notices notices;
     Companion companion(places, screen, notices);
     MainWindow window(companion, screen);
+    if (isFrameLeftToApps(QGuiApplication::platformName(),
+                          qEnvironmentVariable("XDG_CURRENT_DESKTOP"))) {
+        window.takeFrame();
+    }
     const WindowMemory memory = WindowMemory::of(places.purpose());
     window.resize(memory.size(window.screen()->availableSize()));
     app.setTake([&](const Start& other) {

@@ -75,6 +75,9 @@ void Appearance::take(const QString& group, const QString& key, const QVariant& 
         fontName = value.toString();
     } else if (name == QStringLiteral("org.gnome.desktop.interface text-scaling-factor")) {
         textScale = scaleIn(value);
+    } else if (name == QStringLiteral("org.gnome.desktop.wm.preferences button-layout")) {
+        const bool isText = value.typeId() == QMetaType::QString;
+        windowButtons = isText ? std::optional(value.toString()) : std::nullopt;
     }
 }
 
@@ -83,6 +86,7 @@ Look Appearance::look(const Look& usual) const {
     look.accent = accent.value_or(usual.accent);
     look.contrast = isContrastHigh ? Contrast::High : usual.contrast;
     look.motion = isMotionReduced || !areAnimationsEnabled ? Motion::Reduced : usual.motion;
+    look.windowButtons = windowButtons.value_or(usual.windowButtons);
     return look;
 }
 

@@ -20,6 +20,7 @@ struct Appearance {
     bool areAnimationsEnabled = true; ///< what older desktops say of motion
     QString fontName;                 ///< with its size in points at the end; empty for nothing
     double textScale = 1;
+    std::optional<QString> windowButtons; ///< as in `Look`
 
     /// Takes a setting of the desktop's portal; one that nobody here knows, or of a value that
     /// makes no sense, counts as not being said.

@@ -20,7 +20,8 @@ QDBusMessage question() {
     auto call = QDBusMessage::createMethodCall(portalName, portalPath, settingsInterface,
                                                QStringLiteral("ReadAll"));
     call.setArguments({QStringList{QStringLiteral("org.freedesktop.appearance"),
-                                   QStringLiteral("org.gnome.desktop.interface")}});
+                                   QStringLiteral("org.gnome.desktop.interface"),
+                                   QStringLiteral("org.gnome.desktop.wm.preferences")}});
     return call;
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <QColor>
+#include <QString>
 
 namespace quorl {
 
@@ -15,6 +16,8 @@ struct Look {
     QColor accent = QColor(0x5b, 0x6e, 0xf5); ///< of what can be tapped, as the person chose it
     Contrast contrast = Contrast::Standard;
     Motion motion = Motion::Full;
+    /// Of the title bars that are left to apps; see `windowButtonsIn`.
+    QString windowButtons = QStringLiteral(":close");
 
     [[nodiscard]] bool operator==(const Look&) const = default;
 };

@@ -92,6 +92,15 @@ TEST_F(FollowedDesktop, motionIsReducedByEitherSetting) {
     EXPECT_TRUE(waitUntil(rests));
 }
 
+TEST_F(FollowedDesktop, windowHasTheButtonsThatItSays) {
+    Portal portal;
+    follow();
+    portal.set(Portal::windows, "button-layout", QStringLiteral("close:"));
+    EXPECT_TRUE(waitUntil([this] { return look().windowButtons == QStringLiteral("close:"); }));
+    portal.set(Portal::windows, "button-layout", 7);
+    EXPECT_TRUE(waitUntil([this] { return look().windowButtons == Look().windowButtons; }));
+}
+
 TEST_F(FollowedDesktop, rowsGrowWithTheFont) {
     Portal portal;
     follow();

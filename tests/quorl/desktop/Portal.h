@@ -18,6 +18,7 @@ class Portal final : public QDBusVirtualObject {
 
     static constexpr auto appearance = "org.freedesktop.appearance";
     static constexpr auto interface = "org.gnome.desktop.interface";
+    static constexpr auto windows = "org.gnome.desktop.wm.preferences";
 
     /// Changes a setting, and tells so.
     void set(const char* group, const char* key, const QVariant& value);
