@@ -119,8 +119,9 @@ void HeaderBar::setWindowButtons(const WindowButtons& buttons) {
     for (const auto button : buttons.atStart) {
         windowButtonsAtStart_.push_back(add(button));
     }
-    for (auto button = buttons.atEnd.rbegin(); button != buttons.atEnd.rend(); ++button) {
-        windowButtonsAtEnd_.push_back(add(*button));
+    const std::vector inwards(buttons.atEnd.rbegin(), buttons.atEnd.rend());
+    for (const auto button : inwards) {
+        windowButtonsAtEnd_.push_back(add(button));
     }
     fitTexts();
 }

@@ -80,6 +80,19 @@ std::string Backend::connect() {
     return g_dbus_connection_is_closed(bus_.get()) == FALSE ? "" : noSessionBus("it went away");
 }
 
+/// The service announces a change only after it has told the writer that it is stored. Whatever is
+/// asked of it next, it answers after that. A service that does not run has nothing to announce.
+void Backend::awaitAnnouncements() const {
+    constexpr int patience = 1000; // milliseconds
+    if (bus_) {
+        const VariantPointer answer(g_dbus_connection_call_sync(
+            bus_.get(), "ca.desrt.dconf", "/ca/desrt/dconf/Writer/user",
+            "org.freedesktop.DBus.Properties", "GetAll",
+            g_variant_new("(s)", "ca.desrt.dconf.Writer"), nullptr, G_DBUS_CALL_FLAGS_NO_AUTO_START,
+            patience, nullptr, nullptr));
+    }
+}
+
 std::string Backend::storingProblem() {
     if (auto problem = connect(); !problem.empty()) {
         return problem;

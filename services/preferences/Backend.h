@@ -28,6 +28,10 @@ class Backend {
     /// back an empty text, or a sentence that says what to do.
     [[nodiscard]] std::string connect();
 
+    /// Returns when every change that was stored before has been announced in the contexts of those
+    /// who listen; or when the dconf service does not say so in a moment.
+    void awaitAnnouncements() const;
+
     /// Why a value may not have been stored though there is a session bus, as a sentence that says
     /// what to do. Asks the session bus, so it takes its time.
     [[nodiscard]] std::string storingProblem();

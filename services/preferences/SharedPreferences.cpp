@@ -64,6 +64,9 @@ class SharedPreferences::Store {
     /// context, in the middle of a write where that thread writes, so it only takes note.
     static gboolean onChange(GSettings* settings, const GQuark* keys, int count, void* store);
 
+    /// Those that wait in the context. While the own thread does not run.
+    void takeAnnouncements() const;
+
     void run(const std::stop_token& stop);
     [[nodiscard]] KeySet takeChanges(const Announcement& announcement);
 
@@ -105,6 +108,8 @@ SharedPreferences::Store::Store(const std::vector<SchemaPointer>& schemas)
         settings_.emplace_back(g_settings_new_full(schema.get(), backend_->get(), nullptr));
     }
     g_main_context_pop_thread_default(context_.get());
+    backend_->awaitAnnouncements();
+    takeAnnouncements(); // nobody listens yet: what is known from the beginning is no news
 
     forEachPreference([this](const auto& preference) {
         settingsOf_.emplace(preference.key, settings_.at(placeOf(preference.schema)).get());
@@ -132,6 +137,10 @@ SharedPreferences::Store::~Store() {
         g_signal_handlers_disconnect_by_data(settings.get(), this);
     }
     settings_.clear();
+    takeAnnouncements();
+}
+
+void SharedPreferences::Store::takeAnnouncements() const {
     while (g_main_context_iteration(context_.get(), FALSE)) {
     }
 }
