@@ -7,7 +7,7 @@ import sys
 
 
 def play(program, script):
-    return subprocess.run([program, script], stdout=subprocess.PIPE, check=False)
+    return subprocess.run([program, script], capture_output=True, check=False)
 
 
 def differences(commands, expected, replies):
@@ -38,6 +38,8 @@ def main():
     problems = list(differences(lines(script), expected, first.stdout.decode().split("\n")[:-1]))
     if first.stdout != second.stdout:
         problems.append("played twice, the script gives other replies")
+    for complaint in sorted({first.stderr, second.stderr} - {b""}):
+        problems.append(f"on standard error: {complaint.decode(errors='replace')}")
     if first.returncode != int(any('"ok":false' in reply for reply in expected)):
         problems.append(f"the exit status is {first.returncode}")
     print("\n".join(problems))
