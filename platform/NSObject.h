@@ -3,12 +3,12 @@
 #include <concepts>
 #include <cstdint>
 #include <memory>
+#include <type_traits>
 #include <utility>
 
-/// How an object holds what is associated with it.
-enum NSAssociationPolicy : std::uintptr_t {
-    OBJC_ASSOCIATION_RETAIN_NONATOMIC = 1, ///< owns it, not atomically
-};
+/// How an object holds what is associated with it. There is one way: it owns it, not atomically.
+using NSAssociationPolicy = std::integral_constant<std::uintptr_t, 1>;
+inline constexpr NSAssociationPolicy OBJC_ASSOCIATION_RETAIN_NONATOMIC = {};
 
 /// The base of every class of the platform and of its plug-ins.
 ///

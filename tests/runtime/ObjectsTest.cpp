@@ -113,6 +113,10 @@ class AssociatedObjects : public testing::Test {
     const int otherKey_ = 0;
 };
 
+// There is no room for another way to hold them, as none would be heeded.
+static_assert(OBJC_ASSOCIATION_RETAIN_NONATOMIC == 1);
+static_assert(std::is_empty_v<NSAssociationPolicy>);
+
 TEST_F(AssociatedObjects, AreNoneAtFirst) {
     EXPECT_EQ(objc_getAssociatedObject(*owner_, &key_), nullptr);
 }
