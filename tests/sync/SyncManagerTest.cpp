@@ -1,4 +1,6 @@
 #include <array>
+#include <atomic>
+#include <latch>
 #include <limits>
 #include <thread>
 
@@ -20,6 +22,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 
 constexpr auto largestWord = std::numeric_limits<NSUInteger>::max();
+constexpr NSUInteger beyondHalfAWord = NSUInteger{1} << (4 * sizeof(NSUInteger));
 
 /// Counts the status notifications and notes who sent the last one, and on which thread.
 class StatusObserver : public NSObject {
@@ -108,6 +111,58 @@ TEST_F(SyncManager, IsOneForTheProcess) {
 
     EXPECT_EQ(LMQuorlSyncManager::sharedManager(), first);
     EXPECT_EQ(host_->journal.count("sessions DVSessionTypeDeviceSync"), 1U);
+}
+
+/// A host that is asked for the sessions on the main thread while others ask for the manager, which
+/// has just begun.
+class CrowdedHost final : public quorl::HostDouble {
+  public:
+    using Manager = std::shared_ptr<LMQuorlSyncManager>;
+
+    [[nodiscard]] NSArray<DVSession> sessions(const std::string& type) override {
+        if (++fetches_ == 1) {
+            letOthersIn();
+        }
+        return HostDouble::sessions(type);
+    }
+
+    [[nodiscard]] int fetches() const { return fetches_; }
+
+    /// What the others were given, once they all have it.
+    [[nodiscard]] const std::array<Manager, 7>& given() {
+        others_ = {};
+        return given_;
+    }
+
+  private:
+    void letOthersIn() {
+        for (std::size_t other = 0; other < others_.size(); ++other) {
+            others_[other] = std::jthread([this, other] {
+                ready_.count_down();
+                given_[other] = LMQuorlSyncManager::sharedManager();
+            });
+        }
+        ready_.arrive_and_wait();
+        // Whoever is not held back now comes to the second fetch, given the processor.
+        for (int turn = 0; turn < 100 && fetches_ == 1; ++turn) {
+            std::this_thread::yield();
+        }
+    }
+
+    std::latch ready_{8}; // the others and the main thread
+    std::atomic<int> fetches_ = 0;
+    std::array<Manager, 7> given_;
+    std::array<std::jthread, 7> others_;
+};
+
+TEST_F(SyncManager, IsMadeOnceHoweverManyAskForItMeanwhile) {
+    const auto crowd = std::make_shared<CrowdedHost>();
+    quorl::Host::install(crowd);
+
+    const auto manager = LMQuorlSyncManager::sharedManager();
+
+    EXPECT_THAT(crowd->given(), testing::Each(manager));
+    EXPECT_EQ(crowd->fetches(), 1);
 }
 
 TEST_F(SyncManager, PublishesTheNameOfItsNotification) {
@@ -258,6 +313,10 @@ INSTANTIATE_TEST_SUITE_P(
               {{.total = 5}},
               {{.isRunning = true}},
               LMQuorlSyncStageIndeterminateSyncing},
+        Stage{"total that half a word cannot hold",
+              {{.isRunning = true, .total = beyondHalfAWord}},
+              {},
+              LMQuorlSyncStageSyncing},
         Stage{"totals that wrap around to 0 count as 0",
               {{.isRunning = true, .total = largestWord}, {.isRunning = true, .total = 1}},
               {},
@@ -340,11 +399,13 @@ TEST_F(SyncManager, DoesNotHoldItsProgressBetween0And1) {
 
 TEST_F(SyncManager, DividesInDoublePrecisionAndNarrowsAfterwards) {
     const auto session = host_->sessionService.add("A");
-    session->addAssetTask({.progress = 0.1});
-    session->addAssetTask({.progress = 0.2});
-    session->addAssetTask({.progress = 0.4});
+    session->addAssetTask({.progress = 0.01});
+    session->addAssetTask({.progress = 0.02});
+    session->addAssetTask({.progress = 0.05});
+    constexpr double sum = 0.01 + 0.02 + 0.05;
+    static_assert(static_cast<float>(sum / 3) != static_cast<float>(sum) / 3);
 
-    EXPECT_EQ(manager().progress(), static_cast<float>((0.1 + 0.2 + 0.4) / 3.0));
+    EXPECT_EQ(manager().progress(), static_cast<float>(sum / 3));
 }
 
 TEST_F(SyncManager, CountsTheItemsOfAllAssetTasksRunningOrNot) {
@@ -358,6 +419,15 @@ TEST_F(SyncManager, CountsTheItemsOfAllAssetTasksRunningOrNot) {
 
     EXPECT_EQ(manager().completedAssetCount(), 12U);
     EXPECT_EQ(manager().totalAssetCount(), 18U);
+}
+
+TEST_F(SyncManager, CountsItemsInWholeWords) {
+    const auto session = host_->sessionService.add("A");
+    session->addAssetTask({.total = beyondHalfAWord + 2, .completed = beyondHalfAWord + 1});
+    session->addAssetTask({.total = 3, .completed = 2});
+
+    EXPECT_EQ(manager().completedAssetCount(), beyondHalfAWord + 3);
+    EXPECT_EQ(manager().totalAssetCount(), beyondHalfAWord + 5);
 }
 
 TEST_F(SyncManager, TakesMissingTaskListsForEmptyOnes) {
