@@ -49,6 +49,15 @@ class PSSpecifier : public NSObject {
 
     [[nodiscard]] PSCellType cellType() const { return _cell; }
 
+    /// Null also where the target is gone.
+    [[nodiscard]] std::shared_ptr<NSObject> target() const { return _target.lock(); }
+
+    [[nodiscard]] const std::optional<PSSetter>& setter() const { return _set; }
+
+    [[nodiscard]] const std::optional<PSGetter>& getter() const { return _get; }
+
+    [[nodiscard]] const std::optional<Class>& editPaneClass() const { return _edit; }
+
     /// What the getter gives now; null without a getter, or where the target is gone.
     [[nodiscard]] std::optional<std::string> value();
 

@@ -186,6 +186,26 @@ TEST_F(RootPane, KeepsItsRowsWhateverIsChosen) {
     EXPECT_EQ(pane_->specifiers(), before);
 }
 
+TEST_F(RootPane, GivesItsRowsNothingButAGetterAndADetailPane) {
+    pane_ = create<LMQuorlSettingsController>();
+
+    const auto rows = elements<PSSpecifier>(pane_->specifiers());
+
+    for (const auto& row : rows) {
+        EXPECT_FALSE(row->setter()) << row->name().value_or("");
+        EXPECT_EQ(row->editPaneClass(), std::nullopt) << row->name().value_or("");
+    }
+    for (const auto& group : {rows[0], rows[2]}) {
+        EXPECT_EQ(group->target(), nullptr);
+        EXPECT_FALSE(group->getter());
+        EXPECT_EQ(group->detailControllerClass(), std::nullopt);
+    }
+    EXPECT_EQ(rows[1]->target(), pane_);
+    EXPECT_EQ(rows[1]->getter()->name(), "playlistName:");
+    EXPECT_EQ(rows[3]->target(), pane_);
+    EXPECT_EQ(rows[3]->getter()->name(), "limit:");
+}
+
 // The playlist row.
 
 TEST_F(RootPane, ShowsNoneWithoutAPlaylist) {
