@@ -41,6 +41,9 @@ class CallRecorder {
 
     virtual void sessionWillRemoveObserver(const std::string& /*id*/) {}
 
+    /// `key` is the grouping key of the tasks.
+    virtual void sessionWillListTasks(const std::string& /*id*/, const std::string& /*key*/) {}
+
     virtual void wearableWillConnect(dispatch_queue_t /*queue*/) {}
 
     virtual void wearableWillBeAskedForUsage() {}
@@ -60,6 +63,10 @@ class CallRecorder {
     virtual void centerWillRemoveObserver(const NSObject& /*observer*/) {}
 
     virtual void centerWillPost(NSNotificationName /*name*/, const NSObject* /*sender*/) {}
+
+    virtual void controllerWillAppear(bool /*animated*/) {}
+
+    virtual void controllerWillDisappear(bool /*animated*/) {}
 
     virtual void specifierWillSetProperty(const PSSpecifier& /*specifier*/,
                                           const std::optional<std::string>& /*value*/,

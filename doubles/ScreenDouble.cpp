@@ -38,6 +38,14 @@ void ScreenDouble::labelDidSetFrame(UILabel& label) {
     }
 }
 
+void ScreenDouble::controllerWillAppear(UIViewController& /*controller*/, bool animated) {
+    recorder_->controllerWillAppear(animated);
+}
+
+void ScreenDouble::controllerWillDisappear(UIViewController& /*controller*/, bool animated) {
+    recorder_->controllerWillDisappear(animated);
+}
+
 void ScreenDouble::specifierWillSetProperty(PSSpecifier& specifier,
                                             const std::optional<std::string>& value,
                                             std::string_view key) {

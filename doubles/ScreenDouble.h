@@ -45,6 +45,8 @@ class ScreenDouble final : public Screen {
     [[nodiscard]] CGSize sizeOfText(const UILabel& label) const override;
     void layOutLabels(UITableViewCell& cell) override;
     void labelDidSetFrame(UILabel& label) override;
+    void controllerWillAppear(UIViewController& controller, bool animated) override;
+    void controllerWillDisappear(UIViewController& controller, bool animated) override;
     void specifierWillSetProperty(PSSpecifier& specifier, const std::optional<std::string>& value,
                                   std::string_view key) override;
     void listWillReloadSpecifier(PSListController& list, const PSSpecifier* specifier) override;

@@ -53,6 +53,7 @@ NSArray<DVSessionTask> SessionDouble::sessionTasks() const {
 }
 
 NSArray<DVSessionTask> SessionDouble::sessionTasksWithGroupingKey(const std::string& key) const {
+    recorder_->sessionWillListTasks(id_, key);
     if (tasksAreLost_) {
         return nullptr;
     }

@@ -35,6 +35,10 @@ class Screen {
 
     virtual void labelDidSetFrame(UILabel& /*label*/) {}
 
+    virtual void controllerWillAppear(UIViewController& /*controller*/, bool /*animated*/) {}
+
+    virtual void controllerWillDisappear(UIViewController& /*controller*/, bool /*animated*/) {}
+
     virtual void specifierWillSetProperty(PSSpecifier& /*specifier*/,
                                           const std::optional<std::string>& /*value*/,
                                           std::string_view /*key*/) {}

@@ -67,11 +67,19 @@ void UITableViewCell::layoutSubviews() { screen().layOutLabels(*this); }
 
 void UIViewController::setTitle(std::optional<std::string> title) { _title = std::move(title); }
 
-void UIViewController::viewWillAppear(bool /*animated*/) {}
+void UIViewController::viewWillAppear(bool animated) {
+    if (auto* host = quorl::Host::current()) {
+        host->screen().controllerWillAppear(*this, animated);
+    }
+}
 
 void UIViewController::viewDidAppear(bool /*animated*/) {}
 
-void UIViewController::viewWillDisappear(bool /*animated*/) {}
+void UIViewController::viewWillDisappear(bool animated) {
+    if (auto* host = quorl::Host::current()) {
+        host->screen().controllerWillDisappear(*this, animated);
+    }
+}
 
 void UIViewController::viewDidDisappear(bool /*animated*/) {}
 

@@ -255,6 +255,31 @@ INSTANTIATE_TEST_SUITE_P(
                  "Currently 25% through syncing 2 songs to Velora, which will take up SIZE with "
                  "LEFT remaining."}));
 
+TEST_F(LimitFooter, AsksForTheProgressOnlyWhereItTellsIt) {
+    const auto task = host_->sessionService.add("sync")->addAssetTask({.progress = 0.5});
+    syncSongs({1, 2});
+    showFooter();
+    ASSERT_EQ(footer(), synced("2", 3));
+    store(SyncPreference::LastFullySentAssetSyncPlaylistVersion, 0);
+    changeLibrary();
+    ASSERT_THAT(footer().value_or(""), StartsWith("Will sync"));
+    task->become({.isRunning = true, .progress = 0.5});
+    changeLibrary();
+    ASSERT_THAT(footer().value_or(""), StartsWith("Syncing music"));
+    task->become({.isRunning = true, .total = 4, .progress = 0.5});
+    store(SyncPreference::AssetSyncEnabled, 0);
+    changeLibrary();
+    ASSERT_THAT(footer().value_or(""), StartsWith("No songs"));
+    EXPECT_THAT(host_->journal.lines({"tasks"}), testing::IsEmpty());
+
+    store(SyncPreference::AssetSyncEnabled, 1);
+    changeLibrary();
+
+    EXPECT_THAT(footer().value_or(""), StartsWith("Currently 50%"));
+    EXPECT_THAT(host_->journal.lines({"tasks"}),
+                ElementsAre("tasks sync " + DVDeviceSyncSessionAssetTaskGroupingKey));
+}
+
 constexpr const char* nothingSynced =
     "No songs synced to Velora. Pick a playlist to sync songs for local playback.";
 

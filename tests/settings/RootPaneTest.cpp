@@ -416,6 +416,27 @@ TEST_F(RootPane, BeginsToListenToTheLibraryAndRefreshesWhenItAppears) {
     EXPECT_EQ(refreshes(), 1U);
 }
 
+class Appearances : public RootPane, public testing::WithParamInterface<bool> {
+  protected:
+    static std::string how() { return GetParam() ? "animated" : "at once"; }
+};
+
+TEST_P(Appearances, AreTheBaseClassesBeforeTheyAreThePanes) {
+    showPane();
+
+    pane_->viewWillDisappear(GetParam());
+    EXPECT_THAT(host_->journal.lines({"disappear", "library"}),
+                ElementsAre("disappear " + how(), "library end"));
+
+    host_->journal.clear();
+    pane_->viewWillAppear(GetParam());
+    EXPECT_THAT(host_->journal.lines({"appear", "library", "row"}),
+                ElementsAre("appear " + how(), "library begin", playlistRow,
+                            "library hasMediaOfType 2049", "row Playlist Limit"));
+}
+
+INSTANTIATE_TEST_SUITE_P(BothWays, Appearances, testing::Bool());
+
 TEST_F(RootPane, StopsHearingOfTheLibraryWhenItDisappears) {
     showPane();
 

@@ -85,6 +85,10 @@ void Journal::sessionWillAddObserver(const std::string& id) { note("session", id
 
 void Journal::sessionWillRemoveObserver(const std::string& id) { note("session", id, "remove"); }
 
+void Journal::sessionWillListTasks(const std::string& id, const std::string& key) {
+    note("tasks", id, key);
+}
+
 void Journal::wearableWillConnect(dispatch_queue_t /*queue*/) { note("wearable connect"); }
 
 void Journal::wearableWillBeAskedForUsage() { note("wearable usage"); }
@@ -107,6 +111,14 @@ void Journal::centerWillRemoveObserver(const NSObject& /*observer*/) { note("lea
 
 void Journal::centerWillPost(NSNotificationName name, const NSObject* /*sender*/) {
     note("post", name);
+}
+
+void Journal::controllerWillAppear(bool animated) {
+    note("appear", animated ? "animated" : "at once");
+}
+
+void Journal::controllerWillDisappear(bool animated) {
+    note("disappear", animated ? "animated" : "at once");
 }
 
 void Journal::specifierWillSetProperty(const PSSpecifier& /*specifier*/,

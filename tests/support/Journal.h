@@ -12,11 +12,13 @@ namespace quorl::tests {
 ///     query NAME=VALUE ...                with the predicates in their order
 ///     property ID NAME                    of a song or playlist
 ///     sessions TYPE, session ID add       likewise "remove"
+///     tasks ID KEY                        of a session, those of one grouping key
 ///     wearable connect, wearable usage
 ///     glance IDENTIFIER, text KEY, size BYTES
 ///     observe NAME SELECTOR any           or "one", for one sender only; "leave"; "post NAME"
 ///     footer TEXT, row TITLE, list        the reload of a row, and of a list
 ///     show, url TEXT                      likewise "show animated" and "show at once"
+///     appear animated, disappear at once  and the other way round
 ///     table, rows SECTION.ROW ...         the reload of a table, and of rows
 ///     deselect SECTION.ROW
 ///     timer NANOSECONDS                   in virtual time, from now; "timer never"
@@ -45,6 +47,7 @@ class Journal final : public CallRecorder {
     void sessionsWillBeListed(const std::string& type) override;
     void sessionWillAddObserver(const std::string& id) override;
     void sessionWillRemoveObserver(const std::string& id) override;
+    void sessionWillListTasks(const std::string& id, const std::string& key) override;
     void wearableWillConnect(dispatch_queue_t queue) override;
     void wearableWillBeAskedForUsage() override;
     void hostWillGiveGlance(const std::string& identifier) override;
@@ -55,6 +58,8 @@ class Journal final : public CallRecorder {
                                NSNotificationName name, const NSObject* sender) override;
     void centerWillRemoveObserver(const NSObject& observer) override;
     void centerWillPost(NSNotificationName name, const NSObject* sender) override;
+    void controllerWillAppear(bool animated) override;
+    void controllerWillDisappear(bool animated) override;
     void specifierWillSetProperty(const PSSpecifier& specifier,
                                   const std::optional<std::string>& value,
                                   std::string_view key) override;
