@@ -154,6 +154,16 @@ class Inspection(unittest.TestCase):
             "ok": True, "trace": [], "stage": 1, "progress": 2, "completedAssetCount": 3,
             "totalAssetCount": 4, "assetSyncPlaylist": "5"})
 
+    def test_marks_what_a_plugin_does_on_another_thread(self):
+        event = {"do": "session", "id": "1", "event": "sessionWillBegin:"}
+        *_, here, elsewhere = self.replies_of_plugin(
+            os.environ["OBSERVING_PLUGIN"], "ObservingPane", {"do": "sessions", "list": [{"id": "1"}]},
+            {"do": "create"}, event, {**event, "thread": "other"})
+
+        post = ["NSNotificationCenter", "postNotificationName:object:", "SessionWillBegin", None]
+        self.assertEqual(here, {"ok": True, "trace": [post]})
+        self.assertEqual(elsewhere, {"ok": True, "trace": [post + ["thread:other"]]})
+
     def test_says_so_where_a_plugin_shows_nothing(self):
         query, layout, after = self.replies_of_plugin(
             os.environ["PLAIN_PLUGIN"], "TestPane", {"do": "query"}, self.LAYOUT, {"do": "open"})
