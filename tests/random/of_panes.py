@@ -9,6 +9,9 @@ from texts import size_text, songs_that_fit, status_beside
 from world import LIMITS, PLAYLISTS, ROOT, Json
 
 CHECKMARK = 3
+FOOTER = ["PSSpecifier", "setProperty:forKey:", "Music Storage"]
+SONGS = [15, 50, 125, 250]
+MEGABYTES = [100, 500, 1024, 2048]
 
 COUNTED = re.compile(r"(?:\b([\d,]+) songs? .*)?tak(?:e|ing) up (\d+ B)")
 REMAINING = re.compile(r"with (.+) remaining\.$")
@@ -36,10 +39,9 @@ def the_status_beside_a_playlist_is_that_of_the_sync(trial: Trial) -> Iterator[s
         if not shown.after.is_plain:
             return
         right = status_beside(asked.reply["stage"], asked.reply["progress"])
-        for _, _, cell in _cells(shown, PLAYLISTS):
-            is_chosen = cell["accessory"] == CHECKMARK and cell["title"] is not None
-            detail = cell["detail"]
-            if detail is not None and not (is_chosen or cell["title"] is None) or detail not in (None, "Sync Pending…", right):
+        for section, _, cell in _cells(shown, PLAYLISTS):
+            allowed = [right, "Sync Pending…"] if cell["accessory"] == CHECKMARK and section == 0 else [None]
+            if cell["detail"] not in allowed:
                 yield f"{cell}, while it is {right}"
 
 
@@ -129,6 +131,48 @@ def the_stack_is_as_the_commands_left_it(trial: Trial) -> Iterator[str]:
                 yield f"{stack}, not {moment.after.stack}"
 
 
+def only_a_tap_writes_preferences(trial: Trial) -> Iterator[str]:
+    for moment in trial.traced:
+        written = [entry[1:] for entry in moment.entries("LMSyncDefaults")]
+        is_choice = moment.did("tap") and "path" in moment.command
+        if is_choice != bool(written) or (is_choice and not _is_choice(moment, written)):
+            yield f"{moment.command}: {written}"
+
+
+def _is_choice(moment: Moment, written: list) -> bool:
+    section, row = moment.command["path"]
+    match written:
+        case [["setAssetSyncEnabled:", False]]:
+            return moment.after.top == PLAYLISTS and section == 1
+        case [["setAssetSyncEnabled:", True], ["setAssetSyncPlaylistPersistentID:", id_]]:
+            known = any(playlist["id"] == id_ for playlist in moment.after.described)
+            return moment.after.top == PLAYLISTS and section == 0 and known
+        case [["setAssetSyncLimit:", limit], ["setAssetSyncLimitType:", kind]]:
+            right = kind == row if section == 0 else limit == (SONGS if kind == 1 else MEGABYTES)[row]
+            return moment.after.top == LIMITS and right
+    return False
+
+
+def who_does_not_know_the_space_asks_for_it(trial: Trial) -> Iterator[str]:
+    for moment in trial.traced:
+        if moment.after.ticks or not moment.after.is_plain:
+            return
+        for text, is_asked in _refreshed_footers(moment.entries()):
+            if COUNTED.search(text or "") and bool(REMAINING.search(text)) == is_asked:
+                yield f"{text} And the wearable was {'' if is_asked else 'not '}asked"
+
+
+def _refreshed_footers(entries: list[list]) -> Iterator[tuple[str, bool]]:
+    """What the footer said after it was cleared, as a refresh begins, and whether the wearable was asked for more."""
+    is_cleared = False
+    for place, entry in enumerate(entries):
+        if entry[:3] != FOOTER:
+            continue
+        if is_cleared:
+            yield entry[3], entries[place + 2 : place + 3] == [["LSSManager", "getUsage:"]]
+        is_cleared = entry[3] is None
+
+
 def _numbers(section: Json) -> list[int]:
     return [cell["row"] for cell in section["cells"]]
 
@@ -155,7 +199,7 @@ def _id_of(shown: Moment, row: int) -> str | None:
 
 def _rows(shown: Moment) -> list[Json]:
     """The rows of the root pane, where it is shown."""
-    return shown.reply["stack"][0]["specifiers"] if shown.did("snapshot") and shown.reply["stack"] else []
+    return shown.reply["stack"][0].get("specifiers", []) if shown.did("snapshot") and shown.reply["stack"] else []
 
 
 def _is_refresh(moment: Moment, shown: Moment) -> bool:
@@ -177,7 +221,7 @@ def _is_plain_tap(moment: Moment) -> bool:
 def _footers(trial: Trial) -> Iterator[tuple[Moment, str]]:
     """What the footer was set to, as far as it is in plain English."""
     for moment in trial.traced:
-        for entry in moment.entries("PSSpecifier", "setProperty:forKey:", "Music Storage"):
+        for entry in moment.entries(*FOOTER):
             if entry[3] is not None and moment.after.is_plain:
                 yield moment, entry[3]
 
@@ -194,4 +238,6 @@ PROPERTIES = [
     the_root_pane_keeps_its_rows,
     a_table_shows_what_fits_on_the_screen,
     the_stack_is_as_the_commands_left_it,
+    only_a_tap_writes_preferences,
+    who_does_not_know_the_space_asks_for_it,
 ]

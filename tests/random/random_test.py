@@ -15,7 +15,8 @@ from shorten import shorten
 from situations import script
 from story import attempt
 
-MOST_IN_A_SCRIPT = 8
+MOST_IN_A_SCRIPT = 12
+LITTLE_PATIENCE = 2.0  # seconds: a program that does not answer is tried many times
 
 
 class Failure(NamedTuple):
@@ -45,7 +46,7 @@ def failure_of(program: str, number: int, lines: list[str]) -> Failure | None:
 
 
 def _breaks(program: str, lines: list[str], property_: Property) -> bool:
-    broken = broken_by(attempt(program, lines))
+    broken = broken_by(attempt(program, lines, LITTLE_PATIENCE))
     return broken is not None and broken[0] is property_
 
 
@@ -73,7 +74,8 @@ def _numbers(arguments: argparse.Namespace, worker: int) -> Iterator[tuple[int, 
 
 def report(failure: Failure) -> None:
     """Says what is broken, by which lines, and how to see it again."""
-    print(f"\nBroken: {failure.property}\n{failure.problem}\n\nby these lines, shortened from script {failure.number}:\n")
+    print(f"\nBroken: {failure.property}\n{failure.problem}\n")
+    print(f"by these lines, shortened from script {failure.number}:\n")
     print("\n".join(failure.lines))
     print(f"\nTo see it again, save the lines and run {sys.argv[0]} PROGRAM --script FILE")
 

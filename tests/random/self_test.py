@@ -12,6 +12,7 @@ import tempfile
 import unittest
 from typing import Any, Callable
 
+import of_news
 import of_panes
 import of_replies
 import of_time
@@ -24,9 +25,13 @@ FOLDER = pathlib.Path(__file__).resolve().parent
 HOST = FOLDER.parents[1] / "quorl-script"
 PROGRAM = os.environ["QUORL_SCRIPT"]
 
+QUIET = '{"id":"7","name":"Quiet","revision":1,"items":[100,200]}'
+LOUD = '{"id":"8","name":"Loud","revision":1,"items":[40]}'
+TASK = '{"id":"t","group":"asset","running":true,"total":4,"completed":1,"progress":0.25}'
+
 #: Has an occasion for every property.
 TALE = """
-{"do":"library","media":["music"],"playlists":[{"id":"7","name":"Quiet","revision":1,"items":[100,200]},{"id":"8","name":"Loud","revision":1,"items":[40]}]}
+{"do":"library","media":["music"],"playlists":[QUIET,LOUD]}
 {"do":"prefs","set":{"assetSyncEnabled":true,"assetSyncPlaylistPersistentID":"7","assetSyncLimit":100}}
 {"do":"prefs","set":{"lastFullySentAssetSyncPlaylistPersistentID":"7","lastFullySentAssetSyncPlaylistVersion":1}}
 {"do":"usage","reply":{"available":1000,"songs":500}}
@@ -40,7 +45,8 @@ TALE = """
 {"do":"query"}
 {"do":"tap","path":[0,1]}
 {"do":"snapshot"}
-{"do":"sessions","list":[{"id":"s","tasks":[{"id":"t","group":"asset","running":true,"total":4,"completed":1,"progress":0.25}]}]}
+{"do":"library","media":["music"],"playlists":[QUIET,LOUD],"notify":true}
+{"do":"sessions","list":[{"id":"s","tasks":[TASK]}]}
 {"do":"session","id":"s","event":"sessionDidFinish:","times":2}
 {"do":"query"}
 {"do":"advance","seconds":1.5}
@@ -57,7 +63,14 @@ TALE = """
 nonsense
 {"do":"trace","classes":["dispatch"]}
 {"do":"open"}
-""".strip().split("\n")
+""".strip().replace("QUIET", QUIET).replace("LOUD", LOUD).replace("TASK", TASK).split("\n")
+
+#: A program that carries out whatever it is told.
+AGREEABLE = """#!{python}
+import sys
+for line in sys.stdin:
+    print('{{"ok":true,"trace":[]}}', flush=True)
+"""
 
 Replies = list[dict[str, Any]]
 
@@ -111,9 +124,9 @@ def answer(line: str, value: Any, *path: Any, occurrence: int = 0) -> Callable[[
 
 CELL = ("stack", 1, "sections", 0, "cells", 0)
 ROW = ("stack", 0, "specifiers")
-FOOTER = ("PSSpecifier", "setProperty:forKey:", "Music Storage")
+SAYS = ("PSSpecifier", "setProperty:forKey:", "Music Storage", "2 songs synced to Velora, taking up 300 B.")
 LIBRARY = "MPMediaLibrary"
-POST = ["NSNotificationCenter", "postNotificationName:object:", "LMQuorlSyncStatusDidChangeNotification", None]
+POST = ("NSNotificationCenter", "postNotificationName:object:")
 
 #: What breaks each of the properties that look at one playing of a script.
 FALSE_REPLIES: dict[Property, list[Callable[[Replies], None]]] = {
@@ -132,7 +145,9 @@ FALSE_REPLIES: dict[Property, list[Callable[[Replies], None]]] = {
         answer("snapshot", 0, *CELL, "accessory", occurrence=1),
         answer("snapshot", 3, "stack", 1, "sections", 1, "cells", 0, "accessory", occurrence=1),
     ],
-    of_panes.the_rows_of_the_chooser_are_the_ordinary_playlists: [answer("snapshot", "Loud", *CELL, "title", occurrence=1)],
+    of_panes.the_rows_of_the_chooser_are_the_ordinary_playlists: [
+        answer("snapshot", "Loud", *CELL, "title", occurrence=1),
+    ],
     of_panes.the_status_beside_a_playlist_is_that_of_the_sync: [
         answer("snapshot", "Syncing…", *CELL, "detail", occurrence=1), answer("query", 1, "stage", occurrence=1),
     ],
@@ -143,13 +158,13 @@ FALSE_REPLIES: dict[Property, list[Callable[[Replies], None]]] = {
     of_panes.the_playlist_row_says_how_it_stands: [answer("snapshot", "Loud", *ROW, 1, "value")],
     of_panes.the_limit_row_says_the_limit: [answer("snapshot", "100 B", *ROW, 3, "value")],
     of_panes.the_footer_counts_the_first_songs_that_fit: [
-        alter("open", FOOTER, 3, "3 songs synced to Velora, taking up 300 B."),
-        alter("open", FOOTER, 3, "2 songs synced to Velora, taking up 301 B."),
+        alter("open", SAYS, 3, "3 songs synced to Velora, taking up 300 B."),
+        alter("open", SAYS, 3, "2 songs synced to Velora, taking up 301 B."),
     ],
     of_panes.the_wearable_has_told_what_remains: [
-        alter("open", FOOTER, 3, "2 songs synced to Velora, taking up 300 B with 1 B remaining."),
+        alter("open", SAYS, 3, "2 songs synced to Velora, taking up 300 B with 1 B remaining."),
     ],
-    of_panes.the_root_pane_keeps_its_rows: [lambda replies: replies[number_of("snapshot")]["stack"][0]["specifiers"].pop()],
+    of_panes.the_root_pane_keeps_its_rows: [answer("snapshot", 1, *ROW, 0, "cell")],
     of_panes.a_table_shows_what_fits_on_the_screen: [answer("snapshot", 5, *CELL, "row", occurrence=1)],
     of_panes.the_stack_is_as_the_commands_left_it: [answer("snapshot", "Other", "stack", 0, "class")],
     of_time.a_root_pane_refreshes_once_in_the_delay: [add("open", ["dispatch", "dispatch_after", 1500000000])],
@@ -163,7 +178,24 @@ FALSE_REPLIES: dict[Property, list[Callable[[Replies], None]]] = {
         drop("advance", "UITableView", "reloadData", occurrence=1),
         add("advance", ["UITableView", "reloadData"]),
     ],
-    of_time.who_is_seen_wants_to_hear_of_library_changes: [
+    of_panes.who_does_not_know_the_space_asks_for_it: [
+        drop("open", "LSSManager", "getUsage:"),
+        alter("open", SAYS, 3, "2 songs synced to Velora, taking up 300 B with 1500 B remaining."),
+    ],
+    of_news.a_change_of_preferences_is_told_once: [
+        drop("prefs", *POST, "LMSyncPreferencesDidChangeNotification"),
+        drop("tap", *POST, "LMSyncPreferencesDidChangeNotification", occurrence=1),
+        add("query", [*POST, "LMSyncPreferencesDidChangeNotification", None]),
+    ],
+    of_news.a_library_change_is_told_while_anybody_wants_to_hear_of_it: [
+        drop("library", *POST, "MPMediaLibraryDidChangeNotification", occurrence=1),
+        add("query", [*POST, "MPMediaLibraryDidChangeNotification", "MPMediaLibrary"]),
+    ],
+    of_news.a_library_change_is_shown_at_once: [
+        drop("library", "UITableView", "reloadData", occurrence=1),
+        drop("library", "PSListController", "reloadSpecifier:", "Playlist Limit", occurrence=1),
+    ],
+    of_news.who_is_seen_wants_to_hear_of_library_changes: [
         drop("open", LIBRARY, "beginGeneratingLibraryChangeNotifications"),
         drop("back", LIBRARY, "endGeneratingLibraryChangeNotifications"),
         add("query", [LIBRARY, "endGeneratingLibraryChangeNotifications"]),
@@ -177,27 +209,42 @@ FALSE_REPLIES: dict[Property, list[Callable[[Replies], None]]] = {
         drop("back", "NSNotificationCenter", "removeObserver:", "LMQuorlPlaylistChooser"),
         drop("back", "dispatch", "dispatch_source_cancel"),
     ],
-    of_time.only_a_tap_writes_preferences: [
+    of_panes.only_a_tap_writes_preferences: [
         add("query", ["LMSyncDefaults", "setAssetSyncEnabled:", False]),
         drop("tap", "LMSyncDefaults", "setAssetSyncEnabled:", occurrence=1),
         alter("tap", ("LMSyncDefaults", "setAssetSyncLimit:"), 2, 1024, occurrence=3),
     ],
-    of_time.listed_sessions_are_joined_and_former_ones_left: [drop("sessions", "DVSession", "addObserver:", "s")],
-    of_time.a_report_of_a_session_is_one_post_or_none: [add('session"', POST)],
-    of_time.the_stage_follows_the_running_tasks: [
+    of_news.listed_sessions_are_joined_and_former_ones_left: [drop("sessions", "DVSession", "addObserver:", "s")],
+    of_news.a_report_of_a_session_is_one_post_or_none: [
+        add('session"', [*POST, "LMQuorlSyncStatusDidChangeNotification", "LMQuorlSyncManager"]),
+    ],
+    of_news.the_stage_follows_the_running_tasks: [
         answer("query", 2, "stage", occurrence=2), answer("query", 3, "stage"),
     ],
 }
 
+
+def played(name: str, **changes: Any) -> Callable[[Trial], Trial]:
+    """Another outcome of one of the playings."""
+    return lambda trial: dataclasses.replace(trial, **{name: getattr(trial, name)._replace(**changes)})
+
+
+def put_out(name: str, old: bytes, new: bytes) -> Callable[[Trial], Trial]:
+    """Other words in the output of one of the playings."""
+    return lambda trial: played(name, output=getattr(trial, name).output.replace(old, new))(trial)
+
+
 #: What breaks each of the properties that compare playings.
-FALSE_PLAYINGS: dict[Property, Callable[[Trial], Trial]] = {
-    of_replies.nothing_is_written_to_standard_error: lambda it: dataclasses.replace(it, lean=it.lean._replace(errors=b"!")),
-    of_replies.the_exit_status_tells_whether_a_command_failed: lambda it: dataclasses.replace(it, pieces=it.pieces._replace(status=0)),
-    of_replies.the_same_script_gives_the_same_bytes: lambda it: dataclasses.replace(
-        it, pieces=it.pieces._replace(output=it.pieces.output.replace(b"Quiet", b"Queer"))),
-    of_replies.no_reply_waits_for_what_comes_later: lambda it: dataclasses.replace(it, early=it.early._replace(output=b"")),
-    of_replies.what_is_refused_or_only_looks_changes_nothing: lambda it: dataclasses.replace(
-        it, lean=it.lean._replace(output=it.lean.output.replace(b"addObserver", b"addWatcher"))),
+FALSE_PLAYINGS: dict[Property, list[Callable[[Trial], Trial]]] = {
+    of_replies.nothing_is_written_to_standard_error: [played("whole", errors=b"!"), played("lean", errors=b"!")],
+    of_replies.the_exit_status_tells_whether_a_command_failed: [
+        played("pieces", status=0), played("whole", status=None),
+    ],
+    of_replies.the_same_script_gives_the_same_bytes: [
+        put_out("pieces", b"Quiet", b"Queer"), put_out("pieces", b"}\n", b"}"),
+    ],
+    of_replies.no_reply_waits_for_what_comes_later: [played("early", output=b""), put_out("early", b"true", b"none")],
+    of_replies.what_is_refused_or_only_looks_changes_nothing: [put_out("lean", b"addObserver", b"addWatcher")],
 }
 
 
@@ -219,9 +266,10 @@ class EachProperty(unittest.TestCase):
                     self.assertTrue(list(each(falsified(self.trial, way))))
 
     def test_is_broken_by_false_playings(self):
-        for each, way in FALSE_PLAYINGS.items():
-            with self.subTest(each.__name__):
-                self.assertTrue(list(each(way(self.trial))))
+        for each, ways in FALSE_PLAYINGS.items():
+            for number, way in enumerate(ways):
+                with self.subTest(each.__name__, way=number):
+                    self.assertTrue(list(each(way(self.trial))))
 
 
 class Situations(unittest.TestCase):
@@ -252,7 +300,7 @@ class TheWholeTest(unittest.TestCase):
     def test_finds_a_program_that_is_wrong_and_says_by_which_line(self):
         with tempfile.TemporaryDirectory() as folder:
             agrees = pathlib.Path(folder, "agrees")
-            agrees.write_text(f"#!{sys.executable}\nimport sys\nfor line in sys.stdin:\n    print('{{\"ok\":true,\"trace\":[]}}', flush=True)\n")
+            agrees.write_text(AGREEABLE.format(python=sys.executable))
             agrees.chmod(0o755)
             result = subprocess.run(
                 [sys.executable, FOLDER / "random_test.py", agrees, "--seed", "5", "--count", "40", "--workers", "1"],

@@ -41,7 +41,8 @@ WRONG = {
     '{"do":"session","id":"nobody","event":"sessionWillBegin:"}': "id",
     '{"do":"usage","reply":"later"}': "reply", '{"do":"usage","reply":null,"after":-1}': "after",
     '{"do":"clock","by":"1"}': "by", '{"do":"screen","rows":-1}': "rows", '{"do":"tap"}': "specifier",
-    '{"do":"application","state":"asleep"}': "state", '{"do":"batch"}': "steps", '{"do":"trace","classes":"all"}': "classes",
+    '{"do":"application","state":"asleep"}': "state", '{"do":"batch"}': "steps",
+    '{"do":"trace","classes":"all"}': "classes",
     '{"do":"layout","title":[1,2,3],"detail":[1,2,3,4],"fits":1}': "title",
 }
 
@@ -61,10 +62,10 @@ class Situation:
         self._sessions: list[Command] = []
 
     def lines(self) -> list[str]:
-        commands = [self._library(), self._preferences(), self._usage(), self._sessions_list()]
+        commands = [self._library(), self._preferences(), self._chosen(), self._usage(), self._sessions_list()]
         self._source.shuffle(commands)
-        commands = commands[: self._source.randint(2, 4)] + [{"do": "open"}]
-        for _ in range(self._source.randint(4, 12)):
+        commands = commands[: self._source.randint(3, 5)] + [{"do": "open"}]
+        for _ in range(self._source.randint(3, 9)):
             commands += self._event()
         if self._chance(0.5):
             commands.append({"do": self._any(["release", "back"])})
@@ -83,10 +84,11 @@ class Situation:
 
     def _happenings(self) -> tuple[list[Callable[[], Any]], list[int]]:
         weights = {
-            self._advance: 16, self._preferences: 10, self._library: 7, self._sessions_list: 8, self._session: 8,
-            self._usage: 5, self._tap_specifier: 9, self._tap_row: 12, self._choose: 5, self._back: 7,
-            self._is_sent: 4, self._application: 3, self._clock: 3, self._batch: 3, self._coming_and_going: 3,
-            self._send: 3, self._look_of_the_host: 2, self._scroll: 2, self._question: 2, self._trace: 1,
+            self._advance: 16, self._tap_row: 12, self._preferences: 10, self._open_chooser: 9, self._session: 8,
+            self._library: 7, self._back: 7, self._sessions_list: 6, self._sync_runs: 5, self._usage: 5,
+            self._choose: 5, self._is_sent: 4, self._application: 3, self._clock: 3, self._batch: 3,
+            self._coming_and_going: 3, self._send: 3, self._look_of_the_host: 2, self._scroll: 2, self._question: 2,
+            self._trace: 1,
         }
         return list(weights), list(weights.values())
 
@@ -94,7 +96,8 @@ class Situation:
         return self._source.random() < probability
 
     def _look(self) -> list[Command]:
-        fresh = [{"do": "send", "selector": "willBecomeActive"}] if self._chance(0.5) else []
+        """A look at what is there, often drawn anew before it."""
+        fresh = [{"do": "send", "selector": "willBecomeActive"}] if self._chance(0.6) else []
         return [*fresh, {"do": "snapshot"}, {"do": "query"}]
 
     def _library(self) -> Command:
@@ -126,12 +129,18 @@ class Situation:
         names = self._source.sample(list(values), self._source.randint(1, len(values)))
         return {"do": "prefs", "set": {name: values[name] for name in names}, "notify": self._chance(0.8)}
 
+    def _chosen(self) -> Command:
+        return {"do": "prefs", "set": {"assetSyncEnabled": True, "assetSyncPlaylistPersistentID": self._id()}}
+
     def _is_sent(self) -> Command:
         """The engine has sent a playlist of the library in full."""
         sent = self._any(self._playlists) if self._playlists else {"id": "7", "revision": 1}
         return {"do": "prefs", "set": {"assetSyncEnabled": True, "assetSyncPlaylistPersistentID": sent["id"],
                                        "lastFullySentAssetSyncPlaylistPersistentID": sent["id"],
                                        "lastFullySentAssetSyncPlaylistVersion": sent["revision"]}}
+
+    def _sync_runs(self) -> list[Command]:
+        return [self._chosen(), self._sessions_list(), self._advance(), *self._look()]
 
     def _sessions_list(self) -> Command:
         ids = self._source.sample(["s", "u", "ü"], self._source.choices([0, 1, 2, 3], [5, 5, 2, 1])[0])
@@ -168,6 +177,9 @@ class Situation:
     def _tap_specifier(self) -> Command:
         return {"do": "tap", "specifier": self._any(["Synced Playlist"] * 5 + ["Playlist Limit"] * 4 + ["Velora"])}
 
+    def _open_chooser(self) -> list[Command]:
+        return [self._tap_specifier(), *(self._look() if self._chance(0.5) else [])]
+
     def _tap_row(self) -> Command:
         return {"do": "tap", "path": [self._any([0, 0, 0, 1, 1]), self._any([0, 0, 0, 1, 1, 2, 3, 4])]}
 
@@ -193,16 +205,19 @@ class Situation:
 
     def _look_of_the_host(self) -> Command:
         return self._any([
-            {"do": "glance", "row": self._any(["Velora", "", None])}, {"do": "screen", "rows": self._any([0, 1, 2, 3, 12])},
+            {"do": "glance", "row": self._any(["Velora", "", None])},
+            {"do": "screen", "rows": self._any([0, 1, 2, 3, 12])},
             {"do": "screen", "scale": 3, "textColor": self._any(["red", None]), "tintColor": "blue"},
-            {"do": "strings", "table": self._any(STRINGS)}, {"do": "language", "tag": self._any(["de", "ar", "en"])},
+            {"do": "strings", "table": self._any(STRINGS)},
+            {"do": "language", "tag": self._any(["de", "ar", "en", "en"])},
             {"do": "sizes", "text": self._any(["platform", "raw"])}])
 
     def _scroll(self) -> Command:
         return {"do": "scroll", "to": self._source.randint(0, 6)}
 
     def _question(self) -> Command:
-        frames = {name: [self._any([0, 15.25, 80, 200.5]), 0, self._any([0, 60, 99.5]), 20] for name in ("title", "detail")}
+        frames = {name: [self._any([0, 15.25, 80, 200.5]), 0, self._any([0, 60, 99.5]), 20]
+                  for name in ("title", "detail")}
         return self._any([{"do": "rows", "section": self._any([-1, 0, 1, 2])},
                           {"do": "layout", **frames, "fits": self._any([0, 60, 150])}, {"do": "query"}])
 

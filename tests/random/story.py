@@ -7,7 +7,7 @@ from functools import cached_property
 from itertools import takewhile
 from typing import Iterator
 
-from playing import Playing, play, play_in_two_pieces
+from playing import PATIENCE, Playing, play, play_in_two_pieces
 from world import Json, World, after
 
 
@@ -55,14 +55,15 @@ class Trial:
         return list(takewhile(lambda moment: moment.after.selected is None, self.story))
 
 
-def attempt(program: str, lines: list[str]) -> Trial:
+def attempt(program: str, lines: list[str], patience: float = PATIENCE) -> Trial:
     """Plays a script in all ways. Where it is cut into pieces hangs on the script alone."""
     script = _text(lines)
-    whole = play(program, script)
+    whole = play(program, script, patience)
     length = zlib.crc32(script) % (len(script) + 1)  # any, also within a line
-    early, pieces = play_in_two_pieces(program, script, length)
+    early, pieces = play_in_two_pieces(program, script, length, patience)
     kept = [line for line, reply in zip(lines, whole.replies) if is_kept(line, reply)]
-    return Trial(lines, whole, script[:length].count(b"\n"), early, pieces, play(program, _text(kept)))
+    lean = play(program, _text(kept), patience)
+    return Trial(lines, whole, script[:length].count(b"\n"), early, pieces, lean)
 
 
 def is_kept(line: str, reply: bytes) -> bool:

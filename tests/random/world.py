@@ -11,6 +11,10 @@ LIMITS = "LMQuorlLimitChooser"
 SECOND = 10**9
 DELAY = 3 * SECOND // 2  #: between a post of the status and what is shown of it
 
+NEVER_NULL = ("assetSyncEnabled", "assetSyncLimitType")
+PREFERENCES = (*NEVER_NULL, "assetSyncPlaylistPersistentID", "assetSyncLimit",
+               "lastFullySentAssetSyncPlaylistPersistentID", "lastFullySentAssetSyncPlaylistVersion")
+
 Json = dict[str, Any]
 
 
@@ -41,6 +45,8 @@ class World:
     due: tuple[int, ...] = ()  #: latest instants at which answers come
     rows: int = 12  #: that fit on the screen
     is_plain: bool = True  #: texts are in English, and sizes raw
+    ticks: bool = False  #: the wall clock moves when it is read
+    listeners: int = 0  #: how often changes of the library are wanted
     selected: tuple[str, ...] | None = None  #: receivers that are traced
     stack: tuple[str, ...] = ()
     takes_guests: bool = True  #: the root pane pushes what it is to show
@@ -68,6 +74,11 @@ class World:
     @property
     def limit(self) -> int:
         return self.preferences.get("assetSyncLimit") or 0
+
+    def stored(self) -> Json:
+        """The preferences as they are kept: what was never set is as what was cleared, and ids are as revisions."""
+        values = {name: self.preferences.get(name) for name in PREFERENCES}
+        return {name: values[name] or 0 if name in NEVER_NULL else str(values[name]) for name in values}
 
     def ordinary_playlists(self) -> list[Json]:
         """Those that a person can choose from, in their order."""
@@ -104,7 +115,8 @@ def _sessions(_world: World, command: Json) -> Json:
 
 def _usage(world: World, command: Json) -> Json:
     answer, delay = command["reply"], round(command.get("after", 0) * SECOND)
-    told = {"answer": answer, "answer_delay": delay, "figures": world.figures + ((answer,) if isinstance(answer, dict) else ())}
+    figures = world.figures + ((answer,) if isinstance(answer, dict) else ())
+    told = {"answer": answer, "answer_delay": delay, "figures": figures}
     return told if answer == "hold" else {**told, "held": 0, "due": world.due + (world.now + delay,) * world.held}
 
 
@@ -123,7 +135,7 @@ def _send(world: World, command: Json) -> Json:
 
 
 def _is_foreign(world: World, command: Json) -> Json:
-    is_plain = command in ({"do": "language", "tag": "en"}, {"do": "strings", "table": {}}, {"do": "sizes", "text": "raw"})
+    is_plain = list(command.values())[1:] in (["en"], [{}], ["raw"])
     return {"is_plain": world.is_plain and is_plain}
 
 
@@ -132,13 +144,18 @@ SETTLERS = {
     "create": _new_root, "open": _new_root, "send": _send,
     "language": _is_foreign, "strings": _is_foreign, "sizes": _is_foreign,
     "screen": lambda world, command: {"rows": command.get("rows", world.rows)},
+    "clock": lambda world, command: {"ticks": bool(command.get("tick", world.ticks))},
     "back": lambda world, _: {"stack": world.stack[:-1]},
     "release": lambda _world, _: {"stack": ()},
     "trace": lambda _world, command: {"selected": command.get("classes")},
 }
 
-SETTERS = {"setAssetSyncEnabled:": "assetSyncEnabled", "setAssetSyncPlaylistPersistentID:": "assetSyncPlaylistPersistentID",
-           "setAssetSyncLimitType:": "assetSyncLimitType", "setAssetSyncLimit:": "assetSyncLimit"}
+SETTERS = {
+    "setAssetSyncEnabled:": "assetSyncEnabled",
+    "setAssetSyncPlaylistPersistentID:": "assetSyncPlaylistPersistentID",
+    "setAssetSyncLimitType:": "assetSyncLimitType",
+    "setAssetSyncLimit:": "assetSyncLimit",
+}
 
 
 def _told(world: World, command: Json, entry: list, began: int) -> Json:
@@ -148,6 +165,10 @@ def _told(world: World, command: Json, entry: list, began: int) -> Json:
             return {"preferences": {**world.preferences, SETTERS[setter]: value}}
         case ["DVSession", "sessionsWithSessionTypeIdentifier:", *_]:
             return {"observed": world.listed, "joined": tuple(session["id"] for session in world.listed)}
+        case ["MPMediaLibrary", "beginGeneratingLibraryChangeNotifications"]:
+            return {"listeners": world.listeners + 1}
+        case ["MPMediaLibrary", "endGeneratingLibraryChangeNotifications"]:
+            return {"listeners": max(world.listeners - 1, 0)}
         case ["LSSManager", "getUsage:"] if world.answer == "hold":
             return {"held": world.held + 1}
         case ["LSSManager", "getUsage:"]:
