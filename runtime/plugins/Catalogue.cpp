@@ -43,10 +43,11 @@ class Reader {
 
     [[nodiscard]] std::uint32_t number(std::uint64_t place) const {
         require(place + numberSize <= bytes_.size());
+        const auto digits = bytes_.substr(static_cast<std::size_t>(place), numberSize);
         std::uint32_t value = 0;
         for (std::size_t index = 0; index < numberSize; ++index) {
             const auto next = isBigEndian_ ? index : numberSize - 1 - index;
-            const auto byte = static_cast<unsigned char>(bytes_[place + next]);
+            const auto byte = static_cast<unsigned char>(digits[next]);
             value = value << 8U | byte;
         }
         return value;
@@ -58,7 +59,7 @@ class Reader {
         const std::uint32_t length = number(entry);
         const std::uint32_t place = number(entry + numberSize);
         const std::uint64_t end = std::uint64_t{place} + length;
-        require(end < bytes_.size() && bytes_[end] == '\0');
+        require(end < bytes_.size() && bytes_[std::size_t{place} + length] == '\0');
         return bytes_.substr(place, length);
     }
 
