@@ -4,6 +4,7 @@
 
 #include "quorl-simulate/parts/SimulatedVolume.h"
 #include "quorl-syncd/transfer/device/Device.h"
+#include "services/wearable/ContentHash.h"
 #include "services/wearable/Generations.h"
 
 namespace quorl::simulation {
@@ -107,6 +108,10 @@ wearable::Usage SimulatedWearable::usage() const {
     }
     if (list.playlist) {
         static_cast<void>(count(*list.playlist));
+        const auto file = disk.find(music(), list.playlist->name);
+        if (!file || wearable::hashOf(disk.read(*file)) != list.playlist->hash) {
+            usage.sent.reset();
+        }
     }
     return usage;
 }

@@ -6,8 +6,8 @@
 #include <system_error>
 #include <utility>
 
-#include "quorl-syncd/transfer/ContentHash.h"
 #include "quorl-syncd/transfer/Stopped.h"
+#include "services/wearable/ContentHash.h"
 
 namespace quorl::syncd {
 
@@ -80,7 +80,7 @@ std::string Copier::copyContents(OpenSong& source, UnfinishedFile& destination,
                                  std::uint64_t size) {
     const bool isShared = destination.share(source.descriptor());
     const auto mostBytes = progress_.bytes + size;
-    ContentHash hash;
+    wearable::ContentHash hash;
     const auto memory = std::make_unique_for_overwrite<std::byte[]>(largestPiece);
     const std::span buffer(memory.get(), largestPiece);
     for (std::uint64_t copied = 0;;) {

@@ -6,7 +6,7 @@
 #include <unordered_map>
 #include <unordered_set>
 
-#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/FileHash.h"
 #include "quorl-syncd/transfer/device/DeviceNames.h"
 #include "quorl-syncd/transfer/songs/SongProblem.h"
 #include "services/base/Utf8.h"

@@ -7,7 +7,7 @@
 #include <system_error>
 #include <utility>
 
-#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/FileHash.h"
 #include "quorl-syncd/transfer/Messages.h"
 #include "quorl-syncd/transfer/Stopped.h"
 #include "quorl-syncd/transfer/SyncProblem.h"

@@ -9,6 +9,7 @@
 
 #include "services/base/AtomicFile.h"
 #include "services/base/FileStatus.h"
+#include "services/wearable/ContentHash.h"
 #include "services/wearable/Generations.h"
 
 namespace quorl::wearable {
@@ -47,6 +48,17 @@ std::uint64_t bytesBelow(const std::filesystem::path& root) {
     return bytes;
 }
 
+std::string pathOf(const Entry& entry) { return std::string{musicDirectory} + "/" + entry.name; }
+
+/// Somebody's own playlist may be as large as ours. What cannot be read is not as it was.
+bool hasContentsOf(int root, const Entry& playlist) {
+    try {
+        return hashOf(base::readFile(root, pathOf(playlist))) == playlist.hash;
+    } catch (const std::system_error&) {
+        return false;
+    }
+}
+
 /// What of a manifest is on the device, by the sizes of its files.
 struct Stock {
     std::uint64_t songBytes = 0;
@@ -57,10 +69,10 @@ struct Stock {
 Stock stockOf(int root, const Manifest& manifest) {
     Stock stock;
     const auto look = [root, &stock](const Entry& entry) -> std::optional<std::uint64_t> {
-        const auto path = std::string{musicDirectory} + "/" + entry.name;
         base::FileStatus status{};
-        const bool isThere = fstatat(root, path.c_str(), &status, AT_SYMLINK_NOFOLLOW) == 0 &&
-                             S_ISREG(status.st_mode);
+        const bool isThere =
+            fstatat(root, pathOf(entry).c_str(), &status, AT_SYMLINK_NOFOLLOW) == 0 &&
+            S_ISREG(status.st_mode);
         const auto bytes = isThere ? std::optional(base::stateOf(status).size) : std::nullopt;
         stock.isComplete = stock.isComplete && bytes == entry.size;
         return bytes;
@@ -72,6 +84,7 @@ Stock stockOf(int root, const Manifest& manifest) {
     }
     if (manifest.playlist) {
         static_cast<void>(look(*manifest.playlist));
+        stock.isComplete = stock.isComplete && hasContentsOf(root, *manifest.playlist);
     }
     return stock;
 }

@@ -20,8 +20,8 @@ struct Usage {
     std::uint64_t songs = 0;
     /// How many songs these are.
     std::uint64_t songCount = 0;
-    /// What was last sent to it in full; nothing where that is not known, or where a file of it is
-    /// gone or has another size.
+    /// What was last sent to it in full; nothing where that is not known, where a file of it is
+    /// gone or has another size, or where the playlist is not as it was.
     std::optional<Selection> sent = {};
 
     bool operator==(const Usage&) const = default;

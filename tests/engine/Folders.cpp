@@ -9,7 +9,7 @@
 #include <fcntl.h>
 #include <sys/stat.h>
 
-#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/FileHash.h"
 #include "quorl-syncd/transfer/device/PosixVolume.h"
 #include "quorl-syncd/transfer/pace/RateLimit.h"
 #include "quorl-syncd/transfer/pace/SteadyClock.h"

@@ -7,6 +7,7 @@
 #include <sys/mount.h>
 #include <sys/statvfs.h>
 
+#include "services/wearable/ContentHash.h"
 #include "services/wearable/Generations.h"
 #include "tests/base/TemporaryDirectory.h"
 
@@ -58,7 +59,7 @@ class SentTo : public ::testing::Test {
         device_.write(
             ".quorl/manifest.1",
             generationText(1, {.songs = {{"a.mp3", "a", 100, 0, ""}, {"b.mp3", "b", 200, 0, ""}},
-                               .playlist = Entry{"List.m3u8", "List", 6, 0, ""},
+                               .playlist = Entry{"List.m3u8", "List", 6, 0, hashOf("a list")},
                                .strays = {},
                                .sent = sent_}));
     }
@@ -90,6 +91,12 @@ TEST_F(SentTo, DoesNotSayThatAllWasSentOnceASongIsCutOff) {
 
 TEST_F(SentTo, DoesNotSayThatAllWasSentOnceThePlaylistIsGone) {
     device_.remove("Music/List.m3u8");
+
+    EXPECT_EQ(usage().sent, std::nullopt);
+}
+
+TEST_F(SentTo, DoesNotSayThatAllWasSentOnceSomebodyElsesPlaylistIsInItsPlace) {
+    device_.write("Music/List.m3u8", "theirs");
 
     EXPECT_EQ(usage().sent, std::nullopt);
 }

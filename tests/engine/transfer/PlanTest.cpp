@@ -8,7 +8,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "quorl-syncd/transfer/ContentHash.h"
+#include "quorl-syncd/transfer/FileHash.h"
 #include "quorl-syncd/transfer/Stopped.h"
 #include "quorl-syncd/transfer/songs/SongProblem.h"
 

@@ -3,15 +3,12 @@
 #include <cstddef>
 #include <memory>
 #include <span>
-#include <stop_token>
 #include <string>
 #include <string_view>
 
-#include "quorl-syncd/transfer/Reader.h"
-
 struct XXH3_state_s;
 
-namespace quorl::syncd {
+namespace quorl::wearable {
 
 /// Tells contents of files apart: XXH3 with 128 bits. Does not withstand somebody who looks for two
 /// contents with the same hash.
@@ -34,7 +31,4 @@ class ContentHash {
 
 [[nodiscard]] std::string hashOf(std::string_view text);
 
-/// Of everything that is left to read. Throws `Stopped` soon after `stop` was requested.
-[[nodiscard]] std::string hashOf(Reader& reader, const std::stop_token& stop);
-
-} // namespace quorl::syncd
+} // namespace quorl::wearable

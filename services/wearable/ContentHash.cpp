@@ -1,13 +1,11 @@
-#include "quorl-syncd/transfer/ContentHash.h"
+#include "services/wearable/ContentHash.h"
 
 #include <array>
 #include <new>
 
 #include <xxhash.h>
 
-#include "quorl-syncd/transfer/Stopped.h"
-
-namespace quorl::syncd {
+namespace quorl::wearable {
 
 void ContentHash::Free::operator()(XXH3_state_s* state) const { XXH3_freeState(state); }
 
@@ -39,19 +37,4 @@ std::string hashOf(std::string_view text) {
     return hash.text();
 }
 
-std::string hashOf(Reader& reader, const std::stop_token& stop) {
-    constexpr std::size_t pieceSize = 1 << 20;
-    ContentHash hash;
-    const auto memory = std::make_unique_for_overwrite<std::byte[]>(pieceSize);
-    const std::span buffer(memory.get(), pieceSize);
-    for (;;) {
-        stopIf(stop);
-        const auto size = reader.read(buffer);
-        if (size == 0) {
-            return hash.text();
-        }
-        hash.add(buffer.first(size));
-    }
-}
-
-} // namespace quorl::syncd
+} // namespace quorl::wearable

@@ -1,0 +1,25 @@
+#include "quorl-syncd/transfer/FileHash.h"
+
+#include <memory>
+#include <span>
+
+#include "quorl-syncd/transfer/Stopped.h"
+
+namespace quorl::syncd {
+
+std::string hashOf(Reader& reader, const std::stop_token& stop) {
+    constexpr std::size_t pieceSize = 1 << 20;
+    wearable::ContentHash hash;
+    const auto memory = std::make_unique_for_overwrite<std::byte[]>(pieceSize);
+    const std::span buffer(memory.get(), pieceSize);
+    for (;;) {
+        stopIf(stop);
+        const auto size = reader.read(buffer);
+        if (size == 0) {
+            return hash.text();
+        }
+        hash.add(buffer.first(size));
+    }
+}
+
+} // namespace quorl::syncd

@@ -1,0 +1,16 @@
+#pragma once
+
+#include <stop_token>
+#include <string>
+
+#include "quorl-syncd/transfer/Reader.h"
+#include "services/wearable/ContentHash.h"
+
+namespace quorl::syncd {
+
+using wearable::hashOf;
+
+/// Of everything that is left to read. Throws `Stopped` soon after `stop` was requested.
+[[nodiscard]] std::string hashOf(Reader& reader, const std::stop_token& stop);
+
+} // namespace quorl::syncd
