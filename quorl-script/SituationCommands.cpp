@@ -349,11 +349,11 @@ Json clock(Stage& stage, const Field& command) {
     const Field by = command["by"];
     const Field tick = command["tick"];
     const std::chrono::nanoseconds shift(by.isGiven() ? by.seconds() : 0);
-    const auto everyReading = tick.isGiven() ? std::optional(tick.seconds()) : std::nullopt;
+    const std::chrono::nanoseconds everyReading(tick.isGiven() ? tick.seconds() : 0);
 
     stage.host.clock.moveBy(shift);
-    if (everyReading) {
-        stage.host.clock.setTick(std::chrono::nanoseconds(*everyReading));
+    if (tick.isGiven()) {
+        stage.host.clock.setTick(everyReading);
     }
     return nullptr;
 }

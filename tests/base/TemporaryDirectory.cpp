@@ -78,7 +78,8 @@ void TemporaryDirectory::remove(std::string_view file) const {
 
 void TemporaryDirectory::setModified(std::string_view file, std::int64_t nanoseconds) const {
     constexpr std::int64_t second = 1'000'000'000;
-    const timespec time{nanoseconds / second, nanoseconds % second};
+    using Rest = decltype(timespec::tv_nsec); // of 32 bits on some machines
+    const timespec time{nanoseconds / second, static_cast<Rest>(nanoseconds % second)};
     const timespec times[] = {time, time};
     check(utimensat(AT_FDCWD, (path_ / file).c_str(), times, 0));
 }
