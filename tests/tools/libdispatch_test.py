@@ -9,8 +9,8 @@ import unittest
 
 TOOL = pathlib.Path(__file__).resolve().parents[2] / "tools" / "libdispatch"
 
-NEEDED = """awk bash cut cp find flock getent id install mkdir mktemp mv nproc rm sed sha256sum sort tar
-    uname xz""".split()
+NEEDED = """awk bash cut cp dirname find flock getent id install mkdir mktemp mv nproc readlink rm sed
+    sha256sum sort tar uname xz""".split()
 
 MIRROR = 'echo "$(sed -n s/^VERSION_CODENAME=//p /etc/os-release) main http://mirror.invalid/debian"'
 DOWNLOAD = f"""case $* in

@@ -1,0 +1,67 @@
+"""tools/sysroot and tools/emulate where they cannot do what they are asked for."""
+
+import os
+import pathlib
+import shutil
+import subprocess
+import tempfile
+import unittest
+
+TOOLS = pathlib.Path(__file__).resolve().parents[2] / "tools"
+NEEDED = "awk bash cat cut diff dirname flock getent id mkdir mv readlink rm sed sort touch xargs".split()
+
+
+class OtherMachines(unittest.TestCase):
+    def setUp(self):
+        temporary = tempfile.TemporaryDirectory()
+        self.addCleanup(temporary.cleanup)
+        self.cache = pathlib.Path(temporary.name) / "cache"
+        self.path = pathlib.Path(temporary.name) / "path"
+        self.path.mkdir()
+        for name in NEEDED:
+            os.symlink(shutil.which(name), self.path / name)
+        apt = self.path / "apt-get"
+        apt.write_text('#!/bin/bash\n[[ $1 == indextargets ]] && echo "bookworm main http://mirror.invalid/debian"\n')
+        apt.chmod(0o755)
+
+    def run_tool(self, name, *arguments):
+        return subprocess.run(
+            [TOOLS / name, *arguments], capture_output=True, text=True,
+            env={"PATH": str(self.path), "XDG_CACHE_HOME": str(self.cache), "HOME": "/nonexistent"})
+
+    def test_only_asked_for_its_folder_makes_nothing(self):
+        result = self.run_tool("sysroot", "armhf", "--prefix")
+        self.assertEqual((result.stdout, result.returncode), (f"{self.cache}/quorl/sysroot-armhf\n", 0))
+        self.assertFalse(self.cache.exists())
+
+    def test_a_kind_of_machine_that_is_unknown_is_told_with_those_that_are_not(self):
+        for arguments in ([], ["riscv64"]):
+            result = self.run_tool("sysroot", *arguments)
+            self.assertEqual(result.returncode, 1)
+            self.assertIn("Say armhf, arm64 or i386.", result.stderr)
+
+    def test_where_nothing_can_be_fetched_nothing_is_kept(self):
+        result = self.run_tool("sysroot", "armhf")
+        self.assertEqual((result.stdout, result.returncode), ("", 1))
+        self.assertIn("Check the network", result.stderr)
+        self.assertEqual(sorted(path.name for path in self.cache.rglob("*")), ["quorl", "sysroot.lock"])
+
+    def test_what_is_there_already_is_only_named(self):
+        folder = self.cache / "quorl" / "sysroot-arm64"
+        folder.mkdir(parents=True)
+        wanted = subprocess.run(
+            ["awk", '($1 == "build" || $1 == "test") && $2 ~ /-dev$/ || $1 == "sysroot" { print $2 }',
+             TOOLS.parent / "packages.txt"], capture_output=True, text=True, check=True).stdout
+        (folder / "packages").write_text(wanted)
+        result = self.run_tool("sysroot", "arm64")
+        self.assertEqual((result.stdout, result.returncode), (f"{folder}\n", 0))
+
+    def test_a_command_is_needed_to_be_run_elsewhere(self):
+        for arguments in ([], ["armhf"], ["riscv64", "true"]):
+            result = subprocess.run([TOOLS / "emulate", *arguments], capture_output=True, text=True)
+            self.assertEqual(result.returncode, 1)
+            self.assertIn("Say for instance: tools/emulate armhf true", result.stderr)
+
+
+if __name__ == "__main__":
+    unittest.main()
