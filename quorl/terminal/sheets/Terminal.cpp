@@ -61,6 +61,7 @@ void Terminal::enter() {
     mode.c_lflag &= ~static_cast<tcflag_t>(ICANON | ECHO);
     mode.c_cc[VMIN] = 1;
     mode.c_cc[VTIME] = 0;
+    errors_.hold();
     tcsetattr(STDIN_FILENO, TCSADRAIN, &mode); // what has been typed already is kept
     sendIfThere("smcup");
     sendIfThere("rmam");
@@ -77,6 +78,7 @@ void Terminal::leave() {
     sendIfThere("rmcup");
     std::fflush(stdout);
     tcsetattr(STDIN_FILENO, TCSADRAIN, &before_);
+    errors_.release();
 }
 
 Terminal::Size Terminal::size() const {

@@ -5,10 +5,13 @@
 
 #include <termios.h>
 
+#include "quorl/terminal/sheets/HeldErrors.h"
+
 namespace quorl {
 
 /// The terminal of this process, where it can be written anywhere. While it is entered it shows
-/// what is typed not by itself, and none of what was on it before. Main thread.
+/// what is typed not by itself, none of what was on it before, and nothing of what is said on
+/// standard error until it is left. Main thread.
 class Terminal {
   public:
     struct Size {
@@ -49,6 +52,7 @@ class Terminal {
 
     const termios before_;
     bool isEntered_ = false;
+    HeldErrors errors_;
 };
 
 } // namespace quorl
