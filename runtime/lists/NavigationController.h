@@ -24,8 +24,8 @@ class NavigationController : public PSRootController {
         Beside, ///< It stays on the screen, beside the top pane.
     };
 
-    /// Tells the root pane where it comes on the screen by that, or leaves it, while the stack is on
-    /// the screen. `Below` at first.
+    /// Tells the root pane where it comes on the screen by that, or leaves it; nothing while the
+    /// stack is off the screen. `Below` at first.
     void setRootPlace(RootPlace place);
 
     [[nodiscard]] RootPlace rootPlace() const { return rootPlace_; }
