@@ -1,0 +1,1 @@
+"""The parts of ./mutate, which says what each is for."""
