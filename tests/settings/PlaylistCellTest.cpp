@@ -41,11 +41,24 @@ TEST_F(PlaylistCell, KeepsTheStandardLayoutUnroundedWhereTheStatusFits) {
     EXPECT_THAT(placed_, IsEmpty());
 }
 
-TEST_F(PlaylistCell, KeepsTheStandardLayoutWhereTheStatusFitsExactly) {
-    layOut({16, 12, 180, 20}, {200, 12, 100, 20}, 100);
+TEST_F(PlaylistCell, KeepsTheStandardLayoutUnroundedWhereTheStatusFitsExactly) {
+    const CGRect standardTitle{16.25F, 12.5F, 50.75F, 20.25F};
+    const CGRect standardDetail{70.25F, 12.5F, 60.5F, 20.25F};
 
-    EXPECT_EQ(title(), (CGRect{16, 12, 180, 20}));
-    EXPECT_EQ(detail(), (CGRect{200, 12, 100, 20}));
+    layOut(standardTitle, standardDetail, 60.5F);
+
+    EXPECT_EQ(title(), standardTitle);
+    EXPECT_EQ(detail(), standardDetail);
+    EXPECT_THAT(placed_, IsEmpty());
+}
+
+TEST_F(PlaylistCell, TakesFromTheNameLessThanAPoint) {
+    scale_ = 2;
+
+    layOut({16, 12, 180, 20}, {200, 12, 60, 20}, 60.5F);
+
+    EXPECT_EQ(detail(), (CGRect{199.5F, 12, 60.5F, 20}));
+    EXPECT_EQ(title(), (CGRect{16, 12, 179.5F, 20}));
 }
 
 TEST_F(PlaylistCell, TakesFromTheNameWhatTheStatusLacks) {

@@ -46,6 +46,7 @@ std::vector<std::string> TablePaneTest::checkedRows() const {
 void TablePaneTest::expectForwardingToParent() {
     const auto parent = ::create<Parent>();
     controller_->showController(nullptr); // without a parent nothing happens
+    controller_->showController_animate(nullptr, true);
     controller_->handleURL("quorl:nowhere");
     controller_->setParentController(parent.get());
     host_->journal.clear();
