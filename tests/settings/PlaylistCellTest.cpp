@@ -31,25 +31,16 @@ class PlaylistCell : public testing::Test {
 };
 
 TEST_F(PlaylistCell, KeepsTheStandardLayoutUnroundedWhereTheStatusFits) {
-    const CGRect standardTitle{16.25F, 12.5F, 100.75F, 20.25F};
-    const CGRect standardDetail{200.25F, 12.5F, 60.5F, 20.25F};
-
-    layOut(standardTitle, standardDetail, 60);
-
-    EXPECT_EQ(title(), standardTitle);
-    EXPECT_EQ(detail(), standardDetail);
-    EXPECT_THAT(placed_, IsEmpty());
-}
-
-TEST_F(PlaylistCell, KeepsTheStandardLayoutUnroundedWhereTheStatusFitsExactly) {
     const CGRect standardTitle{16.25F, 12.5F, 50.75F, 20.25F};
     const CGRect standardDetail{70.25F, 12.5F, 60.5F, 20.25F};
 
-    layOut(standardTitle, standardDetail, 60.5F);
+    for (const CGFloat needed : {60.0F, 60.5F}) {
+        layOut(standardTitle, standardDetail, needed);
 
-    EXPECT_EQ(title(), standardTitle);
-    EXPECT_EQ(detail(), standardDetail);
-    EXPECT_THAT(placed_, IsEmpty());
+        EXPECT_EQ(title(), standardTitle);
+        EXPECT_EQ(detail(), standardDetail);
+        EXPECT_THAT(placed_, IsEmpty());
+    }
 }
 
 TEST_F(PlaylistCell, TakesFromTheNameLessThanAPoint) {

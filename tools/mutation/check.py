@@ -11,7 +11,7 @@ import random
 import threading
 import time
 
-from .build import Build, Copy, Preambles
+from .build import Build, BuildError, Copy, Preambles
 from .edits import Edit, edits_of
 from .plan import Entry, ListError, Suite
 from .trials import SCRIPTS, Outcome, Tests, Verdict, program_of
@@ -109,6 +109,8 @@ class Results:
 
     def _files_of_tests(self, suite: Suite) -> list[pathlib.Path]:
         files = [self._build.folder / "bin" / program_of(test) for test in suite.tests]
+        if missing := [file.name for file in files if not file.exists()]:
+            raise BuildError(f"{self._build.folder} has no {', '.join(missing)}: build it whole, or say no --build.")
         return files + sorted((self._build.root / "tests/scenarios").glob("*.*") if SCRIPTS in suite.tests else [])
 
 

@@ -3,10 +3,10 @@
 import collections.abc
 import dataclasses
 import enum
-import importlib.util
 import math
 import os
 import pathlib
+import runpy
 import signal
 import subprocess
 import threading
@@ -145,8 +145,8 @@ class Tests:
         return ["prlimit", f"--cpu={math.ceil(run.limit)}", "--core=0", *memory]
 
 
-def replies_as_expected(play: types.ModuleType, program: str, script: str, succeeded: bool, output: bytes) -> bool:
-    """What play.py, the module given, finds; but of one run."""
+def replies_as_expected(play: types.SimpleNamespace, program: str, script: str, succeeded: bool, output: bytes) -> bool:
+    """What play.py, which is given, finds; but of one run."""
     expected = play.lines(play.expected_file(program, script))
     has_errors = any('"ok":false' in reply for reply in expected)
     try:
@@ -156,12 +156,9 @@ def replies_as_expected(play: types.ModuleType, program: str, script: str, succe
         return False
 
 
-def loaded(path: pathlib.Path) -> types.ModuleType:
-    """The module of a file."""
-    specification = importlib.util.spec_from_file_location(path.stem, path)
-    module = importlib.util.module_from_spec(specification)
-    specification.loader.exec_module(module)
-    return module
+def loaded(path: pathlib.Path) -> types.SimpleNamespace:
+    """What a file of Python defines."""
+    return types.SimpleNamespace(**runpy.run_path(str(path)))
 
 
 def program_of(test: str) -> str:
