@@ -32,6 +32,44 @@ class LimitChooser : public TablePaneTest {
     }
 };
 
+/// A table with nothing on the screen, which notes what it is asked for.
+class EmptyTable final : public UITableView {
+  public:
+    [[nodiscard]] std::shared_ptr<UITableViewCell>
+    dequeueReusableCellWithIdentifier(std::string_view /*identifier*/) override {
+        return nullptr;
+    }
+
+    [[nodiscard]] std::shared_ptr<UITableViewCell>
+    cellForRowAtIndexPath(const NSIndexPath& path) const override {
+        note("cell", path);
+        return nullptr;
+    }
+
+    void reloadData() override { asked_.emplace_back("reload"); }
+
+    void reloadRowsAtIndexPaths_withRowAnimation(const std::vector<NSIndexPath>& paths,
+                                                 UITableViewRowAnimation /*animation*/) override {
+        for (const NSIndexPath& path : paths) {
+            note("reload", path);
+        }
+    }
+
+    void deselectRowAtIndexPath_animated(const NSIndexPath& path, bool /*animated*/) override {
+        note("deselect", path);
+    }
+
+    [[nodiscard]] const std::vector<std::string>& asked() const { return asked_; }
+
+  private:
+    void note(const std::string& what, const NSIndexPath& path) const {
+        asked_.push_back(what + " " + std::to_string(path.section) + "." +
+                         std::to_string(path.row));
+    }
+
+    mutable std::vector<std::string> asked_;
+};
+
 const NSIndexPath storageRow = row(0, 0);
 const NSIndexPath songsRow = row(1, 0);
 
@@ -52,8 +90,9 @@ TEST_F(LimitChooser, IsAGroupedTableWithItsTitle) {
 TEST_F(LimitChooser, ReadsTypeAndAmountAndRedrawsWhenItAppears) {
     show(1, 50);
 
-    EXPECT_THAT(host_->journal.lines({"read", "table"}),
-                ElementsAre("read assetSyncLimitType", "read assetSyncLimit", "table"));
+    EXPECT_THAT(
+        host_->journal.lines({"appear", "read", "table"}),
+        ElementsAre("appear at once", "read assetSyncLimitType", "read assetSyncLimit", "table"));
 }
 
 TEST_F(LimitChooser, IsNotThereWithoutAHost) {
@@ -87,6 +126,8 @@ TEST_F(LimitChooser, TakesAMissingAmountForZero) {
     show(0, std::nullopt);
 
     EXPECT_THAT(checkedRows(), ElementsAre("Storage"));
+    tapRow(storageRow);
+    EXPECT_THAT(writes(), ElementsAre("write assetSyncLimit 0", "write assetSyncLimitType 0"));
 }
 
 TEST_F(LimitChooser, ShowsStoragePresetsAsSongsForATypeThatIsNeither) {
@@ -246,6 +287,26 @@ TEST_F(LimitChooser, ShowsTheCheckmarkOfAnAmountThatWasTappedOffScreenOnceItCome
     setRowsOnScreen(6);
     draw();
     EXPECT_THAT(checkedRows(), ElementsAre("Songs", "125 Songs"));
+}
+
+TEST_F(LimitChooser, LooksAtTheFourAmountsWhenOneIsTapped) {
+    show(1, 50);
+    EmptyTable tableView;
+
+    table_->tableView_didSelectRowAtIndexPath(tableView, row(2, 1));
+
+    EXPECT_THAT(tableView.asked(),
+                ElementsAre("cell 1.0", "cell 1.1", "cell 1.2", "cell 1.3", "deselect 1.2"));
+}
+
+TEST_F(LimitChooser, LooksAtTheTappedKindThenAtTheOtherAndReloadsTheAmounts) {
+    show(1, 50);
+    EmptyTable tableView;
+
+    table_->tableView_didSelectRowAtIndexPath(tableView, storageRow);
+
+    EXPECT_THAT(tableView.asked(), ElementsAre("cell 0.0", "cell 0.1", "reload 1.0", "reload 1.1",
+                                               "reload 1.2", "reload 1.3", "deselect 0.0"));
 }
 
 TEST_F(LimitChooser, ShowsWhatWasChangedElsewhereWhenTheAppBecomesActive) {

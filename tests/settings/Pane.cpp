@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "runtime/lists/ListView.h"
+#include "runtime/plugins/StringTable.h"
 #include "sync/LMQuorlSyncManager.h"
 
 namespace quorl::tests {
@@ -23,6 +24,18 @@ ListView::Row rowOf(const NavigationController& navigation, const std::string& t
 }
 
 } // namespace
+
+std::shared_ptr<PaneHost> PaneHost::installed() {
+    auto host = std::make_shared<PaneHost>();
+    install(host);
+    return host;
+}
+
+std::optional<std::string> PaneHost::textForKey(const StringTable& table, const std::string& key,
+                                                const std::optional<std::string>& value) {
+    EXPECT_EQ(table.text({"en"}, StringTable::defaultDomain, key), value);
+    return TestHost::textForKey(table, key, value);
+}
 
 PaneTest::PaneTest() : morning_(host_->mediaLibrary().addPlaylist(7, "Morning")) {
     morning_->setRevision(1);

@@ -9,6 +9,17 @@
 
 namespace quorl::tests {
 
+/// A test host for the plug-in alone: each text that is asked for comes with the English of the
+/// plug-in's own table, or the test fails.
+class PaneHost final : public TestHost {
+  public:
+    [[nodiscard]] static std::shared_ptr<PaneHost> installed();
+
+    [[nodiscard]] std::optional<std::string>
+    textForKey(const StringTable& table, const std::string& key,
+               const std::optional<std::string>& value) override;
+};
+
 /// The Music pane on a test host, as its user meets it: with sync off, no session and one playlist
 /// "Morning" (id 7, revision 1, no songs) in the library.
 class PaneTest : public testing::Test {
@@ -56,7 +67,7 @@ class PaneTest : public testing::Test {
         NSNotificationCenter::defaultCenter().postNotificationName_object(name, nullptr);
     }
 
-    std::shared_ptr<TestHost> host_ = TestHost::installed();
+    std::shared_ptr<PaneHost> host_ = PaneHost::installed();
     std::shared_ptr<PlaylistDouble> morning_;
     std::shared_ptr<NavigationController> navigation_ = ::create<NavigationController>();
     std::shared_ptr<LMQuorlSettingsController> pane_;

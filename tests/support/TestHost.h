@@ -9,7 +9,7 @@ namespace quorl::tests {
 /// of the present, whose wearable replies when the test has it reply. The process-wide objects of
 /// the plug-in keep to the host that was there when they were made, so each test runs in a process
 /// of its own, as ctest does it.
-class TestHost final : public HostDouble {
+class TestHost : public HostDouble {
   public:
     TestHost();
 

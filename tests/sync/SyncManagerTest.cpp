@@ -6,6 +6,7 @@
 
 #include <gmock/gmock.h>
 
+#include "platform/Dispatch.h"
 #include "platform/UserInterface.h"
 #include "sync/LMQuorlSyncManager.h"
 #include "tests/support/TestHost.h"
@@ -565,6 +566,61 @@ TEST_F(SyncManager, LeavesTheOldSessionsAndJoinsTheNewOnesWhenTheyChange) {
     EXPECT_EQ(manager().syncStage(), LMQuorlSyncStageSyncing);
     drain();
     EXPECT_EQ(posts(), 1U);
+}
+
+/// A host whose only session answers whoever joins it with work of its own on the main queue.
+class AnsweringHost final : public quorl::HostDouble {
+  public:
+    [[nodiscard]] NSArray<DVSession> sessions(const std::string& /*type*/) override {
+        return std::make_shared<std::vector<std::shared_ptr<DVSession>>>(1, session_);
+    }
+
+    /// What has come to the main queue, in this order.
+    [[nodiscard]] static std::vector<std::string>& arrived() {
+        static std::vector<std::string> all;
+        return all;
+    }
+
+  private:
+    class Session final : public quorl::ObservedSession {
+      public:
+        void addObserver(const std::shared_ptr<DVSessionObserver>& observer) override {
+            ObservedSession::addObserver(observer);
+            dispatch_async(dispatch_get_main_queue(), [] { arrived().emplace_back("answer"); });
+        }
+
+        [[nodiscard]] bool isFinished() const override { return false; }
+
+        [[nodiscard]] NSArray<DVSessionTask> sessionTasks() const override { return nullptr; }
+
+        [[nodiscard]] NSArray<DVSessionTask>
+        sessionTasksWithGroupingKey(const std::string& /*key*/) const override {
+            return nullptr;
+        }
+    };
+
+    std::shared_ptr<Session> session_ = create<Session>();
+};
+
+/// Notes that a status has come.
+class Arrivals : public NSObject {
+  public:
+    void statusDidChange(const NSNotification& /*notification*/) {
+        AnsweringHost::arrived().emplace_back("status");
+    }
+};
+
+TEST_F(SyncManager, JoinsTheNewSessionsBeforeItQueuesItsPost) {
+    quorl::Host::install(std::make_shared<AnsweringHost>());
+    const auto arrivals = create<Arrivals>();
+    NSNotificationCenter::defaultCenter().addObserver_selector_name_object(
+        arrivals.get(), NSNotificationSelector::of<&Arrivals::statusDidChange>("statusDidChange:"),
+        LMQuorlSyncStatusDidChangeNotification, nullptr);
+
+    (void)LMQuorlSyncManager::sharedManager();
+    drain();
+
+    EXPECT_THAT(AnsweringHost::arrived(), ElementsAre("answer", "status"));
 }
 
 TEST_F(SyncManager, KnowsANewSessionOnlyOnceItIsAnnounced) {
