@@ -38,6 +38,13 @@ int sum(int, int);
 int product(int, int);
 int main() { return sum(1, 2) == 3 && product(2, 3) == 6 ? 0 : 1; }
 """
+BRANCHING_PRODUCT = """int product(int left, int right) {
+    if (left == 0)
+        return 0;
+    return left * right;
+}
+"""
+TEST_OF_SUMS = "int sum(int, int);\nint main() { return sum(1, 2) == 3 ? 0 : 1; }\n"
 LENIENT_TEST = STRICT_TEST.replace("sum(1, 2) == 3", "sum(0, 0) == 0")
 SUITES = """
 [[suite]]
@@ -284,6 +291,27 @@ class Check(unittest.TestCase):
         self.assertIn("seed of the sample is 7", results[0].stdout)
         self.assertFound(results[0], 0, ("static", 2, 2, 0, 0, 0, 0))
         self.assertNotIn("shared", results[0].stdout)
+
+    def build_counting(self, test):
+        self.write("build/tiny/build.ninja", NINJA.format(root=self.root).replace("c++ ", "c++ --coverage "))
+        self.build_with(test)
+
+    def test_what_the_tests_reach_is_told(self):
+        self.write("static/Product.cpp", BRANCHING_PRODUCT)
+        self.build_counting(STRICT_TEST)
+        result = self.check("--coverage")
+        self.assertEqual(result.returncode, 0, result.stderr)
+        rows = [line.split() for line in result.stdout.splitlines()]
+        self.assertIn(["shared", "100.0", "%", "none"], rows)
+        self.assertIn(["static", "75.0", "%", "50.0", "%"], rows)
+
+    def test_an_edit_is_tried_on_tests_that_reach_its_line_while_its_source_stays_the_same(self):
+        self.build_counting(TEST_OF_SUMS)
+        self.check("--coverage")
+        self.build_with(STRICT_TEST)
+        self.assertFound(self.check("--all"), 1, ("shared", 2, 2, 0, 0, 0, 0), ("static", 2, 0, 0, 2, 0, 0))
+        self.write("static/Product.cpp", f"// Of two.\n{PRODUCT}")
+        self.assertFound(self.check("--all"), 0, ("static", 2, 2, 0, 0, 0, 0))
 
     def test_the_report_is_written_to_a_file_too(self):
         self.check("--all", "--report", self.root / "report")

@@ -12,6 +12,7 @@ import threading
 import time
 
 from .build import Build, BuildError, Copy, Preambles
+from .coverage import Reach
 from .edits import Edit, edits_of
 from .plan import Entry, ListError, Suite
 from .trials import SCRIPTS, Outcome, Tests, Verdict, program_of
@@ -136,9 +137,10 @@ def sample(suites: list[Suite], sources: Sources, seed: int) -> collections.abc.
 class Check:
     """Tries edits until none is left or the time is over."""
 
-    def __init__(self, build: Build, sources: Sources, folder: pathlib.Path) -> None:
+    def __init__(self, build: Build, sources: Sources, reach: Reach, folder: pathlib.Path) -> None:
         self._build = build
         self._sources = sources
+        self._reach = reach
         self._folder = folder
         self._preambles = Preambles(build, folder / "preambles")
         self._tests = Tests(build)
@@ -181,5 +183,7 @@ class Check:
 
     def _try_edit(self, copy: Copy, suite: Suite, edit: Edit, content: bytes) -> Tried:
         began = time.monotonic()
-        verdict = self._tests.try_edit(copy, edit.source, edit.applied(content), suite.tests)
+        tests = self._reach.tests_of(edit, content, suite.tests)
+        verdict = (self._tests.try_edit(copy, edit.source, edit.applied(content), tests) if tests
+                   else Verdict(Outcome.SURVIVED))
         return Tried(suite, edit, verdict, time.monotonic() - began)

@@ -44,3 +44,18 @@ def table(suites: list[Suite], tried: list[Tried], equivalent: dict[str, int]) -
         of_suite = [one for one in tried if one.suite == suite]
         lines.append(row(suite.name, of_suite, equivalent[suite.name]))
     return "\n".join(lines)
+
+
+def coverage_table(suites: list[Suite], files: dict[str, dict]) -> str:
+    """A line for each suite, of gcovr's summaries of its sources."""
+    rows = ["".join(("".ljust(WIDTH), *(title.rjust(WIDTH) for title in ("lines", "branches"))))]
+    for suite in suites:
+        of_suite = [files[source] for source in suite.sources if source in files]
+        shares = (share(sum(file[f"{kind}_covered"] for file in of_suite),
+                        sum(file[f"{kind}_total"] for file in of_suite)) for kind in ("line", "branch"))
+        rows.append("".join((suite.name.ljust(WIDTH), *(text.rjust(WIDTH) for text in shares))))
+    return "\n".join(rows)
+
+
+def share(covered: int, total: int) -> str:
+    return f"{100 * covered / total:.1f} %" if total else "none"

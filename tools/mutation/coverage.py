@@ -1,0 +1,85 @@
+"""Which lines and branches of the sources the tests reach, and which test reaches which line."""
+
+import dataclasses
+import hashlib
+import json
+import pathlib
+import subprocess
+
+from .build import Build, BuildError
+from .edits import Edit
+from .plan import Suite
+from .trials import Tests
+
+DIGESTS = "digests"
+"""Beside the tracefiles: of each source, what it was when they were made."""
+
+
+def digest(source: pathlib.Path) -> str:
+    return hashlib.sha256(source.read_bytes()).hexdigest()
+
+
+def gcovr(build: Build, *options: str) -> str:
+    # A branch to where an exception is caught is the compiler's own, and no decision.
+    done = subprocess.run(["gcovr", "--root", build.root, "--exclude-throw-branches",
+                           "--exclude-unreachable-branches", *options],
+                          cwd=build.folder, capture_output=True, text=True, check=False)
+    if done.returncode != 0:
+        raise BuildError(f"gcovr cannot tell what the tests reach:\n{done.stderr}")
+    return done.stdout
+
+
+def measure(build: Build, suites: list[Suite], folder: pathlib.Path) -> dict[str, dict]:
+    """Runs the tests of the suites in a build that counts, keeps in `folder` what each reaches, and returns
+    gcovr's summary of each source."""
+    folder.mkdir(parents=True, exist_ok=True)
+    for old in folder.iterdir():
+        old.unlink()
+    sources = sorted({source for suite in suites for source in suite.sources})
+    tests = sorted({test for suite in suites for test in suite.tests})
+    (folder / DIGESTS).write_text(json.dumps({source: digest(build.root / source) for source in sources}))
+    runner = Tests(build)
+    objects = sorted({str((build.folder / build.object_of(source)).parent) for source in sources})
+    filters = [option for source in sources for option in ("--filter", f"{build.root / source}".replace("+", r"\+"))]
+    for counted in build.folder.rglob("*.gcda"):
+        counted.unlink()
+    for test in tests:
+        runner.run_unedited(test)
+        gcovr(build, "--delete", "--json", str(folder / f"{test}.json"), *filters, *objects)
+    tracefiles = [option for test in tests for option in ("--add-tracefile", str(folder / f"{test}.json"))]
+    summary = json.loads(gcovr(build, *tracefiles, "--json-summary"))
+    return {file["filename"]: file for file in summary["files"]}
+
+
+@dataclasses.dataclass(frozen=True)
+class Reach:
+    """Which tests reach each line of each source that was measured as it is now."""
+
+    lines: dict[str, dict[int, set[str]]]
+
+    def tests_of(self, edit: Edit, content: bytes, tests: list[str]) -> list[str]:
+        """Those of `tests` that come to an edit; all where nothing is known of its lines."""
+        first = content.count(b"\n", 0, edit.start) + 1
+        last = content.count(b"\n", 0, edit.end) + 1
+        known = self.lines.get(edit.source, {})
+        reached = [known[line] for line in range(first, last + 1) if line in known]
+        return [test for test in tests if not reached or any(test in by for by in reached)]
+
+
+def reach(root: pathlib.Path, folder: pathlib.Path) -> Reach:
+    """What was kept in `folder`; nothing where nothing was."""
+    if not (folder / DIGESTS).exists():
+        return Reach({})
+    digests = json.loads((folder / DIGESTS).read_text())
+    lines: dict[str, dict[int, set[str]]] = {}
+    for path in folder.glob("*.json"):
+        for file in json.loads(path.read_text())["files"]:
+            source = file["file"]
+            if not (root / source).exists() or digests.get(source) != digest(root / source):
+                continue
+            of_source = lines.setdefault(source, {})
+            for line in file["lines"]:
+                tests = of_source.setdefault(line["line_number"], set())
+                if line["count"] > 0:
+                    tests.add(path.stem)
+    return Reach(lines)
