@@ -8,6 +8,7 @@ namespace {
 
 using quorl::SyncPreference;
 using quorl::tests::checked;
+using quorl::tests::EmptyTable;
 using quorl::tests::row;
 using quorl::tests::TablePaneTest;
 using testing::ElementsAre;
@@ -30,44 +31,6 @@ class LimitChooser : public TablePaneTest {
     static std::string size(std::uint64_t bytes) {
         return CPFSSizeStrings(static_cast<float>(bytes));
     }
-};
-
-/// A table with nothing on the screen, which notes what it is asked for.
-class EmptyTable final : public UITableView {
-  public:
-    [[nodiscard]] std::shared_ptr<UITableViewCell>
-    dequeueReusableCellWithIdentifier(std::string_view /*identifier*/) override {
-        return nullptr;
-    }
-
-    [[nodiscard]] std::shared_ptr<UITableViewCell>
-    cellForRowAtIndexPath(const NSIndexPath& path) const override {
-        note("cell", path);
-        return nullptr;
-    }
-
-    void reloadData() override { asked_.emplace_back("reload"); }
-
-    void reloadRowsAtIndexPaths_withRowAnimation(const std::vector<NSIndexPath>& paths,
-                                                 UITableViewRowAnimation /*animation*/) override {
-        for (const NSIndexPath& path : paths) {
-            note("reload", path);
-        }
-    }
-
-    void deselectRowAtIndexPath_animated(const NSIndexPath& path, bool /*animated*/) override {
-        note("deselect", path);
-    }
-
-    [[nodiscard]] const std::vector<std::string>& asked() const { return asked_; }
-
-  private:
-    void note(const std::string& what, const NSIndexPath& path) const {
-        asked_.push_back(what + " " + std::to_string(path.section) + "." +
-                         std::to_string(path.row));
-    }
-
-    mutable std::vector<std::string> asked_;
 };
 
 const NSIndexPath storageRow = row(0, 0);
@@ -291,22 +254,25 @@ TEST_F(LimitChooser, ShowsTheCheckmarkOfAnAmountThatWasTappedOffScreenOnceItCome
 
 TEST_F(LimitChooser, LooksAtTheFourAmountsWhenOneIsTapped) {
     show(1, 50);
-    EmptyTable tableView;
+    EmptyTable tableView(host_->journal);
 
     table_->tableView_didSelectRowAtIndexPath(tableView, row(2, 1));
 
-    EXPECT_THAT(tableView.asked(),
-                ElementsAre("cell 1.0", "cell 1.1", "cell 1.2", "cell 1.3", "deselect 1.2"));
+    EXPECT_THAT(tableView.notes(),
+                ElementsAre("cell 1.0", "cell 1.1", "cell 1.2", "cell 1.3", "deselect 1.2",
+                            "write assetSyncLimit 125", "write assetSyncLimitType 1"));
 }
 
 TEST_F(LimitChooser, LooksAtTheTappedKindThenAtTheOtherAndReloadsTheAmounts) {
     show(1, 50);
-    EmptyTable tableView;
+    EmptyTable tableView(host_->journal);
 
     table_->tableView_didSelectRowAtIndexPath(tableView, storageRow);
 
-    EXPECT_THAT(tableView.asked(), ElementsAre("cell 0.0", "cell 0.1", "reload 1.0", "reload 1.1",
-                                               "reload 1.2", "reload 1.3", "deselect 0.0"));
+    EXPECT_THAT(tableView.notes(),
+                ElementsAre("cell 0.0", "cell 0.1", "reload 1.0", "reload 1.1", "reload 1.2",
+                            "reload 1.3", "deselect 0.0", "write assetSyncLimit 500",
+                            "write assetSyncLimitType 0"));
 }
 
 TEST_F(LimitChooser, ShowsWhatWasChangedElsewhereWhenTheAppBecomesActive) {

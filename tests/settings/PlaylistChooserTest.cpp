@@ -14,6 +14,7 @@ using quorl::SyncPreference;
 using quorl::tests::advance;
 using quorl::tests::checked;
 using quorl::tests::drain;
+using quorl::tests::EmptyTable;
 using quorl::tests::row;
 using quorl::tests::TablePaneTest;
 using std::chrono::milliseconds;
@@ -98,8 +99,8 @@ TEST_F(PlaylistChooser, IsNotThereWithoutAHost) {
 TEST_F(PlaylistChooser, LoadsTheListThenListensToTheLibraryWhenItAppears) {
     showChooser();
 
-    const auto lines = host_->journal.lines({"library", "query", "table"});
-    EXPECT_THAT(lines, ElementsAre("library hasMediaOfType 2049",
+    const auto lines = host_->journal.lines({"appear", "library", "query", "table"});
+    EXPECT_THAT(lines, ElementsAre("appear at once", "library hasMediaOfType 2049",
                                    "query MPMediaPlaylistPropertyIsFolder=0 "
                                    "MPMediaPlaylistPropertyIsAugurMix=0 "
                                    "MPMediaPlaylistPropertyIsAugurPlaylist=0",
@@ -320,11 +321,21 @@ TEST_F(PlaylistChooser, ClearsTheStatusOfACellThatAnotherRowUses) {
     ASSERT_EQ(cell(eveningRow), used);
     EXPECT_EQ(status(eveningRow), std::nullopt);
     EXPECT_FALSE(checked(used));
+}
+
+TEST_F(PlaylistChooser, ClearsTheStatusOfACellThatNoneUses) {
+    chooseMorning();
+    sendMorning();
+    rowsOnScreen_ = 1;
+    showChooser();
+    const auto used = cell(morningRow);
+    ASSERT_EQ(used->detailTextLabel().text(), "Synced");
 
     scrollToRow(2);
     draw();
     ASSERT_EQ(cell(noneRow), used);
     EXPECT_EQ(status(noneRow), std::nullopt);
+    EXPECT_FALSE(checked(used));
 }
 
 // Choosing.
@@ -380,6 +391,27 @@ TEST_F(PlaylistChooser, WritesBothAgainAndRedrawsTheStatusWhenTheSyncedPlaylistI
     EXPECT_THAT(host_->journal.lines({"write"}),
                 ElementsAre("write assetSyncEnabled 1", "write assetSyncPlaylistPersistentID 7"));
     EXPECT_EQ(status(morningRow), "50% Synced…") << "it does not wait for an old sync to end";
+}
+
+TEST_F(PlaylistChooser, SwitchesSyncOffBeforeItLooksAtNoneAndAtThePlaylists) {
+    showChooser();
+    EmptyTable tableView(host_->journal);
+
+    table_->tableView_didSelectRowAtIndexPath(tableView, noneRow);
+
+    EXPECT_THAT(tableView.notes(), ElementsAre("write assetSyncEnabled 0", "cell 1.0", "cell 0.0",
+                                               "cell 0.1", "deselect 1.0"));
+}
+
+TEST_F(PlaylistChooser, WritesAChoiceBeforeItLooksAtNoneAtTheOthersAndAtTheTappedRow) {
+    showChooser();
+    EmptyTable tableView(host_->journal);
+
+    table_->tableView_didSelectRowAtIndexPath(tableView, morningRow);
+
+    EXPECT_THAT(tableView.notes(),
+                ElementsAre("write assetSyncEnabled 1", "write assetSyncPlaylistPersistentID 7",
+                            "cell 1.0", "cell 0.1", "cell 0.0", "deselect 0.0"));
 }
 
 TEST_F(PlaylistChooser, ShowsNoneInWhateverSectionFollowsThePlaylists) {

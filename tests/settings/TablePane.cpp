@@ -12,6 +12,46 @@ class Parent : public PSListController {};
 
 } // namespace
 
+std::shared_ptr<UITableViewCell>
+EmptyTable::dequeueReusableCellWithIdentifier(std::string_view /*identifier*/) {
+    return nullptr;
+}
+
+std::shared_ptr<UITableViewCell> EmptyTable::cellForRowAtIndexPath(const NSIndexPath& path) const {
+    note("cell", path);
+    return nullptr;
+}
+
+void EmptyTable::reloadData() { notes_.emplace_back("reload"); }
+
+void EmptyTable::reloadRowsAtIndexPaths_withRowAnimation(const std::vector<NSIndexPath>& paths,
+                                                         UITableViewRowAnimation /*animation*/) {
+    for (const NSIndexPath& path : paths) {
+        note("reload", path);
+    }
+}
+
+void EmptyTable::deselectRowAtIndexPath_animated(const NSIndexPath& path, bool /*animated*/) {
+    note("deselect", path);
+}
+
+const std::vector<std::string>& EmptyTable::notes() const {
+    takeWrites();
+    return notes_;
+}
+
+void EmptyTable::note(const std::string& what, const NSIndexPath& path) const {
+    takeWrites();
+    notes_.push_back(what + " " + std::to_string(path.section) + "." + std::to_string(path.row));
+}
+
+void EmptyTable::takeWrites() const {
+    for (std::string& line : journal_.lines({"write"})) {
+        notes_.push_back(std::move(line));
+    }
+    journal_.clear();
+}
+
 bool checked(const std::shared_ptr<UITableViewCell>& cell) {
     return cell->accessoryType() == UITableViewCellAccessoryType::Checkmark;
 }

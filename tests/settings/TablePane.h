@@ -12,6 +12,33 @@ namespace quorl::tests {
     return NSIndexPath::indexPathForRow_inSection(rowIndex, section);
 }
 
+/// A table with nothing on the screen, which notes what it is asked for among the preferences that
+/// are written.
+class EmptyTable final : public UITableView {
+  public:
+    /// `journal`, which outlives the table, has the writes; those until now are left out.
+    explicit EmptyTable(Journal& journal) : journal_(journal) { journal_.clear(); }
+
+    [[nodiscard]] std::shared_ptr<UITableViewCell>
+    dequeueReusableCellWithIdentifier(std::string_view identifier) override;
+    [[nodiscard]] std::shared_ptr<UITableViewCell>
+    cellForRowAtIndexPath(const NSIndexPath& path) const override;
+    void reloadData() override;
+    void reloadRowsAtIndexPaths_withRowAnimation(const std::vector<NSIndexPath>& paths,
+                                                 UITableViewRowAnimation animation) override;
+    void deselectRowAtIndexPath_animated(const NSIndexPath& path, bool animated) override;
+
+    /// All until now: "cell SECTION.ROW", likewise "reload" and "deselect", and "write NAME VALUE".
+    [[nodiscard]] const std::vector<std::string>& notes() const;
+
+  private:
+    void note(const std::string& what, const NSIndexPath& path) const;
+    void takeWrites() const;
+
+    Journal& journal_;
+    mutable std::vector<std::string> notes_;
+};
+
 /// Whether the row of a cell, which is on the screen, carries the checkmark.
 [[nodiscard]] bool checked(const std::shared_ptr<UITableViewCell>& cell);
 
