@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <clocale>
+#include <limits>
 
 #include <libintl.h>
 
@@ -32,6 +33,14 @@ class TranslatingLocale {
     const locale_t before_;
 };
 
+/// gettext counts in words of the machine. The form of a larger number is, in all languages, that
+/// of one with the same last digits.
+unsigned long countForGettext(std::uint64_t count) {
+    constexpr std::uint64_t digits = 1'000'000;
+    return static_cast<unsigned long>(
+        count > std::numeric_limits<unsigned long>::max() ? digits + count % digits : count);
+}
+
 bool isEnglish() { return followedLanguages().front() == "en"; }
 
 } // namespace
@@ -46,7 +55,8 @@ std::string translated(const char* english) {
 
 std::string translatedCount(const char* one, const char* many, std::uint64_t count) {
     const TranslatingLocale translating;
-    const char* const form = isEnglish() ? (count == 1 ? one : many) : ngettext(one, many, count);
+    const char* const form =
+        isEnglish() ? (count == 1 ? one : many) : ngettext(one, many, countForGettext(count));
     return filled(form, {{"count", numberText(count)}});
 }
 

@@ -98,6 +98,7 @@ TEST_F(Language, hasAFormForEachCount) {
     followLanguages({"fr"});
     EXPECT_EQ(songs(0), "0 morceau");
     EXPECT_EQ(songs(2), "2 morceaux");
+    EXPECT_THAT(songs(0x1'0000'0001), testing::EndsWith(" morceaux")) << "which in 32 bits is 1";
 
     followLanguages({"ar"});
     EXPECT_EQ(songs(1), "أغنية واحدة");
