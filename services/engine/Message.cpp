@@ -4,6 +4,7 @@
 #include <array>
 #include <charconv>
 #include <cstdint>
+#include <limits>
 #include <optional>
 #include <string_view>
 #include <utility>
@@ -212,10 +213,11 @@ constexpr std::array blanks{
 /// A catalogue is somebody else's file: what it has in braces may be anything.
 std::string fill(std::string_view blank, const Arguments& arguments) {
     const auto space = std::min(blank.find(' '), blank.size());
-    const auto place = numberIn(std::string(blank.substr(std::min(space + 1, blank.size()))));
+    const auto written = numberIn(std::string(blank.substr(std::min(space + 1, blank.size()))));
+    constexpr std::uint64_t last = std::numeric_limits<std::size_t>::max();
+    const auto place = static_cast<std::size_t>(std::min(written.value_or(0), last));
     const auto* const found = std::ranges::find(blanks, blank.substr(0, space), &Blank::name);
-    return found == blanks.end() ? '{' + std::string(blank) + '}'
-                                 : found->fill(arguments, place.value_or(0));
+    return found == blanks.end() ? '{' + std::string(blank) + '}' : found->fill(arguments, place);
 }
 
 std::string worded(const char* pattern, const Arguments& arguments) {

@@ -77,7 +77,7 @@ StoredManifest newestManifest(const ReadOwnFile& read) {
     return {parseManifest(newest.text), newest.number, isSecond ? 0U : 1U};
 }
 
-std::string generationText(std::uint64_t number, const Manifest& manifest, std::uint64_t size) {
+std::string generationText(std::uint64_t number, const Manifest& manifest, std::size_t size) {
     auto text = toText(manifest);
     auto whole = withHeader(number, text);
     while (whole.size() < size) { // again where the new checksum is shorter

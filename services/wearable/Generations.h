@@ -38,7 +38,7 @@ using ReadOwnFile = std::function<std::optional<std::string>(const char* name)>;
 /// The contents of the file for the generation of this number, from 1 on.
 /// @param size of the file that they are to be written over, in bytes; they fill it at least.
 [[nodiscard]] std::string generationText(std::uint64_t number, const Manifest& manifest,
-                                         std::uint64_t size = 0);
+                                         std::size_t size = 0);
 
 /// The device may have been in other hands: what could be waited for without end, or would fill the
 /// memory, must not be read. Throws `BadManifest` for such a file.

@@ -55,7 +55,7 @@ TEST_F(Generations, CountByTheirNumbersWhicheverFileTheyAreIn) {
 }
 
 TEST_F(Generations, FillTheFileThatTheyAreWrittenOver) {
-    for (std::uint64_t size = 0; size < 600; ++size) {
+    for (std::size_t size = 0; size < 600; ++size) {
         files_[first] = generationText(3, manifestOf("new"), size);
 
         ASSERT_GE(files_[first].size(), size);

@@ -107,8 +107,9 @@ wearable::Manifest Device::loadManifest() {
 
 void Device::writeGeneration(const std::string& name, const wearable::Manifest& manifest) {
     const auto old = volume_->find(Directory::Own, name);
-    const auto text =
-        wearable::generationText(generation_ + 1, manifest, old.value_or(base::FileState()).size);
+    // It was read, or made by us, and so fits the memory.
+    const auto size = static_cast<std::size_t>(old.value_or(base::FileState()).size);
+    const auto text = wearable::generationText(generation_ + 1, manifest, size);
     try {
         const auto file =
             old ? volume_->overwrite(Directory::Own, name) : volume_->create(Directory::Own, name);
