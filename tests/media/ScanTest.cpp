@@ -162,6 +162,19 @@ TEST(ScanTest, SongsKnowTheirDirectoryNameSizeTimeAndKind) {
     EXPECT_EQ(song.kind, Kind::Audio);
 }
 
+TEST(ScanTest, ASongOf2046KeepsItsTime) {
+    constexpr std::int64_t year2046 = 2'398'377'600'000'000'001; // beyond 32 bits of seconds
+    const TemporaryDirectory folder;
+    folder.writeSongs({"one.mp3"});
+    folder.setModified("one.mp3", year2046);
+    folder.write("List.m3u", "one.mp3");
+
+    const auto inventory = scan(folder.path());
+
+    ASSERT_EQ(inventory->songs.size(), 1U);
+    EXPECT_EQ(inventory->songs[0].modified, year2046);
+}
+
 TEST(ScanTest, ASongOfMoreThanFourGigabytesKeepsItsSize) {
     const TemporaryDirectory folder;
     folder.writeSongs({"long.flac"});

@@ -112,6 +112,17 @@ TEST_F(SyncedWearable, DoesNotGetASongAgainOfWhichOnlyTheTimeHasChanged) {
     EXPECT_EQ(copiedSongs_, 0);
 }
 
+TEST_F(SyncedWearable, GetsASongOf2046Once) {
+    constexpr std::time_t year2046 = 2'398'377'600; // what 32 bits count to ends in 2038
+    ASSERT_EQ(music_.setTime("Album/one.mp3", year2046), year2046);
+
+    EXPECT_EQ(syncAll().kind, Kind::Sent);
+    EXPECT_EQ(copiedSongs_, 2);
+
+    EXPECT_EQ(syncAll().kind, Kind::Sent);
+    EXPECT_EQ(copiedSongs_, 0);
+}
+
 TEST_F(SyncedWearable, GetsASongFromTheFarFutureOnce) {
     constexpr std::time_t year2500 = 16'725'225'600;
     constexpr std::time_t beyondWhatIsTold = 8'500'000'000;
