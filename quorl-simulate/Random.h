@@ -1,5 +1,6 @@
 #pragma once
 
+#include <concepts>
 #include <cstdint>
 
 namespace quorl::simulation {
@@ -10,8 +11,11 @@ class Random {
   public:
     explicit Random(std::uint64_t seed) : state_(seed) {}
 
-    /// Any number below `end`, which is not 0.
-    [[nodiscard]] std::uint64_t below(std::uint64_t end) { return seed() % end; }
+    /// Any number from 0 on and below `end`, which is above 0.
+    template <std::integral Number>
+    [[nodiscard]] Number below(Number end) {
+        return static_cast<Number>(seed() % static_cast<std::uint64_t>(end));
+    }
 
     /// True once in `times`, on average.
     [[nodiscard]] bool onceIn(std::uint64_t times) { return below(times) == 0; }

@@ -211,7 +211,8 @@ void World::happenToDevice(const Event& event, Random& random) {
         break;
     case NearlyFillDevice:
         disk.setSpaceOfOthers(0);
-        disk.setSpaceOfOthers(disk.available() - std::min(disk.available(), random.below(4'000)));
+        disk.setSpaceOfOthers(disk.available() -
+                              std::min(disk.available(), random.below(std::uint64_t{4'000})));
         break;
     case FreeDevice:
         disk.setSpaceOfOthers(0);
@@ -272,7 +273,7 @@ void World::damageManifest(Random& random) {
     if (!own) {
         return;
     }
-    const auto kind = random.below(4);
+    const auto kind = random.below(4U);
     for (std::size_t index = 0; index < 2; ++index) {
         const auto file = disk.find(*own, wearable::generationFiles.at(index));
         if (!file || (kind < 2 && kind != index)) {
