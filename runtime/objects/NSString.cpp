@@ -43,13 +43,24 @@ std::optional<Placeholder> placeholderAt(std::string_view text) {
     return std::nullopt;
 }
 
+/// The formatter of the language that was asked for last: to make one takes a hundred times as long
+/// as to use it.
+const icu::number::LocalizedNumberFormatter& countFormatter(const std::string& language) {
+    thread_local std::string keptLanguage;
+    thread_local std::optional<icu::number::LocalizedNumberFormatter> kept;
+    if (!kept || language != keptLanguage) {
+        keptLanguage = language;
+        kept = icu::number::NumberFormatter::withLocale(
+            icu::Locale::createCanonical(language.c_str()));
+    }
+    return *kept;
+}
+
 std::string countText(NSUInteger count) {
     UErrorCode status = U_ZERO_ERROR;
-    const std::string language = quorl::Host::required().languages().front();
-    const auto text =
-        icu::number::NumberFormatter::withLocale(icu::Locale::createCanonical(language.c_str()))
-            .formatDecimal(std::to_string(count), status)
-            .toString(status);
+    const auto text = countFormatter(quorl::Host::required().languages().front())
+                          .formatDecimal(std::to_string(count), status)
+                          .toString(status);
     std::string result;
     return text.toUTF8String(result);
 }

@@ -1,6 +1,8 @@
 #include "platform/NSBundle.h"
 
 #include <map>
+#include <typeinfo>
+#include <unordered_map>
 
 #include <dlfcn.h>
 
@@ -31,10 +33,8 @@ std::shared_ptr<NSBundle> bundleAt(const std::filesystem::path& directory) {
     }
 }
 
-} // namespace
-
-std::shared_ptr<NSBundle> NSBundle::bundleForClass(const Class& cls) {
-    // Loaded code stays where it is for the life of the process, and so do its bundles.
+/// One bundle for all classes of a directory.
+std::shared_ptr<NSBundle> bundleWithCodeOf(const Class& cls) {
     static auto* const bundles = new std::map<std::filesystem::path, std::shared_ptr<NSBundle>>;
     Dl_info image{};
     if (dladdr(&cls.type(), &image) == 0 || image.dli_fname == nullptr) {
@@ -44,6 +44,20 @@ std::shared_ptr<NSBundle> NSBundle::bundleForClass(const Class& cls) {
     auto& bundle = (*bundles)[directory];
     if (!bundle) {
         bundle = bundleAt(directory);
+    }
+    return bundle;
+}
+
+} // namespace
+
+std::shared_ptr<NSBundle> NSBundle::bundleForClass(const Class& cls) {
+    // Loaded code stays where it is for the life of the process, and so do its classes and bundles.
+    // Two plug-ins may have a class of one name, but it stands in two places.
+    static auto* const bundles =
+        new std::unordered_map<const std::type_info*, std::shared_ptr<NSBundle>>;
+    auto& bundle = (*bundles)[&cls.type()];
+    if (!bundle) {
+        bundle = bundleWithCodeOf(cls);
     }
     return bundle;
 }

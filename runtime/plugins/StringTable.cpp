@@ -81,18 +81,32 @@ std::optional<std::string> StringTable::text(const std::vector<std::string>& lan
     if (key.empty()) {
         return std::nullopt; // a catalogue keeps its own description under the empty key
     }
+    auto [last, isNew] = lastFound_.try_emplace(domain);
+    auto& [ofLanguages, texts] = last->second;
+    if (isNew || ofLanguages != languages) {
+        ofLanguages = languages;
+        texts = firstCatalogue(languages, domain);
+    }
+    if (!texts) {
+        return std::nullopt;
+    }
+    const auto text = texts->find(key);
+    return text == texts->end() ? std::nullopt : std::optional(text->second);
+}
+
+const Texts* StringTable::firstCatalogue(const std::vector<std::string>& languages,
+                                         const std::string& domain) const {
     for (const std::string& language : languages) {
         for (const std::string& name : namesFor(languageName(language))) {
             if (const Texts* texts = catalogue(name, domain)) {
-                const auto text = texts->find(key);
-                return text == texts->end() ? std::nullopt : std::optional(text->second);
+                return texts;
             }
             if (name == "en") {
-                return std::nullopt; // the default texts are English
+                return nullptr; // the default texts are English
             }
         }
     }
-    return std::nullopt;
+    return nullptr;
 }
 
 } // namespace quorl

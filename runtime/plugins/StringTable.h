@@ -29,11 +29,20 @@ class StringTable {
                                                   const std::string& key) const;
 
   private:
+    /// What a list of languages led to; null for no catalogue.
+    struct Found {
+        std::vector<std::string> languages;
+        const Texts* texts = nullptr;
+    };
+
+    [[nodiscard]] const Texts* firstCatalogue(const std::vector<std::string>& languages,
+                                              const std::string& domain) const;
     [[nodiscard]] const Texts* catalogue(const std::string& language,
                                          const std::string& domain) const;
 
     const BundleFiles& files_;
     mutable std::map<std::pair<std::string, std::string>, std::optional<Texts>> catalogues_;
+    mutable std::map<std::string, Found> lastFound_; ///< of each domain
 };
 
 /// The user's languages as the environment names them: `LANGUAGE`, else `LC_ALL`, `LC_MESSAGES` or
