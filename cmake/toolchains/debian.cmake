@@ -16,6 +16,12 @@ execute_process(
   COMMAND ${tools}/libdispatch --target ${QUORL_TARGET} --prefix
   OUTPUT_VARIABLE dispatch OUTPUT_STRIP_TRAILING_WHITESPACE COMMAND_ERROR_IS_FATAL ANY)
 
+# Where the kernel does not start what is built, scripts do; see tools/emulate.
+if(DEFINED ENV{QUORL_EMULATOR})
+  set(CMAKE_CXX_LINKER_LAUNCHER ${tools}/link-emulated $ENV{QUORL_EMULATOR} ${CMAKE_SYSROOT})
+  set(CMAKE_C_LINKER_LAUNCHER ${CMAKE_CXX_LINKER_LAUNCHER})
+endif()
+
 # Programs are this machine's.
 set(CMAKE_FIND_ROOT_PATH ${CMAKE_SYSROOT} ${dispatch})
 set(CMAKE_FIND_ROOT_PATH_MODE_PROGRAM NEVER)

@@ -1,4 +1,4 @@
-"""tools/sysroot and tools/emulate where they cannot do what they are asked for."""
+"""tools/sysroot, tools/emulate and tools/link-emulated, on machines of all kinds."""
 
 import os
 import pathlib
@@ -61,6 +61,48 @@ class OtherMachines(unittest.TestCase):
             result = subprocess.run([TOOLS / "emulate", *arguments], capture_output=True, text=True)
             self.assertEqual(result.returncode, 1)
             self.assertIn("Say for instance: tools/emulate armhf true", result.stderr)
+
+
+class ProgramsBehindScripts(unittest.TestCase):
+    """What tools/link-emulated makes of what a linker has made, which here is a text."""
+
+    def setUp(self):
+        temporary = tempfile.TemporaryDirectory()
+        self.addCleanup(temporary.cleanup)
+        self.folder = pathlib.Path(temporary.name)
+        self.emulator = self.script("emulator", 'printf "%s\\n" "$@"')
+        self.linker = self.script("linker", 'while [ "$1" != -o ]; do shift; done; echo linked > "$2"')
+
+    def script(self, name, text):
+        path = self.folder / name
+        path.write_text(f"#!/bin/sh\n{text}\n")
+        path.chmod(0o755)
+        return path
+
+    def link(self, *arguments):
+        subprocess.run([TOOLS / "link-emulated", self.emulator, "/the root", self.linker, *arguments],
+                       cwd=self.folder, check=True)
+
+    def test_a_program_is_started_by_the_emulator_wherever_one_is_and_whatever_it_is_given(self):
+        (self.folder / "bin").mkdir()
+        self.link("a.o", "-o", "bin/program", "-lm")
+        os.symlink("bin/program", self.folder / "link")
+        for name in ("bin/program", "link"):
+            started = subprocess.run([self.folder / name, "one", "and two", ""], cwd="/", capture_output=True,
+                                     text=True, check=True).stdout.splitlines()
+            self.assertEqual(started, ["-L", "/the root", "-0", str(self.folder / name),
+                                       str(self.folder / "bin/.program"), "one", "and two", ""])
+        self.assertEqual((self.folder / "bin/.program").read_text(), "linked\n")
+
+    def test_a_library_stays_as_it_is(self):
+        self.link("-shared", "-o", "library.so", "a.o")
+        self.assertEqual((self.folder / "library.so").read_text(), "linked\n")
+
+    def test_what_cannot_be_linked_is_not_there(self):
+        with self.assertRaises(subprocess.CalledProcessError):
+            subprocess.run([TOOLS / "link-emulated", self.emulator, "/", "false", "-o", "program"],
+                           cwd=self.folder, check=True)
+        self.assertFalse((self.folder / "program").exists())
 
 
 if __name__ == "__main__":
