@@ -1,5 +1,9 @@
 #include "platform/Dispatch.h"
 
+#ifdef __SANITIZE_THREAD__
+#include <sanitizer/tsan_interface.h>
+#endif
+
 namespace {
 
 using Closure = std::function<void()>;
@@ -9,6 +13,28 @@ void runOnce(void* context) noexcept {
     (*closure)();
 }
 
+// The thread sanitizer does not see what libdispatch, which is not built with it, orders by `once`.
+#ifdef __SANITIZE_THREAD__
+void isDoneBefore(dispatch_once_t* once) { __tsan_release(once); }
+
+void isDoneAfter(dispatch_once_t* once) { __tsan_acquire(once); }
+#else
+void isDoneBefore(dispatch_once_t* /*once*/) {}
+
+void isDoneAfter(dispatch_once_t* /*once*/) {}
+#endif
+
+struct Initialization {
+    dispatch_once_t* once;
+    const Closure& work;
+};
+
+void initialize(void* context) noexcept {
+    const auto& initialization = *static_cast<const Initialization*>(context);
+    initialization.work();
+    isDoneBefore(initialization.once);
+}
+
 void run(void* context) noexcept { (*static_cast<Closure*>(context))(); }
 
 void destroy(void* context) noexcept { delete static_cast<Closure*>(context); }
@@ -16,8 +42,9 @@ void destroy(void* context) noexcept { delete static_cast<Closure*>(context); }
 } // namespace
 
 void dispatch_once(dispatch_once_t* predicate, const std::function<void()>& initializer) {
-    auto* context = const_cast<Closure*>(&initializer); // libdispatch only hands it back
-    dispatch_once_f(predicate, context, run);
+    Initialization initialization{predicate, initializer};
+    dispatch_once_f(predicate, &initialization, initialize);
+    isDoneAfter(predicate);
 }
 
 void dispatch_async(dispatch_queue_t queue, std::function<void()> work) {

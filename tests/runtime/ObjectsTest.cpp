@@ -134,6 +134,12 @@ TEST_F(AssociatedObjects, StayUnderTheirKeyAndOwner) {
     EXPECT_EQ(objc_getAssociatedObject(*elsewhere, &key_), nullptr);
 }
 
+TEST_F(AssociatedObjects, AreNoneUnderAnotherKeyOfTheirOwner) {
+    attach(*owner_, &otherKey_, create<NSObject>());
+
+    EXPECT_EQ(objc_getAssociatedObject(*owner_, &key_), nullptr);
+}
+
 TEST_F(AssociatedObjects, AreOwnedAndDieWithTheirOwner) {
     bool gone = false;
     attach(*owner_, &key_, companion(gone));

@@ -40,6 +40,11 @@ class Sessions : public testing::Test {
     std::vector<std::string> calls_;
 };
 
+TEST_F(Sessions, AreNamedByTheirConstants) {
+    EXPECT_EQ(DVSessionTypeDeviceSync, "DVSessionTypeDeviceSync");
+    EXPECT_EQ(DVDeviceSyncSessionAssetTaskGroupingKey, "DVDeviceSyncSessionAssetTaskGroupingKey");
+}
+
 TEST_F(Sessions, TellTheirObserversInTheOrderOfAttachment) {
     const auto first = listener("first");
     const auto second = listener("second");

@@ -84,12 +84,17 @@ void NotificationService::answer(std::function<void(Manner)> reply) {
 }
 
 void NotificationService::behave(Manner manner) {
-    const std::scoped_lock lock(mutex_);
-    manner_ = manner;
-    if (manner != Manner::KeepsSilent) {
-        for (const auto& reply : std::exchange(unanswered_, {})) {
-            reply(manner);
+    std::vector<std::function<void(Manner)>> answered;
+    {
+        const std::scoped_lock lock(mutex_);
+        manner_ = manner;
+        if (manner != Manner::KeepsSilent) {
+            answered = std::exchange(unanswered_, {});
         }
+    }
+    // The bus has a lock of its own, under which calls arrive.
+    for (const auto& reply : answered) {
+        reply(manner);
     }
 }
 
