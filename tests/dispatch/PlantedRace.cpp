@@ -1,0 +1,38 @@
+// Two closures on a concurrent queue write to one number, and nothing orders them. The thread
+// sanitizer has to tell, or nothing that it says of the other tests means anything.
+
+#include <atomic>
+#include <thread>
+
+#include <dispatch/dispatch.h>
+
+namespace {
+
+struct Planted {
+    std::atomic<int> arrived = 0;
+    int written = 0;
+    dispatch_semaphore_t done = dispatch_semaphore_create(0);
+};
+
+/// Meets the other one, which orders nothing, and writes.
+void race(void* context) {
+    auto& planted = *static_cast<Planted*>(context);
+    planted.arrived.fetch_add(1, std::memory_order_relaxed);
+    while (planted.arrived.load(std::memory_order_relaxed) < 2) {
+        std::this_thread::yield();
+    }
+    ++planted.written;
+    dispatch_semaphore_signal(planted.done);
+}
+
+} // namespace
+
+int main() {
+    Planted planted;
+    const auto queue = dispatch_queue_create("org.quorl.planted-race", DISPATCH_QUEUE_CONCURRENT);
+    dispatch_async_f(queue, &planted, race);
+    dispatch_async_f(queue, &planted, race);
+    dispatch_semaphore_wait(planted.done, DISPATCH_TIME_FOREVER);
+    dispatch_semaphore_wait(planted.done, DISPATCH_TIME_FOREVER);
+    return planted.written == 2 ? 0 : 1;
+}
