@@ -75,7 +75,7 @@ Happening drawHappening(Random& random) {
 /// Some come at once, some in the middle of a copy, some when all is done.
 std::uint64_t drawWait(Random& random) {
     constexpr std::array<std::uint64_t, 3> longest{3, 30, 150};
-    return random.below(longest.at(random.below(longest.size())));
+    return random.below(longest.at(random.indexBelow(longest.size())));
 }
 
 std::optional<Event> parseEvent(const std::string& word) {

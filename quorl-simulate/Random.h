@@ -1,6 +1,6 @@
 #pragma once
 
-#include <concepts>
+#include <cstddef>
 #include <cstdint>
 
 namespace quorl::simulation {
@@ -11,10 +11,12 @@ class Random {
   public:
     explicit Random(std::uint64_t seed) : state_(seed) {}
 
-    /// Any number from 0 on and below `end`, which is above 0.
-    template <std::integral Number>
-    [[nodiscard]] Number below(Number end) {
-        return static_cast<Number>(seed() % static_cast<std::uint64_t>(end));
+    /// Any number below `end`, which is not 0.
+    [[nodiscard]] std::uint64_t below(std::uint64_t end) { return seed() % end; }
+
+    /// The same of an index.
+    [[nodiscard]] std::size_t indexBelow(std::size_t end) {
+        return static_cast<std::size_t>(below(end));
     }
 
     /// True once in `times`, on average.

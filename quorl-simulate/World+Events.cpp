@@ -35,7 +35,8 @@ std::string drawPath(Random& random) {
         "One.mp3",  "one.MP3", "A long name of a song.mp3", "A long name of a tune.mp3",
         "Zwei.ogg", "aux.mp3", "Drei\xC3\xA4.mp3",          "List 1.m3u8",
         "#no.mp3",  "x.mp3",   "not \xFC UTF-8.mp3",        "not \xF6 UTF-8.mp3"};
-    return (random.onceIn(2) ? "a/" : "b/") + std::string(names.at(random.below(names.size())));
+    return (random.onceIn(2) ? "a/" : "b/") +
+           std::string(names.at(random.indexBelow(names.size())));
 }
 
 template <class Container>
@@ -141,7 +142,7 @@ void World::happenToChoices(Happening what, Random& random) {
         now.isSyncEnabled = true;
         break;
     case SetLimit:
-        now.limitType = std::array<std::uint64_t, 5>{0, 1, 1, 1, 7}.at(random.below(5));
+        now.limitType = std::array<std::uint64_t, 5>{0, 1, 1, 1, 7}.at(random.indexBelow(5));
         now.limit = random.below(7);
         break;
     case ToggleSync:
@@ -211,8 +212,7 @@ void World::happenToDevice(const Event& event, Random& random) {
         break;
     case NearlyFillDevice:
         disk.setSpaceOfOthers(0);
-        disk.setSpaceOfOthers(disk.available() -
-                              std::min(disk.available(), random.below(std::uint64_t{4'000})));
+        disk.setSpaceOfOthers(disk.available() - std::min(disk.available(), random.below(4'000)));
         break;
     case FreeDevice:
         disk.setSpaceOfOthers(0);
@@ -264,7 +264,7 @@ std::string World::someOfOurs(Random& random) const {
     auto names = device().disk.names(device().music());
     std::erase_if(names,
                   [this](const auto& name) { return device().filesOfOthers.contains(name); });
-    return names.empty() ? "" : names.at(random.below(names.size()));
+    return names.empty() ? "" : names.at(random.indexBelow(names.size()));
 }
 
 void World::damageManifest(Random& random) {
@@ -273,7 +273,7 @@ void World::damageManifest(Random& random) {
     if (!own) {
         return;
     }
-    const auto kind = random.below(4U);
+    const auto kind = random.below(4);
     for (std::size_t index = 0; index < 2; ++index) {
         const auto file = disk.find(*own, wearable::generationFiles.at(index));
         if (!file || (kind < 2 && kind != index)) {

@@ -410,12 +410,12 @@ SimulatedDisk::Content SimulatedDisk::remains(const File& file, Random& random) 
     const std::size_t was = file.durable.bytes.size();
     const std::size_t is = file.now.bytes.size();
     const std::size_t between =
-        std::min(was, is) + random.below(std::max(was, is) - std::min(was, is) + 1);
-    const std::size_t size = std::array{was, is, between}[random.below(3)];
+        std::min(was, is) + random.indexBelow(std::max(was, is) - std::min(was, is) + 1);
+    const std::size_t size = std::array{was, is, between}[random.indexBelow(3)];
     left.bytes.assign(size, '\0');
     for (std::size_t begin = 0; begin < size; begin += sectorSize) {
         const std::string* const source = std::array<const std::string*, 3>{
-            &file.durable.bytes, &file.now.bytes, nullptr}[random.below(3)];
+            &file.durable.bytes, &file.now.bytes, nullptr}[random.indexBelow(3)];
         for (std::size_t at = begin; at < std::min(begin + sectorSize, size); ++at) {
             if (source != nullptr && at < source->size()) {
                 left.bytes[at] = (*source)[at];
