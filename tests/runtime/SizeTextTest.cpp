@@ -34,6 +34,7 @@ const MeasureUnit kilobytes = MeasureUnit::getKilobyte();
 const MeasureUnit megabytes = MeasureUnit::getMegabyte();
 const MeasureUnit gigabytes = MeasureUnit::getGigabyte();
 const MeasureUnit terabytes = MeasureUnit::getTerabyte();
+const MeasureUnit petabytes = MeasureUnit::getPetabyte();
 
 constexpr float kilo = 1024.0F;
 constexpr float mega = 1024.0F * kilo;
@@ -65,13 +66,18 @@ TEST_F(SizeTexts, HaveOneDecimalFromMegabytesOn) {
     EXPECT_EQ(CPFSSizeStrings(2.3F * mega), amountOf(2.3, megabytes));
     EXPECT_EQ(CPFSSizeStrings(1'500'000'000.0F), amountOf(1.4, gigabytes));
     EXPECT_EQ(CPFSSizeStrings(3 * 1024 * giga), amountOf(3, terabytes));
+    EXPECT_EQ(CPFSSizeStrings(1.5F * 1024 * giga), amountOf(1.5, terabytes));
+    EXPECT_EQ(CPFSSizeStrings(1.5F * 1024 * 1024 * giga), amountOf(1.5, petabytes));
 }
+
+TEST_F(SizeTexts, HaveNoPartOfAByte) { EXPECT_EQ(CPFSSizeStrings(1.3F), amountOf(1, bytes)); }
 
 TEST_F(SizeTexts, NeverSay1024OfAUnit) {
     EXPECT_EQ(CPFSSizeStrings(1024.0F), amountOf(1, kilobytes));
     EXPECT_EQ(CPFSSizeStrings(1023.4F * kilo), amountOf(1023, kilobytes));
     EXPECT_EQ(CPFSSizeStrings(1023.6F * kilo), amountOf(1, megabytes));
     EXPECT_EQ(CPFSSizeStrings(1023.9F * mega), amountOf(1023.9, megabytes));
+    EXPECT_EQ(CPFSSizeStrings(1023.952F * mega), amountOf(1, gigabytes));
     EXPECT_EQ(CPFSSizeStrings(1023.96F * mega), amountOf(1, gigabytes));
     EXPECT_EQ(CPFSSizeStrings(1024 * giga), amountOf(1, terabytes));
 }
@@ -87,7 +93,7 @@ TEST_F(SizeTexts, SayTheLargestSizesToo) {
     const std::string all64Bits =
         CPFSSizeStrings(static_cast<float>(std::numeric_limits<std::uint64_t>::max()));
 
-    EXPECT_EQ(all64Bits, amountOf(16384, MeasureUnit::getPetabyte()));
+    EXPECT_EQ(all64Bits, amountOf(16384, petabytes));
     EXPECT_FALSE(CPFSSizeStrings(std::numeric_limits<float>::infinity()).empty());
 }
 

@@ -35,6 +35,11 @@ class WearableSettings : public testing::Test {
     std::thread::id repliedOn_;
 };
 
+TEST_F(WearableSettings, NameTheFiguresOfAReply) {
+    EXPECT_EQ(kLSSUsageAvailableStorageKey, "kLSSUsageAvailableStorageKey");
+    EXPECT_EQ(kLSSUsageSongsKey, "kLSSUsageSongsKey");
+}
+
 TEST_F(WearableSettings, AreNotThereWithoutAHost) {
     quorl::Host::install(nullptr);
 
