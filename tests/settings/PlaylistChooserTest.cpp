@@ -45,6 +45,16 @@ class PlaylistChooser : public TablePaneTest {
         show<LMQuorlPlaylistChooser>();
     }
 
+    /// Shows the chooser on a screen with room for one row, that of "Morning", which was sent.
+    /// Gives its cell.
+    std::shared_ptr<UITableViewCell> showOnlyASyncedRow() {
+        chooseMorning();
+        sendMorning();
+        rowsOnScreen_ = 1;
+        showChooser();
+        return cell(morningRow);
+    }
+
     /// "Evening" was sent as it is.
     void sendEvening() {
         store(SyncPreference::LastFullySentAssetSyncPlaylistPersistentID, 0x1'0000'0007);
@@ -309,11 +319,7 @@ TEST_F(PlaylistChooser, ReadsTheSwitchOnceForARowBesideTheSyncedPlaylist) {
 }
 
 TEST_F(PlaylistChooser, ClearsTheStatusOfACellThatAnotherRowUses) {
-    chooseMorning();
-    sendMorning();
-    rowsOnScreen_ = 1;
-    showChooser();
-    const auto used = cell(morningRow);
+    const auto used = showOnlyASyncedRow();
     ASSERT_EQ(used->detailTextLabel().text(), "Synced");
 
     scrollToRow(1);
@@ -324,11 +330,7 @@ TEST_F(PlaylistChooser, ClearsTheStatusOfACellThatAnotherRowUses) {
 }
 
 TEST_F(PlaylistChooser, ClearsTheStatusOfACellThatNoneUses) {
-    chooseMorning();
-    sendMorning();
-    rowsOnScreen_ = 1;
-    showChooser();
-    const auto used = cell(morningRow);
+    const auto used = showOnlyASyncedRow();
     ASSERT_EQ(used->detailTextLabel().text(), "Synced");
 
     scrollToRow(2);
