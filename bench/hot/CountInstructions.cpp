@@ -26,7 +26,7 @@ int qemu_plugin_install(std::uint64_t plugin, const void* machine, int count, ch
 
 namespace {
 
-constexpr int add = 0;
+constexpr int add = 0; // of what may be done in line, the only one that qemu has
 
 std::uint64_t executed = 0;
 

@@ -5,17 +5,18 @@
 //     hot-operations               names the operations, a line each
 //     hot-operations NAME COUNT
 
+#include <algorithm>
 #include <charconv>
-#include <functional>
 #include <iostream>
 #include <span>
 
 #include "doubles/HostDouble.h"
+#include "doubles/sessions/TaskDouble.h"
+#include "doubles/virtual-time/VirtualTime.h"
 #include "platform/SizeFormatter.h"
-#include "runtime/lists/ListView.h"
-#include "runtime/lists/NavigationController.h"
 #include "runtime/lists/TableView.h"
 #include "runtime/objects/MainQueue.h"
+#include "runtime/services/ObservedSession.h"
 #include "settings/LMQuorlLimitChooser.h"
 #include "settings/LMQuorlPlaylistChooser.h"
 #include "settings/LMQuorlSettingsController.h"

@@ -13,15 +13,15 @@ void runOnce(void* context) noexcept {
     (*closure)();
 }
 
-// The thread sanitizer does not see what libdispatch, which is not built with it, orders by `once`.
+// The thread sanitizer does not see what libdispatch orders, which is not built with it.
 #ifdef __SANITIZE_THREAD__
-void isDoneBefore(dispatch_once_t* once) { __tsan_release(once); }
+void releaseForSanitizer(dispatch_once_t* once) { __tsan_release(once); }
 
-void isDoneAfter(dispatch_once_t* once) { __tsan_acquire(once); }
+void acquireForSanitizer(dispatch_once_t* once) { __tsan_acquire(once); }
 #else
-void isDoneBefore(dispatch_once_t* /*once*/) {}
+void releaseForSanitizer(dispatch_once_t* /*once*/) {}
 
-void isDoneAfter(dispatch_once_t* /*once*/) {}
+void acquireForSanitizer(dispatch_once_t* /*once*/) {}
 #endif
 
 struct Initialization {
@@ -32,7 +32,7 @@ struct Initialization {
 void initialize(void* context) noexcept {
     const auto& initialization = *static_cast<const Initialization*>(context);
     initialization.work();
-    isDoneBefore(initialization.once);
+    releaseForSanitizer(initialization.once);
 }
 
 void run(void* context) noexcept { (*static_cast<Closure*>(context))(); }
@@ -44,7 +44,7 @@ void destroy(void* context) noexcept { delete static_cast<Closure*>(context); }
 void dispatch_once(dispatch_once_t* predicate, const std::function<void()>& initializer) {
     Initialization initialization{predicate, initializer};
     dispatch_once_f(predicate, &initialization, initialize);
-    isDoneAfter(predicate);
+    acquireForSanitizer(predicate);
 }
 
 void dispatch_async(dispatch_queue_t queue, std::function<void()> work) {

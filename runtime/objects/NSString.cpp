@@ -43,7 +43,7 @@ std::optional<Placeholder> placeholderAt(std::string_view text) {
     return std::nullopt;
 }
 
-/// The formatter of the language that was asked for last: to make one takes a hundred times as long
+/// The formatter of the language that was asked for last: to make one takes twenty times as long
 /// as to use it.
 const icu::number::LocalizedNumberFormatter& countFormatter(const std::string& language) {
     thread_local std::string keptLanguage;

@@ -28,7 +28,7 @@ constexpr std::array units{
 
 using icu::number::LocalizedNumberFormatter;
 
-/// The formatters of the language that was asked for last: to make one takes a hundred times as
+/// The formatters of the language that was asked for last: to make one takes twenty times as
 /// long as to use it.
 class Formatters {
   public:

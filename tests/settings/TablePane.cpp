@@ -22,7 +22,10 @@ std::shared_ptr<UITableViewCell> EmptyTable::cellForRowAtIndexPath(const NSIndex
     return nullptr;
 }
 
-void EmptyTable::reloadData() { notes_.emplace_back("reload"); }
+void EmptyTable::reloadData() {
+    takeWrites();
+    notes_.emplace_back("reload");
+}
 
 void EmptyTable::reloadRowsAtIndexPaths_withRowAnimation(const std::vector<NSIndexPath>& paths,
                                                          UITableViewRowAnimation /*animation*/) {

@@ -28,7 +28,8 @@ class EmptyTable final : public UITableView {
                                                  UITableViewRowAnimation animation) override;
     void deselectRowAtIndexPath_animated(const NSIndexPath& path, bool animated) override;
 
-    /// All until now: "cell SECTION.ROW", likewise "reload" and "deselect", and "write NAME VALUE".
+    /// All until now: "cell SECTION.ROW", likewise "reload" and "deselect"; "reload" alone for the
+    /// whole table; "write NAME VALUE".
     [[nodiscard]] const std::vector<std::string>& notes() const;
 
   private:

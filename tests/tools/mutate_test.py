@@ -24,7 +24,7 @@ rule link
   command = : && c++ $flags -Wl,-rpath,'$$ORIGIN/../lib' $in -o $out $libraries && :
 build Sum.o: compile {root}/shared/Sum.cpp
 build Product.o: compile {root}/static/Product.cpp
-build test.o: compile {root}/test.cpp
+build test.o: compile {root}/tests/test.cpp
 build lib/libshared.so: link Sum.o
   flags = -shared -Wl,-soname,libshared.so
 build libstatic.a: archive Product.o
@@ -197,7 +197,7 @@ class Check(unittest.TestCase):
         self.write("tests/mutations/equivalent.txt", text)
 
     def build_with(self, test):
-        self.write("test.cpp", test)
+        self.write("tests/test.cpp", test)
         folder = self.root / "build/tiny"
         subprocess.run(["ninja", "-C", folder], check=True, stdout=subprocess.DEVNULL)
         with (folder / "compile_commands.json").open("w") as file:
@@ -305,12 +305,22 @@ class Check(unittest.TestCase):
         self.assertIn(["shared", "100.0", "%", "none"], rows)
         self.assertIn(["static", "75.0", "%", "50.0", "%"], rows)
 
-    def test_an_edit_is_tried_on_tests_that_reach_its_line_while_its_source_stays_the_same(self):
+    def measure_with_a_test_that_reaches_sums_only(self):
+        """The build has a test that reaches all, behind the back of the check."""
         self.build_counting(TEST_OF_SUMS)
         self.check("--coverage")
         self.build_with(STRICT_TEST)
+        self.write("tests/test.cpp", TEST_OF_SUMS)
+
+    def test_an_edit_is_tried_on_tests_that_reach_its_line_while_its_source_stays_the_same(self):
+        self.measure_with_a_test_that_reaches_sums_only()
         self.assertFound(self.check("--all"), 1, ("shared", 2, 2, 0, 0, 0, 0), ("static", 2, 0, 0, 2, 0, 0))
         self.write("static/Product.cpp", f"// Of two.\n{PRODUCT}")
+        self.assertFound(self.check("--all"), 0, ("static", 2, 2, 0, 0, 0, 0))
+
+    def test_an_edit_is_tried_on_all_tests_where_one_has_changed(self):
+        self.measure_with_a_test_that_reaches_sums_only()
+        self.write("tests/test.cpp", STRICT_TEST)
         self.assertFound(self.check("--all"), 0, ("static", 2, 2, 0, 0, 0, 0))
 
     def test_the_report_is_written_to_a_file_too(self):

@@ -4,6 +4,7 @@ import dataclasses
 import hashlib
 import json
 import pathlib
+import re
 import subprocess
 
 from .build import Build, BuildError
@@ -12,11 +13,17 @@ from .plan import Suite
 from .trials import Tests
 
 DIGESTS = "digests"
-"""Beside the tracefiles: of each source, what it was when they were made."""
+"""Beside the tracefiles: of each source, and of all tests, what it was when they were made."""
+TESTS = "tests"
 
 
-def digest(source: pathlib.Path) -> str:
-    return hashlib.sha256(source.read_bytes()).hexdigest()
+def digest(*files: pathlib.Path) -> str:
+    return hashlib.sha256(b"".join(file.read_bytes() for file in files)).hexdigest()
+
+
+def digest_of_tests(root: pathlib.Path) -> str:
+    return digest(*sorted(path for path in (root / TESTS).rglob("*") if path.is_file()
+                          and not path.is_relative_to(root / TESTS / "mutations")))
 
 
 def gcovr(build: Build, *options: str) -> str:
@@ -37,10 +44,11 @@ def measure(build: Build, suites: list[Suite], folder: pathlib.Path) -> dict[str
         old.unlink()
     sources = sorted({source for suite in suites for source in suite.sources})
     tests = sorted({test for suite in suites for test in suite.tests})
-    (folder / DIGESTS).write_text(json.dumps({source: digest(build.root / source) for source in sources}))
+    digests = {source: digest(build.root / source) for source in sources} | {TESTS: digest_of_tests(build.root)}
+    (folder / DIGESTS).write_text(json.dumps(digests))
     runner = Tests(build)
     objects = sorted({str((build.folder / build.object_of(source)).parent) for source in sources})
-    filters = [option for source in sources for option in ("--filter", f"{build.root / source}".replace("+", r"\+"))]
+    filters = [option for source in sources for option in ("--filter", re.escape(str(build.root / source)))]
     for counted in build.folder.rglob("*.gcda"):
         counted.unlink()
     for test in tests:
@@ -53,7 +61,7 @@ def measure(build: Build, suites: list[Suite], folder: pathlib.Path) -> dict[str
 
 @dataclasses.dataclass(frozen=True)
 class Reach:
-    """Which tests reach each line of each source that was measured as it is now."""
+    """Which tests reach each line of each source that was measured as it is now, with the tests of now."""
 
     lines: dict[str, dict[int, set[str]]]
 
@@ -67,10 +75,12 @@ class Reach:
 
 
 def reach(root: pathlib.Path, folder: pathlib.Path) -> Reach:
-    """What was kept in `folder`; nothing where nothing was."""
+    """What was kept in `folder`; nothing where nothing was, or the tests have changed."""
     if not (folder / DIGESTS).exists():
         return Reach({})
     digests = json.loads((folder / DIGESTS).read_text())
+    if digests.get(TESTS) != digest_of_tests(root):
+        return Reach({})
     lines: dict[str, dict[int, set[str]]] = {}
     for path in folder.glob("*.json"):
         for file in json.loads(path.read_text())["files"]:

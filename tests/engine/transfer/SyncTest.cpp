@@ -118,6 +118,9 @@ TEST_F(SyncedWearable, GetsASongOf2046Once) {
 
     EXPECT_EQ(syncAll().kind, Kind::Sent);
     EXPECT_EQ(copiedSongs_, 2);
+    EXPECT_THAT(player_.manifest().songs,
+                ::testing::Contains(::testing::Field(&quorl::wearable::Entry::modified,
+                                                     std::int64_t{year2046} * 1'000'000'000)));
 
     EXPECT_EQ(syncAll().kind, Kind::Sent);
     EXPECT_EQ(copiedSongs_, 0);
