@@ -234,10 +234,7 @@ void VirtualTime::queue(dispatch_queue_t target, Work work) {
         mainQueue_.push_back(std::move(work));
         return;
     }
-    dispatch_async_f(target, std::make_unique<Work>(std::move(work)).release(), [](void* context) {
-        const std::unique_ptr<Work> owned(static_cast<Work*>(context));
-        (*owned)();
-    });
+    dispatch_async(target, std::move(work));
 }
 
 void VirtualTime::arm(Moment moment, Work fire) { timers_.emplace(moment, std::move(fire)); }

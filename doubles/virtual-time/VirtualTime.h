@@ -11,7 +11,7 @@
 #include <string_view>
 #include <unordered_map>
 
-#include <dispatch/dispatch.h>
+#include "platform/Dispatch.h"
 
 namespace quorl {
 

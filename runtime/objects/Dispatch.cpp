@@ -8,21 +8,36 @@ namespace {
 
 using Closure = std::function<void()>;
 
+// The thread sanitizer does not see what libdispatch orders, which is not built with it.
+#ifdef __SANITIZE_THREAD__
+void releaseForSanitizer(void* what) { __tsan_release(what); }
+
+void acquireForSanitizer(void* what) { __tsan_acquire(what); }
+#else
+void releaseForSanitizer(void* /*what*/) {}
+
+void acquireForSanitizer(void* /*what*/) {}
+#endif
+
+/// The closure as the context of a function that another thread may run.
+void* handedOver(Closure closure) {
+    auto* const context = std::make_unique<Closure>(std::move(closure)).release();
+    releaseForSanitizer(context);
+    return context;
+}
+
 void runOnce(void* context) noexcept {
+    acquireForSanitizer(context);
     const std::unique_ptr<Closure> closure(static_cast<Closure*>(context));
     (*closure)();
 }
 
-// The thread sanitizer does not see what libdispatch orders, which is not built with it.
-#ifdef __SANITIZE_THREAD__
-void releaseForSanitizer(dispatch_once_t* once) { __tsan_release(once); }
+void run(void* context) noexcept {
+    acquireForSanitizer(context);
+    (*static_cast<Closure*>(context))();
+}
 
-void acquireForSanitizer(dispatch_once_t* once) { __tsan_acquire(once); }
-#else
-void releaseForSanitizer(dispatch_once_t* /*once*/) {}
-
-void acquireForSanitizer(dispatch_once_t* /*once*/) {}
-#endif
+void destroy(void* context) noexcept { delete static_cast<Closure*>(context); }
 
 struct Initialization {
     dispatch_once_t* once;
@@ -35,10 +50,6 @@ void initialize(void* context) noexcept {
     releaseForSanitizer(initialization.once);
 }
 
-void run(void* context) noexcept { (*static_cast<Closure*>(context))(); }
-
-void destroy(void* context) noexcept { delete static_cast<Closure*>(context); }
-
 } // namespace
 
 void dispatch_once(dispatch_once_t* predicate, const std::function<void()>& initializer) {
@@ -48,15 +59,15 @@ void dispatch_once(dispatch_once_t* predicate, const std::function<void()>& init
 }
 
 void dispatch_async(dispatch_queue_t queue, std::function<void()> work) {
-    dispatch_async_f(queue, std::make_unique<Closure>(std::move(work)).release(), runOnce);
+    dispatch_async_f(queue, handedOver(std::move(work)), runOnce);
 }
 
 void dispatch_after(dispatch_time_t when, dispatch_queue_t queue, std::function<void()> work) {
-    dispatch_after_f(when, queue, std::make_unique<Closure>(std::move(work)).release(), runOnce);
+    dispatch_after_f(when, queue, handedOver(std::move(work)), runOnce);
 }
 
 void dispatch_source_set_event_handler(dispatch_source_t source, std::function<void()> handler) {
-    dispatch_set_context(source, std::make_unique<Closure>(std::move(handler)).release());
+    dispatch_set_context(source, handedOver(std::move(handler)));
     dispatch_set_finalizer_f(source, destroy);
     dispatch_source_set_event_handler_f(source, run);
 }
