@@ -46,6 +46,23 @@ BRANCHING_PRODUCT = """int product(int left, int right) {
 """
 TEST_OF_SUMS = "int sum(int, int);\nint main() { return sum(1, 2) == 3 ? 0 : 1; }\n"
 LENIENT_TEST = STRICT_TEST.replace("sum(1, 2) == 3", "sum(0, 0) == 0")
+TEST_WITH_A_CASE_APART = """
+#include <cstdio>
+#include <string>
+int sum(int, int);
+int product(int, int);
+int main(int, char** options) {
+    std::string cases;
+    while (*++options != nullptr) {
+        const std::string option = *options;
+        if (option.rfind("--gtest_filter=", 0) == 0) cases = option.substr(15);
+    }
+    if (cases == "Figures.Sum") return sum(1, 2) == 3 ? 0 : 1;
+    if (cases == "-Figures.Sum") return product(2, 3) == 6 ? 0 : 1;
+    std::puts("[  FAILED  ] Figures.Sum (0 ms)");
+    return 1;
+}
+"""
 SUITES = """
 [[suite]]
 name = "shared"
@@ -260,6 +277,10 @@ class Check(unittest.TestCase):
         result = self.check("--all")
         self.assertEqual(result.returncode, 2)
         self.assertIn("figures-test fails without an edit", result.stderr)
+
+    def test_a_case_that_fails_beside_others_is_run_by_itself(self):
+        self.build_with(TEST_WITH_A_CASE_APART)
+        self.assertFound(self.check("--all"), 0, ("shared", 2, 2, 0, 0, 0, 0), ("static", 2, 2, 0, 0, 0, 0))
 
     def test_sources_and_build_stay_as_they_are(self):
         before = self.everything()
