@@ -15,47 +15,52 @@ void NotificationCenter::addObserver_selector_name_object(NSObject* observer,
                                                           NSNotificationName name,
                                                           const NSObject* object) {
     const std::lock_guard lock(mutex_);
-    registrations_[name].push_back(std::make_shared<Registration>(
-        Registration{observer, observer->weak_from_this(), selector, object}));
+    auto& registrations = registrations_[name];
+    auto more = registrations ? std::make_shared<Registrations>(*registrations)
+                              : std::make_shared<Registrations>();
+    more->push_back(std::make_shared<Registration>(*observer, selector, object));
+    registrations = std::move(more);
 }
 
 void NotificationCenter::removeObserver(const NSObject* observer) {
+    const auto isOthers = [observer](const std::shared_ptr<Registration>& registration) {
+        return registration->observer != observer;
+    };
     const std::lock_guard lock(mutex_);
     for (auto& [name, registrations] : registrations_) {
-        std::erase_if(registrations, [observer](const std::shared_ptr<Registration>& registration) {
-            const bool leaves = registration->observer == observer;
-            registration->removed = registration->removed || leaves;
-            return leaves;
-        });
+        auto others = std::make_shared<Registrations>(*registrations);
+        const auto theirs = std::stable_partition(others->begin(), others->end(), isOthers);
+        std::for_each(theirs, others->end(),
+                      [](const auto& registration) { registration->removed = true; });
+        others->erase(theirs, others->end());
+        registrations = std::move(others);
     }
 }
 
 void NotificationCenter::postNotificationName_object(NSNotificationName name, NSObject* object) {
+    const auto registrations = registrationsFor(name);
     const NSNotification notification{name, object};
-    for (const auto& registration : registrationsFor(name, object)) {
-        if (const auto observer = observerOf(*registration)) {
-            registration->selector(*observer, notification);
+    for (auto newest = registrations->rbegin(); newest != registrations->rend(); ++newest) {
+        const Registration& registration = **newest;
+        if (registration.sender == nullptr || registration.sender == object) {
+            if (const auto observer = observerOf(registration)) {
+                registration.selector(*observer, notification);
+            }
         }
     }
 }
 
-NotificationCenter::Registrations NotificationCenter::registrationsFor(NSNotificationName name,
-                                                                       const NSObject* sender) {
-    const std::lock_guard lock(mutex_);
-    Registrations matching;
-    if (const auto found = registrations_.find(name); found != registrations_.end()) {
-        std::copy_if(found->second.rbegin(), found->second.rend(), std::back_inserter(matching),
-                     [sender](const std::shared_ptr<Registration>& registration) {
-                         return registration->sender == nullptr || registration->sender == sender;
-                     });
-    }
-    return matching;
-}
-
 /// The observer, kept alive for its call, unless it has left since the post began.
 std::shared_ptr<NSObject> NotificationCenter::observerOf(const Registration& registration) {
-    const std::lock_guard lock(mutex_);
     return registration.removed ? nullptr : registration.reference.lock();
+}
+
+std::shared_ptr<const NotificationCenter::Registrations>
+NotificationCenter::registrationsFor(NSNotificationName name) {
+    static const auto none = std::make_shared<const Registrations>();
+    const std::lock_guard lock(mutex_);
+    const auto found = registrations_.find(name);
+    return found == registrations_.end() ? none : found->second;
 }
 
 } // namespace quorl

@@ -1,8 +1,9 @@
 #pragma once
 
-#include <list>
+#include <atomic>
 #include <mutex>
 #include <unordered_map>
+#include <vector>
 
 #include "platform/Foundation.h"
 
@@ -21,20 +22,28 @@ class NotificationCenter : public NSNotificationCenter {
 
   private:
     struct Registration {
+        Registration(NSObject& observing, NSNotificationSelector answer, const NSObject* from)
+            : observer(&observing),
+              reference(observing.weak_from_this()),
+              selector(answer),
+              sender(from) {}
+
         const NSObject* observer; ///< tells whose registration it is, also during its destruction
         std::weak_ptr<NSObject> reference;
         NSNotificationSelector selector;
         const NSObject* sender; ///< null for any
-        bool removed = false;
+        std::atomic<bool> removed = false;
     };
 
+    /// The oldest first. Never changed but replaced, so that a post goes on with those it began
+    /// with.
     using Registrations = std::vector<std::shared_ptr<Registration>>;
 
-    [[nodiscard]] Registrations registrationsFor(NSNotificationName name, const NSObject* sender);
-    [[nodiscard]] std::shared_ptr<NSObject> observerOf(const Registration& registration);
+    [[nodiscard]] std::shared_ptr<const Registrations> registrationsFor(NSNotificationName name);
+    [[nodiscard]] static std::shared_ptr<NSObject> observerOf(const Registration& registration);
 
     std::mutex mutex_;
-    std::unordered_map<NSNotificationName, Registrations> registrations_;
+    std::unordered_map<NSNotificationName, std::shared_ptr<const Registrations>> registrations_;
 };
 
 } // namespace quorl
