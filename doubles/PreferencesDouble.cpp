@@ -4,27 +4,32 @@ namespace quorl {
 
 namespace {
 
+std::size_t placeOf(SyncPreference preference) { return static_cast<std::size_t>(preference); }
+
 std::optional<std::uint64_t> unsetValue(SyncPreference preference) {
-    const auto& declaration = syncPreferences.at(static_cast<std::size_t>(preference));
+    const auto& declaration = syncPreferences.at(placeOf(preference));
     return declaration.canBeNull() ? std::nullopt : std::optional<std::uint64_t>(0);
 }
 
 } // namespace
 
+PreferencesDouble::PreferencesDouble() {
+    for (const auto& declaration : syncPreferences) {
+        values_.at(placeOf(declaration.preference)) = unsetValue(declaration.preference);
+    }
+}
+
 std::optional<std::uint64_t> PreferencesDouble::value(SyncPreference preference) const {
-    const auto found = values_.find(preference);
-    return found == values_.end() ? unsetValue(preference) : found->second;
+    return values_.at(placeOf(preference));
 }
 
 bool PreferencesDouble::setValue(SyncPreference preference, std::optional<std::uint64_t> value) {
-    if (refusesWrites_) {
+    const auto stored = value ? value : unsetValue(preference);
+    auto& kept = values_.at(placeOf(preference));
+    if (refusesWrites_ || kept == stored) {
         return false;
     }
-    if (value) {
-        values_[preference] = *value;
-    } else {
-        values_.erase(preference);
-    }
+    kept = stored;
     return true;
 }
 

@@ -7,6 +7,8 @@ namespace quorl {
 /// The shared preferences in memory, all of them unset at first. Main thread.
 class PreferencesDouble final : public SyncPreferencesStore {
   public:
+    PreferencesDouble();
+
     /// From now on every write fails.
     void refuseWrites() { refusesWrites_ = true; }
 
@@ -15,7 +17,7 @@ class PreferencesDouble final : public SyncPreferencesStore {
                                 std::optional<std::uint64_t> value) override;
 
   private:
-    std::map<SyncPreference, std::uint64_t> values_;
+    std::array<std::optional<std::uint64_t>, syncPreferences.size()> values_;
     bool refusesWrites_ = false;
 };
 

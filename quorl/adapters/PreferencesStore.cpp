@@ -7,9 +7,13 @@
 
 namespace quorl {
 
-namespace {
-
 using namespace preferences;
+
+struct PreferencesStore::Listeners : Changes {
+    std::function<void()> values;
+};
+
+namespace {
 
 /// Calls `use` with the stored preference that stands for `preference`: both are in the order of
 /// the schema, which comes before all others.
@@ -29,7 +33,7 @@ auto with(SyncPreference preference, Use use) {
 
 /// A preference that always has a value stores 0 in place of null.
 template <class T>
-T stored(const Preference<T>& /*preference*/, std::optional<std::uint64_t> value) {
+T storable(const Preference<T>& /*preference*/, std::optional<std::uint64_t> value) {
     if constexpr (std::is_same_v<T, bool>) {
         return value.value_or(0) != 0;
     } else if constexpr (std::is_same_v<T, std::uint64_t>) {
@@ -39,12 +43,13 @@ T stored(const Preference<T>& /*preference*/, std::optional<std::uint64_t> value
     }
 }
 
-using Changes = PreferencesStore::Changes;
+std::size_t placeOf(SyncPreference preference) { return static_cast<std::size_t>(preference); }
 
-/// Has the main thread be told. Any thread.
-void tell(const std::weak_ptr<const Changes>& changes, std::function<void()> Changes::*change) {
-    dispatch_async(dispatch_get_main_queue(), [changes, change] {
-        const auto told = changes.lock();
+/// Has the main thread tell one of the listeners, as long as there are any. Any thread.
+template <class Listeners, class Class>
+void tell(const std::weak_ptr<const Listeners>& listeners, std::function<void()> Class::*change) {
+    dispatch_async(dispatch_get_main_queue(), [listeners, change] {
+        const auto told = listeners.lock();
         if (told && (*told).*change) {
             ((*told).*change)();
         }
@@ -52,32 +57,39 @@ void tell(const std::weak_ptr<const Changes>& changes, std::function<void()> Cha
 }
 
 /// What another program has changed. Any thread.
-void announce(const KeySet& keys, const std::weak_ptr<const Changes>& changes) {
+template <class Listeners>
+void announce(const KeySet& keys, const std::weak_ptr<const Listeners>& listeners) {
     const auto places = keys.count(musicFolder.key) + keys.count(wearableDirectory.key) +
                         keys.count(wearableIdentity.key);
     const auto notices = keys.count(desktopNotices.key);
     if (places + notices < keys.size()) {
+        tell(listeners, &Listeners::values);
         SyncDefaults::announceChange();
     }
     if (places > 0) {
-        tell(changes, &Changes::places);
+        tell(listeners, &Listeners::places);
     }
     if (notices > 0) {
-        tell(changes, &Changes::notices);
+        tell(listeners, &Listeners::notices);
     }
 }
 
 } // namespace
 
 PreferencesStore::PreferencesStore(base::Purpose purpose, Problem problem, Changes changes)
-    : problem_(std::move(problem)), changes_(std::make_shared<const Changes>(std::move(changes))) {
+    : problem_(std::move(problem)),
+      listeners_(std::make_shared<const Listeners>(
+          Listeners{std::move(changes), [this] { takeValues(); }})) {
     auto opened = SharedPreferences::open(
-        [reference = std::weak_ptr(changes_)](const SharedPreferences& /*preferences*/,
-                                              const KeySet& keys) { announce(keys, reference); },
+        [reference = std::weak_ptr(listeners_)](const SharedPreferences& /*preferences*/,
+                                                const KeySet& keys) { announce(keys, reference); },
         purpose);
     preferences_ = std::move(opened.preferences);
+    takeValues();
     problem_(opened.problem);
 }
+
+PreferencesStore::~PreferencesStore() = default;
 
 std::filesystem::path PreferencesStore::musicFolder() const {
     return preferences_ ? chosenMusicFolder(*preferences_) : usualMusicFolder();
@@ -117,18 +129,30 @@ void PreferencesStore::choosePlaces(const std::filesystem::path& music,
 }
 
 std::optional<std::uint64_t> PreferencesStore::value(SyncPreference preference) const {
-    return with(preference, [this](const auto& key) {
-        return std::optional<std::uint64_t>(preferences_ ? preferences_->get(key)
-                                                         : key.defaultValue);
-    });
+    return values_[placeOf(preference)];
 }
 
 bool PreferencesStore::setValue(SyncPreference preference, std::optional<std::uint64_t> value) {
     if (!preferences_) {
         return false; // it was told at the opening
     }
-    return with(preference,
-                [this, value](const auto& key) { return store(key, stored(key, value)); });
+    const bool changed = with(
+        preference, [this, value](const auto& key) { return store(key, storable(key, value)); });
+    values_[placeOf(preference)] = stored(preference);
+    return changed;
+}
+
+std::optional<std::uint64_t> PreferencesStore::stored(SyncPreference preference) const {
+    return with(preference, [this](const auto& key) {
+        return std::optional<std::uint64_t>(preferences_ ? preferences_->get(key)
+                                                         : key.defaultValue);
+    });
+}
+
+void PreferencesStore::takeValues() {
+    for (const auto& declaration : syncPreferences) {
+        values_[placeOf(declaration.preference)] = stored(declaration.preference);
+    }
 }
 
 template <class T>
@@ -138,7 +162,7 @@ bool PreferencesStore::store(const Preference<T>& preference,
     if (!result.problem.empty()) {
         problem_(result.problem);
     }
-    return result.problem.empty();
+    return result.changed;
 }
 
 } // namespace quorl

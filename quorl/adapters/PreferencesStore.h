@@ -1,5 +1,6 @@
 #pragma once
 
+#include <array>
 #include <filesystem>
 #include <functional>
 
@@ -8,7 +9,8 @@
 
 namespace quorl {
 
-/// The preferences that this app and the sync engine share. Main thread.
+/// The preferences that this app and the sync engine share, copied where the pane reads them all
+/// the time: what another process has changed is there when the pane is told. Main thread.
 class PreferencesStore final : public SyncPreferencesStore {
   public:
     /// Is told with a sentence for the user why values last no longer than the process, or why one
@@ -29,6 +31,10 @@ class PreferencesStore final : public SyncPreferencesStore {
 
     /// Opens the preferences.
     PreferencesStore(base::Purpose purpose, Problem problem, Changes changes);
+
+    PreferencesStore(const PreferencesStore&) = delete;
+    PreferencesStore& operator=(const PreferencesStore&) = delete;
+    ~PreferencesStore() override;
 
     /// The music folder that was chosen, or else the usual one.
     [[nodiscard]] std::filesystem::path musicFolder() const;
@@ -54,12 +60,22 @@ class PreferencesStore final : public SyncPreferencesStore {
                                 std::optional<std::uint64_t> value) override;
 
   private:
+    /// Who is told of a change, this object among them.
+    struct Listeners;
+
+    /// What is stored in this moment.
+    [[nodiscard]] std::optional<std::uint64_t> stored(SyncPreference preference) const;
+
+    /// Brings the copies up to date.
+    void takeValues();
+
     template <class T>
     bool store(const preferences::Preference<T>& preference, const std::type_identity_t<T>& value);
 
     const Problem problem_;
-    const std::shared_ptr<const Changes> changes_;
+    const std::shared_ptr<const Listeners> listeners_;
     std::unique_ptr<preferences::SharedPreferences> preferences_; ///< null: nothing can be stored
+    std::array<std::optional<std::uint64_t>, syncPreferences.size()> values_;
 };
 
 } // namespace quorl

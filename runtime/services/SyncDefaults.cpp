@@ -61,11 +61,18 @@ void SyncDefaults::announceChange() {
 
 std::shared_ptr<NSNumber> SyncDefaults::number(SyncPreference preference) const {
     const auto value = store_.value(preference);
-    return value ? NSNumber::numberWithUnsignedLongLong(*value) : nullptr;
+    if (!value) {
+        return nullptr;
+    }
+    auto& number = numbers_[static_cast<std::size_t>(preference)];
+    if (!number || number->unsignedLongLongValue() != *value) {
+        number = NSNumber::numberWithUnsignedLongLong(*value);
+    }
+    return number;
 }
 
 void SyncDefaults::set(SyncPreference preference, std::optional<std::uint64_t> value) {
-    if (store_.value(preference) != value && store_.setValue(preference, value)) {
+    if (store_.setValue(preference, value)) {
         announceChange();
     }
 }

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <array>
+
 #include "platform/SyncPreferences.h"
 #include "runtime/services/SyncPreference.h"
 
@@ -10,11 +12,12 @@ class SyncPreferencesStore {
   public:
     virtual ~SyncPreferencesStore() = default;
 
-    /// What is stored now, by whichever process; null for nothing. A truth value is 0 or 1.
+    /// What is stored; null for nothing. A truth value is 0 or 1. What another process has stored
+    /// is there at the latest when `SyncDefaults::announceChange` tells of it.
     [[nodiscard]] virtual std::optional<std::uint64_t> value(SyncPreference preference) const = 0;
 
-    /// Stores a value, null to clear it. False where that failed, which the store has told the
-    /// user.
+    /// Stores a value, null to clear it. Whether that has changed what was stored: false also where
+    /// it failed, which the store has told the user.
     [[nodiscard]] virtual bool setValue(SyncPreference preference,
                                         std::optional<std::uint64_t> value) = 0;
 };
@@ -47,6 +50,7 @@ class SyncDefaults : public LMSyncDefaults {
     void set(SyncPreference preference, std::optional<std::uint64_t> value);
 
     SyncPreferencesStore& store_;
+    mutable std::array<std::shared_ptr<NSNumber>, syncPreferences.size()> numbers_; ///< given last
 };
 
 } // namespace quorl
