@@ -34,7 +34,8 @@ bool isRewritten(const Sheet& sheet) { return sheet.form().kind == SheetForm::Ki
 
 std::string quoted(const std::string& text) {
     constexpr int columns = 40;
-    return "“" + isolated(shortened(base::printable(text), columns)) + "”";
+    return filled(translated("“{name}”"),
+                  {{"name", isolated(shortened(base::printable(text), columns))}});
 }
 
 std::string noSuchRow(NSInteger number, NSInteger count) {

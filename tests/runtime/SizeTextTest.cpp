@@ -111,7 +111,8 @@ TEST_P(SizeTextsByLanguage, AreWhatTheLanguageWrites) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Languages, SizeTextsByLanguage,
-                         testing::Values("en", "de", "de_AT", "fr", "ar", "ar_EG"));
+                         testing::Values("en", "de", "de_AT", "fr", "ar", "ar_EG", "es", "it", "ja",
+                                         "nl", "pl", "pt_BR", "ru", "sv", "zh_CN"));
 
 TEST_F(SizeTexts, UseTheLanguagesOwnDigitsAndSeparators) {
     host_->setLanguages({"de"});
