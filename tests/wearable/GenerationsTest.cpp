@@ -54,6 +54,35 @@ TEST_F(Generations, CountByTheirNumbersWhicheverFileTheyAreIn) {
     EXPECT_EQ(newest().next, 1);
 }
 
+/// What stands on wearables: later versions have to read it, and write nothing else for it.
+TEST_F(Generations, AreWrittenAsTheyAlwaysWere) {
+    const std::string text = R"(207614251ec5156a 255
+{
+ "format": 1,
+ "songs": [],
+ "strays": []
+}
+)";
+    EXPECT_EQ(generationText(255, {}), text);
+    files_ = {{second, text}};
+    EXPECT_EQ(newest().number, 255);
+}
+
+TEST_F(Generations, BeginWithTheFirst) {
+    files_ = {{first, generationText(0, manifestOf("none"))}};
+    EXPECT_EQ(newest().manifest, Manifest());
+
+    files_ = {{first, generationText(1, manifestOf("song"))}};
+    EXPECT_EQ(newest().manifest, manifestOf("song"));
+}
+
+TEST_F(Generations, OfOneNumberAreThatOfTheFirstFile) {
+    files_ = {{first, generationText(3, manifestOf("first"))},
+              {second, generationText(3, manifestOf("second"))}};
+    EXPECT_EQ(newest().manifest, manifestOf("first"));
+    EXPECT_EQ(newest().next, 1);
+}
+
 TEST_F(Generations, FillTheFileThatTheyAreWrittenOver) {
     for (std::size_t size = 0; size < 600; ++size) {
         files_[first] = generationText(3, manifestOf("new"), size);
@@ -104,7 +133,7 @@ TEST_F(Generations, SayWhatToDoWhereBothAreDamaged) {
         static_cast<void>(newest());
         FAIL();
     } catch (const BadManifest& error) {
-        EXPECT_THAT(error.what(), HasSubstr("both copies of it are damaged"));
+        EXPECT_THAT(error.what(), HasSubstr("(both copies of it are damaged)"));
         EXPECT_THAT(error.what(), HasSubstr("Remove the files .quorl/manifest.*"));
     }
 }
@@ -145,20 +174,26 @@ TEST_P(OddManifestFile, IsRejectedAndNotWaitedFor) {
     const auto manifest = device.path() / ".quorl" / GetParam();
     std::filesystem::create_directory(device.path() / ".quorl");
     ASSERT_EQ(mkfifo(manifest.c_str(), 0644), 0);
-    EXPECT_THAT(rejectionOf(device), HasSubstr("not a regular file"));
+    EXPECT_THAT(rejectionOf(device), HasSubstr("(it is not a regular file)"));
 
     std::filesystem::remove(manifest);
     std::filesystem::create_directory(manifest);
-    EXPECT_THAT(rejectionOf(device), HasSubstr("not a regular file"));
+    EXPECT_THAT(rejectionOf(device), HasSubstr("(it is not a regular file)"));
 
     std::filesystem::remove(manifest);
     std::filesystem::create_symlink("/dev/zero", manifest);
-    EXPECT_THAT(rejectionOf(device), HasSubstr("not a regular file"));
+    EXPECT_THAT(rejectionOf(device), HasSubstr("(it is not a regular file)"));
 
     std::filesystem::remove(manifest);
     std::ofstream{manifest}.close();
     std::filesystem::resize_file(manifest, std::uintmax_t{1} << 30);
-    EXPECT_THAT(rejectionOf(device), HasSubstr("larger than 64 MiB"));
+    EXPECT_THAT(rejectionOf(device), HasSubstr("(it is larger than 64 MiB)"));
+}
+
+TEST(ManifestFile, IsReadUpTo64MebibytesAndNoFurther) {
+    constexpr std::uint64_t most = 67'108'864;
+    EXPECT_NO_THROW(requireReadable(true, most));
+    EXPECT_THROW(requireReadable(true, most + 1), BadManifest);
 }
 
 INSTANTIATE_TEST_SUITE_P(Name, OddManifestFile,

@@ -65,13 +65,13 @@ void RowsView::showMatches(std::optional<std::vector<NSInteger>> paneRows) {
 
 void RowsView::closeSearch() {
     const auto found = currentRow();
-    const auto paneRow = found ? std::optional(content_->paneRow(*found)) : std::nullopt;
+    const NSInteger paneRow = found ? content_->paneRow(*found) : 0;
     finder_.endFilter();
     search_->hide();
     placeSearch();
     showMatches(std::nullopt);
     setFocus(Qt::ShortcutFocusReason);
-    goToPaneRow(paneRow.value_or(0));
+    goToPaneRow(paneRow);
 }
 
 void RowsView::goToPaneRow(NSInteger paneRow) {
