@@ -19,6 +19,9 @@ class NSNumber final : public NSObject {
     [[nodiscard]] static std::shared_ptr<NSNumber> numberWithLongLong(std::int64_t value);
     [[nodiscard]] static std::shared_ptr<NSNumber> numberWithDouble(double value);
 
+    /// `object` as a number; null where it is null or something else.
+    [[nodiscard]] static const NSNumber* of(const NSObject* object);
+
     /// The value under another type. An integer keeps its low bits; a double is truncated as by
     /// `NSSaturatingTruncate`.
     [[nodiscard]] bool boolValue() const;

@@ -123,7 +123,7 @@ struct Fit {
 
 std::uint64_t fileSize(const MPMediaItem& item) {
     const auto value = item.valueForProperty(MPMediaItemPropertyFileSize);
-    const auto* number = dynamic_cast<const NSNumber*>(value.get());
+    const auto* number = NSNumber::of(value.get());
     return number ? number->unsignedLongLongValue() : 0;
 }
 

@@ -34,11 +34,8 @@ class LibraryPlaylist final : public MPMediaPlaylist {
     mutable NSArray<MPMediaItem> items_;
 
     // Handed out; a number never changes.
-    mutable NSNumber identifier_;
-    mutable NSNumber revision_;
-    mutable NSNumber isFolder_;
-    mutable NSNumber isMix_;
-    mutable NSNumber isGenerated_;
+    std::shared_ptr<NSNumber> identifier_;
+    std::shared_ptr<NSNumber> revision_;
 };
 
 } // namespace quorl

@@ -88,7 +88,7 @@ AppPage::Row FrontPage::chargerRow() {
 }
 
 void FrontPage::setOnCharger(const std::shared_ptr<NSObject>& isOn, const Row& /*row*/) {
-    const auto* number = dynamic_cast<const NSNumber*>(isOn.get());
+    const auto* number = NSNumber::of(isOn.get());
     services().setOnCharger(number && number->boolValue());
 }
 

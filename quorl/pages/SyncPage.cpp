@@ -136,14 +136,14 @@ void SyncPage::syncNow(const std::shared_ptr<NSObject>& /*nothing*/, const Row& 
 }
 
 void SyncPage::setLoginStart(const std::shared_ptr<NSObject>& isOn, const Row& /*row*/) {
-    const auto* number = dynamic_cast<const NSNumber*>(isOn.get());
+    const auto* number = NSNumber::of(isOn.get());
     services().setStartAtLogin(number && number->boolValue());
     startsAtLogin_ = services().startsAtLogin();
     refresh();
 }
 
 void SyncPage::setNotices(const std::shared_ptr<NSObject>& areOn, const Row& /*row*/) {
-    const auto* number = dynamic_cast<const NSNumber*>(areOn.get());
+    const auto* number = NSNumber::of(areOn.get());
     services().setDesktopNotices(number && number->boolValue());
     refresh();
 }

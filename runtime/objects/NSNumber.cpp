@@ -1,6 +1,7 @@
 #include "platform/NSNumber.h"
 
 #include <cmath>
+#include <typeinfo>
 
 namespace {
 
@@ -62,6 +63,13 @@ std::shared_ptr<NSNumber> NSNumber::numberWithDouble(double value) {
     return std::make_shared<NSNumber>(Value(value));
 }
 
+const NSNumber* NSNumber::of(const NSObject* object) {
+    // No class is derived from this one, so that it need not be looked for among base classes.
+    return object != nullptr && typeid(*object) == typeid(NSNumber)
+               ? static_cast<const NSNumber*>(object)
+               : nullptr;
+}
+
 bool NSNumber::boolValue() const {
     return std::visit([](auto value) { return value != 0; }, _value);
 }
@@ -85,6 +93,6 @@ double NSNumber::doubleValue() const {
 }
 
 bool NSNumber::isEqual(const NSObject* other) const {
-    const auto* number = dynamic_cast<const NSNumber*>(other);
+    const auto* number = of(other);
     return number != nullptr && std::visit(SameValue{}, _value, number->_value);
 }

@@ -49,6 +49,13 @@ std::shared_ptr<NSNumber> signedNumber(std::int64_t value) {
 
 std::shared_ptr<NSNumber> real(double value) { return NSNumber::numberWithDouble(value); }
 
+TEST(Numbers, AreFoundAmongObjects) {
+    const auto number = real(0.5);
+    EXPECT_EQ(NSNumber::of(number.get()), number.get());
+    EXPECT_EQ(NSNumber::of(create<NSObject>().get()), nullptr);
+    EXPECT_EQ(NSNumber::of(nullptr), nullptr);
+}
+
 struct Pair {
     std::shared_ptr<NSNumber> left;
     std::shared_ptr<NSNumber> right;
