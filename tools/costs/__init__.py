@@ -1,0 +1,1 @@
+"""What tools/phone-costs and tools/hot-costs share."""
