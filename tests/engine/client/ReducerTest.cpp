@@ -7,6 +7,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "services/engine/Codes.h"
+#include "services/engine/Message.h"
 #include "services/engine/Names.h"
 
 namespace {
@@ -167,6 +169,11 @@ TEST_F(AnEngine, KeepsASessionThatLosesSomeOtherInterface) {
     EXPECT_THAT(state_->sessions, SizeIs(1));
 }
 
+TEST_F(AnEngine, KeepsATaskThatLosesSomeOtherInterface) {
+    EXPECT_EQ(hear(ObjectRemoved{task, {"org.example.Other"}}), std::nullopt);
+    EXPECT_EQ(theTask().path, task);
+}
+
 TEST_F(AnEngine, MayTellOfWhatIsUnknown) {
     const auto before = *state_;
     for (const auto& message : std::vector<BusMessage>{
@@ -208,6 +215,36 @@ TEST_F(AnEngine, TellsOfItselfAndOfItsWearable) {
     EXPECT_EQ(state_->engine.status, "calm");
     EXPECT_EQ(hear(PropertiesChanged{wearablePath, wearableInterface, {{"Songs", count(9)}}}),
               Kind::StatusDidChange);
+    EXPECT_EQ(state_->wearable.songs, 9);
+}
+
+TEST_F(AnEngine, IsWordedInTheLanguageOfTheReaderWhereTheReaderKnowsTheWords) {
+    const auto text = [](const char* words) { return sdbus::Variant(std::string(words)); };
+    const auto arguments = sdbus::Variant(std::vector<std::string>{"2"});
+    hear(PropertiesChanged{enginePath,
+                           engineInterface,
+                           {{"Status", text("ruhig")},
+                            {"StatusCode", text(code::upToDateBut)},
+                            {"StatusArguments", arguments},
+                            {"LastMessage", text("fertig")},
+                            {"LastCode", text(code::synced)},
+                            {"LastArguments", arguments}}});
+    EXPECT_EQ(state_->engine.status, sentence({code::upToDateBut, {"2"}}));
+    EXPECT_EQ(state_->engine.lastMessage, sentence({code::synced, {"2"}}));
+
+    hear(PropertiesChanged{enginePath,
+                           engineInterface,
+                           {{"Status", text("ruhig")},
+                            {"StatusCode", text("calm")},
+                            {"LastMessage", text("fertig")},
+                            {"LastCode", text("done")}}});
+    EXPECT_EQ(state_->engine.status, "ruhig");
+    EXPECT_EQ(state_->engine.lastMessage, "fertig");
+}
+
+TEST_F(AnEngine, ListsItsWearable) {
+    hear(ObjectsListed{
+        {{sdbus::ObjectPath(wearablePath), {{wearableInterface, {{"Songs", count(9)}}}}}}});
     EXPECT_EQ(state_->wearable.songs, 9);
 }
 
