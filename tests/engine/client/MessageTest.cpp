@@ -7,10 +7,12 @@
 
 #include "services/engine/Codes.h"
 #include "services/media/playlists/LeftOut.h"
+#include "services/wearable/Unseen.h"
 
 namespace {
 
 using namespace quorl::engine;
+namespace unseen = quorl::wearable::unseen;
 using quorl::media::Reason;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
@@ -48,6 +50,33 @@ TEST(Message, NamesASongWhereItIsGiven) {
     EXPECT_EQ(sentence({code::songUnreadable}), "It cannot be read.");
 }
 
+TEST(Message, TellsWhatIsTheMatterWithASong) {
+    EXPECT_EQ(sentence({code::songNotAFile, {"a.mp3"}}), "“a.mp3” is not a file any more.");
+    EXPECT_EQ(sentence({code::songChanged, {"a.mp3"}}),
+              "“a.mp3” has just been changed. It will be sent once it stays as it is.");
+    EXPECT_EQ(sentence({code::songTooLarge, {"a.mp3"}}),
+              "“a.mp3” is larger than a file on the Velora can be.");
+}
+
+TEST(Message, TellsWhyAWearableCannotBeLookedAt) {
+    EXPECT_EQ(sentence({unseen::unreachable, {"/media/a\nb", "Permission denied"}}),
+              "The Velora at /media/a\uFFFDb cannot be reached: Permission denied.");
+    EXPECT_EQ(sentence({unseen::silent}), "The Velora does not answer. Check its connection.");
+    EXPECT_EQ(sentence({unseen::notPluggedIn}),
+              "The Velora that was chosen is not plugged in. Plug it in.");
+    const std::string rest =
+        " is at /media/a in its place. Plug in the one that was chosen, or choose this one.";
+    EXPECT_EQ(sentence({unseen::otherDrive, {"/media/a"}}),
+              "The Velora that was chosen is not connected. Another drive" + rest);
+    EXPECT_EQ(sentence({unseen::otherDrive, {"/media/a", "STICK"}}),
+              "The Velora that was chosen is not connected. Another drive, “STICK”," + rest);
+}
+
+TEST(Message, HasTitles) {
+    EXPECT_EQ(sentence({code::titleSynced}), "Music synced");
+    EXPECT_EQ(sentence({code::titleNotSynced}), "Music not synced");
+}
+
 TEST(Message, TellsTheFirstSongThatIsLeftOutAndHowManyMoreThereAre) {
     EXPECT_EQ(sentence({code::songsLeftOut, {"1", "song-gone", "a.mp3"}}),
               "“a.mp3” is no longer in the music folder.");
@@ -79,7 +108,12 @@ TEST(Message, OfAnotherEngineMayBeAnything) {
     EXPECT_EQ(sentence({"weather", {"fine"}}), "");
     EXPECT_EQ(sentence({code::synced}), " synced to Velora.");
     EXPECT_EQ(sentence({code::synced, {"many"}}), "many synced to Velora.");
-    EXPECT_EQ(sentence({code::syncOff, {"1"}}), "Music sync is switched off.");
+    EXPECT_THAT(sentence({code::notEnoughSpace, {"much", "little"}}),
+                HasSubstr("much are needed for new songs, little are available"));
+    EXPECT_EQ(sentence({code::syncOff, std::vector<std::string>(8)}),
+              "Music sync is switched off.");
+    EXPECT_EQ(sentence({code::syncOff, std::vector<std::string>(9)}), "");
+    EXPECT_EQ(sentence({code::stopping}), "Ending the sync. ");
     EXPECT_EQ(sentence({code::songsLeftOut}), "");
     EXPECT_EQ(sentence({code::songGone, {"\x1B[2J"}}), sentence({code::songGone, {"\uFFFD[2J"}}));
     EXPECT_EQ(sentence({code::stopping, std::vector<std::string>(100'000, code::stopping)}), "");
