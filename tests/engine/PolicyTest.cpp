@@ -220,6 +220,41 @@ INSTANTIATE_TEST_SUITE_P(
              {runAnotherPlaylist, disconnect},
              stops(disconnected)}));
 
+void requestRemoval(Situation& now) {
+    switchOff(now);
+    now.isRemovalRequested = true;
+}
+
+void remove(Situation& now) {
+    requestRemoval(now);
+    now.running = {{}, now.wearable, Charger::Ignored};
+}
+
+void removeFromAnotherWearable(Situation& now) {
+    remove(now);
+    now.running->wearable.root = "/media/other";
+}
+
+const Decision beginsRemoval{Kind::Begin, {}, {}};
+
+INSTANTIATE_TEST_SUITE_P(
+    RemovalRequested, Decides,
+    ::testing::Values(
+        Case{"nothing runs", {requestRemoval}, beginsRemoval},
+        Case{"not on charger", {requestRemoval, takeOffCharger}, beginsRemoval},
+        Case{"wearable away", {requestRemoval, loseWearable}, rests},
+        Case{"wearable perhaps another one", {requestRemoval, lookForWearable}, rests},
+        Case{"not connected", {requestRemoval, disconnect}, rests},
+        Case{"a sync runs", {run, requestRemoval}, stops(off)},
+        Case{"a sync runs, and the wearable is away",
+             {run, requestRemoval, loseWearable},
+             stops(off)},
+        Case{"it runs", {remove}, continues},
+        Case{"it runs, wearable perhaps another one", {remove, lookForWearable}, continues},
+        Case{"it runs, wearable away", {remove, loseWearable}, stops(away)},
+        Case{"it runs, not connected", {remove, disconnect}, stops(disconnected)},
+        Case{"it runs on another wearable", {removeFromAnotherWearable}, stops(otherChosen)}));
+
 struct ClaimCase {
     const char* name;
     std::vector<void (*)(Situation&)> changes;

@@ -31,6 +31,11 @@ build libstatic.a: archive Product.o
 build bin/figures-test: link test.o | lib/libshared.so libstatic.a
   libraries = lib/libshared.so libstatic.a
 """
+NINJA_OF_OTHER_TEST = """
+build other.o: compile {root}/tests/other.cpp
+build bin/other-test: link other.o | lib/libshared.so libstatic.a
+  libraries = lib/libshared.so libstatic.a
+"""
 SUM = "int sum(int left, int right) {\n    return left + right;\n}\n"
 PRODUCT = "int product(int left, int right) {\n    return left * right;\n}\n"
 STRICT_TEST = """
@@ -45,6 +50,8 @@ BRANCHING_PRODUCT = """int product(int left, int right) {
 }
 """
 TEST_OF_SUMS = "int sum(int, int);\nint main() { return sum(1, 2) == 3 ? 0 : 1; }\n"
+TEST_OF_PRODUCTS = "int product(int, int);\nint main() { return product(2, 3) == 6 ? 0 : 1; }\n"
+TEST_OF_NOTHING = "int main() {}\n"
 LENIENT_TEST = STRICT_TEST.replace("sum(1, 2) == 3", "sum(0, 0) == 0")
 TEST_WITH_A_CASE_APART = """
 #include <cstdio>
@@ -313,8 +320,8 @@ class Check(unittest.TestCase):
         self.assertFound(results[0], 0, ("static", 2, 2, 0, 0, 0, 0))
         self.assertNotIn("shared", results[0].stdout)
 
-    def build_counting(self, test):
-        self.write("build/tiny/build.ninja", NINJA.format(root=self.root).replace("c++ ", "c++ --coverage "))
+    def build_counting(self, test, ninja=NINJA):
+        self.write("build/tiny/build.ninja", ninja.format(root=self.root).replace("c++ ", "c++ --coverage "))
         self.build_with(test)
 
     def test_what_the_tests_reach_is_told(self):
@@ -326,22 +333,33 @@ class Check(unittest.TestCase):
         self.assertIn(["shared", "100.0", "%", "none"], rows)
         self.assertIn(["static", "75.0", "%", "50.0", "%"], rows)
 
-    def measure_with_a_test_that_reaches_sums_only(self):
-        """The build has a test that reaches all, behind the back of the check."""
+    def measure_a_test_of_sums_and_one_of_products(self):
+        """Then, behind the back of the check, the build has one that notices nothing, and one of both."""
+        self.write("tests/mutations/suites.toml", SUITES.replace('"figures-test"', '"figures-test", "other-test"'))
+        self.write("tests/other.cpp", TEST_OF_PRODUCTS)
+        self.build_counting(TEST_OF_SUMS, NINJA + NINJA_OF_OTHER_TEST)
+        self.check("--coverage")
+        self.write("tests/other.cpp", STRICT_TEST)
+        self.build_with(TEST_OF_NOTHING)
+        self.write("tests/other.cpp", TEST_OF_PRODUCTS)
+        self.write("tests/test.cpp", TEST_OF_SUMS)
+
+    def test_an_edit_is_tried_on_tests_that_reach_its_line_while_its_source_stays_the_same(self):
+        self.measure_a_test_of_sums_and_one_of_products()
+        self.assertFound(self.check("--all"), 1, ("shared", 2, 0, 0, 2, 0, 0), ("static", 2, 2, 0, 0, 0, 0))
+        self.write("shared/Sum.cpp", f"// Of two.\n{SUM}")
+        self.assertFound(self.check("--all"), 0, ("shared", 2, 2, 0, 0, 0, 0))
+
+    def test_an_edit_is_tried_on_all_tests_where_one_has_changed(self):
+        self.measure_a_test_of_sums_and_one_of_products()
+        self.write("tests/test.cpp", STRICT_TEST)
+        self.assertFound(self.check("--all"), 0, ("shared", 2, 2, 0, 0, 0, 0))
+
+    def test_an_edit_is_tried_on_all_tests_where_none_seems_to_reach_it(self):
         self.build_counting(TEST_OF_SUMS)
         self.check("--coverage")
         self.build_with(STRICT_TEST)
         self.write("tests/test.cpp", TEST_OF_SUMS)
-
-    def test_an_edit_is_tried_on_tests_that_reach_its_line_while_its_source_stays_the_same(self):
-        self.measure_with_a_test_that_reaches_sums_only()
-        self.assertFound(self.check("--all"), 1, ("shared", 2, 2, 0, 0, 0, 0), ("static", 2, 0, 0, 2, 0, 0))
-        self.write("static/Product.cpp", f"// Of two.\n{PRODUCT}")
-        self.assertFound(self.check("--all"), 0, ("static", 2, 2, 0, 0, 0, 0))
-
-    def test_an_edit_is_tried_on_all_tests_where_one_has_changed(self):
-        self.measure_with_a_test_that_reaches_sums_only()
-        self.write("tests/test.cpp", STRICT_TEST)
         self.assertFound(self.check("--all"), 0, ("static", 2, 2, 0, 0, 0, 0))
 
     def test_the_report_is_written_to_a_file_too(self):

@@ -183,7 +183,6 @@ class Check:
 
     def _try_edit(self, copy: Copy, suite: Suite, edit: Edit, content: bytes) -> Tried:
         began = time.monotonic()
-        tests = self._reach.tests_of(edit, content, suite.tests)
-        verdict = (self._tests.try_edit(copy, edit.source, edit.applied(content), tests) if tests
-                   else Verdict(Outcome.SURVIVED))
+        verdict = self._tests.try_edit(copy, edit.source, edit.applied(content),
+                                       self._reach.tests_of(edit, content, suite.tests))
         return Tried(suite, edit, verdict, time.monotonic() - began)

@@ -88,6 +88,7 @@ INSTANTIATE_TEST_SUITE_P(
         ResultCase{
             "SongChanged", failed, {code::songsLeftOut, {"1", code::songChanged, "a.mp3"}}, {}},
         ResultCase{"NoSong", failed, {code::songsLeftOut, {}}, {}},
+        ResultCase{"NoCause", failed, {code::songsLeftOut, {"1"}}, {}},
         ResultCase{"OffTheCharger", failed, {code::notOnCharger, {}}, {}},
         ResultCase{"Cancelled", failed, {code::cancelled, {}}, {}},
         ResultCase{"AnotherChoice", failed, {code::somethingElseChosen, {}}, {}},
