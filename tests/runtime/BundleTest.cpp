@@ -10,6 +10,7 @@
 #include <sys/stat.h>
 
 #include "platform/InterfaceVersion.h"
+#include "runtime/plugins/BundleFiles.h"
 #include "runtime/plugins/PluginBundle.h"
 #include "tests/base/TemporaryDirectory.h"
 #include "tests/runtime/Digests.h"
@@ -24,6 +25,7 @@ using quorl::tests::bytesOf;
 using quorl::tests::TemporaryDirectory;
 using quorl::tests::TestHost;
 using std::filesystem::path;
+using testing::ContainsRegex;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
@@ -40,6 +42,8 @@ void write(const path& file, const std::string& content) {
 }
 
 class OfThisProgram : public NSObject {};
+
+class AlsoOfThisProgram : public NSObject {};
 
 class Bundles : public testing::Test {
   protected:
@@ -77,6 +81,10 @@ class Bundles : public testing::Test {
         } catch (const BundleError& error) {
             EXPECT_EQ(error.file(), file);
             EXPECT_THAT(error.what(), StartsWith(file.string() + ": "));
+            EXPECT_THAT(
+                error.what(),
+                ContainsRegex("(install the plug-in (again|for this one|and the app from one "
+                              "release)|check its permissions)$"));
             return error.what();
         }
         ADD_FAILURE() << "no problem was found";
@@ -157,6 +165,11 @@ TEST_F(Bundles, OfTheProgramAndThePlatformHaveNoIdentifierAndNoTexts) {
         EXPECT_EQ(own->localizedStringForKey_value_table("KEY", "", std::nullopt), "KEY");
         EXPECT_EQ(own->localizedStringForKey_value_table("KEY", std::nullopt, "table"), "KEY");
     }
+}
+
+TEST_F(Bundles, AreOneForAllClassesThatStandTogether) {
+    EXPECT_EQ(NSBundle::bundleForClass(Class::of<OfThisProgram>()),
+              NSBundle::bundleForClass(Class::of<AlsoOfThisProgram>()));
 }
 
 TEST_F(Bundles, LookATextUpInTheirTableThenTakeTheValueThenTheKey) {
@@ -336,14 +349,37 @@ TEST_F(Bundles, WhoseLibraryNamesMoreThanItHoldsAreNotLoaded) {
     makeBundle();
     const std::string whole = bytesOf(builtPlugin);
     const auto place = valueAt<ElfW(Ehdr)>(whole, 0).e_phoff;
+    const auto with = [&](const ElfW(Phdr) & segment) {
+        std::string changed = whole;
+        return changed.replace(place, sizeof segment, reinterpret_cast<const char*>(&segment),
+                               sizeof segment);
+    };
     for (const auto field : {&ElfW(Phdr)::p_offset, &ElfW(Phdr)::p_filesz}) {
         auto segment = valueAt<ElfW(Phdr)>(whole, place);
         segment.*field = static_cast<ElfW(Off)>(whole.size() + 1);
-        std::string longer = whole;
-        longer.replace(place, sizeof segment, reinterpret_cast<const char*>(&segment),
-                       sizeof segment);
-        EXPECT_THAT(problemOfLibrary(longer), HasSubstr("its end is missing"));
+        EXPECT_THAT(problemOfLibrary(with(segment)), HasSubstr("its end is missing"));
     }
+    auto last = valueAt<ElfW(Phdr)>(whole, place);
+    last.p_offset = static_cast<ElfW(Off)>(whole.size() - 1);
+    last.p_filesz = 2;
+    EXPECT_THAT(problemOfLibrary(with(last)), HasSubstr("its end is missing"));
+}
+
+TEST_F(Bundles, WhoseLibraryHasNoSegmentsAreNotLoaded) {
+    makeBundle();
+    std::string bytes = bytesOf(builtPlugin);
+    bytes.replace(offsetof(ElfW(Ehdr), e_phnum), sizeof(ElfW(Half)), sizeof(ElfW(Half)), '\0');
+
+    EXPECT_THAT(problemOfLibrary(bytes), HasSubstr("its end is missing"));
+}
+
+TEST_F(Bundles, WhoseFilesAreLargerThanAnyAreRefusedUnread) {
+    constexpr std::size_t most = 1000;
+    const auto file = directory_.path() / "file";
+    write(file, std::string(most, 'x'));
+    EXPECT_EQ(quorl::readBundleFile(file, most), std::string(most, 'x'));
+    EXPECT_THAT(problemIn(file, [&] { (void)quorl::readBundleFile(file, most - 1); }),
+                HasSubstr("larger than any of its kind"));
 }
 
 TEST_F(Bundles, WhoseLibraryIsSomethingElseAreNotLoaded) {

@@ -57,6 +57,16 @@ TEST_F(Preferences, GiveBackAtOnceWhatWasStored) {
     EXPECT_EQ(defaults_.assetSyncLimit()->unsignedIntegerValue(), 250U);
 }
 
+TEST_F(Preferences, GiveTheSameNumberUntilItChanges) {
+    defaults_.setAssetSyncLimit(number(250));
+    const auto before = defaults_.assetSyncLimit();
+    EXPECT_EQ(defaults_.assetSyncLimit(), before);
+
+    defaults_.setAssetSyncLimit(number(500));
+    EXPECT_EQ(before->unsignedIntegerValue(), 250U);
+    EXPECT_EQ(defaults_.assetSyncLimit()->unsignedIntegerValue(), 500U);
+}
+
 TEST_F(Preferences, AreClearedByNull) {
     defaults_.setAssetSyncPlaylistPersistentID(number(7));
     defaults_.setAssetSyncLimit(number(15));

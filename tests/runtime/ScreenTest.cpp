@@ -149,6 +149,12 @@ TEST_F(Screens, LayTheSubtitleOutBelowTheTitle) {
 
     EXPECT_EQ(row->textLabel().frame(), (CGRect{16, 2, 50, 20}));
     EXPECT_EQ(row->detailTextLabel().frame(), (CGRect{16, 22, 60, 20}));
+
+    row->textLabel().setText(std::string(100, 'x'));
+    row->detailTextLabel().setText(std::string(100, 'x'));
+    row->layoutSubviews();
+    EXPECT_EQ(row->textLabel().frame(), (CGRect{16, 2, 320 - 2 * 16, 20}));
+    EXPECT_EQ(row->detailTextLabel().frame(), (CGRect{16, 22, 320 - 2 * 16, 20}));
 }
 
 class AnyList : public PSListController {};

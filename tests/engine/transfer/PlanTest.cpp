@@ -183,6 +183,11 @@ TEST_F(Planning, ListsASongOnceThatIsListedTwice) {
     EXPECT_EQ(playlistText(order(), plan.songs), "#EXTM3U\n#PLAYLIST:List\none.mp3\none.mp3\n");
 }
 
+TEST_F(Planning, KeepsThePlaylistsNameOnOneLine) {
+    playlist_.name = "A\nlong\x01 \u00F6 name";
+    EXPECT_EQ(playlistText(order(), {}), "#EXTM3U\n#PLAYLIST:A long  \u00F6 name\n");
+}
+
 TEST_F(Planning, LeavesOutASongThatCannotBeRead) {
     wish("gone.mp3", 10, 2 * second, "1");
     wish("two.mp3", 20, second, "2");
