@@ -12,6 +12,7 @@
 #include "platform/InterfaceVersion.h"
 #include "runtime/plugins/BundleFiles.h"
 #include "runtime/plugins/PluginBundle.h"
+#include "tests/base/ManualPage.h"
 #include "tests/base/TemporaryDirectory.h"
 #include "tests/runtime/Digests.h"
 #include "tests/support/Damage.h"
@@ -126,6 +127,23 @@ TEST_F(Bundles, SayWhatTheyAreBeforeTheirCodeIsLoaded) {
     EXPECT_EQ(opened->registration().rootClass, "TestPane");
     EXPECT_EQ(opened->registration().library, "libTestPlugin.so");
     EXPECT_EQ(opened->registration().interfaceVersion, QuorlInterfaceVersion);
+}
+
+TEST_F(Bundles, AreRegisteredAsTheManualShows) {
+    std::filesystem::create_directories(bundle_);
+    const auto example = nlohmann::json::parse(quorl::tests::exampleIn("quorl-registration.5"));
+    write(registration_, example.dump());
+
+    const auto registered = PluginBundle::open(bundle_)->registration();
+    EXPECT_EQ(registered.identifier, example.at("identifier"));
+    EXPECT_EQ(registered.rootClass, example.at("rootClass"));
+    EXPECT_EQ(registered.library, example.at("library"));
+    EXPECT_EQ(registered.digests, example.at("sha256"));
+    for (const auto& [field, value] : example.items()) {
+        auto rest = example;
+        rest.erase(field);
+        EXPECT_THAT(problemOfRegistration(rest.dump()), HasSubstr('"' + field + '"'));
+    }
 }
 
 TEST_F(Bundles, GiveTheClassOfTheirRootPane) {

@@ -9,6 +9,7 @@
 #include <sys/stat.h>
 
 #include "services/base/AtomicFile.h"
+#include "tests/base/ManualPage.h"
 #include "tests/base/TemporaryDirectory.h"
 
 namespace {
@@ -40,6 +41,17 @@ TEST_F(Generations, AreNoneOnANewWearable) {
     EXPECT_EQ(newest().manifest, Manifest());
     EXPECT_EQ(newest().number, 0);
     EXPECT_EQ(newest().next, 0);
+}
+
+TEST_F(Generations, AreWrittenAsTheManualShows) {
+    const auto example = quorl::tests::exampleIn("quorl-manifest.5");
+    files_ = {{first, example}};
+    const auto [manifest, number, next] = newest();
+
+    ASSERT_EQ(manifest.songs.size(), 2);
+    EXPECT_EQ(manifest.songs[1].source, "Café/Evening.mp3");
+    EXPECT_TRUE(manifest.playlist && manifest.sent);
+    EXPECT_EQ(generationText(number, manifest), example);
 }
 
 TEST_F(Generations, CountByTheirNumbersWhicheverFileTheyAreIn) {
