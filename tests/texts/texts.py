@@ -45,7 +45,7 @@ def run(*command):
 
 def entries(path):
     """The entries of a catalogue, without those that are empty or marked as doubtful."""
-    checked = run("msgfmt", "--check-domain", "-o", "/dev/null", str(path))
+    checked = run("msgfmt", "--check", "-o", "/dev/null", str(path))
     if checked.returncode:
         raise UnreadableText(checked.stderr)
     return [entry for entry in polib.pofile(str(path)) if entry.translated()]
