@@ -30,6 +30,10 @@ TEST_P(PixelAlignment, MovesTheEdgesOutwardToWholePixels) {
 }
 
 constexpr CGFloat third = CGFloat{1} / 3;
+constexpr CGFloat one = 1;
+constexpr CGFloat tenth = one / 10;
+constexpr CGFloat aboutATenth = one - one * 9 / 10;     ///< a little less
+constexpr CGFloat aboutThreeTenths = tenth + tenth * 2; ///< a little more
 
 INSTANTIATE_TEST_SUITE_P(
     Scales, PixelAlignment,
@@ -40,7 +44,14 @@ INSTANTIATE_TEST_SUITE_P(
                     Alignment{2, {10.25F, 10.5F, 10.5F, 0.25F}, {10, 10.5F, 11, 0.5F}},
                     Alignment{2, {10.5F, 0, 0.5F, 0}, {10.5F, 0, 0.5F, 0}},
                     Alignment{3, {third, 2 * third, third, 1}, {third, 2 * third, third, 1}},
-                    Alignment{3, {0.1F, 0.4F, 0.5F, 0.5F}, {0, third, 2 * third, 2 * third}}));
+                    Alignment{3, {0.1F, 0.4F, 0.5F, 0.5F}, {0, third, 2 * third, 2 * third}},
+                    Alignment{
+                        10, {aboutATenth, 0, 1, aboutThreeTenths}, {tenth, 0, 1, 3 * tenth}}));
+
+TEST(PixelAlignmentProperties, TakesWhatIsFurtherOffThanAnErrorOfTheCalculationSerious) {
+    const CGFloat off = sizeof(CGFloat) == sizeof(double) ? CGFloat(1e-4) : CGFloat(1e-2);
+    EXPECT_EQ(UIRectIntegralWithScale({0, 0, 1 + off, 1}, 1).width, 2);
+}
 
 TEST(PixelAlignmentProperties, LiesOnWholePixelsAndHoldsWhatItWasGiven) {
     for (const CGFloat scale : {CGFloat{1}, CGFloat{1.5}, CGFloat{2}, CGFloat{3}}) {
@@ -181,6 +192,12 @@ class AnyTable : public UITableViewController {
 TEST(WithoutAHost, NoPaneIsMade) {
     EXPECT_EQ(create<AnyList>(), nullptr);
     EXPECT_EQ(create<AnyTable>(), nullptr);
+}
+
+TEST(WithoutAHost, AControllerMayComeAndGo) {
+    const auto controller = create<UIViewController>();
+    controller->viewWillAppear(false);
+    controller->viewWillDisappear(false);
 }
 
 TEST(WithoutAHost, TheUseOfAServiceEndsTheProcessWithAMessage) {
