@@ -4,15 +4,12 @@ import hashlib
 import json
 import os
 import pathlib
-import re
 import shutil
 import signal
 import subprocess
 import tempfile
-import textwrap
 import unittest
 
-ROOT = pathlib.Path(__file__).resolve().parents[2]
 PROGRAM = os.environ["QUORL_SCRIPT"]
 BUNDLES = pathlib.Path(PROGRAM).parent.parent / "lib/quorl/plugins"
 BUSY = b'{"do":"open"}\n' + b'{"do":"snapshot"}\n{"do":"advance","seconds":1}\n' * 50
@@ -180,16 +177,6 @@ class Inspection(unittest.TestCase):
         self.assertEqual(reply, {
             "ok": True, "trace": [["dealloc", "LMQuorlPlaylistCell"]],
             "title": [16, 10, 110, 20], "detail": [160, 10, 100, 20], "set": ["detail", "title"]})
-
-
-class Guide(unittest.TestCase):
-    def test_every_example_of_the_guide_can_be_played(self):
-        guide = (ROOT / "docs/scripting.md").read_text(encoding="utf-8")
-        examples = re.findall(r"(?:^    \{.*\n)+", guide, re.MULTILINE)
-        self.assertEqual(len(examples), 3)
-        for example in examples:
-            with self.subTest(example):
-                self.assertEqual(play(textwrap.dedent(example).encode()).returncode, 0)
 
 
 class CommandLine(unittest.TestCase):

@@ -32,11 +32,11 @@ std::size_t threads() {
     return static_cast<std::size_t>(std::distance(Entries("/proc/self/task"), Entries()));
 }
 
-/// Proportional set size, in KiB.
+/// Its own, in KiB: what it shares with others is divided among them, who come and go.
 std::size_t memory() {
     std::ifstream stream("/proc/self/smaps_rollup");
     for (std::string word; stream >> word;) {
-        if (word == "Pss:") {
+        if (word == "Anonymous:") {
             std::size_t kibibytes = 0;
             stream >> kibibytes;
             return kibibytes;
