@@ -3,8 +3,8 @@
 #include "platform/Foundation.h"
 
 /// The preferences that the panes and the sync engine share. Another process may change any of them
-/// at any time; a getter gives what this process has stored last, or what another has, at the latest
-/// when that is announced. Main thread only.
+/// at any time; a getter gives what this process has stored last, or what another has, at the
+/// latest when that is announced. Main thread only.
 class LMSyncDefaults : public NSObject {
   public:
     /// The one object of the process.
