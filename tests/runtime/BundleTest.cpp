@@ -7,11 +7,13 @@
 #include <gmock/gmock.h>
 #include <link.h>
 #include <nlohmann/json.hpp>
+#include <sys/resource.h>
 #include <sys/stat.h>
 
 #include "platform/InterfaceVersion.h"
 #include "runtime/plugins/BundleFiles.h"
 #include "runtime/plugins/PluginBundle.h"
+#include "runtime/plugins/SharedObjectFile.h"
 #include "tests/base/ManualPage.h"
 #include "tests/base/TemporaryDirectory.h"
 #include "tests/runtime/Digests.h"
@@ -252,6 +254,35 @@ TEST_F(Bundles, WhoseRegistrationIsAGigabyteAreRefusedUnread) {
 
     EXPECT_THAT(problemIn(registration_, [this] { (void)PluginBundle::open(bundle_); }),
                 HasSubstr("larger than any of its kind"));
+
+    constexpr std::uintmax_t most = std::uintmax_t{1} << 20;
+    std::filesystem::resize_file(registration_, most + 1);
+    EXPECT_THAT(problemIn(registration_, [this] { (void)PluginBundle::open(bundle_); }),
+                HasSubstr("larger than any of its kind"));
+}
+
+TEST_F(Bundles, WhoseLibraryIsLargerThanAnyAreNotLoaded) {
+    makeBundle();
+    constexpr std::uintmax_t most = std::uintmax_t{256} << 20;
+    std::filesystem::resize_file(library_, most + 1);
+
+    EXPECT_THAT(problemOfLibrary(), HasSubstr("larger than any of its kind"));
+}
+
+TEST(SharedObjects, ThatAreNotThereOrCannotBeReadSayWhatToDo) {
+    const TemporaryDirectory directory;
+    const auto missing = "this file is missing; install the plug-in again";
+    EXPECT_EQ(quorl::problemOfSharedObject(directory.path() / "gone"), missing);
+    EXPECT_EQ(quorl::problemOfSharedObject(directory.path()), missing);
+    EXPECT_EQ(quorl::problemOfSharedObject(builtPlugin), std::nullopt);
+
+    rlimit before{};
+    getrlimit(RLIMIT_NOFILE, &before);
+    const rlimit none{0, before.rlim_max};
+    setrlimit(RLIMIT_NOFILE, &none);
+    const auto problem = quorl::problemOfSharedObject(builtPlugin);
+    setrlimit(RLIMIT_NOFILE, &before);
+    EXPECT_EQ(problem, "this file cannot be read; check its permissions");
 }
 
 TEST_F(Bundles, WhoseRegistrationWasDamagedAreRefusedOrOpened) {

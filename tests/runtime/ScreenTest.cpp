@@ -103,6 +103,10 @@ TEST_F(Screens, MeasureLabelsWithinTheSizeGiven) {
     EXPECT_EQ(label.sizeThatFits({1000, 1000}), (CGSize{0, 0}));
 }
 
+TEST_F(Screens, GiveACellTheDefaultStyleWhereNoneIsSaid) {
+    EXPECT_EQ(create<UITableViewCell>()->style(), UITableViewCellStyle::Default);
+}
+
 TEST_F(Screens, LayTitleAndDetailOutSideBySide) {
     const auto row = cell(UITableViewCellStyle::Value1);
     row->textLabel().setText("title");
