@@ -18,7 +18,7 @@ void NotificationCenter::addObserver_selector_name_object(NSObject* observer,
     auto& registrations = registrations_[name];
     auto more = registrations ? std::make_shared<Registrations>(*registrations)
                               : std::make_shared<Registrations>();
-    more->push_back(std::make_shared<Registration>(*observer, selector, object));
+    more->insert(more->begin(), std::make_shared<Registration>(*observer, selector, object));
     registrations = std::move(more);
 }
 
@@ -40,11 +40,10 @@ void NotificationCenter::removeObserver(const NSObject* observer) {
 void NotificationCenter::postNotificationName_object(NSNotificationName name, NSObject* object) {
     const auto registrations = registrationsFor(name);
     const NSNotification notification{name, object};
-    for (auto newest = registrations->rbegin(); newest != registrations->rend(); ++newest) {
-        const Registration& registration = **newest;
-        if (registration.sender == nullptr || registration.sender == object) {
-            if (const auto observer = observerOf(registration)) {
-                registration.selector(*observer, notification);
+    for (const auto& registration : *registrations) {
+        if (registration->sender == nullptr || registration->sender == object) {
+            if (const auto observer = observerOf(*registration)) {
+                registration->selector(*observer, notification);
             }
         }
     }

@@ -35,7 +35,7 @@ class NotificationCenter : public NSNotificationCenter {
         std::atomic<bool> removed = false;
     };
 
-    /// The oldest first. Never changed but replaced, so that a post goes on with those it began
+    /// The newest first. Never changed but replaced, so that a post goes on with those it began
     /// with.
     using Registrations = std::vector<std::shared_ptr<Registration>>;
 
