@@ -32,13 +32,18 @@
 #include "services/base/Utf8.h"
 #include "services/engine/BusLoop.h"
 #include "services/engine/Names.h"
+#include "services/language/CommandLineWords.h"
 #include "services/language/Languages.h"
+#include "services/language/Translated.h"
 #include "services/preferences/ChosenPlaces.h"
 #include "services/preferences/SharedPreferences.h"
 
 namespace {
 
 using namespace quorl;
+using language::filled;
+using language::translated;
+using language::wordedCheck;
 
 enum ExitCode { Ended = 0, CannotStart = 1, BusLost = 2, AlreadyRunning = 3 };
 
@@ -123,7 +128,6 @@ void followWearable(syncd::Engine& engine, const std::string& directory) {
 }
 
 int serve(const Options& options) {
-    language::followLanguages(language::usersLanguages());
     const auto signals = blockSignals();
     engine::BusLoop loop(sdbus::createSessionBusConnection());
     loop.watch(signals.get(), POLLIN, [&] { loop.stop(); });
@@ -192,49 +196,77 @@ int serve(const Options& options) {
         loop.bus().requestName(engine::busNameFor(options.purpose));
     } catch (const sdbus::Error& error) {
         return complain(AlreadyRunning,
-                        std::string("Another sync engine is running, which has the name ") +
-                            engine::busNameFor(options.purpose) + ". End that one first. (" +
-                            error.getMessage() + ")");
+                        filled(translated("Another sync engine is running, which has the name "
+                                          "{name}. End that one first. ({reason})"),
+                               {{"name", engine::busNameFor(options.purpose)},
+                                {"reason", error.getMessage()}}));
     }
 
     const auto problem = loop.run();
     return problem.empty()
                ? Ended
-               : complain(BusLost, "The session bus is gone (" + problem +
-                                       "). Start the engine again in the next session.");
+               : complain(BusLost, filled(translated("The session bus is gone ({reason}). Start "
+                                                     "the engine again in the next session."),
+                                          {{"reason", problem}}));
+}
+
+void addPlaces(CLI::App& program, Options& options) {
+    program.add_flag_callback(
+        "--trial", [&options] { options.purpose = base::Purpose::Trial; },
+        translated("For a trial, beside another engine: settings and an embedded wearable of its "
+                   "own; ends when its standard input ends"));
+    program
+        .add_option(
+            "--music-folder", options.engine.musicFolder,
+            translated("The folder with songs and playlists, instead of the one that was chosen"))
+        ->type_name("DIRECTORY");
+    program
+        .add_option(
+            "--wearable", options.engine.wearableDirectory,
+            translated("The directory of a mounted wearable, instead of the one that was chosen"))
+        ->type_name("DIRECTORY");
+}
+
+void addFigures(CLI::App& program, Options& options, std::int64_t& retryDelay) {
+    const auto notNegative =
+        wordedCheck(CLI::NonNegativeNumber, translated("give a number, 0 or more"));
+    program
+        .add_option("--embedded-capacity", options.embeddedCapacity,
+                    translated("What the embedded wearable holds, in bytes"))
+        ->type_name("BYTES")
+        ->check(notNegative);
+    program
+        .add_option(
+            "--rate-limit", options.engine.rateLimit,
+            translated(
+                "Bytes a second that are copied to the embedded wearable at most; 0 for no limit"))
+        ->type_name("BYTES")
+        ->check(notNegative);
+    program
+        .add_option(
+            "--retry-after", retryDelay,
+            filled(
+                translated("Seconds after which a sync that did not work is tried again, twice as "
+                           "many after each further one, up to an hour; {usual} unless given"),
+                {{"usual", std::to_string(retryDelay)}}))
+        ->type_name("SECONDS")
+        ->check(wordedCheck(CLI::Range(1, 3600), translated("give a number from 1 to 3600")));
 }
 
 } // namespace
 
 int main(int argc, char** argv) {
+    language::followLanguages(language::usersLanguages());
     Options options;
-    CLI::App program("Brings the chosen playlist to the Velora, and tells on the session bus how "
-                     "far it is.");
-    program.set_version_flag("--version", "quorl-syncd " QUORL_VERSION);
-    program.add_flag_callback(
-        "--trial", [&options] { options.purpose = base::Purpose::Trial; },
-        "for a trial, beside another engine: settings and an embedded wearable of its own; ends "
-        "when its standard input ends");
-    program.add_option("--music-folder", options.engine.musicFolder,
-                       "the folder with songs and playlists, instead of the one that was chosen");
-    program.add_option("--wearable", options.engine.wearableDirectory,
-                       "the directory of a mounted wearable, instead of the one that was chosen");
-    program
-        .add_option("--embedded-capacity", options.embeddedCapacity,
-                    "what the embedded wearable holds, in bytes")
-        ->check(CLI::NonNegativeNumber);
-    program
-        .add_option("--rate-limit", options.engine.rateLimit,
-                    "bytes a second that are copied to the embedded wearable at most; 0 for no "
-                    "limit")
-        ->check(CLI::NonNegativeNumber);
+    CLI::App program(translated("Brings the chosen playlist to the Velora, and tells on the "
+                                "session bus how far it is."),
+                     "quorl-syncd");
+    language::wordCommandLine(program);
+    program.set_version_flag("--version", "quorl-syncd " QUORL_VERSION,
+                             translated("Print the version and end"));
+    addPlaces(program, options);
     std::int64_t retryDelay = options.engine.retryDelay.count();
-    program
-        .add_option("--retry-after", retryDelay,
-                    "seconds after which a sync that did not work is tried again, twice as many "
-                    "after each further one, up to an hour; " +
-                        std::to_string(retryDelay) + " unless given")
-        ->check(CLI::Range(1, 3600));
+    addFigures(program, options, retryDelay);
     CLI11_PARSE(program, argc, argv);
 
     options.engine.retryDelay = std::chrono::seconds(retryDelay);
@@ -244,12 +276,15 @@ int main(int argc, char** argv) {
     try {
         return base::endOfProgram(serve(options));
     } catch (const sdbus::Error& error) {
-        return complain(CannotStart, "There is no session bus (" + error.getMessage() +
-                                         "). Log in, or start one with dbus-run-session.");
+        return complain(CannotStart,
+                        filled(translated("There is no session bus ({reason}). Log in again, or "
+                                          "start the program with dbus-run-session."),
+                               {{"reason", error.getMessage()}}));
     } catch (const syncd::NotReady& error) {
         return complain(CannotStart, error.what());
     } catch (const std::exception& error) {
-        return complain(CannotStart, std::string("The sync engine cannot go on: ") + error.what() +
-                                         ". Close some programs, then start it again.");
+        return complain(CannotStart, filled(translated("The sync engine cannot go on: {reason}. "
+                                                       "Close some programs, then start it again."),
+                                            {{"reason", error.what()}}));
     }
 }

@@ -10,6 +10,8 @@
 #include "quorl/terminal/TerminalMode.h"
 #include "quorl/window/WindowMode.h"
 #include "services/base/Errand.h"
+#include "services/language/Languages.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
 
@@ -42,6 +44,8 @@ ExitCode run(char* program, const Options& options) {
 } // namespace quorl
 
 int main(int argc, char** argv) {
+    namespace language = quorl::language;
+    language::followLanguages(language::usersLanguages());
     const auto parsed = quorl::parseCommandLine(argc, argv);
     if (const auto* code = std::get_if<quorl::ExitCode>(&parsed)) {
         return static_cast<int>(*code);
@@ -50,7 +54,8 @@ int main(int argc, char** argv) {
         const auto code = quorl::run(argv[0], std::get<quorl::Options>(parsed));
         return quorl::base::endOfProgram(static_cast<int>(code));
     } catch (const std::exception& error) {
-        std::cerr << "quorl: " << error.what() << ". Close some programs, then try again.\n";
+        const auto pattern = language::translated("{reason}. Close some programs, then try again.");
+        std::cerr << "quorl: " << language::filled(pattern, {{"reason", error.what()}}) << '\n';
         return static_cast<int>(quorl::ExitCode::Failure);
     }
 }

@@ -52,6 +52,12 @@ bool has(const std::vector<std::string>& abilities, std::string_view ability) {
     return std::ranges::find(abilities, ability) != abilities.end();
 }
 
+void complain(const std::string& pattern, const sdbus::Error& error) {
+    std::cerr << "quorl-syncd: "
+              << language::filled(pattern, {{"reason", base::printable(error.getMessage())}})
+              << '\n';
+}
+
 std::string titleOf(Kind kind) {
     return engine::sentence(
         {kind == Kind::Done ? engine::code::titleSynced : engine::code::titleNotSynced, {}});
@@ -159,8 +165,7 @@ void DesktopNotices::noteAnswer(const sdbus::Error* error) {
     isUnderWay_ = false;
     if (error != nullptr && !isProblemTold_) {
         isProblemTold_ = true;
-        std::cerr << "quorl-syncd: Nothing can be told on the desktop ("
-                  << base::printable(error->getMessage()) << ").\n";
+        complain(language::translated("Nothing can be told on the desktop ({reason})."), *error);
     }
 }
 
@@ -194,8 +199,7 @@ void DesktopNotices::openApp() {
         .withArguments(platform)
         .uponReplyInvoke([](const sdbus::Error* error) {
             if (error != nullptr) {
-                std::cerr << "quorl-syncd: The app cannot be opened ("
-                          << base::printable(error->getMessage()) << ").\n";
+                complain(language::translated("The app cannot be opened ({reason})."), *error);
             }
         });
 }

@@ -3,6 +3,7 @@
 #include <chrono>
 #include <string>
 
+#include "services/language/Translated.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl::syncd {
@@ -21,9 +22,11 @@ SleepInhibitor::SleepInhibitor() {
         manager->callMethod("Inhibit")
             .onInterface("org.freedesktop.login1.Manager")
             .withTimeout(patience)
-            .withArguments("sleep", "quorl-syncd",
-                           std::string("Music is being synced to the ") + wearable::wearableName,
-                           "block")
+            .withArguments(
+                "sleep", "quorl-syncd",
+                language::filled(language::translated("Music is being synced to the {wearable}"),
+                                 {{"wearable", wearable::wearableName}}),
+                "block")
             .storeResultsTo(lock_);
     } catch (const sdbus::Error&) {
         // A machine without a login manager does not put itself to sleep.

@@ -10,8 +10,11 @@
 #include "services/base/Errand.h"
 #include "services/base/FileDescriptor.h"
 #include "services/base/Utf8.h"
+#include "services/language/Translated.h"
 
 namespace quorl::syncd {
+
+using language::translated;
 
 /// Shared with the thread that asks for it.
 struct DirectoryCheck::Answer {
@@ -38,10 +41,16 @@ namespace {
 constexpr std::chrono::seconds patience{1};
 constexpr std::size_t mostOpen = 4;
 
-std::string quoted(const std::string& directory) { return "“" + base::printable(directory) + "”"; }
+/// @param pattern a sentence about it, translated.
+/// @param error what the system says.
+std::string complaint(const std::string& pattern, const std::string& directory, int error = 0) {
+    return language::filled(pattern, {{"name", base::printable(directory)},
+                                      {"reason", std::generic_category().message(error)}});
+}
 
 std::string silence(const std::string& directory) {
-    return "What has " + quoted(directory) + " does not answer. Check its connection.";
+    return complaint(translated("What has “{name}” does not answer. Check its connection."),
+                     directory);
 }
 
 /// Never waits for a pipe, which is no directory.
@@ -54,10 +63,12 @@ std::string examined(const std::string& directory) {
     case ENOENT:
         return {};
     case ENOTDIR:
-        return quoted(directory) + " is not a directory. Name one.";
+        return complaint(translated("“{name}” is not a directory. Name one."), directory);
     default:
-        return quoted(directory) + " cannot be read: " + std::generic_category().message(error) +
-               ". Change that, or name another directory.";
+        return complaint(
+            translated(
+                "“{name}” cannot be read: {reason}. Change that, or name another directory."),
+            directory, error);
     }
 }
 
@@ -68,7 +79,8 @@ std::string DirectoryCheck::objectionTo(const std::string& directory) {
         return {}; // stands for the usual one
     }
     if (!directory.starts_with('/')) {
-        return quoted(directory) + " is not a full path. Begin it with a slash.";
+        return complaint(translated("“{name}” is not a full path. Begin it with a slash."),
+                         directory);
     }
     std::erase_if(open_, [](const auto& answer) { return answer->get().has_value(); });
     if (open_.size() >= mostOpen) {
@@ -81,8 +93,10 @@ std::string DirectoryCheck::objectionTo(const std::string& directory) {
             [answer](const std::stop_token&) { answer->give(examined(answer->directory)); },
             patience);
     } catch (const std::system_error& error) {
-        return quoted(directory) + " cannot be looked at: " + error.code().message() +
-               ". Close some programs, then try again.";
+        return complaint(
+            translated(
+                "“{name}” cannot be looked at: {reason}. Close some programs, then try again."),
+            directory, error.code().value());
     }
     const auto objection = answer->get();
     if (!objection) {

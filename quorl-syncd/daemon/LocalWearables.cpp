@@ -12,12 +12,19 @@
 #include "services/base/AtomicFile.h"
 #include "services/base/Errand.h"
 #include "services/base/Paths.h"
+#include "services/language/Translated.h"
 #include "services/wearable/Lookout.h"
 #include "services/wearable/UsageReader.h"
 
 namespace quorl::syncd {
 
 namespace {
+
+std::string notSaved(const std::system_error& error) {
+    return language::filled(
+        language::translated("The wearable could not remember how it is attached: {reason}."),
+        {{"reason", error.code().message()}});
+}
 
 /// What is known of a wearable. Shared with the threads that look at it.
 class Known {
@@ -55,8 +62,7 @@ class Known {
             saveAttachment(root.get(), change.appliedTo(wearable::loadAttachment(root.get())));
             return {};
         } catch (const std::system_error& error) {
-            return "The wearable could not remember how it is attached: " + error.code().message() +
-                   ".";
+            return notSaved(error);
         }
     }
 
@@ -112,10 +118,7 @@ class LocalWearable final : public WatchedWearable {
                 },
                 patience);
         } catch (const std::system_error& error) {
-            const auto problem =
-                "The wearable could not remember how it is attached: " + error.code().message() +
-                ".";
-            loop_.post([tell, problem] { tell(problem); });
+            loop_.post([tell, problem = notSaved(error)] { tell(problem); });
         }
     }
 

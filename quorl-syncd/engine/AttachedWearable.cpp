@@ -7,6 +7,7 @@
 #include "quorl-syncd/engine/NotReady.h"
 #include "services/base/Utf8.h"
 #include "services/engine/Codes.h"
+#include "services/language/Translated.h"
 
 namespace quorl::syncd {
 
@@ -38,7 +39,8 @@ void AttachedWearable::refresh() {
 
 void AttachedWearable::attach(const wearable::AttachmentChange& change) {
     if (!identity_.isEmbedded()) {
-        throw NotReady("This wearable is a device; plug it in or out instead.");
+        throw NotReady(
+            language::translated("This wearable is a device; plug it in or out instead."));
     }
     wished_.connected = change.connected ? change.connected : wished_.connected;
     wished_.onCharger = change.onCharger ? change.onCharger : wished_.onCharger;

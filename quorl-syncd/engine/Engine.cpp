@@ -5,8 +5,13 @@
 #include <utility>
 
 #include "services/engine/Codes.h"
+#include "services/language/Translated.h"
 
 namespace quorl::syncd {
+
+using language::filled;
+using language::toTranslate;
+using language::translated;
 
 namespace {
 
@@ -21,13 +26,13 @@ constexpr auto quietTime = 200ms;
 constexpr auto stallTime = 10s;
 
 /// Does what takes a thread or a file of this process.
+/// @param complaint where that cannot be had, in English.
 template <class Act>
-void requireMeans(const char* what, Act act) {
+void requireMeans(const char* complaint, Act act) {
     try {
         act();
     } catch (const std::system_error& error) {
-        throw NotReady(std::string(what) + " cannot be watched: " + error.code().message() +
-                       ". Close some programs, then try again.");
+        throw NotReady(filled(translated(complaint), {{"reason", error.code().message()}}));
     }
 }
 
@@ -103,7 +108,9 @@ void Engine::removeMusic() {
 
 void Engine::setMusicFolder(const std::string& path) {
     const auto folder = path.empty() ? ports_.music.usualFolder() : path;
-    requireMeans("The music folder", [&] {
+    constexpr auto complaint = toTranslate(
+        "The music folder cannot be watched: {reason}. Close some programs, then try again.");
+    requireMeans(complaint, [&] {
         music_ = ports_.music.watch(folder, [this](auto inventory) {
             inventory_ = std::move(inventory);
             consider();
@@ -121,7 +128,9 @@ void Engine::setRateLimit(std::uint64_t bytesPerSecond) {
 }
 
 void Engine::setWearableDirectory(const std::string& path) {
-    requireMeans("The wearable", [&] { wearable_.choose(path); });
+    constexpr auto complaint = toTranslate(
+        "The wearable cannot be watched: {reason}. Close some programs, then try again.");
+    requireMeans(complaint, [&] { wearable_.choose(path); });
     givenUp_.reset();
     isRemovalRequested_ = false; // it was for the other one
     tellLastResult();
@@ -328,8 +337,12 @@ void Engine::keepResult(const std::string& wearable, bool success, const engine:
         const auto complete = isComplete ? now : ports_.results.of(wearable).lastComplete;
         ports_.results.remember(wearable, {success, message, now, complete});
     } catch (const std::system_error& error) {
-        std::cerr << "quorl-syncd: What became of the sync is forgotten when the engine ends ("
-                  << error.what() << ").\n";
+        std::cerr
+            << "quorl-syncd: "
+            << filled(translated(
+                          "What became of the sync is forgotten when the engine ends ({reason})."),
+                      {{"reason", error.what()}})
+            << '\n';
     }
     tellLastResult();
 }

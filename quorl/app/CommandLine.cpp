@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <charconv>
-#include <iostream>
 #include <map>
 #include <optional>
 #include <vector>
@@ -10,17 +9,24 @@
 #include <CLI/CLI.hpp>
 
 #include "services/base/Utf8.h"
+#include "services/language/CommandLineWords.h"
+#include "services/language/Translated.h"
 #include "services/preferences/Preference.h"
 
 namespace quorl {
 
+using language::filled;
+using language::translated;
+using language::wordedCheck;
+
 namespace {
 
-constexpr const char* exitCodes = "Exit codes:\n"
-                                  "  0  done\n"
-                                  "  1  it could not be done; standard error says why\n"
-                                  "  2  the command line is wrong\n"
-                                  "  3  --library, --playlists: the music folder is missing";
+constexpr auto exitCodes =
+    language::toTranslate("Exit codes:\n"
+                          "  0  done\n"
+                          "  1  it could not be done; standard error says why\n"
+                          "  2  the command line is wrong\n"
+                          "  3  --library, --playlists: the music folder is missing");
 
 /// So that megabytes are still a number of bytes.
 constexpr std::uint64_t mostOfALimit = std::uint64_t{1} << 40U;
@@ -45,8 +51,10 @@ std::string takeSize(const std::string& text, Picture& picture) {
                             ? std::nullopt
                             : side(std::string_view(text).substr(separator + 1));
     if (!width || !height) {
-        return "give the size as WIDTHxHEIGHT, each from " + std::to_string(smallestSide) + " to " +
-               std::to_string(largestSide) + ", for instance 360x720";
+        return filled(
+            translated(
+                "give the size as WIDTHxHEIGHT, each from {least} to {most}, for instance 360x720"),
+            {{"least", std::to_string(smallestSide)}, {"most", std::to_string(largestSide)}});
     }
     picture.width = *width;
     picture.height = *height;
@@ -70,25 +78,28 @@ void excludeEachOther(const std::vector<CLI::Option*>& options) {
 }
 
 void addModes(CLI::App& app, Options& options, Flags& flags) {
-    auto* text =
-        app.add_flag("--text", flags.text, "Show the pane in the terminal, without any display");
-    auto* screenshot = app.add_option("--screenshot", options.picture.file,
-                                      "Write a picture of the pane to FILE (PNG) and end")
-                           ->type_name("FILE");
-    auto* library =
-        app.add_flag("--library", flags.library,
-                     "Print what the music folder holds and what was left out, and end");
-    auto* playlists = app.add_flag("--playlists", flags.playlists,
-                                   "Print the playlists that can be chosen, one a line: id, songs, "
-                                   "bytes, name, separated by tabs; and end");
+    auto* text = app.add_flag("--text", flags.text,
+                              translated("Show the pane in the terminal, without any display"));
+    auto* screenshot =
+        app.add_option("--screenshot", options.picture.file,
+                       translated("Write a picture of the pane to FILE (PNG) and end"))
+            ->type_name("FILE");
+    auto* library = app.add_flag(
+        "--library", flags.library,
+        translated("Print what the music folder holds and what was left out, and end"));
+    auto* playlists =
+        app.add_flag("--playlists", flags.playlists,
+                     translated("Print the playlists that can be chosen, one a line: id, songs, "
+                                "bytes, name, separated by tabs; and end"));
     auto* wearables = app.add_flag(
         "--wearables", flags.wearables,
-        "Print the wearables that can be chosen, one a line: * for the one that is chosen, bytes "
-        "free, bytes in all, name, directory, separated by tabs; and end");
+        translated(
+            "Print the wearables that can be chosen, one a line: * for the one that is chosen, "
+            "bytes free, bytes in all, name, directory, separated by tabs; and end"));
     auto* status = app.add_flag("--status", flags.status,
-                                "Print how the sync and the wearable stand, and end");
+                                translated("Print how the sync and the wearable stand, and end"));
     excludeEachOther({text, screenshot, library, playlists, wearables, status});
-    app.add_flag("--json", options.json, "Print the status or a list as JSON");
+    app.add_flag("--json", options.json, translated("Print the status or a list as JSON"));
 }
 
 constexpr auto usualMusic = "usual";
@@ -114,8 +125,8 @@ std::string takeLimit(const std::string& text, Commands& commands) {
     const auto parsed = std::from_chars(text.data(), end, limit.amount);
     const auto type = limitTypeOf(CLI::detail::trim_copy(std::string(parsed.ptr, end)));
     if (parsed.ec != std::errc() || limit.amount == 0 || limit.amount > mostOfALimit || !type) {
-        return "give the limit as a number of songs or megabytes, for instance \"50 songs\" or "
-               "\"500 MB\"";
+        return translated("give the limit as a number of songs or megabytes, for instance \"50 "
+                          "songs\" or \"500 MB\"");
     }
     limit.type = *type;
     commands.limit = limit;
@@ -125,21 +136,21 @@ std::string takeLimit(const std::string& text, Commands& commands) {
 void addCommands(CLI::App& app, Commands& commands) {
     std::vector<CLI::Option*> all{
         app.add_option("--use-wearable", commands.wearable,
-                       "Choose this wearable for good, by its name, the path of its directory, or "
-                       "\"this-device\" for the one in this machine")
+                       translated("Choose this wearable for good, by its name, the path of its "
+                                  "directory, or \"this-device\" for the one in this machine"))
             ->type_name("WEARABLE"),
         app.add_option_function<std::string>(
                "--use-music",
                [&commands](const std::string& folder) {
                    if (folder.empty()) {
-                       throw CLI::ValidationError("--use-music", "name a folder");
+                       throw CLI::ValidationError("--use-music", translated("name a folder"));
                    }
                    commands.music = folder == usualMusic ? std::string() : full(folder).string();
                },
-               "Choose this music folder for good, or \"usual\" for the user's own")
+               translated("Choose this music folder for good, or \"usual\" for the user's own"))
             ->type_name("DIR"),
         app.add_option("--choose", commands.playlist,
-                       "Choose this playlist, by its name or its id, or \"none\"")
+                       translated("Choose this playlist, by its name or its id, or \"none\""))
             ->type_name("PLAYLIST"),
         app.add_option_function<std::string>(
                "--limit",
@@ -148,14 +159,15 @@ void addCommands(CLI::App& app, Commands& commands) {
                        throw CLI::ValidationError("--limit", problem);
                    }
                },
-               "Choose how much of it is synced at most: \"50 songs\", \"500 MB\"")
+               translated("Choose how much of it is synced at most: \"50 songs\", \"500 MB\""))
             ->type_name("LIMIT"),
-        app.add_flag("--sync", commands.sync,
-                     "Sync now, also off the charger and when everything was sent already"),
-        app.add_flag("--cancel", commands.cancel, "End the running sync"),
+        app.add_flag(
+            "--sync", commands.sync,
+            translated("Sync now, also off the charger and when everything was sent already")),
+        app.add_flag("--cancel", commands.cancel, translated("End the running sync")),
         app.add_flag("--wait", commands.wait,
-                     "End when everything is on the wearable, or it is clear that it does not get "
-                     "there"),
+                     translated("End when everything is on the wearable, or it is clear that it "
+                                "does not get there")),
     };
     app.get_option("--sync")->excludes(app.get_option("--cancel"));
     for (auto* command : all) {
@@ -169,15 +181,18 @@ void addCommands(CLI::App& app, Commands& commands) {
 void addPlaces(CLI::App& app, Places& places) {
     app.add_option(
            "--music", places.music,
-           "For this run only, a trial with this music folder: with a sync engine and settings of "
-           "its own, so that nothing of what is chosen changes")
+           translated("For this run only, a trial with this music folder: with a sync engine and "
+                      "settings of its own, so that nothing of what is chosen changes"))
         ->type_name("DIR");
-    app.add_option("--wearable", places.wearable,
-                   "For this run only, a trial with the Velora that is mounted in this directory")
+    app.add_option(
+           "--wearable", places.wearable,
+           translated(
+               "For this run only, a trial with the Velora that is mounted in this directory"))
         ->type_name("DIR");
-    app.add_option("--plugins", places.plugins, "Look for plug-ins here before all other places")
+    app.add_option("--plugins", places.plugins,
+                   translated("Look for plug-ins here before all other places"))
         ->type_name("DIR")
-        ->check(CLI::ExistingDirectory);
+        ->check(wordedCheck(CLI::ExistingDirectory, translated("name a directory that is there")));
 }
 
 void addPictureOptions(CLI::App& app, Picture& picture) {
@@ -189,23 +204,25 @@ void addPictureOptions(CLI::App& app, Picture& picture) {
                    throw CLI::ValidationError("--size", problem);
                }
            },
-           "Size of the picture in points (default 360x720)")
+           translated("Size of the picture in points (default 360x720)"))
         ->type_name("WxH")
         ->needs(screenshot);
-    app.add_option("--scale", picture.scale, "Pixels of the picture to the point (default 1)")
+    app.add_option("--scale", picture.scale,
+                   translated("Pixels of the picture to the point (default 1)"))
         ->type_name("N")
-        ->check(CLI::Range(1.0, 4.0))
+        ->check(wordedCheck(CLI::Range(1.0, 4.0), translated("give a number from 1 to 4")))
         ->needs(screenshot);
-    app.add_flag("--dark", picture.isDark, "Picture the dark look")->needs(screenshot);
+    app.add_flag("--dark", picture.isDark, translated("Picture the dark look"))->needs(screenshot);
     static const std::map<std::string, Picture::Pane> panes{{"root", Picture::Pane::Root},
                                                             {"playlist", Picture::Pane::Playlist},
                                                             {"limit", Picture::Pane::Limit},
                                                             {"front", Picture::Pane::Front}};
     app.add_option_function<std::string>(
            "--pane", [&picture](const std::string& name) { picture.pane = panes.at(name); },
-           "Picture this pane (default root)")
+           translated("Picture this pane (default root)"))
         ->type_name("root|playlist|limit|front")
-        ->check(CLI::IsMember(panes).description(""))
+        ->check(wordedCheck(CLI::IsMember(panes),
+                            translated("give one of root, playlist, limit and front")))
         ->needs(screenshot);
 }
 
@@ -243,8 +260,9 @@ void requireStorable(const Options& options) {
     }
     for (const auto& place : kept) {
         if (base::validUtf8(place) != place) {
-            throw CLI::ValidationError(base::printable(place),
-                                       "the name of this folder is not in UTF-8, rename it");
+            throw CLI::ValidationError(
+                base::printable(place),
+                translated("the name of this folder is not in UTF-8, rename it"));
         }
     }
 }
@@ -254,10 +272,11 @@ void requireStorable(const Options& options) {
 std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* argv) {
     Options options;
     Flags flags;
-    CLI::App app("Chooses the music that goes to your Velora.", "quorl");
-    app.set_version_flag("--version", "quorl " QUORL_VERSION, "Print the version and end");
-    app.set_help_flag("-h,--help", "Print this help and end");
-    app.footer(exitCodes);
+    CLI::App app(translated("Chooses the music that goes to your Velora."), "quorl");
+    language::wordCommandLine(app);
+    app.set_version_flag("--version", "quorl " QUORL_VERSION,
+                         translated("Print the version and end"));
+    app.footer(translated(exitCodes));
     addModes(app, options, flags);
     addPlaces(app, options.places);
     addCommands(app, options.commands);
@@ -265,18 +284,16 @@ std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* ar
     try {
         app.parse(argc, argv);
         if (options.json && !flags.status && !flags.playlists && !flags.wearables) {
-            throw CLI::RequiresError("--json", "--status, --playlists or --wearables");
+            throw CLI::ValidationError(
+                "--json", translated("give --status, --playlists or --wearables with it"));
         }
         options.mode = modeOf(options, flags);
         complete(options.places);
         requireStorable(options);
     } catch (const CLI::ParseError& error) {
-        if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) {
-            app.exit(error); // help or version
-            return ExitCode::Success;
-        }
-        std::cerr << "quorl: " << error.what() << "\nRun \"quorl --help\" for the options.\n";
-        return ExitCode::Usage;
+        // Help and version are answered in the same way as mistakes.
+        const bool isMistake = app.exit(error) != static_cast<int>(CLI::ExitCodes::Success);
+        return isMistake ? ExitCode::Usage : ExitCode::Success;
     }
     return options;
 }

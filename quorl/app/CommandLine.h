@@ -40,7 +40,8 @@ struct Options {
 };
 
 /// What the arguments ask for, or what to end with at once: after `--help` and `--version`, which
-/// are answered on standard output, and after a mistake, which is told on standard error.
+/// are answered on standard output, and after a mistake, which is told on standard error, both in
+/// the language that is followed.
 [[nodiscard]] std::variant<Options, ExitCode> parseCommandLine(int argc, const char* const* argv);
 
 } // namespace quorl

@@ -29,6 +29,12 @@ std::shared_ptr<PSSpecifier> rowThatOpens(const std::string& name, UIViewControl
     return nullptr;
 }
 
+/// What a pane calls itself; the name of its class where none can be made.
+std::string titleOf(const Class& pane) {
+    const auto made = std::dynamic_pointer_cast<QPSNotificationAppController>(pane.create());
+    return made ? made->localizedPaneTitle() : pane.name();
+}
+
 } // namespace
 
 Companion::Companion(Places places, PaneScreen& screen, Notices& notices)
@@ -59,7 +65,15 @@ void Companion::makeFrontPage() {
         problem_ = problem->text;
         return;
     }
-    frontPage_ = FrontPage::over(*host_, std::get<Class>(loaded), translated("Music"));
+    const Class& pane = std::get<Class>(loaded);
+    frontPage_ = FrontPage::over(*host_, pane, titleOf(pane));
+    for (const LoadedPane& other : loadPanes(paneDirectories())) {
+        if (const auto* problem = std::get_if<PaneProblem>(&other)) {
+            frontPage_->addProblem(problem->text);
+        } else {
+            frontPage_->addPane(std::get<Class>(other), titleOf(std::get<Class>(other)));
+        }
+    }
     navigation_->setRootPane(frontPage_);
     (void)frontPage_->specifiers(); // builds the rows before the page is shown
     host_->setEngineObserver([this] { refreshPages(); });
@@ -115,7 +129,7 @@ void Companion::start() {
 void Companion::openMusicPane() {
     if (!navigation_->open(frontPage_->paneRow())) {
         notices_.set(Notices::Topic::Pane,
-                     translated("The Music pane cannot be shown. Install its plug-in again."));
+                     translated("The pane cannot be shown. Install its plug-in again."));
     }
 }
 

@@ -3,6 +3,7 @@
 #include <iostream>
 
 #include "quorl/facts/FolderTrouble.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
 
@@ -18,7 +19,9 @@ ExitCode tellFolderTrouble(const media::Inventory& inventory) {
 ExitCode finishPrinting() {
     std::cout.flush();
     if (!std::cout) {
-        std::cerr << "quorl: The list could not be written to standard output.\n";
+        std::cerr << "quorl: "
+                  << language::translated("The list could not be written to standard output.")
+                  << '\n';
         return ExitCode::Failure;
     }
     return ExitCode::Success;

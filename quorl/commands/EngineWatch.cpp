@@ -2,6 +2,8 @@
 
 #include <future>
 
+#include "services/language/Translated.h"
+
 namespace quorl {
 
 EngineWatch::EngineWatch() : client_([this](const engine::Event& event) { take(event); }) {}
@@ -20,7 +22,10 @@ EngineWatch::waitUntil(const Condition& condition) {
     if (state_->isThere) {
         return state_;
     }
-    return "The sync engine is not running. Start quorl-syncd, or log in again. (" + problem_ + ")";
+    return language::filled(
+        language::translated(
+            "The sync engine is not running. Start quorl-syncd, or log in again. ({reason})"),
+        {{"reason", problem_}});
 }
 
 std::string EngineWatch::ask(void (engine::Client::*what)(engine::Client::Reply)) {

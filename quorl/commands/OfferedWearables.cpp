@@ -5,8 +5,12 @@
 
 #include "services/base/Paths.h"
 #include "services/base/Utf8.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
+
+using language::filled;
+using language::translated;
 
 namespace {
 
@@ -15,8 +19,10 @@ using Directory = std::variant<std::filesystem::path, std::string>;
 constexpr auto thisDevice = "this-device";
 
 Directory ambiguous(const std::string& name, const std::vector<finding::Offer>& offers) {
-    std::string text = "Several wearables are called " + base::printable(name) +
-                       ". Give the directory of one of them instead:";
+    auto text = filled(
+        translated(
+            "Several wearables are called {name}. Give the directory of one of them instead:"),
+        {{"name", base::printable(name)}});
     for (const auto& offer : offers) {
         text += "\n  " + base::printable(offer.directory.string());
     }
@@ -24,9 +30,9 @@ Directory ambiguous(const std::string& name, const std::vector<finding::Offer>& 
 }
 
 Directory notFound(const std::string& name) {
-    return "There is no wearable called " + base::printable(name) +
-           ". 'quorl --wearables' lists those that can be chosen; a directory is given with its "
-           "path.";
+    return filled(translated("There is no wearable called {name}. 'quorl --wearables' lists those "
+                             "that can be chosen; a directory is given with its path."),
+                  {{"name", base::printable(name)}});
 }
 
 } // namespace

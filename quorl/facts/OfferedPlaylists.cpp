@@ -4,8 +4,12 @@
 #include <iterator>
 
 #include "services/base/Utf8.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
+
+using language::filled;
+using language::translated;
 
 namespace {
 
@@ -19,8 +23,9 @@ Playlists filtered(const Playlists& playlists, Predicate predicate) {
 }
 
 std::string ambiguous(const std::string& name, const Playlists& playlists) {
-    std::string text = "Several playlists are called " + base::printable(name) +
-                       ". Give the id of one of them instead:";
+    auto text = filled(
+        translated("Several playlists are called {name}. Give the id of one of them instead:"),
+        {{"name", base::printable(name)}});
     for (const auto* playlist : playlists) {
         text += "\n  " + std::to_string(playlist->id) + "  " + base::printable(playlist->path);
     }
@@ -53,10 +58,12 @@ std::variant<const media::Playlist*, std::string> findOffered(const media::Inven
     if (found.size() > 1) {
         return ambiguous(nameOrID, found);
     }
-    return found.empty() ? std::variant<const media::Playlist*, std::string>(
-                               "There is no playlist called " + base::printable(nameOrID) +
-                               ". 'quorl --playlists' lists those that can be chosen.")
-                         : found.front();
+    if (found.empty()) {
+        return filled(translated("There is no playlist called {name}. 'quorl --playlists' lists "
+                                 "those that can be chosen."),
+                      {{"name", base::printable(nameOrID)}});
+    }
+    return found.front();
 }
 
 } // namespace quorl

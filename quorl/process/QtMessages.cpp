@@ -5,8 +5,11 @@
 #include <iostream>
 
 #include "quorl/process/ExitCode.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
+
+using language::translated;
 
 namespace {
 
@@ -17,18 +20,19 @@ bool isDisplayGone(const QString& text) {
 }
 
 /// At once: what would be taken down in order is in the midst of being called.
-[[noreturn]] void endWith(const QString& sentence) {
-    std::cerr << "quorl: " << sentence.toStdString() << std::endl;
+[[noreturn]] void endWith(const std::string& sentence) {
+    std::cerr << "quorl: " << sentence << std::endl;
     std::_Exit(static_cast<int>(ExitCode::Failure));
 }
 
 void take(QtMsgType type, const QMessageLogContext& context, const QString& text) {
     if (isDisplayGone(text)) {
-        endWith(QStringLiteral("The display has gone. Start quorl again when there is one."));
+        endWith(translated("The display has gone. Start quorl again when there is one."));
     }
     if (type == QtFatalMsg) {
-        endWith(text.section(u'.', 0, 0) +
-                QStringLiteral(". Start quorl on a display that works, or with --text."));
+        endWith(language::filled(
+            translated("{reason}. Start quorl on a display that works, or with --text."),
+            {{"reason", text.section(u'.', 0, 0).toStdString()}}));
     }
     std::cerr << qFormatLogMessage(type, context, text).toStdString() << '\n';
 }

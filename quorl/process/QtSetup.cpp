@@ -7,12 +7,12 @@
 #include "quorl/process/QtMessages.h"
 #include "quorl/process/QtTexts.h"
 #include "services/language/Languages.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
 
 QtSetup::QtSetup(char* program) : arguments_{program, nullptr} {
     takeQtMessages();
-    language::followLanguages(language::usersLanguages());
     QCoreApplication::setApplicationName(QStringLiteral("quorl"));
     QCoreApplication::setApplicationVersion(QStringLiteral(QUORL_VERSION));
     QGuiApplication::setDesktopFileName(QStringLiteral("org.quorl.Velora"));
@@ -21,6 +21,12 @@ QtSetup::QtSetup(char* program) : arguments_{program, nullptr} {
 bool QtSetup::hasDisplay() {
     return qEnvironmentVariableIsSet("DISPLAY") || qEnvironmentVariableIsSet("WAYLAND_DISPLAY") ||
            qEnvironmentVariableIsSet("QT_QPA_PLATFORM");
+}
+
+std::string QtSetup::displayProblem() {
+    return hasDisplay() ? ""
+                        : language::translated("There is no display here. Start quorl in a "
+                                               "graphical session, or with --text.");
 }
 
 void QtSetup::followUsersLanguage() {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <array>
+#include <string>
 
 namespace quorl {
 
@@ -8,8 +9,7 @@ namespace quorl {
 /// and outlives it. Main thread.
 class QtSetup {
   public:
-    /// Names the program to Qt, and follows the user's languages. `program` is how it was called.
-    /// Before other threads are started.
+    /// Names the program to Qt. `program` is how it was called.
     explicit QtSetup(char* program);
 
     QtSetup(const QtSetup&) = delete;
@@ -17,6 +17,9 @@ class QtSetup {
 
     /// Whether there is a display to show a window on.
     [[nodiscard]] static bool hasDisplay();
+
+    /// Why there can be no window, and what to do; empty where there is a display.
+    [[nodiscard]] static std::string displayProblem();
 
     /// Has Qt write and lay out as the followed language does. Wants an application object with a
     /// display.

@@ -6,26 +6,32 @@
 #include "runtime/services/SizeText.h"
 #include "services/base/Utf8.h"
 #include "services/language/Languages.h"
+#include "services/language/Numbers.h"
+#include "services/language/Translated.h"
 #include "services/media/MusicFolder.h"
 #include "services/preferences/ChosenPlaces.h"
 
 namespace quorl {
 
+using language::filled;
+using language::translated;
+using language::translatedCount;
+
 namespace {
 
-std::string countOf(std::size_t count, const std::string& singular) {
-    return std::to_string(count) + " " + singular + (count == 1 ? "" : "s");
+std::string songsWords(std::size_t count) {
+    return translatedCount("{count} song", "{count} songs", count);
 }
 
-std::string_view kindOf(const media::Playlist& playlist) {
+std::string kindOf(const media::Playlist& playlist) {
     if (playlist.folder) {
-        return "folder";
+        return translated("folder");
     }
     switch (playlist.generated) {
     case media::Generated::Mix:
-        return "generated mix";
+        return translated("generated mix");
     case media::Generated::Playlist:
-        return "generated playlist";
+        return translated("generated playlist");
     case media::Generated::No:
         break;
     }
@@ -34,26 +40,35 @@ std::string_view kindOf(const media::Playlist& playlist) {
 
 std::string describe(const media::Playlist& playlist, const media::Inventory& inventory,
                      const std::string& language) {
-    std::string line = base::printable(playlist.name) + ": " +
-                       countOf(playlist.songs.size(), "song") + ", " +
-                       sizeText(static_cast<double>(inventory.bytesOf(playlist)), language) + ", " +
-                       base::printable(playlist.path);
     const auto kind = kindOf(playlist);
-    return kind.empty() ? line : line + " (" + std::string(kind) + ")";
+    return filled(kind.empty() ? translated("{name}: {songs}, {size}, {path}")
+                               : translated("{name}: {songs}, {size}, {path} ({kind})"),
+                  {{"name", base::printable(playlist.name)},
+                   {"songs", songsWords(playlist.songs.size())},
+                   {"size", sizeText(static_cast<double>(inventory.bytesOf(playlist)), language)},
+                   {"path", base::printable(playlist.path)},
+                   {"kind", kind}});
 }
 
 void printPlaylists(const media::Inventory& inventory) {
     const std::string language = language::followedLanguages().front();
-    std::cout << base::printable(inventory.root.string()) << ": "
-              << countOf(inventory.playlists.size(), "playlist") << ", "
-              << countOf(inventory.songs.size(), "song") << " listed\n";
+    const auto count = inventory.playlists.size();
+    std::cout << filled(translated("{folder}: {playlists}, {songs} listed"),
+                        {{"folder", base::printable(inventory.root.string())},
+                         {"playlists",
+                          translatedCount("{count} playlist", "{count} playlists", count)},
+                         {"songs", songsWords(inventory.songs.size())}})
+              << '\n';
     for (const auto& playlist : inventory.playlists) {
         std::cout << "  " << describe(playlist, inventory, language) << '\n';
     }
 }
 
 void printLeftOut(const media::Inventory& inventory) {
-    std::cout << "\nLeft out: " << inventory.leftOut.size() << '\n';
+    std::cout << '\n'
+              << filled(translated("Left out: {count}"),
+                        {{"count", language::numberText(inventory.leftOut.size())}})
+              << '\n';
     for (const auto& leftOut : inventory.leftOut) {
         std::cout << "  " << media::describe(leftOut) << '\n';
     }

@@ -8,6 +8,7 @@
 
 #include "quorl/process/QtSetup.h"
 #include "quorl/window/MainWindow.h"
+#include "services/language/Translated.h"
 
 namespace quorl {
 
@@ -48,9 +49,13 @@ class Photographer final : public QObject {
             QCoreApplication::exit(static_cast<int>(ExitCode::Success));
             return;
         }
-        std::cerr << "quorl: The picture could not be written to " << picture_.file.string() << ": "
-                  << writer.errorString().toStdString()
-                  << ". Choose another file, or make room for it.\n";
+        std::cerr << "quorl: "
+                  << language::filled(language::translated(
+                                          "The picture could not be written to {file}: {reason}. "
+                                          "Choose another file, or make room for it."),
+                                      {{"file", picture_.file.string()},
+                                       {"reason", writer.errorString().toStdString()}})
+                  << '\n';
         QCoreApplication::exit(static_cast<int>(ExitCode::Failure));
     }
 

@@ -1,11 +1,15 @@
 #include "quorl/reports/StatusReport.h"
 
 #include <algorithm>
+#include <array>
 #include <chrono>
 #include <condition_variable>
 #include <iostream>
 #include <mutex>
 #include <optional>
+#include <string_view>
+#include <utility>
+#include <vector>
 
 #include <nlohmann/json.hpp>
 
@@ -15,9 +19,16 @@
 #include "services/engine/Message.h"
 #include "services/engine/RunningSession.h"
 #include "services/language/Languages.h"
+#include "services/language/Numbers.h"
+#include "services/language/Translated.h"
+#include "services/media/playlists/LeftOut.h"
 #include "services/preferences/SharedPreferences.h"
 
 namespace quorl {
+
+using language::filled;
+using language::toTranslate;
+using language::translated;
 
 namespace {
 
@@ -114,10 +125,34 @@ std::string size(std::uint64_t bytes) {
     return sizeText(static_cast<double>(bytes), language::followedLanguages().front());
 }
 
+/// Translations align what stands behind the colons, as English does.
+void printLine(const std::string& pattern,
+               const std::vector<std::pair<std::string_view, std::string>>& texts) {
+    std::cout << filled(pattern, texts) << '\n';
+}
+
 /// Some other engine may have words that nobody here knows.
 std::string explanationOf(const std::string& code) {
     const auto explanation = engine::sentence(engine::Message{code});
-    return explanation.empty() ? code : explanation;
+    return base::printable(explanation.empty() ? code : explanation);
+}
+
+struct StateLine {
+    std::string_view state;
+    const char* line;
+};
+
+/// The same for a word of its SyncState.
+std::string lineFor(const std::string& state) {
+    constexpr std::array lines{StateLine{engine::syncOff, toTranslate("Sync:       off")},
+                               StateLine{engine::syncPending, toTranslate("Sync:       pending")},
+                               StateLine{engine::syncSyncing, toTranslate("Sync:       syncing")},
+                               StateLine{engine::syncSynced, toTranslate("Sync:       synced")},
+                               StateLine{engine::syncUnknown, toTranslate("Sync:       unknown")}};
+    const auto* const found = std::ranges::find(lines, state, &StateLine::state);
+    return found == lines.end()
+               ? filled(translated("Sync:       {state}"), {{"state", base::printable(state)}})
+               : translated(found->line);
 }
 
 void printLeftOut(const engine::EngineStatus& engine) {
@@ -125,55 +160,74 @@ void printLeftOut(const engine::EngineStatus& engine) {
     if (engine.leftOutCount == 0) {
         return;
     }
-    std::cout << "Left out:   " << engine.leftOutCount << '\n';
+    printLine(translated("Left out:   {count}"),
+              {{"count", language::numberText(engine.leftOutCount)}});
     const auto shown = std::min(mostShown, engine.leftOut.size());
     for (std::size_t index = 0; index < shown; ++index) {
-        const auto& entry = engine.leftOut[index].get<0>();
-        std::cout << "  " << base::printable(entry) << (entry.empty() ? "" : ": ")
-                  << base::printable(explanationOf(engine.leftOut[index].get<1>())) << '\n';
+        const auto& entry = engine.leftOut[index];
+        std::cout << "  " << media::describe(entry.get<0>(), explanationOf(entry.get<1>())) << '\n';
     }
     if (engine.leftOutCount > shown) {
-        std::cout << "  and " << engine.leftOutCount - shown << " more; see quorl --library\n";
+        std::cout << "  "
+                  << language::translatedCount("and {count} more; see quorl --library",
+                                               "and {count} more; see quorl --library",
+                                               engine.leftOutCount - shown)
+                  << '\n';
     }
 }
 
-void printText(const engine::EngineState& state, const Choice& choice) {
+void printChoice(const engine::EngineState& state, const Choice& choice) {
     const bool isKnown = choice.state != engine::syncUnknown;
-    std::cout << "Playlist:   "
-              << (!choice.playlist.empty() ? base::printable(choice.playlist)
-                  : isKnown                ? "none"
-                                           : "unknown")
-              << '\n'
-              << "Sync:       " << base::printable(choice.state);
-    if (const auto progress = progressOf(state)) {
-        std::cout << ", " << static_cast<int>(*progress * 100) << "%";
-    }
-    std::cout << '\n';
+    printLine(!choice.playlist.empty() ? translated("Playlist:   {playlist}")
+              : isKnown                ? translated("Playlist:   none")
+                                       : translated("Playlist:   unknown"),
+              {{"playlist", base::printable(choice.playlist)}});
+    const auto progress = progressOf(state);
+    printLine(progress ? translated("{state}, {percent}") : "{state}",
+              {{"state", lineFor(choice.state)},
+               {"percent", language::percentText(progress.value_or(0))}});
+}
+
+void printWearable(const engine::WearableStatus& wearable) {
+    printLine(translated("Wearable:   {name}, {connection}, {charger}"),
+              {{"name", base::printable(wearable.name)},
+               {"connection", translated(wearable.isConnected ? toTranslate("connected")
+                                                              : toTranslate("not connected"))},
+               {"charger", translated(wearable.isOnCharger ? toTranslate("on its charger")
+                                                           : toTranslate("not on its charger"))}});
+    printLine(translated("Storage:    {available} of {capacity} free, {songs} in songs"),
+              {{"available", size(wearable.available)},
+               {"capacity", size(wearable.capacity)},
+               {"songs", size(wearable.songs)}});
+}
+
+void printText(const engine::EngineState& state, const Choice& choice) {
+    printChoice(state, choice);
     if (!state.isThere) {
-        std::cout << "Engine:     not running; start quorl-syncd, or log in again\n";
+        printLine(translated("Engine:     not running; start quorl-syncd, or log in again"), {});
         return;
     }
-    std::cout << "Engine:     " << base::printable(state.engine.status) << '\n'
-              << "Wearable:   " << base::printable(state.wearable.name)
-              << (state.wearable.isConnected ? ", connected" : ", not connected")
-              << (state.wearable.isOnCharger ? ", on its charger" : ", not on its charger") << '\n'
-              << "Storage:    " << size(state.wearable.available) << " of "
-              << size(state.wearable.capacity) << " free, " << size(state.wearable.songs)
-              << " in songs\n"
-              << "Last sync:  "
-              << (state.engine.lastTime == 0 ? "not yet"
-                                             : base::printable(state.engine.lastMessage))
-              << '\n';
-    printLeftOut(state.engine);
+    const auto& engine = state.engine;
+    printLine(translated("Engine:     {status}"), {{"status", base::printable(engine.status)}});
+    printWearable(state.wearable);
+    printLine(engine.lastTime == 0 ? translated("Last sync:  not yet")
+                                   : translated("Last sync:  {result}"),
+              {{"result", base::printable(engine.lastMessage)}});
+    printLeftOut(engine);
 }
 
 } // namespace
 
 ExitCode printStatus(const Options& options) {
+    if (options.json) {
+        language::followLanguages({}); // programs read the same in every language
+    }
     const auto asked = askEngine();
     if (!asked) {
-        std::cerr
-            << "quorl: The sync engine does not answer. End quorl-syncd, then start it again.\n";
+        std::cerr << "quorl: "
+                  << translated(
+                         "The sync engine does not answer. End quorl-syncd, then start it again.")
+                  << '\n';
         return ExitCode::Failure;
     }
     const auto& answer = *asked;

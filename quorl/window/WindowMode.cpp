@@ -60,9 +60,8 @@ ExitCode showWindow(OneApp& app, const Places& places) {
 } // namespace
 
 ExitCode runInWindow(char* program, const Places& places) {
-    if (!QtSetup::hasDisplay()) {
-        std::cerr << "quorl: There is no display here. Start quorl in a graphical session, or with "
-                     "--text.\n";
+    if (const auto problem = QtSetup::displayProblem(); !problem.empty()) {
+        tell(QString::fromStdString(problem));
         return ExitCode::Failure;
     }
     const Start start = Start::with(places);

@@ -8,8 +8,12 @@
 #include "services/engine/BusLoop.h"
 #include "services/engine/Interface.h"
 #include "services/engine/Reducer.h"
+#include "services/language/Translated.h"
 
 namespace quorl::engine {
+
+using language::filled;
+using language::translated;
 
 namespace {
 
@@ -95,8 +99,9 @@ class Client::Connection {
         if (base::validUtf8(path) == path) {
             setProperty<State, name>(object, path, std::move(reply));
         } else {
-            refuse(base::printable(path) + " cannot be told to the sync engine, for its name is "
-                                           "not in UTF-8. Rename it.",
+            refuse(filled(translated("{path} cannot be told to the sync engine, for its name is "
+                                     "not in UTF-8. Rename it."),
+                          {{"path", base::printable(path)}}),
                    std::move(reply));
         }
     }
@@ -180,14 +185,15 @@ void Client::Connection::work() {
         busProblem_ = loop_.run();
     }
     if (!busProblem_.empty()) {
-        busProblem_ = "The session bus is gone (" + busProblem_ + "). Log in again.";
+        busProblem_ = filled(translated("The session bus is gone ({reason}). Log in again."),
+                             {{"reason", busProblem_}});
         ++fetches_;
         hear(BusGone{busProblem_});
         answerAll(busProblem_);
         static_cast<void>(loop_.run());
     }
     isClosed_ = true;
-    answerAll("The connection to the sync engine was closed.");
+    answerAll(translated("The connection to the sync engine was closed."));
     // Before the bus that they belong to.
     proxies_.clear();
     manager_.reset();
@@ -262,7 +268,7 @@ void Client::Connection::onOwnerChanged(sdbus::Message& message) {
     message >> name >> before >> now;
     if (!before.empty()) {
         // The sessions of another engine are others, whatever their paths.
-        noteEngineGone("The sync engine has ended.");
+        noteEngineGone(translated("The sync engine has ended."));
     }
     if (!now.empty()) {
         fetchState();

@@ -133,12 +133,12 @@ std::string songs(const Arguments& arguments, std::size_t place) {
     return count ? countOfSongs(*count) : at(arguments, place);
 }
 
-/// Of several songs those that are not named.
+/// Of several songs those that are not named, with what parts the sentence from the one before.
 std::string others(const Arguments& arguments, std::size_t place) {
     const auto count = numberIn(at(arguments, place)).value_or(0);
     return count < 2 ? ""
-                     : " " + translatedCount("{count} song more could not be sent.",
-                                             "{count} songs more could not be sent.", count - 1);
+                     : translatedCount(" {count} more song could not be sent.",
+                                       " {count} more songs could not be sent.", count - 1);
 }
 
 /// Rounded up.
@@ -170,9 +170,10 @@ std::string drive(const Arguments& arguments, std::size_t place) {
                         : filled(translated("Another drive, “{name}”,"), {{"name", name}});
 }
 
+/// With what parts it from the sentence that it is in.
 std::string detail(const Arguments& arguments, std::size_t place) {
     const auto text = at(arguments, place);
-    return text.empty() ? "" : ": " + text;
+    return text.empty() ? "" : filled(translated(": {text}"), {{"text", text}});
 }
 
 /// All arguments from here on are its own.

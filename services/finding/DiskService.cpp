@@ -8,8 +8,11 @@
 #include <sys/sysmacros.h>
 
 #include "services/base/Utf8.h"
+#include "services/language/Translated.h"
 
 namespace quorl::finding {
+
+using language::toTranslate;
 
 namespace {
 
@@ -116,16 +119,19 @@ void takeAway(sdbus::IConnection& bus, const Removal& removal) {
 }
 
 std::string sentenceOf(const sdbus::Error& error, const std::string& name) {
-    const std::string drive = "“" + base::printable(name) + "”";
     const std::string_view kind = error.getName();
-    if (kind.ends_with(".DeviceBusy")) {
-        return drive + " is still in use. Close what is open on it, then eject it again.";
-    }
-    if (kind.find(".NotAuthorized") != std::string_view::npos) {
-        return "You are not allowed to eject " + drive + ". Ask who administers this machine.";
-    }
-    return drive + " could not be ejected: " + base::printable(error.getMessage()) +
-           " Leave it plugged in, and try again.";
+    const auto* const pattern =
+        kind.ends_with(".DeviceBusy")
+            ? toTranslate(
+                  "“{name}” is still in use. Close what is open on it, then eject it again.")
+        : kind.find(".NotAuthorized") != std::string_view::npos
+            ? toTranslate(
+                  "You are not allowed to eject “{name}”. Ask who administers this machine.")
+            : toTranslate(
+                  "“{name}” could not be ejected: {reason} Leave it plugged in, and try again.");
+    return language::filled(
+        language::translated(pattern),
+        {{"name", base::printable(name)}, {"reason", base::printable(error.getMessage())}});
 }
 
 } // namespace

@@ -11,6 +11,7 @@
 #include "services/base/MountWatch.h"
 #include "services/engine/BusLoop.h"
 #include "services/finding/SystemFiles.h"
+#include "services/language/Translated.h"
 
 namespace quorl::finding {
 
@@ -104,8 +105,11 @@ void watch(const SurroundingsWatch::Tell& tell, const Sources& sources,
     try {
         Watch(connectedOrNull(sources.connect), sources.files, tell).run(stop);
     } catch (const std::system_error& error) {
-        std::cerr << "What is plugged in is not noticed: " << error.code().message()
-                  << ". Close some programs, then start this one again.\n";
+        std::cerr << language::filled(
+                         language::translated("What is plugged in is not noticed: {reason}. Close "
+                                              "some programs, then start this one again."),
+                         {{"reason", error.code().message()}})
+                  << '\n';
     }
 }
 

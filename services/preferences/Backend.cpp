@@ -7,7 +7,12 @@
 
 #include <gio/gsettingsbackend.h>
 
+#include "services/language/Translated.h"
+
 namespace quorl::preferences {
+
+using language::filled;
+using language::translated;
 
 namespace {
 
@@ -15,20 +20,25 @@ namespace {
 constexpr std::string_view dconf = "DConfSettingsBackend";
 
 std::string notDconf(const char* backend) {
-    const std::string text =
-        "The settings are not shared with the sync engine and may be lost when "
-        "the program ends, because GSettings keeps them in " +
-        std::string(backend) + " instead of dconf. ";
-    if (const char* chosen = g_getenv("GSETTINGS_BACKEND")) {
-        return text + "Unset the environment variable GSETTINGS_BACKEND, which asks for '" +
-               chosen + "', and start the program again.";
+    const char* const wanted = g_getenv("GSETTINGS_BACKEND");
+    if (wanted == nullptr) {
+        return filled(
+            translated("The settings are not shared with the sync engine and may be lost when the "
+                       "program ends, because GSettings keeps them in {backend} instead of dconf. "
+                       "Install the package dconf-gsettings-backend and start the program again."),
+            {{"backend", backend}});
     }
-    return text + "Install the package dconf-gsettings-backend and start the program again.";
+    return filled(translated("The settings are not shared with the sync engine and may be lost "
+                             "when the program ends, because GSettings keeps them in {backend} "
+                             "instead of dconf. Unset the environment variable GSETTINGS_BACKEND, "
+                             "which asks for “{wanted}”, and start the program again."),
+                  {{"backend", backend}, {"wanted", wanted}});
 }
 
 std::string noSessionBus(const std::string& reason) {
-    return "There is no session bus (" + reason +
-           "). Log in again, or start the program with dbus-run-session.";
+    return filled(translated("There is no session bus ({reason}). Log in again, or start the "
+                             "program with dbus-run-session."),
+                  {{"reason", reason}});
 }
 
 } // namespace
@@ -39,9 +49,9 @@ Backend::Backend(const std::vector<SchemaPointer>& schemas)
     if (name != dconf) {
         problem_ = notDconf(name);
     } else if (const auto missing = connect(); !missing.empty()) {
-        problem_ = "The settings are not shared with the sync engine, and changes last only until "
-                   "the program ends. " +
-                   missing;
+        problem_ = filled(translated("The settings are not shared with the sync engine, and "
+                                     "changes last only until the program ends. {problem}"),
+                          {{"problem", missing}});
         keepInMemory(schemas);
     }
 }
@@ -77,7 +87,9 @@ std::string Backend::connect() {
         return noSessionBus(error->message);
     }
     g_dbus_connection_set_exit_on_close(bus_.get(), FALSE);
-    return g_dbus_connection_is_closed(bus_.get()) == FALSE ? "" : noSessionBus("it went away");
+    return g_dbus_connection_is_closed(bus_.get()) == FALSE
+               ? ""
+               : noSessionBus(translated("it went away"));
 }
 
 /// The service announces a change only after it has told the writer that it is stored. Whatever is
@@ -104,17 +116,18 @@ std::string Backend::storingProblem() {
         G_DBUS_CALL_FLAGS_NONE, -1, nullptr, &failure));
     const ErrorPointer error(failure);
     if (!error) {
-        return std::string(
-                   "The dconf service did not store it. Log in again if it hangs; otherwise make "
-                   "room on the disk, and see to it that ") +
-               g_get_user_config_dir() +
-               "/dconf may be written and that the service runs for the same directory.";
+        return filled(
+            translated("The dconf service did not store it. Log in again if it hangs; otherwise "
+                       "make room on the disk, and see to it that {directory} may be written and "
+                       "that the service runs for the same directory."),
+            {{"directory", std::string(g_get_user_config_dir()) + "/dconf"}});
     }
     if (g_dbus_connection_is_closed(bus_.get()) != FALSE) {
         return noSessionBus(error->message);
     }
-    return std::string("The dconf service does not start (") + error->message +
-           "). Install the package dconf-service, or log in again.";
+    return filled(translated("The dconf service does not start ({reason}). Install the package "
+                             "dconf-service, or log in again."),
+                  {{"reason", error->message}});
 }
 
 } // namespace quorl::preferences

@@ -4,10 +4,14 @@
 #include <string_view>
 #include <system_error>
 
+#include "services/language/Translated.h"
 #include "services/preferences/Preference.h"
 #include "services/preferences/Variant.h"
 
 namespace quorl::preferences {
+
+using language::filled;
+using language::translated;
 
 namespace {
 
@@ -69,18 +73,21 @@ std::string misfits(GSettingsSchema& schema, std::string_view name) {
 
 /// Empty where the schema can be used.
 std::string problemOf(const SchemaPointer& schema, std::string_view name, const std::string& id) {
-    const auto cannotOpen = "The settings cannot be opened, because their schema " + id;
     if (!schema) {
-        return cannotOpen + " is in none of these directories: " + searchedDirectories() +
-               ". Install the program again; or run glib-compile-schemas on the one that holds " +
-               id + ".gschema.xml.";
+        return filled(
+            translated("The settings cannot be opened, because their schema {id} is in none of "
+                       "these directories: {directories}. Install the program again; or run "
+                       "glib-compile-schemas on the one that holds {id}.gschema.xml."),
+            {{"id", id}, {"directories", searchedDirectories()}});
     }
     const auto wrong = misfits(*schema, name);
-    return wrong.empty() ? ""
-                         : cannotOpen + " is of another version: it does not have " + wrong +
-                               " as this program knows it. These directories were searched, the "
-                               "first that has the schema counts: " +
-                               searchedDirectories() + ". Install the program again.";
+    return wrong.empty()
+               ? ""
+               : filled(translated("The settings cannot be opened, because their schema {id} is of "
+                                   "another version: it does not have {keys} as this program knows "
+                                   "it. These directories were searched, the first that has the "
+                                   "schema counts: {directories}. Install the program again."),
+                        {{"id", id}, {"keys", wrong}, {"directories", searchedDirectories()}});
 }
 
 } // namespace

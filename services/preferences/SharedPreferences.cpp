@@ -10,11 +10,15 @@
 #include <utility>
 #include <vector>
 
+#include "services/language/Translated.h"
 #include "services/preferences/Backend.h"
 #include "services/preferences/Schema.h"
 #include "services/preferences/Variant.h"
 
 namespace quorl::preferences {
+
+using language::filled;
+using language::translated;
 
 namespace {
 
@@ -156,7 +160,8 @@ WriteResult SharedPreferences::Store::write(const char* key, VariantPointer valu
         return {};
     }
     if (const auto problem = store(key, value); !problem.empty()) {
-        return {false, std::string("The setting ") + key + " was not changed. " + problem};
+        return {false, filled(translated("The setting {key} was not changed. {problem}"),
+                              {{"key", key}, {"problem", problem}})};
     }
     known_.at(key).value = std::move(value);
     return {true, {}};
@@ -164,7 +169,7 @@ WriteResult SharedPreferences::Store::write(const char* key, VariantPointer valu
 
 std::string SharedPreferences::Store::store(const char* key, const VariantPointer& value) {
     if (g_settings_is_writable(settingsOf_.at(key), key) == FALSE) {
-        return "The administrator of this machine has locked it.";
+        return translated("The administrator of this machine has locked it.");
     }
     // The second try is for a dconf service that ended in the middle of the first; dconf starts it
     // again for the next write only.
@@ -282,9 +287,9 @@ template <class T>
 WriteResult SharedPreferences::set(const Preference<T>& preference,
                                    const std::type_identity_t<T>& value) {
     if (!isStorable<T>(value)) {
-        return {false,
-                std::string("The setting ") + preference.key +
-                    " was not changed: it holds text in UTF-8 only. Rename what it is to name."};
+        return {false, filled(translated("The setting {key} was not changed: it holds text in "
+                                         "UTF-8 only. Rename what it is to name."),
+                              {{"key", preference.key}})};
     }
     return store_->write(preference.key, Stored<T>::wrap(value));
 }

@@ -9,9 +9,12 @@
 
 #include "services/base/AtomicFile.h"
 #include "services/base/FileStatus.h"
+#include "services/language/Translated.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
+
+using language::toTranslate;
 
 namespace {
 
@@ -66,7 +69,7 @@ StoredManifest newestManifest(const ReadOwnFile& read) {
     const std::array generations{generationIn(files[0]), generationIn(files[1])};
     if (!generations[0] && !generations[1]) {
         if (files[0] && files[1]) {
-            rejectManifest("both copies of it are damaged");
+            rejectManifest(toTranslate("both copies of it are damaged"));
         }
         const auto former = read(formerManifestFile);
         return {former ? parseManifest(*former) : Manifest(), 0, files[1] ? 1U : 0U};
@@ -90,10 +93,10 @@ std::string generationText(std::uint64_t number, const Manifest& manifest, std::
 void requireReadable(bool isRegularFile, std::uint64_t size) {
     constexpr std::uint64_t mostBytes = std::uint64_t{64} << 20;
     if (!isRegularFile) {
-        rejectManifest("it is not a regular file");
+        rejectManifest(toTranslate("it is not a regular file"));
     }
     if (size > mostBytes) {
-        rejectManifest("it is larger than 64 MiB");
+        rejectManifest(toTranslate("it is larger than 64 MiB"));
     }
 }
 

@@ -6,9 +6,12 @@
 
 #include <nlohmann/json.hpp>
 
+#include "services/language/Translated.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
+
+using language::toTranslate;
 
 namespace {
 
@@ -52,7 +55,7 @@ std::string decoded(std::string_view text) {
         const auto* const end = digits.data() + digits.size();
         const auto read = std::from_chars(digits.data(), end, value, hexadecimal);
         if (digits.size() != 2 || read.ec != std::errc{} || read.ptr != end) {
-            throw Wrong{"a path is not well-formed"};
+            throw Wrong{toTranslate("a path is not well-formed")};
         }
         bytes += static_cast<char>(value);
         text.remove_prefix(3);
@@ -82,7 +85,7 @@ std::string checkedName(std::string name) {
                                 name.find('/') != std::string::npos ||
                                 name.find('\0') != std::string::npos;
     if (leadsElsewhere) {
-        throw Wrong{"a name leads out of the music directory"};
+        throw Wrong{toTranslate("a name leads out of the music directory")};
     }
     return name;
 }
@@ -94,7 +97,7 @@ Number numberOf(const json& value) {
             ? std::in_range<Number>(value.get<std::uint64_t>())
             : value.is_number_integer() && std::in_range<Number>(value.get<std::int64_t>());
     if (!fits) {
-        throw Wrong{"a number in it is not a whole one, or out of range"};
+        throw Wrong{toTranslate("a number in it is not a whole one, or out of range")};
     }
     return value.get<Number>();
 }
@@ -121,7 +124,7 @@ std::vector<Entry> entriesOf(const json& list) {
 
 Manifest manifestOf(const json& value) {
     if (value.at("format") != format) {
-        throw Wrong{"a later version has written it"};
+        throw Wrong{toTranslate("a later version has written it")};
     }
     Manifest manifest{entriesOf(value.at("songs")), {}, entriesOf(value.at("strays")), {}};
     if (value.contains("playlist")) {
@@ -138,7 +141,7 @@ json parsed(std::string_view text) {
     constexpr int deepest = 8;
     return json::parse(text, [](int depth, json::parse_event_t /*event*/, const json& /*value*/) {
         if (depth > deepest) {
-            throw Wrong{"it is nested too deeply"};
+            throw Wrong{toTranslate("it is nested too deeply")};
         }
         return true;
     });
@@ -175,7 +178,7 @@ Manifest parseManifest(std::string_view text) {
     try {
         return manifestOf(parsed(text));
     } catch (const json::exception&) {
-        rejectManifest("it is not well-formed");
+        rejectManifest(toTranslate("it is not well-formed"));
     } catch (const Wrong& error) {
         rejectManifest(error.what());
     }

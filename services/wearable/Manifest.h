@@ -61,6 +61,7 @@ class BadManifest : public CannotBeSeen {
 };
 
 /// Throws `BadManifest` with a sentence that says what to do.
+/// @param why in English; whoever words the message translates it.
 [[noreturn]] void rejectManifest(const std::string& why);
 
 /// As text, to be read by `parseManifest`.

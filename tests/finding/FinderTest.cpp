@@ -70,8 +70,9 @@ TEST_F(FinderTest, ADriveIsOfferedFromWhenItIsMountedUntilItIsUnmounted) {
     service_.plugIn("ABCD", "Walkman", deviceAt(folder_ / "a"));
     const auto found = told_.waitFor(
         offers(folder_ / "a", [](const Offer& offer) { return offer.name == "Walkman"; }));
-    EXPECT_EQ(found.offers.front().space->capacity, 1U << 20U);
-    EXPECT_EQ(found.offers.front().identity, (Identity{"ABCD", folder_ / "a"}));
+    const auto drive = std::ranges::find(found.offers, folder_ / "a", &Offer::directory);
+    EXPECT_EQ(drive->space->capacity, 1U << 20U);
+    EXPECT_EQ(drive->identity, (Identity{"ABCD", folder_ / "a"}));
 
     umount((folder_ / "a").c_str());
     told_.waitFor([this](const Found& now) {

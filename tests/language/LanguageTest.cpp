@@ -12,6 +12,7 @@
 #include "services/language/Languages.h"
 #include "services/language/Numbers.h"
 #include "services/language/Translated.h"
+#include "services/wearable/Manifest.h"
 
 namespace quorl::language {
 
@@ -148,6 +149,31 @@ TEST_F(Language, wordsWhatTheEngineTells) {
     EXPECT_EQ(engine::sentence(engine::other("Nobody says so.")), "Nobody says so.");
     EXPECT_EQ(engine::sentence({engine::code::songUnreadable, {"a/b.mp3", ""}}),
               "„a/b.mp3“ kann nicht gelesen werden.");
+}
+
+TEST_F(Language, partsSentencesAndDetailsAsItsWritersDo) {
+    const engine::Message unreadable{engine::code::songUnreadable, {"a.mp3", "No"}};
+    const engine::Message several{engine::code::songsLeftOut, {"2", "song-gone", "a.mp3"}};
+    EXPECT_EQ(engine::sentence(unreadable), "“a.mp3” cannot be read: No.");
+    EXPECT_EQ(engine::sentence(several), "“a.mp3” is no longer in the music folder. 1 more song "
+                                         "could not be sent.");
+
+    followLanguages({"fr"});
+    EXPECT_THAT(engine::sentence(unreadable), testing::EndsWith("\u00A0: No."));
+
+    followLanguages({"ja"});
+    EXPECT_THAT(engine::sentence(several), testing::HasSubstr("。ほかに1曲"));
+}
+
+TEST_F(Language, reachesIntoBrackets) {
+    followLanguages({"de"});
+    try {
+        static_cast<void>(wearable::parseManifest("{"));
+        FAIL() << "it is none";
+    } catch (const wearable::BadManifest& error) {
+        EXPECT_THAT(engine::sentence(error.message()),
+                    testing::HasSubstr(" nicht brauchbar (es ist nicht wohlgeformt). "));
+    }
 }
 
 TEST_F(Language, isSaidAsItIsWhereACatalogueHasBlanksThatThereAreNot) {

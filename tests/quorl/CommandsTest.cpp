@@ -90,6 +90,20 @@ TEST_F(Commands, choosingWhatIsNotOfferedSaysWhatToDoAndChangesNothing) {
     EXPECT_EQ(storedPreference("asset-sync-enabled"), "false");
 }
 
+TEST_F(Commands, whatToDoIsToldInTheUsersLanguage) {
+    QuorlProcess playlist({"--choose", "Nothing"}, {{"LANGUAGE", "de"}});
+    EXPECT_EQ(playlist.end(), 1);
+    EXPECT_EQ(playlist.errors(), "quorl: Es gibt keine Playlist namens Nothing. \"quorl "
+                                 "--playlists\" nennt die wählbaren.\n");
+
+    QuorlProcess settings({"--choose", "none"},
+                          {{"DBUS_SESSION_BUS_ADDRESS", "unix:path=/nowhere"}, {"LANGUAGE", "fr"}});
+    EXPECT_EQ(settings.end(), 1);
+    EXPECT_THAT(settings.errors(),
+                AllOf(HasSubstr("Les réglages ne sont pas partagés avec le service"),
+                      HasSubstr("fin du programme. Il n’y a pas de bus de session (")));
+}
+
 TEST_F(Commands, choosingANameThatTwoHaveListsTheirIds) {
     music_.folder().write("a/Road Trip.m3u8", "../one.flac\n");
 
@@ -150,6 +164,20 @@ TEST_F(Commands, wearablesAreThoseThatWereFoundWithTheChosenOneMarked) {
     EXPECT_GT(list.front()["capacityBytes"], 0);
     EXPECT_TRUE(list.back()["embedded"]);
     EXPECT_TRUE(list.back()["chosen"]);
+}
+
+TEST_F(Commands, listsForProgramsAreTheSameInEveryLanguage) {
+    QuorlProcess wearables({"--wearables"}, {{"LANGUAGE", "de"}});
+    EXPECT_EQ(wearables.end(), 0) << wearables.errors();
+    EXPECT_THAT(wearables.output(), HasSubstr("*\t\t\tOn this device (for trying out)\t\n"));
+
+    for (const auto& list :
+         std::vector<std::vector<std::string>>{{"--playlists"}, {"--playlists", "--json"}}) {
+        ASSERT_EQ(run(list), 0) << errors_;
+        QuorlProcess playlists(list, {{"LANGUAGE", "de"}});
+        EXPECT_EQ(playlists.end(), 0) << playlists.errors();
+        EXPECT_EQ(playlists.output(), output_);
+    }
 }
 
 TEST_F(Commands, withoutAnEngineNoWearableIsChosen) {
@@ -249,6 +277,24 @@ TEST_F(CommandsWithEngine, statusHasFiguresForPeople) {
     EXPECT_EQ(run({"--status"}), 0);
 
     EXPECT_THAT(output_, HasSubstr(" of 4 GB free, 1 MB in songs"));
+}
+
+TEST_F(CommandsWithEngine, statusIsInTheUsersLanguageButNotForPrograms) {
+    QuorlProcess people({"--status"}, {{"LANGUAGE", "de"}});
+    EXPECT_EQ(people.end(), 0) << people.errors();
+    EXPECT_THAT(people.output(),
+                testing::StartsWith("Playlist:       keine\n"
+                                    "Sync:           aus\n"
+                                    "Dienst:         Die Musiksynchronisierung ist "
+                                    "ausgeschaltet.\n"
+                                    "Wearable:       Velora, verbunden, "));
+    EXPECT_THAT(people.output(), HasSubstr(" frei, 0 Byte in Titeln\nZuletzt:        noch nie\n"));
+
+    QuorlProcess programs({"--status", "--json"}, {{"LANGUAGE", "de"}});
+    EXPECT_EQ(programs.end(), 0) << programs.errors();
+    const auto json = nlohmann::json::parse(programs.output());
+    EXPECT_EQ(json["state"], "off");
+    EXPECT_EQ(json["status"], "Music sync is switched off.");
 }
 
 } // namespace

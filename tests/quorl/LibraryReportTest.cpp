@@ -30,6 +30,16 @@ TEST(LibraryReport, saysWhatWasLeftOutAndWhy) {
     EXPECT_THAT(quorl.output(), HasSubstr("Road Trip.m3u8: gone.flac: There is no such file."));
 }
 
+TEST(LibraryReport, isInTheUsersLanguage) {
+    const SampleMusic music;
+    QuorlProcess quorl({"--library", "--music", music.path()}, {{"LANGUAGE", "de"}});
+    EXPECT_EQ(quorl.end(), 0);
+    EXPECT_THAT(quorl.output(), HasSubstr(": 3 Playlists, 3 Titel darin\n"));
+    EXPECT_THAT(quorl.output(), HasSubstr("Morning Mix.m3u8 (erzeugter Mix)\n"));
+    EXPECT_THAT(quorl.output(), HasSubstr("\nAusgelassen: 1\n  Road Trip.m3u8: gone.flac: Diese "
+                                          "Datei gibt es nicht."));
+}
+
 TEST(LibraryReport, marksFoldersOfPlaylists) {
     const SampleMusic music;
     music.folder().write("Workout/Intervals.m3u8", "../one.flac\n");

@@ -55,6 +55,10 @@ def is_of_pane(entry):
     return entry.msgid.startswith(PREFIX)
 
 
+def languages(root):
+    return {path.stem for path in (root / "resources" / "locale").glob("*.po")}
+
+
 def texts_in_catalogue(path):
     """The texts of the pane in a catalogue by key."""
     return {entry.msgid: entry.msgstr for entry in entries(path) if is_of_pane(entry)}
@@ -147,9 +151,17 @@ class ThisProject(unittest.TestCase):
     def test_has_texts_and_languages_to_look_at(self):
         self.assertGreater(len(texts_in_code(ROOT)), 30)
         self.assertGreater(len(app_texts_in_code(ROOT)), 140)
-        languages = {path.stem for path in (ROOT / "resources" / "locale").glob("*.po")}
         self.assertLessEqual({"ar", "de", "en", "es", "fr", "it", "ja", "nl", "pl", "pt_BR", "ru", "sv", "zh_CN"},
-                             languages)
+                             languages(ROOT))
+
+    def test_tells_desktops_in_each_language_what_it_is(self):
+        entry = (ROOT / "resources/desktop/org.quorl.Velora.desktop").read_text(encoding="utf-8")
+        for key in ("GenericName", "Comment", "Keywords"):
+            self.assertEqual(set(re.findall(rf"^{key}\[(\w+)\]=.", entry, re.MULTILINE)), languages(ROOT) - {"en"})
+        for component, elements in (("Velora", ("summary", "p")), ("Velora.MusicPane", ("name", "summary"))):
+            text = (ROOT / f"resources/desktop/org.quorl.{component}.metainfo.xml").read_text(encoding="utf-8")
+            for element in elements:
+                self.assertEqual(set(re.findall(rf'<{element} xml:lang="(\w+)">.', text)), languages(ROOT) - {"en"})
 
 
 class PlantedError(unittest.TestCase):
@@ -264,7 +276,7 @@ class PlantedError(unittest.TestCase):
         self.change_app_text("{count} weiterer Titel konnte", "Ein weiterer Titel konnte")
         self.assertEqual(problems(self.root), [])
         self.change_app_text("Ein weiterer Titel konnte", "{songs} weiterer Titel konnte")
-        self.assert_only_problem("de.po: {count} song more could not be sent. takes other arguments than in English")
+        self.assert_only_problem("de.po:  {count} more song could not be sent. takes other arguments than in English")
 
     def test_the_same_arguments_in_another_order_are_let_pass(self):
         for right in ("%tu %@ %@", "%3$@ %2$@ %1$tu", "100%% %1$tu %2$@ %3$@"):

@@ -81,9 +81,9 @@ TEST(Message, TellsTheFirstSongThatIsLeftOutAndHowManyMoreThereAre) {
     EXPECT_EQ(sentence({code::songsLeftOut, {"1", "song-gone", "a.mp3"}}),
               "“a.mp3” is no longer in the music folder.");
     EXPECT_EQ(sentence({code::songsLeftOut, {"2", "song-gone", "a.mp3"}}),
-              "“a.mp3” is no longer in the music folder. 1 song more could not be sent.");
+              "“a.mp3” is no longer in the music folder. 1 more song could not be sent.");
     EXPECT_EQ(sentence({code::songsLeftOut, {"3", "song-unreadable", "a.mp3", "No."}}),
-              "“a.mp3” cannot be read: No.. 2 songs more could not be sent.");
+              "“a.mp3” cannot be read: No.. 2 more songs could not be sent.");
 }
 
 TEST(Message, TellsWhatEndsASync) {
