@@ -1,7 +1,7 @@
 #include "doubles/HostDouble.h"
 
 #include <array>
-#include <cstdio>
+#include <charconv>
 
 namespace quorl {
 
@@ -9,10 +9,10 @@ namespace {
 
 /// Whole, however large: a float holds whole bytes only.
 std::string rawSizeText(float bytes) {
-    std::array<char, 64> text{}; // the largest float has 39 digits
-    const int length =
-        std::snprintf(text.data(), text.size(), "%.0f B", static_cast<double>(bytes));
-    return {text.data(), static_cast<std::size_t>(length)};
+    std::array<char, 64> digits{}; // the largest float has 39
+    const auto written =
+        std::to_chars(digits.begin(), digits.end(), bytes, std::chars_format::fixed, 0);
+    return std::string(digits.begin(), written.ptr) + " B";
 }
 
 } // namespace

@@ -4,8 +4,6 @@ namespace quorl {
 
 namespace {
 
-std::size_t placeOf(SyncPreference preference) { return static_cast<std::size_t>(preference); }
-
 std::optional<std::uint64_t> unsetValue(SyncPreference preference) {
     const auto& declaration = syncPreferences.at(placeOf(preference));
     return declaration.canBeNull() ? std::nullopt : std::optional<std::uint64_t>(0);

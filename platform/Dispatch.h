@@ -1,8 +1,10 @@
 #pragma once
 
+#include <concepts>
 #include <functional>
 #include <memory>
 #include <type_traits>
+#include <utility>
 
 #include <dispatch/dispatch.h>
 
@@ -18,6 +20,34 @@ void dispatch_once(dispatch_once_t* predicate, const std::function<void()>& init
 
 /// Queues `work` and returns at once, also when the caller is on `queue` already. Any thread.
 void dispatch_async(dispatch_queue_t queue, std::function<void()> work);
+
+/// Any closure on its way to a queue.
+class dispatch_closure {
+  public:
+    dispatch_closure() = default;
+    dispatch_closure(const dispatch_closure&) = delete;
+    dispatch_closure& operator=(const dispatch_closure&) = delete;
+    virtual ~dispatch_closure() = default;
+
+    virtual void run() = 0;
+};
+
+/// The same for what is not null.
+void dispatch_async(dispatch_queue_t queue, std::unique_ptr<dispatch_closure> work);
+
+/// The same for whatever can be called, in one piece of memory. It may own what cannot be copied.
+template <std::invocable Closure>
+void dispatch_async(dispatch_queue_t queue, Closure work) {
+    struct Kept final : dispatch_closure {
+        explicit Kept(Closure what) : closure(std::move(what)) {}
+
+        void run() override { closure(); }
+
+        Closure closure;
+    };
+
+    dispatch_async(queue, std::make_unique<Kept>(std::move(work)));
+}
 
 /// Queues `work` when `when` has come; it cannot be taken back. Any thread.
 void dispatch_after(dispatch_time_t when, dispatch_queue_t queue, std::function<void()> work);

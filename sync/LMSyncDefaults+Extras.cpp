@@ -3,15 +3,16 @@
 
 namespace {
 
-/// Its address is the key: unique in the process, with no storage of its own.
-std::shared_ptr<_LMSyncDefaultsAssociatedObject> _associatedObject(LMSyncDefaults& defaults) {
+/// Its address is the key: unique in the process, with no storage of its own. The object is owned
+/// by `defaults`.
+_LMSyncDefaultsAssociatedObject& _associatedObject(LMSyncDefaults& defaults) {
     const auto* key = reinterpret_cast<const void*>(&_associatedObject);
     if (const auto attached = objc_getAssociatedObject(defaults, key)) {
-        return std::static_pointer_cast<_LMSyncDefaultsAssociatedObject>(attached);
+        return static_cast<_LMSyncDefaultsAssociatedObject&>(*attached);
     }
-    auto object = create<_LMSyncDefaultsAssociatedObject>();
+    const auto object = create<_LMSyncDefaultsAssociatedObject>();
     objc_setAssociatedObject(defaults, key, object, OBJC_ASSOCIATION_RETAIN_NONATOMIC);
-    return object;
+    return *object;
 }
 
 } // namespace
@@ -24,8 +25,8 @@ std::shared_ptr<MPMediaPlaylist> assetSyncPlaylist(LMSyncDefaults& defaults) {
     if (!persistentID) {
         return nullptr;
     }
-    const auto cache = _associatedObject(defaults);
-    auto cached = cache->assetSyncPlaylist();
+    auto& cache = _associatedObject(defaults);
+    const auto& cached = cache.assetSyncPlaylist();
     if (cached && cached->persistentID() == persistentID->unsignedLongLongValue()) {
         return cached;
     }
@@ -34,14 +35,14 @@ std::shared_ptr<MPMediaPlaylist> assetSyncPlaylist(LMSyncDefaults& defaults) {
         persistentID, MPMediaPlaylistPropertyPersistentID));
     const auto collections = query->collections();
     const auto found = elements<MPMediaPlaylist>(collections);
-    cache->setAssetSyncPlaylist(found.empty() ? nullptr : found.front());
-    return cache->assetSyncPlaylist();
+    cache.setAssetSyncPlaylist(found.empty() ? nullptr : found.front());
+    return cache.assetSyncPlaylist();
 }
 
 void setAssetSyncPlaylist(LMSyncDefaults& defaults,
                           const std::shared_ptr<MPMediaPlaylist>& playlist) {
     // The cache first: whoever reads after the write finds it filled, and runs no query.
-    _associatedObject(defaults)->setAssetSyncPlaylist(playlist);
+    _associatedObject(defaults).setAssetSyncPlaylist(playlist);
     defaults.setAssetSyncPlaylistPersistentID(
         playlist ? NSNumber::numberWithUnsignedLongLong(playlist->persistentID()) : nullptr);
 }

@@ -2,18 +2,18 @@
 // takes (tools/phone-costs): nothing of it hangs on a clock, so that the figures of two runs are
 // the same.
 //
-//     hot-operations               names the operations, a line each
+//     hot-operations               names the operations, a line each; behind a tab what to hold one
+//                                  against, which is an operation too
 //     hot-operations NAME COUNT
 
 #include <algorithm>
-#include <charconv>
-#include <iostream>
-#include <span>
 
+#include "bench/hot/Operations.h"
 #include "doubles/HostDouble.h"
 #include "doubles/sessions/TaskDouble.h"
 #include "doubles/virtual-time/VirtualTime.h"
 #include "platform/SizeFormatter.h"
+#include "quorl/adapters/LibraryPlaylist.h"
 #include "runtime/lists/TableView.h"
 #include "runtime/objects/MainQueue.h"
 #include "runtime/services/ObservedSession.h"
@@ -33,6 +33,8 @@ constexpr std::uint64_t chosen = playlistCount / 2;
 constexpr std::size_t songCount = 100;
 constexpr int taskCount = 100;
 constexpr NSInteger rowsOnScreen = 10;
+constexpr std::size_t manySongs = 10'000;
+constexpr std::size_t manyPlaylists = 1'000;
 
 /// A session with songs under way. Its list is made once, so that what is counted is the pane's
 /// work.
@@ -69,7 +71,69 @@ class BusyHost final : public HostDouble {
         return std::make_shared<const std::vector<std::shared_ptr<DVSession>>>(1, session);
     }
 
+    /// Those of the app: nobody takes notes.
+    [[nodiscard]] LMSyncDefaults& syncDefaults() override { return *defaults_; }
+
     const std::shared_ptr<BusySession> session = create<BusySession>();
+
+  private:
+    const std::shared_ptr<quorl::SyncDefaults> defaults_ =
+        std::make_shared<quorl::SyncDefaults>(preferences);
+};
+
+/// A music folder with many playlists, the first of which has many songs.
+quorl::media::Inventory largeInventory() {
+    quorl::media::Inventory inventory;
+    inventory.playlists.resize(manyPlaylists);
+    for (std::uint64_t id = 1; auto& playlist : inventory.playlists) {
+        playlist.id = id++;
+    }
+    const auto directory = inventory.songs.addDirectory("");
+    for (std::size_t song = 0; song < manySongs; ++song) {
+        quorl::media::Song entry{};
+        entry.size = 100'000;
+        inventory.playlists.front().songs.push_back(inventory.songs.add(directory, entry));
+    }
+    return inventory;
+}
+
+/// What the app has of it.
+class LargeLibrary {
+  public:
+    LargeLibrary() {
+        for (const auto& playlist : inventory_->playlists) {
+            playlists_.push_back(std::make_shared<quorl::LibraryPlaylist>(inventory_, playlist));
+        }
+        for (const auto property :
+             {MPMediaPlaylistPropertyIsFolder, MPMediaPlaylistPropertyIsAugurMix,
+              MPMediaPlaylistPropertyIsAugurPlaylist}) {
+            isOrdinary_.push_back(MPMediaPropertyPredicate::predicateWithValue_forProperty(
+                NSNumber::numberWithBool(false), property));
+        }
+    }
+
+    [[nodiscard]] const auto& longPlaylist() const { return playlists_.front(); }
+
+    /// What the chooser of playlists asks.
+    [[nodiscard]] auto ordinary() const { return matching(playlists_, isOrdinary_); }
+
+    [[nodiscard]] auto ordinaryInALoop() const {
+        auto place = inventory_->playlists.begin();
+        std::vector<std::shared_ptr<MPMediaPlaylist>> found;
+        for (const auto& playlist : playlists_) {
+            const auto& entry = *place++;
+            if (!entry.folder && entry.generated == quorl::media::Generated::No) {
+                found.push_back(playlist);
+            }
+        }
+        return found;
+    }
+
+  private:
+    std::shared_ptr<const quorl::media::Inventory> inventory_ =
+        std::make_shared<const quorl::media::Inventory>(largeInventory());
+    std::vector<std::shared_ptr<quorl::LibraryPlaylist>> playlists_;
+    std::vector<std::shared_ptr<MPMediaPropertyPredicate>> isOrdinary_;
 };
 
 /// A host with as much as a person has: a chosen playlist among others, a limit, a sync under way.
@@ -124,6 +188,25 @@ class Panes {
 
     void refresh() const { root_->viewWillAppear(false); }
 
+    void refreshLong() const {
+        setAssetSyncPlaylist(LMSyncDefaults::sharedDefaults(), library_.longPlaylist());
+        refresh();
+    }
+
+    void addUpSizes() const {
+        std::uint64_t sum = 0;
+        const auto items = library_.longPlaylist()->items();
+        for (const auto& item : elements(items)) {
+            const auto size = item->valueForProperty(MPMediaItemPropertyFileSize);
+            sum += NSNumber::of(size.get())->unsignedLongLongValue();
+        }
+        keep(sum);
+    }
+
+    void findOrdinary() const { keep(library_.ordinary()); }
+
+    void findOrdinaryInALoop() const { keep(library_.ordinaryInALoop()); }
+
     void askForRow() const { keep(root_->limit(nullptr)); }
 
     void drawPlaylists() const {
@@ -145,18 +228,14 @@ class Panes {
         asm volatile("" : : "r"(&value) : "memory"); // as if somebody looked at it
     }
 
+    LargeLibrary library_;
     BusySession& session_;
     std::shared_ptr<LMQuorlSettingsController> root_ = create<LMQuorlSettingsController>();
     std::shared_ptr<LMQuorlPlaylistChooser> playlists_ = create<LMQuorlPlaylistChooser>();
     std::shared_ptr<LMQuorlLimitChooser> limits_ = create<LMQuorlLimitChooser>();
 };
 
-struct Operation {
-    std::string_view name;
-    void (Panes::*perform)() const;
-};
-
-constexpr Operation operations[]{
+constexpr quorl::Operation<Panes> operations[]{
     {"the synced playlist, remembered", &Panes::findPlaylist},
     {"the stage of 100 tasks", &Panes::askForStage},
     {"the progress of 100 tasks", &Panes::askForProgress},
@@ -167,33 +246,19 @@ constexpr Operation operations[]{
     {"ten rows of playlists", &Panes::drawPlaylists},
     {"a tap on an amount", &Panes::chooseAmount},
     {"the text of a size", &Panes::formatSize},
+    {"rows and footer of 10,000 songs", &Panes::refreshLong, "the sizes of 10,000 songs"},
+    {"the sizes of 10,000 songs", &Panes::addUpSizes},
+    {"the ordinary ones of 1,000 playlists", &Panes::findOrdinary, "a loop over 1,000 playlists"},
+    {"a loop over 1,000 playlists", &Panes::findOrdinaryInALoop},
 };
 
 } // namespace
 
 int main(int count, char** words) {
-    const std::span arguments(words, static_cast<std::size_t>(count));
-    if (arguments.size() != 3) {
-        for (const Operation& operation : operations) {
-            std::cout << operation.name << '\n';
-        }
-        return 0;
-    }
-    const auto* const found =
-        std::ranges::find(operations, std::string_view(arguments[1]), &Operation::name);
-    const std::string_view digits = arguments[2];
-    int turns = 0;
-    const auto read = std::from_chars(digits.data(), digits.data() + digits.size(), turns);
-    if (found == std::end(operations) || read.ptr != digits.data() + digits.size()) {
-        std::cerr << "hot-operations: give the name of an operation and a number\n";
-        return 2;
-    }
-    (void)quorl::mainQueueDescriptor(); // before any thread is started
-    const auto host = busyHost();
-    quorl::Host::install(host);
-    const Panes panes(*host->session);
-    for (int turn = 0; turn < turns; ++turn) {
-        (panes.*found->perform)();
-    }
-    return 0;
+    return quorl::perform<Panes>(operations, {words, static_cast<std::size_t>(count)}, [] {
+        (void)quorl::mainQueueDescriptor(); // before any thread is started
+        const auto host = busyHost();
+        quorl::Host::install(host);
+        return std::make_unique<Panes>(*host->session);
+    });
 }

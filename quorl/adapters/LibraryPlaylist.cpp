@@ -1,8 +1,33 @@
 #include "quorl/adapters/LibraryPlaylist.h"
 
+#include <algorithm>
+#include <array>
+
 #include "quorl/adapters/LibraryItems.h"
 
 namespace quorl {
+
+namespace {
+
+const std::array truths{NSNumber::numberWithBool(false), NSNumber::numberWithBool(true)};
+
+const std::shared_ptr<NSNumber>& truth(bool value) { return truths[value ? 1 : 0]; }
+
+/// A predicate as it is asked of many playlists.
+struct Condition {
+    LibraryPlaylist::Reader read; ///< null: none fulfils it
+    const NSNumber* value;
+
+    [[nodiscard]] bool isMet(const LibraryPlaylist& playlist) const {
+        if (read == nullptr) {
+            return false;
+        }
+        const NSNumber& number = *read(playlist);
+        return &number == value || number.isEqual(value); // of each truth value there is one number
+    }
+};
+
+} // namespace
 
 LibraryPlaylist::LibraryPlaylist(std::shared_ptr<const media::Inventory> inventory,
                                  const media::Playlist& playlist)
@@ -26,20 +51,35 @@ void LibraryPlaylist::moveTo(std::shared_ptr<const media::Inventory> inventory,
 
 std::uint64_t LibraryPlaylist::persistentID() const { return playlist_->id; }
 
-std::shared_ptr<NSObject> LibraryPlaylist::valueForProperty(MPMediaProperty property) const {
+LibraryPlaylist::Reader LibraryPlaylist::readerOf(MPMediaProperty property) {
+    using Number = std::shared_ptr<NSNumber>;
+    using Playlist = LibraryPlaylist;
+    using media::Generated;
     if (property == MPMediaPlaylistPropertyIsFolder) {
-        return NSNumber::numberWithBool(playlist_->folder);
+        return [](const Playlist& it) -> const Number& { return truth(it.playlist_->folder); };
     }
     if (property == MPMediaPlaylistPropertyIsAugurMix) {
-        return NSNumber::numberWithBool(playlist_->generated == media::Generated::Mix);
+        return [](const Playlist& it) -> const Number& {
+            return truth(it.playlist_->generated == Generated::Mix);
+        };
     }
     if (property == MPMediaPlaylistPropertyIsAugurPlaylist) {
-        return NSNumber::numberWithBool(playlist_->generated == media::Generated::Playlist);
+        return [](const Playlist& it) -> const Number& {
+            return truth(it.playlist_->generated == Generated::Playlist);
+        };
     }
     if (property == MPMediaPlaylistPropertyPersistentID) {
-        return identifier_;
+        return [](const Playlist& it) -> const Number& { return it.identifier_; };
     }
-    return property == MPMediaEntityPropertyEntityRevision ? revision_ : nullptr;
+    if (property == MPMediaEntityPropertyEntityRevision) {
+        return [](const Playlist& it) -> const Number& { return it.revision_; };
+    }
+    return nullptr;
+}
+
+std::shared_ptr<NSObject> LibraryPlaylist::valueForProperty(MPMediaProperty property) const {
+    const Reader read = readerOf(property);
+    return read != nullptr ? read(*this) : nullptr;
 }
 
 std::optional<std::string> LibraryPlaylist::name() const { return playlist_->name; }
@@ -49,6 +89,25 @@ NSArray<MPMediaItem> LibraryPlaylist::items() const {
         items_ = makeItems(inventory_, playlist_->songs);
     }
     return items_;
+}
+
+NSArray<MPMediaPlaylist>
+matching(std::span<const std::shared_ptr<LibraryPlaylist>> playlists,
+         std::span<const std::shared_ptr<MPMediaPropertyPredicate>> predicates) {
+    std::vector<Condition> conditions;
+    for (const auto& predicate : predicates) {
+        const auto read = LibraryPlaylist::readerOf(predicate->property());
+        conditions.push_back({read, predicate->value().get()});
+    }
+    std::vector<std::shared_ptr<MPMediaPlaylist>> matching;
+    for (const auto& playlist : playlists) {
+        if (std::ranges::all_of(conditions,
+                                [&](const Condition& it) { return it.isMet(*playlist); })) {
+            matching.push_back(playlist);
+        }
+    }
+    return std::make_shared<const std::vector<std::shared_ptr<MPMediaPlaylist>>>(
+        std::move(matching));
 }
 
 } // namespace quorl

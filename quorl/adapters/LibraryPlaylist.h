@@ -18,9 +18,13 @@ class LibraryPlaylist final : public MPMediaPlaylist {
     /// Takes the place of `isSame` playlist in another inventory, and lets go of the one before.
     void moveTo(std::shared_ptr<const media::Inventory> inventory, const media::Playlist& playlist);
 
-    [[nodiscard]] std::uint64_t persistentID() const override;
+    /// Gives the number of a property; allocates nothing.
+    using Reader = const std::shared_ptr<NSNumber>& (*)(const LibraryPlaylist& playlist);
 
-    /// Allocates nothing.
+    /// How a property is read of every playlist; null for one that playlists lack.
+    [[nodiscard]] static Reader readerOf(MPMediaProperty property);
+
+    [[nodiscard]] std::uint64_t persistentID() const override;
     [[nodiscard]] std::shared_ptr<NSObject>
     valueForProperty(MPMediaProperty property) const override;
     [[nodiscard]] std::optional<std::string> name() const override;
@@ -37,5 +41,10 @@ class LibraryPlaylist final : public MPMediaPlaylist {
     std::shared_ptr<NSNumber> identifier_;
     std::shared_ptr<NSNumber> revision_;
 };
+
+/// Those of `playlists` that fulfil every predicate; never null.
+[[nodiscard]] NSArray<MPMediaPlaylist>
+matching(std::span<const std::shared_ptr<LibraryPlaylist>> playlists,
+         std::span<const std::shared_ptr<MPMediaPropertyPredicate>> predicates);
 
 } // namespace quorl

@@ -63,14 +63,7 @@ bool MusicLibrary::hasMediaOfType(NSUInteger mask) const {
 }
 
 NSArray<MPMediaPlaylist> MusicLibrary::playlistsMatching(const Predicates& predicates) const {
-    std::vector<std::shared_ptr<MPMediaPlaylist>> matching;
-    for (const auto& playlist : playlists_) {
-        if (fulfils(*playlist, predicates)) {
-            matching.push_back(playlist);
-        }
-    }
-    return std::make_shared<const std::vector<std::shared_ptr<MPMediaPlaylist>>>(
-        std::move(matching));
+    return matching(playlists_, predicates);
 }
 
 } // namespace quorl

@@ -43,8 +43,6 @@ T storable(const Preference<T>& /*preference*/, std::optional<std::uint64_t> val
     }
 }
 
-std::size_t placeOf(SyncPreference preference) { return static_cast<std::size_t>(preference); }
-
 /// Has the main thread tell one of the listeners, as long as there are any. Any thread.
 template <class Listeners, class Class>
 void tell(const std::weak_ptr<const Listeners>& listeners, std::function<void()> Class::*change) {

@@ -8,24 +8,25 @@ namespace quorl {
 
 namespace {
 
-/// Never destroyed: panes and process-wide objects of plug-ins may outlive `main`.
-std::shared_ptr<Host>& installed() {
-    static auto* const host = new std::shared_ptr<Host>;
-    return *host;
-}
+constinit Host* installed = nullptr;
 
 } // namespace
 
-void Host::install(std::shared_ptr<Host> host) { installed() = std::move(host); }
+void Host::install(std::shared_ptr<Host> host) {
+    // Never destroyed: panes and process-wide objects of plug-ins may outlive `main`.
+    static auto* const kept = new std::shared_ptr<Host>;
+    installed = host.get();
+    *kept = std::move(host);
+}
 
-Host* Host::current() { return installed().get(); }
+Host* Host::current() { return installed; }
 
 Host& Host::required() {
-    if (!current()) {
+    if (!installed) {
         std::fputs("quorl: a pane was used before a host was installed\n", stderr);
         std::abort();
     }
-    return *current();
+    return *installed;
 }
 
 std::shared_ptr<PSSpecifier> Host::glanceSpecifier(const std::string& /*identifier*/) {

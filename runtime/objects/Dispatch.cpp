@@ -19,11 +19,18 @@ void releaseForSanitizer(void* /*what*/) {}
 void acquireForSanitizer(void* /*what*/) {}
 #endif
 
-/// The closure as the context of a function that another thread may run.
-void* handedOver(Closure closure) {
-    auto* const context = std::make_unique<Closure>(std::move(closure)).release();
+/// What is kept, as the context of a function that another thread may run.
+template <class Kept>
+void* handedOver(std::unique_ptr<Kept> kept) {
+    auto* const context = kept.release();
     releaseForSanitizer(context);
     return context;
+}
+
+void runClosure(void* context) noexcept {
+    acquireForSanitizer(context);
+    const std::unique_ptr<dispatch_closure> closure(static_cast<dispatch_closure*>(context));
+    closure->run();
 }
 
 void runOnce(void* context) noexcept {
@@ -59,15 +66,19 @@ void dispatch_once(dispatch_once_t* predicate, const std::function<void()>& init
 }
 
 void dispatch_async(dispatch_queue_t queue, std::function<void()> work) {
-    dispatch_async_f(queue, handedOver(std::move(work)), runOnce);
+    dispatch_async_f(queue, handedOver(std::make_unique<Closure>(std::move(work))), runOnce);
+}
+
+void dispatch_async(dispatch_queue_t queue, std::unique_ptr<dispatch_closure> work) {
+    dispatch_async_f(queue, handedOver(std::move(work)), runClosure);
 }
 
 void dispatch_after(dispatch_time_t when, dispatch_queue_t queue, std::function<void()> work) {
-    dispatch_after_f(when, queue, handedOver(std::move(work)), runOnce);
+    dispatch_after_f(when, queue, handedOver(std::make_unique<Closure>(std::move(work))), runOnce);
 }
 
 void dispatch_source_set_event_handler(dispatch_source_t source, std::function<void()> handler) {
-    dispatch_set_context(source, handedOver(std::move(handler)));
+    dispatch_set_context(source, handedOver(std::make_unique<Closure>(std::move(handler))));
     dispatch_set_finalizer_f(source, destroy);
     dispatch_source_set_event_handler_f(source, run);
 }

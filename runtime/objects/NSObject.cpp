@@ -1,9 +1,19 @@
 #include "platform/NSObject.h"
 
-#include <unordered_map>
+#include <algorithm>
+#include <vector>
 
 struct NSObject::AssociatedObjects {
-    std::unordered_map<const void*, std::shared_ptr<NSObject>> byKey;
+    struct Associated {
+        const void* key;
+        std::shared_ptr<NSObject> value;
+    };
+
+    std::vector<Associated> all; ///< of which an object has one or two
+
+    [[nodiscard]] auto placeOf(const void* key) {
+        return std::ranges::find(all, key, &Associated::key);
+    }
 };
 
 NSObject::NSObject() = default;
@@ -18,9 +28,9 @@ std::shared_ptr<NSObject> objc_getAssociatedObject(const NSObject& object, const
     if (!object._associatedObjects) {
         return nullptr;
     }
-    const auto& byKey = object._associatedObjects->byKey;
-    const auto found = byKey.find(key);
-    return found == byKey.end() ? nullptr : found->second;
+    auto& associated = *object._associatedObjects;
+    const auto found = associated.placeOf(key);
+    return found == associated.all.end() ? nullptr : found->value;
 }
 
 void objc_setAssociatedObject(NSObject& object, const void* key, std::shared_ptr<NSObject> value,
@@ -28,6 +38,11 @@ void objc_setAssociatedObject(NSObject& object, const void* key, std::shared_ptr
     if (!object._associatedObjects) {
         object._associatedObjects = std::make_unique<NSObject::AssociatedObjects>();
     }
-    // The old value is let go of last: its destructor may come back here.
-    std::swap(object._associatedObjects->byKey[key], value);
+    auto& associated = *object._associatedObjects;
+    const auto found = associated.placeOf(key);
+    if (found == associated.all.end()) {
+        associated.all.push_back({key, std::move(value)});
+    } else {
+        std::swap(found->value, value); // the old one is let go of last: it may come back here
+    }
 }

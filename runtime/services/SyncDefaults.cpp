@@ -64,7 +64,7 @@ std::shared_ptr<NSNumber> SyncDefaults::number(SyncPreference preference) const 
     if (!value) {
         return nullptr;
     }
-    auto& number = numbers_[static_cast<std::size_t>(preference)];
+    auto& number = numbers_[placeOf(preference)];
     if (!number || number->unsignedLongLongValue() != *value) {
         number = NSNumber::numberWithUnsignedLongLong(*value);
     }

@@ -100,6 +100,16 @@ TEST(MainQueueWork, IsLetGoOfRightAfterItHasRun) {
     EXPECT_TRUE(isGoneForTheNext);
 }
 
+TEST(MainQueueWork, MayOwnWhatCannotBeCopied) {
+    int seen = 0;
+
+    dispatch_async(dispatch_get_main_queue(),
+                   [owned = std::make_unique<int>(7), &seen] { seen = *owned; });
+    runQueuedWork();
+
+    EXPECT_EQ(seen, 7);
+}
+
 TEST(MainQueueWork, ThatThrowsEndsTheProcess) {
     EXPECT_DEATH(
         {

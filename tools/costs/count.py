@@ -8,6 +8,7 @@ import sys
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 QEMU = {"x86_64": "qemu-x86_64", "armhf": "qemu-arm", "arm64": "qemu-aarch64"}
 PROGRAM = "hot-operations"
+BURST = "hot-burst"
 TURNS = (100, 300)  # what starting and ending take is in both
 
 
@@ -30,6 +31,12 @@ def file_of(folder, target):
     """What a target of the build has made."""
     return next(path for pattern in (f"bin/{target}", f"**/lib{target}.so*", f"**/{target}.so", f"**/{target}")
                 for path in sorted(folder.glob(pattern)) if path.is_file() and not path.is_symlink())
+
+
+def operations(program):
+    """The operations of a program, and what to hold each against, where there is such a one."""
+    lines = (line.partition("\t") for line in output(program).splitlines())
+    return {name: beside for name, _, beside in lines}
 
 
 class Counter:
