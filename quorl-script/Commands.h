@@ -15,10 +15,10 @@ struct Stage {
     Panes panes;
 };
 
-/// Carries a command out and gives back what its reply has besides the trace: an object, or null
-/// for nothing. Everything of the command is checked first: where it is not right a `CommandError`
-/// is thrown and nothing has changed.
-using Command = Json (*)(Stage& stage, const Field& command);
+/// Carries a command out and gives back what its reply has besides the trace. Everything of the
+/// command is checked first: where it is not right a `CommandError` is thrown and nothing has
+/// changed.
+using Command = JsonObject (*)(Stage& stage, const Field& command);
 
 /// The command of this name, or null: of those that set the situation, and of those that are a
 /// user's or the host's doing. `batch` is neither.
@@ -26,6 +26,6 @@ using Command = Json (*)(Stage& stage, const Field& command);
 [[nodiscard]] Command paneCommand(std::string_view name);
 
 /// One of the latter, which has its own file.
-[[nodiscard]] Json send(Stage& stage, const Field& command);
+[[nodiscard]] JsonObject send(Stage& stage, const Field& command);
 
 } // namespace quorl

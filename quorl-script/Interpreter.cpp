@@ -44,49 +44,37 @@ nlohmann::json parse(std::string_view line) {
 }
 
 /// The trace comes first, then what `results` has.
-Json success(Json trace, Json results) {
-    Json reply;
-    reply["ok"] = true;
-    reply["trace"] = std::move(trace);
-    if (results.is_object()) {
-        for (auto& [name, result] : results.items()) {
-            reply[name] = std::move(result);
-        }
-    }
-    return reply;
-}
-
-std::string textOfReply(const Json& reply) {
-    return reply.dump(-1, ' ', false, Json::error_handler_t::replace);
+JsonObject success(const JsonList& trace, const JsonObject& results) {
+    return JsonObject().set("ok", true).set("trace", trace).setAll(results);
 }
 
 } // namespace
 
 std::string Interpreter::reply(std::string_view line) {
     try {
-        return textOfReply(carryOut(line));
+        return carryOut(line).text();
     } catch (const CommandError& error) {
-        return textOfReply(failure(error));
+        return failure(error).text();
     }
 }
 
 std::string Interpreter::replyToTooLongLine(std::size_t limit) {
-    return textOfReply(
-        failure(CommandError("the line is not taken: it is longer than " + std::to_string(limit) +
-                             " bytes; say it in several commands")));
+    return failure(CommandError("the line is not taken: it is longer than " +
+                                std::to_string(limit) + " bytes; say it in several commands"))
+        .text();
 }
 
-Json Interpreter::carryOut(std::string_view line) {
+JsonObject Interpreter::carryOut(std::string_view line) {
     const nlohmann::json document = parse(line);
-    Json results = perform(Field(&document, ""));
+    const JsonObject results = perform(Field(&document, ""));
     runAndDraw();
-    return success(stage_.trace->take(), std::move(results));
+    return success(stage_.trace->take(), results);
 }
 
-Json Interpreter::perform(const Field& command) {
+JsonObject Interpreter::perform(const Field& command) {
     const Field name = command["do"];
     if (name.text() == "batch") {
-        return {{"replies", performSteps(command["steps"])}};
+        return JsonObject().set("replies", performSteps(command["steps"]));
     }
     Command known = situationCommand(name.text());
     known = known ? known : paneCommand(name.text());
@@ -96,26 +84,26 @@ Json Interpreter::perform(const Field& command) {
     return known(stage_, command);
 }
 
-Json Interpreter::performSteps(const Field& steps) {
-    Json replies = Json::array();
+JsonList Interpreter::performSteps(const Field& steps) {
+    JsonList replies;
     for (const Field& step : steps.elements()) {
-        replies.push_back(performStep(step));
+        replies.add(performStep(step));
     }
     return replies;
 }
 
-Json Interpreter::performStep(const Field& step) {
+JsonObject Interpreter::performStep(const Field& step) {
     try {
-        Json results = perform(step);
-        return success(stage_.trace->take(), std::move(results));
+        const JsonObject results = perform(step);
+        return success(stage_.trace->take(), results);
     } catch (const CommandError& error) {
         return failure(error);
     }
 }
 
-Json Interpreter::failure(const std::exception& error) {
+JsonObject Interpreter::failure(const std::exception& error) {
     hasFailed_ = true;
-    return {{"ok", false}, {"error", error.what()}};
+    return JsonObject().set("ok", false).set("error", error.what());
 }
 
 /// What a command leaves to be done later is done before its reply.

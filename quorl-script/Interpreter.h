@@ -24,11 +24,11 @@ class Interpreter {
     [[nodiscard]] bool hasFailed() const { return hasFailed_; }
 
   private:
-    [[nodiscard]] Json carryOut(std::string_view line);
-    [[nodiscard]] Json perform(const Field& command);
-    [[nodiscard]] Json performSteps(const Field& steps);
-    [[nodiscard]] Json performStep(const Field& step);
-    [[nodiscard]] Json failure(const std::exception& error);
+    [[nodiscard]] JsonObject carryOut(std::string_view line);
+    [[nodiscard]] JsonObject perform(const Field& command);
+    [[nodiscard]] JsonList performSteps(const Field& steps);
+    [[nodiscard]] JsonObject performStep(const Field& step);
+    [[nodiscard]] JsonObject failure(const std::exception& error);
     void runAndDraw();
 
     Stage stage_;

@@ -1,5 +1,8 @@
 #include "quorl-script/Naming.h"
 
+#include <typeinfo>
+#include <unordered_map>
+
 #include "platform/HostApp.h"
 #include "platform/MediaLibrary.h"
 #include "platform/SyncPreferences.h"
@@ -29,12 +32,8 @@ bool is(const NSObject& object) {
     return dynamic_cast<const Platform*>(&object) != nullptr;
 }
 
-} // namespace
-
-std::string className(const NSObject& object) {
-    if (const auto* standIn = dynamic_cast<const StandInPane*>(&object)) {
-        return standIn->className();
-    }
+/// What an object's class is called, that of the platform for one of the host.
+std::string platformName(const NSObject& object) {
     if (is<MPMediaLibrary>(object)) {
         return "MPMediaLibrary";
     }
@@ -50,14 +49,27 @@ std::string className(const NSObject& object) {
     return Class::ofObject(object).name();
 }
 
+} // namespace
+
+const std::string& className(const NSObject& object) {
+    if (typeid(object) == typeid(StandInPane)) {
+        return static_cast<const StandInPane&>(object).className();
+    }
+    thread_local std::unordered_map<const std::type_info*, std::string> names;
+    std::string& name = names[&typeid(object)];
+    if (name.empty()) {
+        name = platformName(object);
+    }
+    return name;
+}
+
 Json classNameOrNull(const NSObject* object) {
     return object ? Json(className(*object)) : Json(nullptr);
 }
 
-void watchLife(NSObject& object, std::string name, const std::shared_ptr<Trace>& trace) {
+void watchLife(NSObject& object, const std::string& name, const std::shared_ptr<Trace>& trace) {
     if (!objc_getAssociatedObject(object, &lifeWatchKey)) {
-        objc_setAssociatedObject(object, &lifeWatchKey,
-                                 std::make_shared<LifeWatch>(std::move(name), trace),
+        objc_setAssociatedObject(object, &lifeWatchKey, std::make_shared<LifeWatch>(name, trace),
                                  OBJC_ASSOCIATION_RETAIN_NONATOMIC);
     }
 }

@@ -10,31 +10,31 @@ namespace quorl {
 
 namespace {
 
-Json create(Stage& stage, const Field& /*command*/) {
+JsonObject create(Stage& stage, const Field& /*command*/) {
     stage.panes.createRoot(stage.plugin.rootClass());
-    return nullptr;
+    return {};
 }
 
-Json specifiers(Stage& stage, const Field& /*command*/) {
+JsonObject specifiers(Stage& stage, const Field& /*command*/) {
     stage.panes.askForSpecifiers();
-    return nullptr;
+    return {};
 }
 
-Json appear(Stage& stage, const Field& command) {
+JsonObject appear(Stage& stage, const Field& command) {
     stage.panes.appear(command["animated"].booleanOr(false));
-    return nullptr;
+    return {};
 }
 
-Json disappear(Stage& stage, const Field& command) {
+JsonObject disappear(Stage& stage, const Field& command) {
     stage.panes.disappear(command["animated"].booleanOr(false));
-    return nullptr;
+    return {};
 }
 
-Json open(Stage& stage, const Field& /*command*/) {
+JsonObject open(Stage& stage, const Field& /*command*/) {
     stage.panes.createRoot(stage.plugin.rootClass());
     stage.panes.askForSpecifiers();
     stage.panes.appear(false);
-    return nullptr;
+    return {};
 }
 
 NSIndexPath pathOf(const Field& field) {
@@ -47,7 +47,7 @@ NSIndexPath pathOf(const Field& field) {
             static_cast<NSInteger>(indices[1].count(largest))};
 }
 
-Json tap(Stage& stage, const Field& command) {
+JsonObject tap(Stage& stage, const Field& command) {
     const Field specifier = command["specifier"];
     if (specifier.isGiven()) {
         stage.panes.tapSpecifier(specifier.text());
@@ -56,43 +56,43 @@ Json tap(Stage& stage, const Field& command) {
     } else {
         specifier.refuse("the title of a row, or \"path\" its place in the table");
     }
-    return nullptr;
+    return {};
 }
 
-Json back(Stage& stage, const Field& /*command*/) {
+JsonObject back(Stage& stage, const Field& /*command*/) {
     stage.panes.back();
-    return nullptr;
+    return {};
 }
 
-Json scroll(Stage& stage, const Field& command) {
+JsonObject scroll(Stage& stage, const Field& command) {
     constexpr auto largest = std::numeric_limits<std::int32_t>::max();
     const auto row = static_cast<NSInteger>(command["to"].count(largest));
     stage.panes.scrollTo(row);
-    return nullptr;
+    return {};
 }
 
-Json release(Stage& stage, const Field& /*command*/) {
+JsonObject release(Stage& stage, const Field& /*command*/) {
     stage.panes.releaseAll();
-    return nullptr;
+    return {};
 }
 
-Json rows(Stage& stage, const Field& command) {
+JsonObject rows(Stage& stage, const Field& command) {
     const std::int64_t section = command["section"].integer();
     if (!std::in_range<NSInteger>(section)) {
         command["section"].refuse("the index of a section");
     }
     UITableViewController& pane = stage.panes.topTable();
-    return {{"result", pane.tableView_numberOfRowsInSection(pane.tableView(),
-                                                            static_cast<NSInteger>(section))}};
+    return JsonObject().set("result", pane.tableView_numberOfRowsInSection(
+                                          pane.tableView(), static_cast<NSInteger>(section)));
 }
 
-Json query(Stage& stage, const Field& /*command*/) { return stage.plugin.status(); }
+JsonObject query(Stage& stage, const Field& /*command*/) { return stage.plugin.status(); }
 
-Json snapshot(Stage& stage, const Field& /*command*/) {
-    return {{"stack", snapshotOf(stage.panes.stack())}};
+JsonObject snapshot(Stage& stage, const Field& /*command*/) {
+    return JsonObject().set("stack", snapshotOf(stage.panes.stack()));
 }
 
-Json trace(Stage& stage, const Field& command) {
+JsonObject trace(Stage& stage, const Field& command) {
     std::optional<std::set<std::string, std::less<>>> classes;
     if (const Field field = command["classes"]; field.isGiven()) {
         classes.emplace();
@@ -101,7 +101,7 @@ Json trace(Stage& stage, const Field& command) {
         }
     }
     stage.trace->select(std::move(classes));
-    return nullptr;
+    return {};
 }
 
 CGRect frameOf(const Field& field) {
@@ -115,11 +115,11 @@ CGRect frameOf(const Field& field) {
     return {side(0), side(1), side(2), side(3)};
 }
 
-Json frameOf(const UILabel& label) {
+JsonList frameOf(const UILabel& label) {
     const CGRect frame = label.frame();
-    Json sides = Json::array();
+    JsonList sides;
     for (const CGFloat side : {frame.x, frame.y, frame.width, frame.height}) {
-        sides.push_back(numberOf(static_cast<double>(side)));
+        sides.add(numberOf(static_cast<double>(side)));
     }
     return sides;
 }
@@ -137,19 +137,20 @@ CellLayout layoutOf(const ScreenDouble& screen, const Field& command) {
     return layout;
 }
 
-Json layout(Stage& stage, const Field& command) {
+JsonObject layout(Stage& stage, const Field& command) {
     ScreenDouble& screen = stage.host.screen();
     const CellLayout layout = layoutOf(screen, command);
     const auto cell = stage.plugin.newPlaylistCell();
     watchLife(*cell, className(*cell), stage.trace);
     const auto labels = screen.tryLayout(*cell, layout);
-    Json set = Json::array();
+    JsonList set;
     for (const UILabel* label : labels) {
-        set.push_back(label == &cell->textLabel() ? "title" : "detail");
+        set.add(label == &cell->textLabel() ? "title" : "detail");
     }
-    return {{"title", frameOf(cell->textLabel())},
-            {"detail", frameOf(cell->detailTextLabel())},
-            {"set", std::move(set)}};
+    return JsonObject()
+        .set("title", frameOf(cell->textLabel()))
+        .set("detail", frameOf(cell->detailTextLabel()))
+        .set("set", set);
 }
 
 } // namespace

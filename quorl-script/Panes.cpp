@@ -4,6 +4,7 @@
 
 #include "quorl-script/Naming.h"
 #include "quorl-script/input/Field.h"
+#include "runtime/lists/ListView.h"
 #include "runtime/lists/TableView.h"
 
 namespace quorl {
@@ -25,6 +26,14 @@ class WatchedNavigation final : public NavigationController {
   private:
     std::shared_ptr<Trace> trace_;
 };
+
+/// Whether a switch of the list `pane` is on for whoever looks at it.
+bool isDrawnOn(const UIViewController& pane, const std::shared_ptr<PSSpecifier>& specifier) {
+    const auto& rows = ListView::of(dynamic_cast<const PSListController&>(pane)).rows();
+    return std::ranges::any_of(rows, [&specifier](const ListView::Row& row) {
+        return row.specifier == specifier && row.value == PSSwitchOnValue;
+    });
+}
 
 } // namespace
 
@@ -80,18 +89,20 @@ void Panes::disappear(bool animated) {
 
 void Panes::tapSpecifier(const std::string& title) {
     const auto specifier = rowOnScreen(title);
-    if (!specifier->detailControllerClass()) {
-        return; // nothing opens
-    }
-    if (!navigation_->open(specifier)) {
+    if (specifier->cellType() == PSCellType::Switch) {
+        specifier->setValue(NSNumber::numberWithBool(!isDrawnOn(top(), specifier)));
+    } else if (specifier->cellType() == PSCellType::Button) {
+        specifier->setValue(nullptr);
+    } else if (specifier->detailControllerClass() && !navigation_->open(specifier)) {
         throw CommandError("\"specifier\": the row's pane could not be made");
     }
 }
 
 std::shared_ptr<PSSpecifier> Panes::rowOnScreen(const std::string& title) const {
-    if (isOnScreen_ && stack().size() == 1) {
-        const auto list = root().specifiers();
-        for (const auto& specifier : elements(list)) {
+    auto* list = stack().empty() ? nullptr : dynamic_cast<PSListController*>(stack().back().get());
+    if (isOnScreen_ && list) {
+        const auto rows = list->specifiers();
+        for (const auto& specifier : elements(rows)) {
             if (specifier->cellType() != PSCellType::Group && specifier->name() == title) {
                 return specifier;
             }

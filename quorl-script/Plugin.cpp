@@ -18,19 +18,19 @@ Plugin Plugin::load(const std::vector<std::filesystem::path>& directories) {
     return {std::move(bundle), rootClass};
 }
 
-Json Plugin::status() const {
+JsonObject Plugin::status() const {
     const auto* table = static_cast<const QuorlInspection*>(bundle_->symbol(QuorlInspectionSymbol));
     if (!table) {
         refuse(QuorlInspectionSymbol);
     }
-    Json status;
-    status["stage"] = table->syncStage();
-    status["progress"] = table->progress();
-    status["completedAssetCount"] = table->completedAssetCount();
-    status["totalAssetCount"] = table->totalAssetCount();
+    JsonObject status;
+    status.set("stage", table->syncStage())
+        .set("progress", table->progress())
+        .set("completedAssetCount", table->completedAssetCount())
+        .set("totalAssetCount", table->totalAssetCount());
     const auto playlist = table->assetSyncPlaylist();
-    status["assetSyncPlaylist"] =
-        playlist ? Json(std::to_string(playlist->persistentID())) : Json(nullptr);
+    status.set("assetSyncPlaylist",
+               playlist ? Json(std::to_string(playlist->persistentID())) : Json(nullptr));
     return status;
 }
 

@@ -2,7 +2,7 @@
 
 #include "platform/Inspection.h"
 #include "platform/UserInterface.h"
-#include "quorl-script/Trace.h"
+#include "quorl-script/output/Json.h"
 #include "runtime/plugins/PluginBundle.h"
 
 namespace quorl {
@@ -20,7 +20,7 @@ class Plugin {
 
     /// What the plug-in's table of inspection answers, asked in the table's order. Throws
     /// `CommandError` where the plug-in has no table.
-    [[nodiscard]] Json status() const;
+    [[nodiscard]] JsonObject status() const;
 
     /// A new cell of the class that the plug-in shows its playlists in, never null. Throws
     /// `CommandError` where the plug-in does not offer that class.

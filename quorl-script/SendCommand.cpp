@@ -17,13 +17,13 @@ struct Message {
     PSController& receiver;
 };
 
-using Send = Json (*)(const Message& message);
+using Send = JsonObject (*)(const Message& message);
 
 /// For a member without arguments and without a result.
 template <auto Member>
-Json plain(const Message& message) {
+JsonObject plain(const Message& message) {
     (message.receiver.*Member)();
-    return nullptr;
+    return {};
 }
 
 /// A pane that some other part of the app would hand over.
@@ -47,67 +47,71 @@ PSController* paneBelow(const Message& message) {
     field.refuse("the class of a pane below this one, or null");
 }
 
-Json resultOf(const NSObject* object) { return {{"result", classNameOrNull(object)}}; }
-
-Json canBeShownFromSuspendedState(const Message& message) {
-    return {{"result", message.receiver.canBeShownFromSuspendedState()}};
+JsonObject resultOf(const NSObject* object) {
+    return JsonObject().set("result", classNameOrNull(object));
 }
 
-Json handleURL(const Message& message) {
+JsonObject canBeShownFromSuspendedState(const Message& message) {
+    return JsonObject().set("result", message.receiver.canBeShownFromSuspendedState());
+}
+
+JsonObject handleURL(const Message& message) {
     message.receiver.handleURL(message.command["url"].text());
-    return nullptr;
+    return {};
 }
 
-Json parentController(const Message& message) {
+JsonObject parentController(const Message& message) {
     return resultOf(dynamic_cast<NSObject*>(message.receiver.parentController()));
 }
 
-Json readPreferenceValue(const Message& message) {
+JsonObject readPreferenceValue(const Message& message) {
     return resultOf(message.receiver.readPreferenceValue(nullptr).get());
 }
 
-Json rootController(const Message& message) { return resultOf(message.receiver.rootController()); }
+JsonObject rootController(const Message& message) {
+    return resultOf(message.receiver.rootController());
+}
 
-Json setParentController(const Message& message) {
+JsonObject setParentController(const Message& message) {
     message.receiver.setParentController(paneBelow(message));
-    return nullptr;
+    return {};
 }
 
-Json setPreferenceValue(const Message& message) {
+JsonObject setPreferenceValue(const Message& message) {
     message.receiver.setPreferenceValue_specifier(nullptr, nullptr);
-    return nullptr;
+    return {};
 }
 
-Json setRootController(const Message& message) {
+JsonObject setRootController(const Message& message) {
     const bool isGiven = message.command["controller"].isGiven();
     message.receiver.setRootController(isGiven ? &message.stage.panes.navigation() : nullptr);
-    return nullptr;
+    return {};
 }
 
-Json setSpecifier(const Message& message) {
+JsonObject setSpecifier(const Message& message) {
     message.receiver.setSpecifier(nullptr);
-    return nullptr;
+    return {};
 }
 
-Json showController(const Message& message) {
+JsonObject showController(const Message& message) {
     message.receiver.showController(newPane(message));
-    return nullptr;
+    return {};
 }
 
-Json showControllerAnimate(const Message& message) {
+JsonObject showControllerAnimate(const Message& message) {
     const bool animate = message.command["animate"].booleanOr(false);
     message.receiver.showController_animate(newPane(message), animate);
-    return nullptr;
+    return {};
 }
 
-Json specifier(const Message& message) {
+JsonObject specifier(const Message& message) {
     const auto specifier = message.receiver.specifier();
-    return {{"result", specifier ? textOf(specifier->name()) : Json(nullptr)}};
+    return JsonObject().set("result", specifier ? specifier->name() : std::nullopt);
 }
 
-Json statusBarWillAnimateByHeight(const Message& message) {
+JsonObject statusBarWillAnimateByHeight(const Message& message) {
     message.receiver.statusBarWillAnimateByHeight(0);
-    return nullptr;
+    return {};
 }
 
 const std::unordered_map<std::string, Send>& members() {
@@ -138,7 +142,7 @@ const std::unordered_map<std::string, Send>& members() {
 
 } // namespace
 
-Json send(Stage& stage, const Field& command) {
+JsonObject send(Stage& stage, const Field& command) {
     const Field selector = command["selector"];
     const auto found = members().find(selector.text());
     if (found == members().end()) {

@@ -49,7 +49,7 @@ PlaylistDescription playlistOf(const Field& field) {
     return playlist;
 }
 
-Json library(Stage& stage, const Field& command) {
+JsonObject library(Stage& stage, const Field& command) {
     std::vector<PlaylistDescription> playlists;
     for (const Field& playlist : command["playlists"].elements()) {
         playlists.push_back(playlistOf(playlist));
@@ -66,7 +66,7 @@ Json library(Stage& stage, const Field& command) {
     if (isAnnounced) {
         library.contentsDidChange();
     }
-    return nullptr;
+    return {};
 }
 
 using PreferenceReader = std::uint64_t (*)(const Field&);
@@ -95,7 +95,7 @@ const SyncPreferenceDeclaration& preferenceOf(const Field& field, std::string_vi
     return *found;
 }
 
-Json prefs(Stage& stage, const Field& command) {
+JsonObject prefs(Stage& stage, const Field& command) {
     const Field set = command["set"];
     std::vector<std::pair<SyncPreference, std::optional<std::uint64_t>>> values;
     for (const Field& field : set.members()) {
@@ -116,7 +116,7 @@ Json prefs(Stage& stage, const Field& command) {
     if (hasChanged && isAnnounced) {
         SyncDefaults::announceChange();
     }
-    return nullptr;
+    return {};
 }
 
 TaskDescription taskOf(const Field& field) {
@@ -144,7 +144,7 @@ SessionDescription sessionOf(const Field& field) {
     return session;
 }
 
-Json sessions(Stage& stage, const Field& command) {
+JsonObject sessions(Stage& stage, const Field& command) {
     std::vector<SessionDescription> descriptions;
     for (const Field& session : command["list"].elements()) {
         descriptions.push_back(sessionOf(session));
@@ -156,7 +156,7 @@ Json sessions(Stage& stage, const Field& command) {
         NSNotificationCenter::defaultCenter().postNotificationName_object(
             DVSessionsDidChangeNotification, nullptr);
     }
-    return nullptr;
+    return {};
 }
 
 /// How an observer is told of an event; `task` is null for the events of the session itself.
@@ -207,7 +207,7 @@ std::shared_ptr<TaskDouble> taskOf(const SessionDouble& session, const Field& fi
     return task;
 }
 
-Json session(Stage& stage, const Field& command) {
+JsonObject session(Stage& stage, const Field& command) {
     constexpr std::uint64_t mostTimes = 100'000;
     const auto session = stage.host.sessionService.find(command["id"].text());
     if (!session) {
@@ -229,7 +229,7 @@ Json session(Stage& stage, const Field& command) {
     } else {
         tell();
     }
-    return nullptr;
+    return {};
 }
 
 UsageAnswer answerOf(const Field& reply) {
@@ -260,13 +260,13 @@ VirtualTime::Nanoseconds durationOf(const Field& field) {
     return static_cast<VirtualTime::Nanoseconds>(nanoseconds);
 }
 
-Json usage(Stage& stage, const Field& command) {
+JsonObject usage(Stage& stage, const Field& command) {
     UsageAnswer answer = answerOf(command["reply"]);
     const Field after = command["after"];
     answer.delay = after.isGiven() ? durationOf(after) : 0;
 
     stage.host.wearable.setAnswer(answer);
-    return nullptr;
+    return {};
 }
 
 std::shared_ptr<PSSpecifier> glanceRow(const std::string& title) {
@@ -275,14 +275,14 @@ std::shared_ptr<PSSpecifier> glanceRow(const std::string& title) {
         std::nullopt);
 }
 
-Json glance(Stage& stage, const Field& command) {
+JsonObject glance(Stage& stage, const Field& command) {
     const auto title = command["row"].textOrNull();
 
     stage.host.glance = title ? glanceRow(*title) : nullptr;
-    return nullptr;
+    return {};
 }
 
-Json strings(Stage& stage, const Field& command) {
+JsonObject strings(Stage& stage, const Field& command) {
     HostDouble::Texts texts;
     const Field table = command["table"];
     for (const Field& text : table.members()) {
@@ -291,20 +291,20 @@ Json strings(Stage& stage, const Field& command) {
         }
     }
     stage.host.texts = std::move(texts);
-    return nullptr;
+    return {};
 }
 
-Json language(Stage& stage, const Field& command) {
+JsonObject language(Stage& stage, const Field& command) {
     const Field tag = command["tag"];
     if (tag.text().empty()) {
         tag.refuse("a language's tag, for instance \"de\"");
     }
     stage.host.setLanguages({tag.text()});
-    return nullptr;
+    return {};
 }
 
 /// What it says is enough: the field may have any name.
-Json sizes(Stage& stage, const Field& command) {
+JsonObject sizes(Stage& stage, const Field& command) {
     std::string sizes = "raw";
     for (const Field& field : command.members()) {
         if (field.name() == "do" || !field.isGiven()) {
@@ -317,7 +317,7 @@ Json sizes(Stage& stage, const Field& command) {
     }
     stage.host.sizeTexts =
         sizes == "raw" ? HostDouble::SizeTexts::Raw : HostDouble::SizeTexts::Platform;
-    return nullptr;
+    return {};
 }
 
 CGFloat scaleOf(const Field& field) {
@@ -328,7 +328,7 @@ CGFloat scaleOf(const Field& field) {
     return scale;
 }
 
-Json screen(Stage& stage, const Field& command) {
+JsonObject screen(Stage& stage, const Field& command) {
     constexpr std::uint64_t mostRows = 1'000'000;
     Looks looks = stage.host.screen().looks;
     looks.rows = static_cast<NSInteger>(
@@ -342,10 +342,10 @@ Json screen(Stage& stage, const Field& command) {
     looks.tintColor = command["tintColor"].textOrNull().value_or(looks.tintColor);
 
     stage.host.screen().looks = std::move(looks);
-    return nullptr;
+    return {};
 }
 
-Json clock(Stage& stage, const Field& command) {
+JsonObject clock(Stage& stage, const Field& command) {
     const Field by = command["by"];
     const Field tick = command["tick"];
     const std::chrono::nanoseconds shift(by.isGiven() ? by.seconds() : 0);
@@ -355,19 +355,19 @@ Json clock(Stage& stage, const Field& command) {
     if (tick.isGiven()) {
         stage.host.clock.setTick(everyReading);
     }
-    return nullptr;
+    return {};
 }
 
-Json advance(Stage& /*stage*/, const Field& command) {
+JsonObject advance(Stage& /*stage*/, const Field& command) {
     const VirtualTime::Nanoseconds duration = durationOf(command["seconds"]);
     if (duration > VirtualTime::end - VirtualTime::shared().now()) {
         command["seconds"].refuse("no more than what 292 years of virtual time have left");
     }
     VirtualTime::shared().advance(duration);
-    return nullptr;
+    return {};
 }
 
-Json application(Stage& /*stage*/, const Field& command) {
+JsonObject application(Stage& /*stage*/, const Field& command) {
     const Field state = command["state"];
     if (state.text() != "background" && state.text() != "foreground") {
         state.refuse("\"background\" or \"foreground\"");
@@ -376,7 +376,7 @@ Json application(Stage& /*stage*/, const Field& command) {
         state.text() == "background" ? UIApplicationDidEnterBackgroundNotification
                                      : UIApplicationWillEnterForegroundNotification,
         nullptr);
-    return nullptr;
+    return {};
 }
 
 } // namespace

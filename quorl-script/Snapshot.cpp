@@ -8,72 +8,69 @@ namespace quorl {
 
 namespace {
 
-Json specifierOf(const ListView::Row& row) {
+JsonObject specifierOf(const ListView::Row& row) {
     const PSSpecifier& specifier = *row.specifier;
-    Json entry;
-    entry["cell"] = static_cast<NSInteger>(specifier.cellType());
-    entry["title"] = textOf(specifier.name());
+    JsonObject entry;
+    entry.set("cell", static_cast<NSInteger>(specifier.cellType())).set("title", specifier.name());
     if (specifier.cellType() == PSCellType::Group) {
-        entry["footer"] = textOf(row.footer);
-        return entry;
+        return entry.set("footer", row.footer);
     }
     const auto& detail = specifier.detailControllerClass();
-    entry["value"] = textOf(row.value);
-    entry["detail"] = detail ? Json(detail->name()) : Json(nullptr);
-    return entry;
+    return entry.set("value", row.value)
+        .set("detail", detail ? Json(detail->name()) : Json(nullptr));
 }
 
-Json specifiersOf(const PSListController& list) {
-    Json specifiers = Json::array();
+JsonList specifiersOf(const PSListController& list) {
+    JsonList specifiers;
     for (const auto& row : ListView::of(list).rows()) {
-        specifiers.push_back(specifierOf(row));
+        specifiers.add(specifierOf(row));
     }
     return specifiers;
 }
 
-Json cellOf(const TableView::VisibleRow& row) {
+JsonObject cellOf(const TableView::VisibleRow& row) {
     const UITableViewCell& cell = *row.cell;
-    Json entry;
-    entry["row"] = row.path.row;
-    entry["class"] = className(cell);
-    entry["style"] = static_cast<NSInteger>(cell.style());
-    entry["reuse"] = cell.reuseIdentifier();
-    entry["title"] = textOf(cell.textLabel().text());
-    entry["detail"] = textOf(cell.detailTextLabel().text());
-    entry["accessory"] = static_cast<NSInteger>(cell.accessoryType());
-    entry["textColor"] = textOf(cell.textLabel().textColor());
-    entry["tintColor"] = textOf(cell.tintColor());
-    return entry;
+    return JsonObject()
+        .set("row", row.path.row)
+        .set("class", className(cell))
+        .set("style", static_cast<NSInteger>(cell.style()))
+        .set("reuse", cell.reuseIdentifier())
+        .set("title", cell.textLabel().text())
+        .set("detail", cell.detailTextLabel().text())
+        .set("accessory", static_cast<NSInteger>(cell.accessoryType()))
+        .set("textColor", cell.textLabel().textColor())
+        .set("tintColor", cell.tintColor());
 }
 
-Json sectionsOf(const TableView& table) {
-    Json sections = Json::array();
-    for (const NSInteger rows : table.sectionLengths()) {
-        sections.push_back({{"rows", rows}, {"cells", Json::array()}});
-    }
+JsonList sectionsOf(const TableView& table) {
+    const auto& lengths = table.sectionLengths();
+    std::vector<JsonList> cells(lengths.size());
     for (const auto& row : table.visibleRows()) {
         if (row.cell) {
-            sections[static_cast<std::size_t>(row.path.section)]["cells"].push_back(cellOf(row));
+            cells[static_cast<std::size_t>(row.path.section)].add(cellOf(row));
         }
+    }
+    JsonList sections;
+    for (std::size_t section = 0; section < lengths.size(); ++section) {
+        sections.add(JsonObject().set("rows", lengths[section]).set("cells", cells[section]));
     }
     return sections;
 }
 
 } // namespace
 
-Json snapshotOf(const std::vector<std::shared_ptr<UIViewController>>& panes) {
-    Json stack = Json::array();
+JsonList snapshotOf(const std::vector<std::shared_ptr<UIViewController>>& panes) {
+    JsonList stack;
     for (const auto& pane : panes) {
-        Json entry;
-        entry["class"] = className(*pane);
-        entry["title"] = textOf(pane->title());
+        JsonObject entry;
+        entry.set("class", className(*pane)).set("title", pane->title());
         if (const auto* list = dynamic_cast<const PSListController*>(pane.get())) {
-            entry["specifiers"] = specifiersOf(*list);
+            entry.set("specifiers", specifiersOf(*list));
         } else if (const auto* table = dynamic_cast<const UITableViewController*>(pane.get())) {
-            entry["style"] = static_cast<NSInteger>(table->style());
-            entry["sections"] = sectionsOf(TableView::of(*table));
+            entry.set("style", static_cast<NSInteger>(table->style()))
+                .set("sections", sectionsOf(TableView::of(*table)));
         }
-        stack.push_back(std::move(entry));
+        stack.add(entry);
     }
     return stack;
 }

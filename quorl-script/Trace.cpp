@@ -1,6 +1,7 @@
 #include "quorl-script/Trace.h"
 
 #include <cmath>
+#include <utility>
 
 namespace quorl {
 
@@ -11,18 +12,18 @@ constexpr std::string_view lifeReceiver = "life";
 } // namespace
 
 void Trace::recordDealloc(const std::string& className) {
-    add(lifeReceiver, Json::array({"dealloc", className}));
+    add(lifeReceiver, JsonList().add("dealloc").add(className));
 }
 
-void Trace::add(std::string_view receiver, Json entry) {
+void Trace::add(std::string_view receiver, JsonList entry) {
     const std::lock_guard lock(mutex_);
     if (!isSelected(receiver)) {
         return;
     }
     if (std::this_thread::get_id() != mainThread_) {
-        entry.push_back("thread:other");
+        entry.add("thread:other");
     }
-    entries_.push_back(std::move(entry));
+    entries_.add(entry);
 }
 
 void Trace::select(std::optional<std::set<std::string, std::less<>>> receivers) {
@@ -30,9 +31,9 @@ void Trace::select(std::optional<std::set<std::string, std::less<>>> receivers) 
     receivers_ = std::move(receivers);
 }
 
-Json Trace::take() {
+JsonList Trace::take() {
     const std::lock_guard lock(mutex_);
-    return std::exchange(entries_, Json::array());
+    return std::exchange(entries_, {});
 }
 
 bool Trace::isSelected(std::string_view receiver) const {
@@ -47,14 +48,12 @@ void Trace::pause(int change) {
 Json numberOf(double value) {
     constexpr double limit = 18446744073709551616.0; // 2^64
     if (std::trunc(value) != value || std::abs(value) >= limit) {
-        return value;
+        return Json(value);
     }
     if (value >= 0) {
-        return static_cast<std::uint64_t>(value);
+        return Json(static_cast<std::uint64_t>(value));
     }
     return value >= -limit / 2 ? Json(static_cast<std::int64_t>(value)) : Json(value);
 }
-
-Json textOf(const std::optional<std::string>& text) { return text ? Json(*text) : Json(nullptr); }
 
 } // namespace quorl

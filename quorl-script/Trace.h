@@ -6,14 +6,10 @@
 #include <string>
 #include <string_view>
 #include <thread>
-#include <utility>
 
-#include <nlohmann/json.hpp>
+#include "quorl-script/output/Json.h"
 
 namespace quorl {
-
-/// What is written; its members keep their order.
-using Json = nlohmann::ordered_json;
 
 /// The calls that were made since the last reply. Any thread.
 class Trace {
@@ -21,12 +17,15 @@ class Trace {
     /// Notes a call: the receiver's class, the selector, the arguments. A call off the thread that
     /// made the trace gets a last element that says so.
     template <class... Arguments>
-    void record(std::string_view receiver, Arguments&&... arguments) {
-        add(receiver, Json::array({receiver, Json(std::forward<Arguments>(arguments))...}));
+    void record(std::string_view receiver, const Arguments&... arguments) {
+        JsonList entry;
+        entry.add(receiver);
+        (entry.add(arguments), ...);
+        add(receiver, std::move(entry));
     }
 
     /// The same for a call whose entry was put together elsewhere.
-    void add(std::string_view receiver, Json entry);
+    void add(std::string_view receiver, JsonList entry);
 
     /// Notes that an object was destroyed.
     void recordDealloc(const std::string& className);
@@ -36,7 +35,7 @@ class Trace {
     void select(std::optional<std::set<std::string, std::less<>>> receivers);
 
     /// The entries so far, which are then forgotten.
-    [[nodiscard]] Json take();
+    [[nodiscard]] JsonList take();
 
     /// Nothing is noted while one of these lives: what drawing asks for is the host's own doing.
     class Pause {
@@ -58,15 +57,12 @@ class Trace {
 
     const std::thread::id mainThread_ = std::this_thread::get_id();
     std::mutex mutex_;
-    Json entries_ = Json::array();
+    JsonList entries_;
     std::optional<std::set<std::string, std::less<>>> receivers_;
     int pauses_ = 0;
 };
 
 /// A number as JSON, without a fraction where it has none.
 [[nodiscard]] Json numberOf(double value);
-
-/// A text, or null.
-[[nodiscard]] Json textOf(const std::optional<std::string>& text);
 
 } // namespace quorl

@@ -46,21 +46,23 @@ Json valueOf(const MPMediaPropertyPredicate& predicate) {
     return value->boolValue();
 }
 
-Json listOf(const AnnouncingLibrary::Predicates& predicates) {
-    Json entries = Json::array();
+JsonList listOf(const AnnouncingLibrary::Predicates& predicates) {
+    JsonList entries;
     for (const auto& predicate : predicates) {
-        entries.push_back(Json::array({predicate->property(), valueOf(*predicate),
-                                       static_cast<NSInteger>(predicate->comparisonType())}));
+        entries.add(JsonList()
+                        .add(predicate->property())
+                        .add(valueOf(*predicate))
+                        .add(static_cast<NSInteger>(predicate->comparisonType())));
     }
     return entries;
 }
 
-Json pathOf(const NSIndexPath& path) { return Json::array({path.section, path.row}); }
+JsonList pathOf(const NSIndexPath& path) { return JsonList().add(path.section).add(path.row); }
 
-Json listOf(const std::vector<NSIndexPath>& paths) {
-    Json entries = Json::array();
+JsonList listOf(const std::vector<NSIndexPath>& paths) {
+    JsonList entries;
     for (const NSIndexPath& path : paths) {
-        entries.push_back(pathOf(path));
+        entries.add(pathOf(path));
     }
     return entries;
 }
@@ -115,7 +117,7 @@ void TraceRecorder::hostWillGiveGlance(const std::string& identifier) {
 
 void TraceRecorder::hostWillLookUpText(const std::string& key,
                                        const std::optional<std::string>& value) {
-    trace_->record("NSBundle", "localizedStringForKey:value:table:", key, textOf(value), nullptr);
+    trace_->record("NSBundle", "localizedStringForKey:value:table:", key, value, nullptr);
 }
 
 void TraceRecorder::hostWillFormatSize(float bytes) {
@@ -124,7 +126,7 @@ void TraceRecorder::hostWillFormatSize(float bytes) {
 
 void TraceRecorder::centerWillAddObserver(NSObject& observer, NSNotificationSelector selector,
                                           NSNotificationName name, const NSObject* sender) {
-    const std::string observerClass = className(observer);
+    const std::string& observerClass = className(observer);
     trace_->record(center, "addObserver:selector:name:object:", observerClass, selector.name(),
                    name, classNameOrNull(sender));
     if (observerClass == sideObjectClass) {
@@ -143,12 +145,11 @@ void TraceRecorder::centerWillPost(NSNotificationName name, const NSObject* send
 void TraceRecorder::specifierWillSetProperty(const PSSpecifier& specifier,
                                              const std::optional<std::string>& value,
                                              std::string_view key) {
-    trace_->record("PSSpecifier", "setProperty:forKey:", textOf(specifier.name()), textOf(value),
-                   key);
+    trace_->record("PSSpecifier", "setProperty:forKey:", specifier.name(), value, key);
 }
 
 void TraceRecorder::listWillReloadSpecifier(const PSSpecifier* specifier) {
-    trace_->record(list, "reloadSpecifier:", specifier ? textOf(specifier->name()) : Json(nullptr));
+    trace_->record(list, "reloadSpecifier:", specifier ? specifier->name() : std::nullopt);
 }
 
 void TraceRecorder::listWillReload() { trace_->record(list, "reload"); }
@@ -181,9 +182,10 @@ void TraceRecorder::tableWillDeselectRow(const NSIndexPath& path, bool animated)
 
 void TraceRecorder::dispatchWillBeCalled(std::string_view function,
                                          std::initializer_list<std::uint64_t> figures) {
-    Json entry = Json::array({"dispatch", function});
+    JsonList entry;
+    entry.add("dispatch").add(function);
     for (const std::uint64_t figure : figures) {
-        entry.push_back(figure == DISPATCH_TIME_FOREVER ? Json("forever") : Json(figure));
+        entry.add(figure == DISPATCH_TIME_FOREVER ? Json("forever") : Json(figure));
     }
     trace_->add("dispatch", std::move(entry));
 }

@@ -6,14 +6,6 @@
 class CountingPane : public QPSNotificationAppController {
   public:
     [[nodiscard]] std::string localizedPaneTitle() override { return "Counting"; }
-
-    [[nodiscard]] std::shared_ptr<NSBundle> bundle() override {
-        return NSBundle::bundleForClass(Class::ofObject(*this));
-    }
-
-    [[nodiscard]] std::optional<std::string> applicationBundleIdentifier() override {
-        return bundle()->bundleIdentifier();
-    }
 };
 
 QUORL_EXPORT_CLASS(CountingPane)

@@ -15,14 +15,6 @@ class ObservingPane : public QPSNotificationAppController, public DVSessionObser
 
     [[nodiscard]] std::string localizedPaneTitle() override { return "Observing"; }
 
-    [[nodiscard]] std::shared_ptr<NSBundle> bundle() override {
-        return NSBundle::bundleForClass(Class::ofObject(*this));
-    }
-
-    [[nodiscard]] std::optional<std::string> applicationBundleIdentifier() override {
-        return bundle()->bundleIdentifier();
-    }
-
     void sessionWillBegin(DVSession& /*session*/) override {
         NSNotificationCenter::defaultCenter().postNotificationName_object("SessionWillBegin",
                                                                           nullptr);
