@@ -1,13 +1,15 @@
-// Compares reading a large music folder with what `find` needs for the same files, in one run, so
-// that the figures do not depend on the machine: 50,000 songs in 2,500 directories, and 1,000
-// playlists with 100 entries each.
+// Compares the music folder with the bare minimum for the same files, in turn in one run, so that
+// the figures do not depend on the machine. The library has 50,000 songs in 2,000 directories, and
+// 1,000 playlists with 100 entries each.
 //
-//     quorl-media-bench [DIRECTORY]
+//     quorl-media-bench [--rounds N] [--growth SECONDS] [DIRECTORY]
 //
-// The library is made in DIRECTORY, which must not exist yet, or in a temporary one, and deleted.
+// The library is made in DIRECTORY and kept there for the next time, or in a temporary one and
+// deleted. Each figure is a line of JSON: medians, and the ratios of the quarter of the rounds that
+// did best and of the quarter that did worst. With `--growth` one more: how long a scan takes for
+// ever more songs, as far as that can be found out in so many seconds.
 
 #include <algorithm>
-#include <array>
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
@@ -15,62 +17,115 @@
 #include <fstream>
 #include <functional>
 #include <future>
+#include <semaphore>
 #include <stdexcept>
 #include <string>
+#include <vector>
 
+#include <poll.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
+#include "services/base/DirectoryWatch.h"
+#include "services/base/FileStatus.h"
 #include "services/media/MusicFolder.h"
 
 namespace {
 
 using Clock = std::chrono::steady_clock;
-using Milliseconds = std::chrono::duration<double, std::milli>;
+using Seconds = std::chrono::duration<double>;
 
 constexpr int artists = 500;
 constexpr int albumsEach = 4;
 constexpr int songsEach = 25;
-constexpr int playlists = 1000;
+constexpr int songsOfArtist = albumsEach * songsEach;
 constexpr int entriesEach = 100;
+constexpr auto quietTime = std::chrono::milliseconds(50);
 
-std::string albumPath(int artist, int album) {
-    return "Artist number " + std::to_string(artist) + "/Album number " + std::to_string(album);
+std::string albumPath(int album) {
+    return "Artist number " + std::to_string(album / albumsEach) + "/Album number " +
+           std::to_string(album % albumsEach);
 }
 
 std::string songName(int song) {
     return std::to_string(song + 10) + " - A song of usual length.mp3";
 }
 
-void makeLibrary(const std::filesystem::path& root) {
-    for (int artist = 0; artist < artists; ++artist) {
-        for (int album = 0; album < albumsEach; ++album) {
-            const std::filesystem::path directory = root / albumPath(artist, album);
-            std::filesystem::create_directories(directory);
-            for (int song = 0; song < songsEach; ++song) {
-                std::ofstream(directory / songName(song)) << song;
-            }
-        }
-    }
-    std::filesystem::create_directories(root / "Playlists");
-    constexpr int songs = artists * albumsEach * songsEach;
-    for (int playlist = 0; playlist < playlists; ++playlist) {
-        std::ofstream file(root / "Playlists" / ("Playlist " + std::to_string(playlist) + ".m3u8"));
-        file << "#EXTM3U\n";
-        for (int entry = 0; entry < entriesEach; ++entry) {
-            // Far apart, and over all playlists every song.
-            const int song = (playlist * entriesEach + entry) * 7919 % songs;
-            const int album = song / songsEach;
-            file << "#EXTINF:180,A song\n../" << albumPath(album / albumsEach, album % albumsEach)
-                 << '/' << songName(song % songsEach) << '\n';
-        }
+std::string songPath(int song) {
+    return albumPath(song / songsEach) + '/' + songName(song % songsEach);
+}
+
+void writePlaylist(const std::filesystem::path& root, int playlist, int songs) {
+    std::ofstream file(root / "Playlists" / ("Playlist " + std::to_string(playlist) + ".m3u8"));
+    file << "#EXTM3U\n";
+    for (int entry = 0; entry < entriesEach; ++entry) {
+        // Far apart, and over all playlists every song.
+        const auto song = (std::int64_t{playlist} * entriesEach + entry) * 7919 % songs;
+        file << "#EXTINF:180,A song\n../" << songPath(static_cast<int>(song)) << '\n';
     }
 }
 
-Milliseconds timeOf(const std::function<void()>& act) {
+/// Adds the artists from `first` to before `end`, and the playlists for as many songs twice.
+void growLibrary(const std::filesystem::path& root, int first, int end) {
+    std::filesystem::create_directories(root / "Playlists");
+    for (int album = first * albumsEach; album < end * albumsEach; ++album) {
+        std::filesystem::create_directories(root / albumPath(album));
+    }
+    for (int song = first * songsOfArtist; song < end * songsOfArtist; ++song) {
+        std::ofstream(root / songPath(song)) << song;
+    }
+    for (int playlist = 2 * first; playlist < 2 * end; ++playlist) {
+        writePlaylist(root, playlist, end * songsOfArtist);
+    }
+}
+
+Seconds timeOf(const std::function<void()>& act) {
     const Clock::time_point begin = Clock::now();
     act();
     return Clock::now() - begin;
 }
+
+/// That of this process, or of its children that have ended.
+Seconds processorTime(int whose = RUSAGE_SELF) {
+    rusage usage{};
+    getrusage(whose, &usage);
+    const auto seconds = [](const timeval& time) {
+        return Seconds(static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) / 1e6);
+    };
+    return seconds(usage.ru_utime) + seconds(usage.ru_stime);
+}
+
+double quantile(std::vector<double> values, double part) {
+    std::ranges::sort(values);
+    return values[static_cast<std::size_t>(part * static_cast<double>(values.size() - 1))];
+}
+
+/// Two ways to do the same, of which each round has one after the other: they meet the same state
+/// of the machine.
+class Comparison {
+  public:
+    void add(Seconds ours, Seconds theirs) {
+        ours_.push_back(ours.count());
+        theirs_.push_back(theirs.count());
+        ratios_.push_back(ours / theirs);
+    }
+
+    void print(const std::string& what, const std::string& beside) const {
+        std::printf(R"({"what":"%s","beside":"%s","ratio":%.3f,"spread":[%.3f,%.3f],"rounds":%zu,)"
+                    R"("seconds":[%.4f,%.4f]})"
+                    "\n",
+                    what.c_str(), beside.c_str(), quantile(ratios_, 0.5), quantile(ratios_, 0.25),
+                    quantile(ratios_, 0.75), ratios_.size(), quantile(ours_, 0.5),
+                    quantile(theirs_, 0.5));
+        std::fflush(stdout);
+    }
+
+  private:
+    std::vector<double> ours_;
+    std::vector<double> theirs_;
+    std::vector<double> ratios_;
+};
 
 void runFind(const std::filesystem::path& root) {
     const std::string command =
@@ -81,24 +136,92 @@ void runFind(const std::filesystem::path& root) {
     }
 }
 
-/// The median, in turn so that both meet the same state of the machine.
-void compareTimes(const std::filesystem::path& root) {
-    constexpr std::size_t rounds = 11;
-    std::array<Milliseconds, rounds> find{};
-    std::array<Milliseconds, rounds> scan{};
+void compareScan(const std::filesystem::path& root, int rounds) {
+    Comparison wall;
+    Comparison processor;
     std::shared_ptr<const quorl::media::Inventory> inventory;
     runFind(root);
-    for (std::size_t round = 0; round < rounds; ++round) {
-        find[round] = timeOf([&] { runFind(root); });
-        scan[round] = timeOf([&] { inventory = quorl::media::scan(root); });
+    for (int round = 0; round < rounds; ++round) {
+        const Seconds before = processorTime();
+        const Seconds beforeFind = processorTime(RUSAGE_CHILDREN);
+        const Seconds find = timeOf([&] { runFind(root); });
+        wall.add(timeOf([&] { inventory = quorl::media::scan(root); }), find);
+        processor.add(processorTime() - before, processorTime(RUSAGE_CHILDREN) - beforeFind);
     }
-    std::ranges::sort(find);
-    std::ranges::sort(scan);
-    std::printf("found:  %zu songs, %zu playlists and folders, %zu left out\n",
-                inventory->songs.size(), inventory->playlists.size(), inventory->leftOut.size());
-    std::printf("find:   %.1f ms\n", find[rounds / 2].count());
-    std::printf("scan:   %.1f ms, %.2f times find\n", scan[rounds / 2].count(),
-                scan[rounds / 2] / find[rounds / 2]);
+    if (inventory->songs.size() != std::size_t{artists} * songsOfArtist ||
+        !inventory->leftOut.empty()) {
+        throw std::runtime_error("The scan did not find what there is.");
+    }
+    const std::string what = "scan of 50,000 files and 1,000 playlists";
+    const std::string beside = "find -printf '%s %T@'";
+    wall.print(what, beside);
+    processor.print(what + ", processor time", beside);
+}
+
+/// A music folder whose news can be waited for.
+class Watched {
+  public:
+    explicit Watched(const std::filesystem::path& root)
+        : folder_(root, [this](const auto& /*inventory*/) { told_.release(); }) {
+        told_.acquire();
+    }
+
+    void waitUntilTold() { told_.acquire(); }
+
+    void rescan() {
+        std::promise<void> done;
+        folder_.rescan([&done] { done.set_value(); });
+        done.get_future().wait();
+    }
+
+  private:
+    std::counting_semaphore<> told_{0};
+    quorl::media::MusicFolder folder_;
+};
+
+/// Something that is done to a file.
+struct Change {
+    std::filesystem::path file;
+    std::string appended;
+
+    void make() const { std::ofstream(file, std::ios::app) << appended; }
+};
+
+/// The least that anybody can do who waits for quiet: a watch, the time, and a look at the file.
+void waitBarely(const Change& change) {
+    quorl::base::DirectoryWatch watch;
+    static_cast<void>(watch.add(change.file.parent_path()));
+    change.make();
+    pollfd descriptor{watch.descriptor(), POLLIN, 0};
+    while (poll(&descriptor, 1, static_cast<int>(quietTime.count())) > 0) {
+        static_cast<void>(watch.take());
+    }
+    quorl::base::FileStatus status{};
+    static_cast<void>(stat(change.file.c_str(), &status));
+}
+
+/// `changeOf` says what happens in a round.
+void compareChange(const std::filesystem::path& root, int rounds, const std::string& what,
+                   const std::function<Change(int)>& changeOf) {
+    Watched watched(root);
+    Comparison wall;
+    Comparison processor;
+    for (int round = 0; round < rounds; ++round) {
+        const Change change = changeOf(round);
+        const Seconds barely = timeOf([&] { waitBarely(change); });
+        watched.waitUntilTold(); // of that, too
+        const Seconds before = processorTime();
+        wall.add(timeOf([&] {
+                     change.make();
+                     watched.waitUntilTold();
+                 }),
+                 barely);
+        const Seconds after = processorTime();
+        static_cast<void>(quorl::media::scan(root));
+        processor.add(after - before, processorTime() - after);
+    }
+    wall.print(what + " until the pane is told", "a bare watch that waits as long for quiet");
+    processor.print(what + ", processor time", "that of a scan");
 }
 
 double residentMegabytes() {
@@ -111,44 +234,94 @@ double residentMegabytes() {
 
 /// What a watched folder keeps, on top of what the libraries need for an empty one.
 void measureMemory(const std::filesystem::path& root) {
-    const auto watch = [](const std::filesystem::path& folder) {
-        auto music = std::make_unique<quorl::media::MusicFolder>(folder, nullptr);
-        std::promise<void> done;
-        music->rescan([&done] { done.set_value(); });
-        done.get_future().wait();
-        return music;
-    };
-    const auto empty = watch(root / albumPath(0, 0));
+    const Watched empty(root / albumPath(0));
     const double before = residentMegabytes();
-    const auto music = watch(root);
-    std::printf("memory: %.1f MB resident for the watched folder\n", residentMegabytes() - before);
+    Watched music(root);
+    const double first = residentMegabytes() - before;
+    music.rescan();
+    std::printf(R"({"memory":"watched folder","megabytes":%.1f,"after a rescan":%.1f})"
+                "\n",
+                first, residentMegabytes() - before);
+}
 
-    const std::filesystem::path extra = root / "Playlists" / "Extra.m3u8";
-    const Milliseconds rescan = timeOf([&] {
-        std::promise<void> done;
-        music->rescan([&done] { done.set_value(); });
-        done.get_future().wait();
+/// Doubles the library from a small one on, as long as the next step is likely to end in time.
+void measureGrowth(const std::filesystem::path& root, double seconds) {
+    constexpr int most = 10'000;
+    const Clock::time_point begin = Clock::now();
+    const char* separator = "";
+    std::printf(R"({"growth":"scan","points":[)");
+    int there = 0;
+    for (int next = 60; next <= most; next *= 2) {
+        growLibrary(root, there, next);
+        there = next;
+        std::vector<double> times;
+        for (int round = 0; round < 3; ++round) {
+            times.push_back(timeOf([&] { static_cast<void>(quorl::media::scan(root)); }).count());
+        }
+        std::printf("%s[%d,%.4f]", separator, there * songsOfArtist, quantile(times, 0.5));
+        std::fflush(stdout);
+        separator = ",";
+        if (Seconds(Clock::now() - begin).count() * 3 > seconds) {
+            break;
+        }
+    }
+    std::printf("]}\n");
+}
+
+/// A directory that is gone when it is no longer needed.
+class Temporary {
+  public:
+    Temporary() : path_(std::filesystem::temp_directory_path() / "quorl-media-bench-XXXXXX") {
+        if (mkdtemp(path_.data()) == nullptr) {
+            throw std::runtime_error("No temporary directory can be made.");
+        }
+    }
+
+    ~Temporary() { std::filesystem::remove_all(path_); }
+
+    Temporary(const Temporary&) = delete;
+    Temporary& operator=(const Temporary&) = delete;
+
+    [[nodiscard]] const std::string& path() const { return path_; }
+
+  private:
+    std::string path_;
+};
+
+void measure(const std::filesystem::path& root, int rounds) {
+    if (!std::filesystem::exists(root / "Playlists")) {
+        growLibrary(root, 0, artists);
+    }
+    measureMemory(root);
+    compareScan(root, rounds);
+    compareChange(root, rounds, "a song that was written again", [&](int round) {
+        return Change{root / songPath(round * 7919), "."};
     });
-    std::printf("rescan: %.1f ms\n", rescan.count());
-    std::printf("memory: %.1f MB resident after a rescan\n", residentMegabytes() - before);
+    compareChange(root, rounds, "a playlist with a new entry", [&](int round) {
+        const auto name = "Playlist " + std::to_string(round) + ".m3u8";
+        return Change{root / "Playlists" / name, "../" + songPath(round) + '\n'};
+    });
 }
 
 } // namespace
 
 int main(int argc, char** argv) {
-    std::string root = std::filesystem::temp_directory_path() / "quorl-media-bench-XXXXXX";
-    if (argc > 1) {
-        root = argv[1];
-        if (!std::filesystem::create_directory(root)) {
-            std::fprintf(stderr, "%s is there already.\n", root.c_str());
-            return 1;
+    int rounds = 11;
+    double growth = 0;
+    std::string directory;
+    const std::vector<std::string> words(argv + 1, argv + argc);
+    for (std::size_t at = 0; at < words.size(); ++at) {
+        if (words[at] == "--rounds" && at + 1 < words.size()) {
+            rounds = std::stoi(words[++at]);
+        } else if (words[at] == "--growth" && at + 1 < words.size()) {
+            growth = std::stod(words[++at]);
+        } else {
+            directory = words[at];
         }
-    } else if (mkdtemp(root.data()) == nullptr) {
-        std::perror("mkdtemp");
-        return 1;
     }
-    makeLibrary(root);
-    measureMemory(root);
-    compareTimes(root);
-    std::filesystem::remove_all(root);
+    const Temporary temporary;
+    measure(directory.empty() ? temporary.path() + "/library" : directory, rounds);
+    if (growth > 0) {
+        measureGrowth(temporary.path() + "/growing", growth);
+    }
 }

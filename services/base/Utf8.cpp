@@ -36,6 +36,10 @@ void append(std::string& text, gunichar character) {
     text.append(bytes.data(), static_cast<std::size_t>(length));
 }
 
+bool isSpace(char character) {
+    return character == ' ' || (character >= '\t' && character <= '\r');
+}
+
 /// Whether a terminal that is shown the character may do something else than to draw it: move,
 /// clear, or show what follows in another order.
 bool isSteering(gunichar character) {
@@ -59,16 +63,17 @@ std::string normalised(std::string_view text, GNormalizeMode mode) {
 } // namespace
 
 std::string_view trimmed(std::string_view text) {
-    constexpr std::string_view space = " \t\r\n\f\v";
-    const std::size_t first = text.find_first_not_of(space);
-    if (first == std::string_view::npos) {
-        return text.substr(0, 0);
+    while (!text.empty() && isSpace(text.front())) {
+        text.remove_prefix(1);
     }
-    return text.substr(first, text.find_last_not_of(space) - first + 1);
+    while (!text.empty() && isSpace(text.back())) {
+        text.remove_suffix(1);
+    }
+    return text;
 }
 
 std::string toUtf8(std::string_view text) {
-    if (g_utf8_validate_len(text.data(), text.size(), nullptr)) {
+    if (isUtf8(text)) {
         return std::string(text);
     }
     std::string result;
@@ -111,9 +116,17 @@ std::string composed(std::string_view text) { return normalised(text, G_NORMALIZ
 
 std::string decomposed(std::string_view text) { return normalised(text, G_NORMALIZE_NFD); }
 
+bool isUtf8(std::string_view text) {
+    return isAscii(text) || g_utf8_validate_len(text.data(), text.size(), nullptr) != FALSE;
+}
+
 bool isAscii(std::string_view text) {
-    return std::ranges::all_of(text,
-                               [](char byte) { return static_cast<unsigned char>(byte) < 0x80; });
+    // To the end in any case, so that many bytes are looked at together.
+    unsigned char all = 0;
+    for (const char byte : text) {
+        all |= static_cast<unsigned char>(byte);
+    }
+    return all < 0x80;
 }
 
 } // namespace quorl::base

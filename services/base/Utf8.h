@@ -25,6 +25,9 @@ namespace quorl::base {
 [[nodiscard]] std::string composed(std::string_view text);
 [[nodiscard]] std::string decomposed(std::string_view text);
 
+/// What holds a NUL is valid only where all of it is ASCII.
+[[nodiscard]] bool isUtf8(std::string_view text);
+
 [[nodiscard]] bool isAscii(std::string_view text);
 
 } // namespace quorl::base

@@ -1,10 +1,12 @@
 #include "services/media/Collation.h"
 
+#include <bit>
 #include <cstdint>
 
 #include <glib.h>
 #include <unicode/locid.h>
 #include <unicode/stringpiece.h>
+#include <unicode/unistr.h>
 
 namespace quorl::media {
 
@@ -34,10 +36,24 @@ Collation::Collation() {
     collator_.reset(icu::Collator::createInstance(userLocale(), error));
 }
 
-int Collation::compare(std::string_view left, std::string_view right) const {
-    UErrorCode error = U_ZERO_ERROR;
-    return collator_ ? collator_->compareUTF8(piece(left), piece(right), error)
-                     : left.compare(right);
+std::string Collation::key(std::string_view text) const {
+    if (!collator_) {
+        return std::string(text);
+    }
+    const auto unicode = icu::UnicodeString::fromUTF8(piece(text));
+    std::string result(text.size() * 2 + 8, '\0');
+    const auto fill = [&] {
+        return static_cast<std::size_t>(
+            collator_->getSortKey(unicode, std::bit_cast<std::uint8_t*>(result.data()),
+                                  static_cast<std::int32_t>(result.size())));
+    };
+    const std::size_t size = fill();
+    const bool fits = size <= result.size();
+    result.resize(size);
+    if (!fits) {
+        fill();
+    }
+    return result;
 }
 
 } // namespace quorl::media

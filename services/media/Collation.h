@@ -1,6 +1,7 @@
 #pragma once
 
 #include <memory>
+#include <string>
 #include <string_view>
 
 #include <unicode/coll.h>
@@ -14,8 +15,8 @@ class Collation {
   public:
     Collation();
 
-    /// Below 0: `left` is before `right`; 0: they sort alike. Both in UTF-8.
-    [[nodiscard]] int compare(std::string_view left, std::string_view right) const;
+    /// Bytes that sort as `text`, which is in UTF-8, does for the user.
+    [[nodiscard]] std::string key(std::string_view text) const;
 
   private:
     std::unique_ptr<icu::Collator> collator_;

@@ -18,6 +18,7 @@
 #include "services/base/MallocText.h"
 #include "services/base/Paths.h"
 #include "services/base/Utf8.h"
+#include "services/media/PlaylistIdentity.h"
 
 namespace quorl::media {
 
@@ -79,39 +80,46 @@ class DirectoryReader {
   public:
     DirectoryReader(Directory& directory, const std::string& path, const std::string& root,
                     ContentKinds& kinds)
-        : directory_(directory),
-          path_(path),
-          root_(root),
-          kinds_(kinds),
-          previousPlaylists_(std::exchange(directory.playlists, {})) {}
+        : directory_(directory), path_(path), root_(root), kinds_(kinds) {}
 
-    Dropped read() {
-        clear();
-        directory_.unreadable = !readEntries();
+    Reading read() {
+        Reading reading;
+        const bool wasUnreadable = std::exchange(directory_.unreadable, !readEntries());
         if (directory_.unreadable) {
             clear();
         }
         order();
-        return replaceChildren();
+        reading.otherPlaylists = directory_.unreadable != wasUnreadable || !playlists_.empty() ||
+                                 !directory_.playlists.empty();
+        replacePlaylists();
+        const bool otherSongs = replaceSongs();
+        reading.otherNames = replaceChildren(reading.dropped) || otherSongs;
+        return reading;
     }
 
   private:
+    struct ListedSong {
+        /// Index in `names_`.
+        std::uint32_t name;
+        Kind kind;
+    };
+
     struct ListedChild {
         std::string name;
         ino_t inode;
     };
 
     void clear() {
-        directory_.songNames = {};
-        directory_.songs.clear();
-        directory_.playlists.clear();
-        directory_.hasLinks = false;
-        listed_.clear();
+        names_ = {};
+        songs_.clear();
+        playlists_.clear();
+        children_.clear();
     }
 
     /// False: the directory cannot be read. One that is gone is no failure, for its parent tells
     /// that.
     bool readEntries() {
+        directory_.hasLinks = false;
         constexpr int flags = O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC;
         base::FileDescriptor opened(open(path_.c_str(), flags));
         if (!opened) {
@@ -139,7 +147,7 @@ class DirectoryReader {
     void addEntry(const dirent& entry) {
         switch (typeOf(entry)) {
         case DT_DIR:
-            listed_.push_back({entry.d_name, entry.d_ino});
+            children_.push_back({entry.d_name, entry.d_ino});
             break;
         case DT_REG:
             addRegularFile(entry.d_name);
@@ -171,12 +179,12 @@ class DirectoryReader {
 
     void addRegularFile(const char* name) {
         if (const auto format = playlistFormat(name)) {
-            addPlaylist(name, *format);
+            PlaylistFile playlist;
+            playlist.name = name;
+            playlist.format = *format;
+            playlists_.push_back(std::move(playlist));
         } else if (const auto kind = kinds_.kindOf(descriptor_, name)) {
-            SongFile song;
-            song.name = directory_.songNames.add(name);
-            song.kind = *kind;
-            directory_.songs.push_back(song);
+            songs_.push_back({names_.add(name), *kind});
         }
     }
 
@@ -210,60 +218,76 @@ class DirectoryReader {
     }
 
     void addFailedPlaylist(const char* name, Reason reason) {
-        directory_.playlists.push_back({name, {}, false, reason});
-    }
-
-    void addPlaylist(const char* name, Format format) {
-
-        base::FileStatus status{};
-        if (PlaylistFile* const previous = previousPlaylist(name);
-            previous != nullptr && previous->isQuiet &&
-            fstatat(descriptor_, name, &status, 0) == 0 && stateOf(status) == previous->state) {
-            directory_.playlists.push_back(
-                {name, previous->state, true, std::move(previous->content)});
-            return;
-        }
-        // Not blocking, for what was a file a moment ago may be a pipe by now.
-        const base::FileDescriptor file(
-            openat(descriptor_, name, O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
-        if (!file || fstat(file.get(), &status) != 0) {
-            addFailedPlaylist(name, Reason::PlaylistUnreadable);
-            return;
-        }
-        PlaylistFile playlist{name, stateOf(status), false, Reason::PlaylistUnreadable};
-        const bool wasQuietBefore = isQuiet(playlist.state);
-        playlist.content = readPlaylist(file.get(), status, format);
-        playlist.isQuiet =
-            wasQuietBefore && std::holds_alternative<PlaylistContent>(playlist.content);
-        directory_.playlists.push_back(std::move(playlist));
-    }
-
-    /// What is known of the file from the last reading; null: nothing.
-    PlaylistFile* previousPlaylist(std::string_view name) {
-        const auto found =
-            std::ranges::lower_bound(previousPlaylists_, name, {}, &PlaylistFile::name);
-        return found != previousPlaylists_.end() && found->name == name ? &*found : nullptr;
+        PlaylistFile playlist;
+        playlist.name = name;
+        playlist.format = *playlistFormat(name);
+        playlist.content = reason;
+        playlist.dirty = false;
+        playlists_.push_back(std::move(playlist));
     }
 
     void order() {
-        const TextList& names = directory_.songNames;
-        std::ranges::sort(directory_.songs, {},
-                          [&names](const SongFile& song) { return names[song.name]; });
-        std::ranges::sort(directory_.playlists, {}, &PlaylistFile::name);
-        std::ranges::sort(listed_, {}, &ListedChild::name);
-        directory_.songNames.shrink();
-        directory_.songs.shrink_to_fit();
+        std::ranges::sort(songs_, {}, [this](const ListedSong& song) { return names_[song.name]; });
+        std::ranges::sort(playlists_, {}, &PlaylistFile::name);
+        std::ranges::sort(children_, {}, &ListedChild::name);
+    }
+
+    /// What was read from the files before is kept until they are looked at.
+    void replacePlaylists() {
+        auto previous = directory_.playlists.begin();
+        const auto end = directory_.playlists.end();
+        for (PlaylistFile& playlist : playlists_) {
+            previous = std::find_if(previous, end, [&playlist](const PlaylistFile& each) {
+                return each.name >= playlist.name;
+            });
+            if (playlist.dirty && previous != end && previous->name == playlist.name) {
+                playlist = std::move(*previous++);
+                playlist.dirty = true;
+            }
+        }
+        directory_.playlists = std::move(playlists_);
         directory_.playlists.shrink_to_fit();
     }
 
-    /// Puts the listed children in place; gives those that are gone or replaced.
-    Dropped replaceChildren() {
-        Dropped dropped;
+    /// False: they are the same songs in the same places, which are to be asked again.
+    bool replaceSongs() {
+        if (areSongsAsBefore()) {
+            for (SongFile& song : directory_.songs) {
+                song.examined = false;
+            }
+            return false;
+        }
+        TextList names;
+        std::vector<SongFile> songs(songs_.size());
+        for (std::size_t index = 0; index < songs.size(); ++index) {
+            names.add(names_[songs_[index].name]);
+            songs[index].kind = songs_[index].kind;
+        }
+        directory_.songs = std::move(songs);
+        directory_.songNames = NameTable(std::move(names));
+        directory_.reshaped = true;
+        return true;
+    }
+
+    [[nodiscard]] bool areSongsAsBefore() const {
+        std::uint32_t index = 0;
+        return songs_.size() == directory_.songs.size() &&
+               std::ranges::all_of(songs_, [&](const ListedSong& song) {
+                   const std::uint32_t at = index++;
+                   return song.kind == directory_.songs[at].kind &&
+                          names_[song.name] == directory_.songNames[at];
+               });
+    }
+
+    /// Puts the listed children in place, and those that are gone or replaced into `dropped`.
+    /// False: they are all the same.
+    bool replaceChildren(Dropped& dropped) {
+        bool anyNew = false;
         std::vector<std::unique_ptr<Directory>> children;
-        children.reserve(listed_.size());
+        children.reserve(children_.size());
         auto previous = directory_.children.begin();
         const auto end = directory_.children.end();
-        for (ListedChild& child : listed_) {
+        for (ListedChild& child : children_) {
             while (previous != end && (*previous)->name < child.name) {
                 dropped.push_back(std::move(*previous++));
             }
@@ -275,11 +299,20 @@ class DirectoryReader {
                 children.back()->parent = &directory_;
                 children.back()->name = std::move(child.name);
                 children.back()->inode = child.inode;
+                anyNew = true;
             }
         }
         std::move(previous, end, std::back_inserter(dropped));
         directory_.children = std::move(children);
-        return dropped;
+        const bool areOthers = anyNew || !dropped.empty();
+        if (areOthers) {
+            TextList names;
+            for (const auto& child : directory_.children) {
+                names.add(child->name);
+            }
+            directory_.childNames = NameTable(std::move(names));
+        }
+        return areOthers;
     }
 
     Directory& directory_;
@@ -287,9 +320,39 @@ class DirectoryReader {
     const std::string& root_;
     ContentKinds& kinds_;
     int descriptor_ = -1;
-    std::vector<PlaylistFile> previousPlaylists_;
-    std::vector<ListedChild> listed_;
+    TextList names_;
+    std::vector<ListedSong> songs_;
+    std::vector<PlaylistFile> playlists_;
+    std::vector<ListedChild> children_;
 };
+
+/// Looks at the file in the open `directory`, and reads it where that is not what was read before.
+void refresh(PlaylistFile& playlist, int directory) {
+    playlist.dirty = false;
+    base::FileStatus status{};
+    if (playlist.isQuiet && fstatat(directory, playlist.name.c_str(), &status, 0) == 0 &&
+        stateOf(status) == playlist.state) {
+        return;
+    }
+    playlist.isQuiet = false;
+    playlist.content = Reason::PlaylistUnreadable;
+    playlist.title.reset();
+    playlist.meaning = {};
+    // Not blocking, for what was a file a moment ago may be a pipe by now.
+    const base::FileDescriptor file(
+        openat(directory, playlist.name.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
+    if (!file || fstat(file.get(), &status) != 0) {
+        return;
+    }
+    playlist.state = stateOf(status);
+    const bool wasQuietBefore = isQuiet(playlist.state);
+    playlist.content = readPlaylist(file.get(), status, playlist.format);
+    playlist.isQuiet = wasQuietBefore && std::holds_alternative<PlaylistContent>(playlist.content);
+}
+
+base::FileDescriptor openToLookAt(const std::string& path) {
+    return base::FileDescriptor(open(path.c_str(), O_PATH | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
+}
 
 void examine(int directory, const char* name, SongFile& song) {
     base::FileStatus status{};
@@ -308,15 +371,13 @@ void examine(int directory, const char* name, SongFile& song) {
 } // namespace
 
 Directory* Directory::child(std::string_view childName) const {
-    const auto nameOf = [](const auto& candidate) -> std::string_view { return candidate->name; };
-    const auto found = std::ranges::lower_bound(children, childName, {}, nameOf);
-    return found != children.end() && (*found)->name == childName ? found->get() : nullptr;
+    const auto found = childNames.find(childName);
+    return found ? children[*found].get() : nullptr;
 }
 
 SongFile* Directory::song(std::string_view songName) {
-    const auto nameOf = [this](const SongFile& candidate) { return songNames[candidate.name]; };
-    const auto found = std::ranges::lower_bound(songs, songName, {}, nameOf);
-    return found != songs.end() && nameOf(*found) == songName ? &*found : nullptr;
+    const auto found = songNames.find(songName);
+    return found ? &songs[*found] : nullptr;
 }
 
 std::string Directory::path() const {
@@ -331,22 +392,36 @@ std::string Directory::pathOf(std::string_view entry) const {
     return result.append(entry);
 }
 
-Dropped readDirectory(Directory& directory, const std::string& path, const std::string& root,
+Reading readDirectory(Directory& directory, const std::string& path, const std::string& root,
                       ContentKinds& kinds) {
     return DirectoryReader(directory, path, root, kinds).read();
 }
 
+void readPlaylists(Directory& directory, const std::string& path, std::size_t begin,
+                   std::size_t end) {
+    const base::FileDescriptor opened = openToLookAt(path);
+    for (std::size_t index = begin; index < end; ++index) {
+        if (directory.playlists[index].dirty) {
+            refresh(directory.playlists[index], opened.get());
+        }
+    }
+}
+
 void examineListedSongs(Directory& directory, const std::string& path) {
     const auto isWanted = [](const SongFile& song) { return song.listed && !song.examined; };
-    auto song = std::ranges::find_if(directory.songs, isWanted);
-    if (song == directory.songs.end()) {
+    if (std::ranges::none_of(directory.songs, isWanted)) {
         return;
     }
-    const base::FileDescriptor opened(
-        open(path.c_str(), O_PATH | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
-    for (; song != directory.songs.end();
-         song = std::find_if(++song, directory.songs.end(), isWanted)) {
-        examine(opened.get(), std::string(directory.songNames[song->name]).c_str(), *song);
+    const base::FileDescriptor opened = openToLookAt(path);
+    const Fingerprint common = fingerprintOf(directory.path());
+    std::string name;
+    for (std::uint32_t index = 0; index < directory.songs.size(); ++index) {
+        SongFile& song = directory.songs[index];
+        if (isWanted(song)) {
+            name = directory.songNames[index];
+            examine(opened.get(), name.c_str(), song);
+            song.fingerprint = fingerprint(common, {{}, name, song.size, song.modified, song.kind});
+        }
     }
 }
 

@@ -35,6 +35,27 @@ Directory* follow(Directory& directory, std::string_view& path) {
     return at;
 }
 
+/// Whether `entry` can be read in one way only, as the path that is written there.
+bool isPlainPath(std::string_view entry) {
+    // To the end in any case, so that many bytes are looked at together.
+    unsigned special = 0;
+    for (const char character : entry) {
+        special |=
+            static_cast<unsigned>(character == '\0') | static_cast<unsigned>(character == '%') |
+            static_cast<unsigned>(character == ':') | static_cast<unsigned>(character == '\\');
+    }
+    return special == 0 && !entry.empty();
+}
+
+/// Whether the way may lead through a directory in which its end is not.
+bool hasDetour(std::string_view path) {
+    constexpr std::string_view up = "../";
+    while (path.starts_with(up)) {
+        path.remove_prefix(up.size());
+    }
+    return path.find("/..") != std::string_view::npos;
+}
+
 bool isHidden(std::string_view path) {
     return path.starts_with('.') || path.find("/.") != std::string_view::npos;
 }
@@ -49,15 +70,21 @@ bool isMissing(const Resolved& result) {
 EntryResolver::EntryResolver(const FolderTree& tree)
     : tree_(tree), givenRoot_(tree.root() == "/" ? std::string() : tree.root().string()) {}
 
-Resolved EntryResolver::resolve(Directory& directory, std::string_view entry, Format format) const {
+Resolution EntryResolver::resolve(Directory& directory, std::string_view entry,
+                                  Format format) const {
+    if (isPlainPath(entry)) {
+        if (const auto found = find(directory, entry)) {
+            return *found;
+        }
+    }
     const auto read = readEntry(entry, format);
     if (const Reason* const reason = std::get_if<Reason>(&read)) {
-        return *reason;
+        return {*reason, Basis::Text};
     }
     const auto& readings = std::get<EntryReadings>(read);
     for (const std::string& path : readings) {
-        if (const auto found = locateInAnyNormalisation(directory, path)) {
-            return *found;
+        if (const auto found = find(directory, path)) {
+            return {found->meaning, &path == &readings.front() ? found->basis : Basis::Names};
         }
     }
     Resolved result = Reason::Missing;
@@ -66,19 +93,24 @@ Resolved EntryResolver::resolve(Directory& directory, std::string_view entry, Fo
             result = examine(directory, path);
         }
     }
-    return result;
+    return {result, Basis::Files};
 }
 
-std::optional<FoundSong> EntryResolver::locateInAnyNormalisation(Directory& directory,
-                                                                 const std::string& path) const {
-    auto found = locate(directory, path);
-    if (!found && !base::isAscii(path)) {
-        found = locate(directory, base::composed(path));
-        if (!found) {
-            found = locate(directory, base::decomposed(path));
-        }
+std::optional<Resolution> EntryResolver::find(Directory& directory, std::string_view path) const {
+    if (const auto found = locate(directory, path)) {
+        return Resolution{*found, hasDetour(path) ? Basis::Names : Basis::Song};
     }
-    return found;
+    const auto found = locateInOtherNormalisation(directory, path);
+    return found ? std::optional(Resolution{*found, Basis::Names}) : std::nullopt;
+}
+
+std::optional<FoundSong> EntryResolver::locateInOtherNormalisation(Directory& directory,
+                                                                   std::string_view path) const {
+    if (base::isAscii(path)) {
+        return std::nullopt;
+    }
+    const auto found = locate(directory, base::composed(path));
+    return found ? found : locate(directory, base::decomposed(path));
 }
 
 std::optional<FoundSong> EntryResolver::locate(Directory& directory, std::string_view path) const {

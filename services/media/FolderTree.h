@@ -19,6 +19,16 @@ namespace quorl::media {
 /// unmounted.
 class FolderTree {
   public:
+    /// What became known since somebody took it in.
+    struct News {
+        /// Directories that were read or noted, each once; some of them may be gone.
+        std::vector<Directory*> touched;
+        /// Songs or directories came or went.
+        bool otherNames = false;
+        /// The playlists, or which directories can be read, may be others.
+        bool otherPlaylists = false;
+    };
+
     /// `root` is absolute. `watch` is told of every directory and outlives the tree; null: nobody
     /// watches. Reads nothing yet.
     FolderTree(std::filesystem::path root, base::DirectoryWatch* watch);
@@ -35,8 +45,16 @@ class FolderTree {
     /// Something was marked, or nothing was read yet.
     [[nodiscard]] bool isDirty() const { return dirty_; }
 
-    /// Reads what is dirty. False: stopped before the end; call again to go on.
+    /// Reads what is dirty, on all cores. False: stopped before the end; call again to go on.
     [[nodiscard]] bool refresh(const std::stop_token& stop);
+
+    [[nodiscard]] const News& news() const { return news_; }
+
+    /// Counts `directory` among those that were touched.
+    void note(Directory& directory);
+
+    /// The news were taken in. Until then a directory that is gone is still there.
+    void forgetNews();
 
     /// The music folder as it was given.
     [[nodiscard]] const std::filesystem::path& root() const { return root_; }
@@ -57,19 +75,27 @@ class FolderTree {
     [[nodiscard]] std::string absolute(const std::string& path) const;
 
   private:
+    using Directories = std::vector<Directory*>;
+
     void findTop();
-    void read(Directory& directory);
+    void read(const Directories& visited, const std::stop_token& stop);
+    void readPlaylists(const std::stop_token& stop) const;
+    void settle(const Directories& visited);
+    void drop(std::unique_ptr<Directory> top);
     void startWatching(Directory& directory, const std::string& path);
     void stopWatching(const Directory& directory);
-    void stopWatchingAll(Directory& top);
 
     const std::filesystem::path root_;
     base::DirectoryWatch* const watch_;
     std::string canonicalRoot_;
     std::unique_ptr<Directory> top_;
     std::unordered_map<int, Directory*> watched_;
-    ContentKinds kinds_;
+    /// Of each worker its own.
+    std::vector<ContentKinds> kinds_;
     bool dirty_ = true;
+    News news_;
+    /// That are gone, until the news are forgotten.
+    Dropped dropped_;
 };
 
 } // namespace quorl::media

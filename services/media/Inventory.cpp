@@ -90,10 +90,11 @@ std::string Inventory::unwatchedNotice() const {
         return {};
     }
     return language::translatedCount(
-        "Changes in {count} directory of the music folder go unnoticed, because the system watches "
-        "no more directories. Raise fs.inotify.max_user_watches, or rescan after a change.",
+        "Changes in {count} directory of the music folder go unnoticed, because the system cannot "
+        "watch more directories. Raise fs.inotify.max_user_watches, or rescan after a change.",
         "Changes in {count} directories of the music folder go unnoticed, because the system "
-        "watches no more directories. Raise fs.inotify.max_user_watches, or rescan after a change.",
+        "cannot watch more directories. Raise fs.inotify.max_user_watches, or rescan after a "
+        "change.",
         unwatchedDirectories);
 }
 

@@ -110,7 +110,7 @@ struct Inventory {
     bool hasAudio = false;
     bool hasMusicVideo = false;
     /// Directories whose changes go unnoticed until `MusicFolder::rescan`, because the system
-    /// watches no more directories. Always 0 for an inventory that nobody keeps up to date.
+    /// cannot watch more directories. Always 0 for an inventory that nobody keeps up to date.
     std::size_t unwatchedDirectories = 0;
 
     /// The playlist of this id; null: there is none.

@@ -1,15 +1,17 @@
 #include "services/media/InventoryBuilder.h"
 
 #include <algorithm>
+#include <atomic>
+#include <tuple>
 #include <unordered_map>
 #include <unordered_set>
 #include <utility>
 #include <variant>
 
 #include "services/base/Utf8.h"
-#include "services/media/Collation.h"
 #include "services/media/EntryResolver.h"
 #include "services/media/PlaylistIdentity.h"
+#include "services/media/Workers.h"
 
 namespace quorl::media {
 
@@ -18,229 +20,343 @@ namespace {
 /// A longer name is none, but somebody's attempt to choke whoever shows it.
 constexpr std::size_t longestName = 4096;
 
-/// A playlist on its way into the inventory.
-struct Draft {
-    Playlist playlist;
-    /// Where the file lies; for a folder, the folder itself.
-    Directory* directory;
-    /// Null for a folder.
-    const PlaylistContent* content;
-    Format format;
-    /// What the entries of the file mean, in their order.
-    std::vector<Resolved> resolved;
-};
-
 std::string fileNameWithoutExtension(std::string_view fileName) {
     const std::size_t dot = fileName.rfind('.');
     return base::validUtf8(dot == 0 ? fileName : fileName.substr(0, dot));
 }
 
-class InventoryBuilder {
-  public:
-    InventoryBuilder(FolderTree& tree, const std::stop_token& stop) : tree_(tree), stop_(stop) {}
+const PlaylistContent& contentOf(const PlaylistFile& file) {
+    return std::get<PlaylistContent>(file.content);
+}
 
-    std::shared_ptr<const Inventory> build() {
-        snapshot_->root = tree_.root();
-        snapshot_->rootFound = tree_.top() != nullptr;
-        snapshot_->unwatchedDirectories = tree_.unwatchedDirectories();
-        if (tree_.top() != nullptr) {
-            collect();
-            order();
-            leaveOutDoubles();
-            resolveEntries();
-            examineSongs();
-            listSongs();
-            fillFolders();
-            finish();
+std::string nameOf(const PlaylistFile& file) {
+    const std::string& name = contentOf(file).name;
+    return name.empty() || name.size() > longestName ? fileNameWithoutExtension(file.name) : name;
+}
+
+Title makeTitle(std::string path, std::string name, bool folder, const Collation& collation) {
+    const std::uint64_t id = playlistId(path, folder);
+    std::string order = collation.key(name);
+    return {id, std::move(path), std::move(name), std::move(order)};
+}
+
+/// Several workers may find the same song.
+void markListed(SongFile& song) {
+    std::atomic_ref(song.listed).store(true, std::memory_order_relaxed);
+}
+
+/// Finds out what the entries of one playlist file mean.
+class MeaningFinder {
+  public:
+    MeaningFinder(const EntryResolver& resolver, Directory& directory, PlaylistFile& file)
+        : resolver_(resolver),
+          directory_(directory),
+          format_(file.format),
+          entries_(contentOf(file).entries),
+          meaning_(file.meaning) {}
+
+    void findAll(const std::stop_token& stop) {
+        meaning_ = {};
+        meaning_.entries.reserve(entries_.size());
+        for (std::uint32_t index = 0; index < entries_.size(); ++index) {
+            if (stop.stop_requested()) {
+                return;
+            }
+            const Resolution resolution = resolver_.resolve(directory_, entries_[index], format_);
+            meaning_.entries.push_back(noted(resolution.meaning));
+            meaning_.hangsOnNames = meaning_.hangsOnNames || resolution.basis == Basis::Names;
+            if (resolution.basis == Basis::Files) {
+                meaning_.asked.push_back(index);
+            }
         }
-        return stop_.stop_requested() ? nullptr : std::move(snapshot_);
+        meaning_.holders.shrink_to_fit();
+        meaning_.known = true;
+    }
+
+    void askAgain(const std::stop_token& stop) {
+        const auto isAsBefore = [&](std::uint32_t index) {
+            return stop.stop_requested() ||
+                   isSame(meaning_.entries[index],
+                          resolver_.resolve(directory_, entries_[index], format_).meaning);
+        };
+        if (!std::ranges::all_of(meaning_.asked, isAsBefore)) {
+            findAll(stop);
+        }
     }
 
   private:
-    void collect() {
-        for (Directory* const directory : tree_.directories()) {
-            if (directory->unreadable) {
-                leaveOut(directory->path(), {}, Reason::DirectoryUnreadable);
-            }
-            for (SongFile& song : directory->songs) {
-                song.song = SongFile::notListed;
-                song.listed = false;
-                (song.kind == Kind::Audio ? snapshot_->hasAudio : snapshot_->hasMusicVideo) = true;
-            }
-            collectPlaylists(*directory);
+    [[nodiscard]] bool isSame(const Meaning::Entry& entry, const Resolved& resolved) const {
+        const auto* const before = std::get_if<Meaning::Found>(&entry);
+        const auto* const now = std::get_if<FoundSong>(&resolved);
+        if (before == nullptr || now == nullptr) {
+            return before == nullptr && now == nullptr &&
+                   std::get<Reason>(entry) == std::get<Reason>(resolved);
+        }
+        Directory* const holder = meaning_.holders[before->holder];
+        return holder == now->directory && &holder->songs[before->song] == now->file;
+    }
+
+    Meaning::Entry noted(const Resolved& resolved) {
+        const auto* const found = std::get_if<FoundSong>(&resolved);
+        if (found == nullptr) {
+            return std::get<Reason>(resolved);
+        }
+        markListed(*found->file);
+        if (meaning_.holders.empty() || meaning_.holders.back() != found->directory) {
+            meaning_.holders.push_back(found->directory);
+        }
+        return Meaning::Found{
+            static_cast<std::uint32_t>(meaning_.holders.size() - 1),
+            static_cast<std::uint32_t>(found->file - found->directory->songs.data())};
+    }
+
+    const EntryResolver& resolver_;
+    Directory& directory_;
+    const Format format_;
+    const TextList& entries_;
+    Meaning& meaning_;
+};
+
+/// Puts the songs of playlists into an inventory.
+class SongLister {
+  public:
+    explicit SongLister(Inventory& inventory) : inventory_(inventory) {}
+
+    /// The songs must not be listed by another one as long as this is there.
+    ~SongLister() {
+        for (SongFile* const file : files_) {
+            file->song = SongFile::notListed;
         }
     }
 
-    void collectPlaylists(Directory& directory) {
-        bool any = false;
-        for (const PlaylistFile& file : directory.playlists) {
-            std::string path = directory.pathOf(file.name);
-            if (const Reason* const reason = std::get_if<Reason>(&file.content)) {
-                leaveOut(std::move(path), {}, *reason);
-                continue;
+    SongLister(const SongLister&) = delete;
+    SongLister& operator=(const SongLister&) = delete;
+
+    void list(Playlist& playlist, const PlaylistFile& file) {
+        const PlaylistContent& content = contentOf(file);
+        const Meaning& meaning = file.meaning;
+        playlist.songs.reserve(meaning.entries.size());
+        for (std::uint32_t index = 0; index < meaning.entries.size(); ++index) {
+            const Meaning::Entry& entry = meaning.entries[index];
+            const auto* const found = std::get_if<Meaning::Found>(&entry);
+            const auto obstacle = found == nullptr
+                                      ? std::optional(std::get<Reason>(entry))
+                                      : add(*meaning.holders[found->holder], found->song, playlist);
+            if (obstacle) {
+                leaveOut(playlist.path, std::string(content.entries[index]), *obstacle);
             }
-            const auto& content = std::get<PlaylistContent>(file.content);
-            Playlist playlist;
-            playlist.name = content.name.empty() || content.name.size() > longestName
-                                ? fileNameWithoutExtension(file.name)
-                                : content.name;
-            playlist.path = std::move(path);
-            playlist.generated = content.generated;
-            drafts_.push_back(
-                {std::move(playlist), &directory, &content, *playlistFormat(file.name), {}});
-            any = true;
         }
-        if (any && directory.parent != nullptr) {
-            Playlist folder;
-            folder.name = base::validUtf8(directory.name);
-            folder.path = directory.path();
-            folder.folder = true;
-            drafts_.push_back({std::move(folder), &directory, nullptr, Format::M3u, {}});
+        playlist.songs.shrink_to_fit();
+        playlist.revision = revisionOf(playlist.songs);
+        if (content.truncated) {
+            leaveOut(playlist.path, {}, Reason::TooManyEntries);
         }
     }
 
-    void order() {
-        const Collation collation;
-        std::ranges::sort(drafts_, [&collation](const Draft& left, const Draft& right) {
-            const int order = collation.compare(left.playlist.name, right.playlist.name);
-            return order != 0 ? order < 0 : left.playlist.path < right.playlist.path;
-        });
-    }
-
-    void leaveOutDoubles() {
-        std::unordered_set<std::uint64_t> ids;
-        std::erase_if(drafts_, [&](Draft& draft) {
-            draft.playlist.id = playlistId(draft.playlist.path, draft.playlist.folder);
-            if (ids.insert(draft.playlist.id).second) {
-                return false;
-            }
-            leaveOut(draft.playlist.path, {}, Reason::SameAsAnother);
-            return true;
-        });
-    }
-
-    /// Finds what every entry means before any file is asked for its size, so that those of one
-    /// directory can be asked together.
-    void resolveEntries() {
-        const EntryResolver resolver(tree_);
-        for (Draft& draft : drafts_) {
-            const std::uint32_t count =
-                draft.content == nullptr ? 0 : draft.content->entries.size();
-            draft.resolved.reserve(count);
-            for (std::uint32_t index = 0; index < count && !stop_.stop_requested(); ++index) {
-                draft.resolved.push_back(resolver.resolve(
-                    *draft.directory, draft.content->entries[index], draft.format));
-                if (auto* const found = std::get_if<FoundSong>(&draft.resolved.back())) {
-                    found->file->listed = true;
-                }
-            }
+    [[nodiscard]] std::uint64_t revisionOf(const std::vector<SongIndex>& songs) const {
+        Fingerprint revision;
+        for (const SongIndex song : songs) {
+            revision.add(files_[song]->fingerprint);
         }
+        return revision.value();
     }
 
-    void examineSongs() {
-        for (Directory* const directory : tree_.directories()) {
-            if (!stop_.stop_requested()) {
-                examineListedSongs(*directory, tree_.absolute(directory->path()));
-            }
+  private:
+    /// Gives back why it cannot be listed; null: it was.
+    std::optional<Reason> add(Directory& directory, std::uint32_t song, Playlist& playlist) {
+        SongFile& file = directory.songs[song];
+        if (file.obstacle) {
+            return file.obstacle;
         }
-    }
-
-    void listSongs() {
-        for (Draft& draft : drafts_) {
-            Playlist& playlist = draft.playlist;
-            for (std::uint32_t index = 0; index < draft.resolved.size(); ++index) {
-                if (const auto song = songOf(draft.resolved[index])) {
-                    playlist.songs.push_back(*song);
-                } else {
-                    leaveOut(playlist.path, std::string(draft.content->entries[index]),
-                             reasonOf(draft.resolved[index]));
-                }
-            }
-            draft.resolved = {};
-            if (draft.content != nullptr && draft.content->truncated) {
-                leaveOut(playlist.path, {}, Reason::TooManyEntries);
-            }
-        }
-    }
-
-    /// Null: the entry is left out.
-    std::optional<SongIndex> songOf(const Resolved& resolved) {
-        const FoundSong* const found = std::get_if<FoundSong>(&resolved);
-        if (found == nullptr || found->file->obstacle) {
-            return std::nullopt;
-        }
-        SongFile& file = *found->file;
         if (file.song == SongFile::notListed) {
-            const std::string_view name = found->directory->songNames[file.name];
-            file.song = snapshot_->songs.add(indexOf(*found->directory),
-                                             {{}, name, file.size, file.modified, file.kind});
-            fingerprints_.push_back(fingerprint(snapshot_->songs[file.song]));
+            file.song = inventory_.songs.add(
+                indexOf(directory),
+                {{}, directory.songNames[song], file.size, file.modified, file.kind});
+            files_.push_back(&file);
         }
-        return file.song;
-    }
-
-    static Reason reasonOf(const Resolved& resolved) {
-        const FoundSong* const found = std::get_if<FoundSong>(&resolved);
-        return found == nullptr ? std::get<Reason>(resolved) : *found->file->obstacle;
+        playlist.songs.push_back(file.song);
+        return std::nullopt;
     }
 
     std::uint32_t indexOf(const Directory& directory) {
         const auto [place, isNew] = directories_.try_emplace(&directory, 0);
         if (isNew) {
-            place->second = snapshot_->songs.addDirectory(directory.path());
+            place->second = inventory_.songs.addDirectory(directory.path());
         }
         return place->second;
     }
 
-    void fillFolders() {
-        std::unordered_map<const Directory*, std::vector<SongIndex>*> folders;
-        for (Draft& draft : drafts_) {
-            if (draft.content == nullptr) {
-                folders.emplace(draft.directory, &draft.playlist.songs);
-            }
-        }
-        for (const Draft& draft : drafts_) {
-            const auto folder = folders.find(draft.directory);
-            if (draft.content != nullptr && folder != folders.end()) {
-                folder->second->insert(folder->second->end(), draft.playlist.songs.begin(),
-                                       draft.playlist.songs.end());
-            }
-        }
-    }
-
-    void finish() {
-        snapshot_->playlists.reserve(drafts_.size());
-        for (Draft& draft : drafts_) {
-            Fingerprint revision;
-            for (const SongIndex song : draft.playlist.songs) {
-                revision.add(fingerprints_[song]);
-            }
-            draft.playlist.revision = revision.value();
-            draft.playlist.songs.shrink_to_fit();
-            snapshot_->playlists.push_back(std::move(draft.playlist));
-        }
-        snapshot_->songs.shrink();
-        std::ranges::stable_sort(snapshot_->leftOut, {}, &LeftOut::playlist);
-        snapshot_->leftOut.shrink_to_fit();
-    }
-
     void leaveOut(std::string playlist, std::string entry, Reason reason) {
-        snapshot_->leftOut.push_back({std::move(playlist), std::move(entry), reason});
+        inventory_.leftOut.push_back({std::move(playlist), std::move(entry), reason});
     }
 
-    FolderTree& tree_;
-    const std::stop_token& stop_;
-    std::shared_ptr<Inventory> snapshot_ = std::make_shared<Inventory>();
-    std::vector<Draft> drafts_;
+    Inventory& inventory_;
+    /// In the order of the songs of the inventory.
+    std::vector<SongFile*> files_;
     std::unordered_map<const Directory*, std::uint32_t> directories_;
-    /// Of the songs of the inventory, in their order.
-    std::vector<std::uint64_t> fingerprints_;
 };
 
 } // namespace
 
-std::shared_ptr<const Inventory> buildInventory(FolderTree& tree, const std::stop_token& stop) {
-    return InventoryBuilder(tree, stop).build();
+std::shared_ptr<const Inventory> InventoryBuilder::build(const std::stop_token& stop) {
+    const FolderTree::News& news = tree_.news();
+    if (isFirst_ || news.otherNames || news.otherPlaylists) {
+        collect();
+    }
+    if (tree_.top() != nullptr) {
+        findMeanings(stop);
+        examineSongs(stop);
+    }
+    if (stop.stop_requested()) {
+        return nullptr;
+    }
+    isFirst_ = false;
+    auto inventory = takeInventory();
+    tree_.forgetNews();
+    return inventory;
+}
+
+void InventoryBuilder::collect() {
+    listed_.clear();
+    leftOut_.clear();
+    hasAudio_ = hasMusicVideo_ = false;
+    for (Directory* const directory : tree_.directories()) {
+        if (directory->unreadable) {
+            leftOut_.push_back({directory->path(), {}, Reason::DirectoryUnreadable});
+        }
+        for (const SongFile& song : directory->songs) {
+            (song.kind == Kind::Audio ? hasAudio_ : hasMusicVideo_) = true;
+        }
+        collectPlaylists(*directory);
+    }
+    std::ranges::sort(listed_, {}, [](const Listed& each) {
+        return std::tie(each.title->order, each.title->path);
+    });
+    leaveOutDoubles();
+}
+
+void InventoryBuilder::collectPlaylists(Directory& directory) {
+    bool any = false;
+    for (PlaylistFile& file : directory.playlists) {
+        if (const Reason* const reason = std::get_if<Reason>(&file.content)) {
+            leftOut_.push_back({directory.pathOf(file.name), {}, *reason});
+            continue;
+        }
+        if (!file.title) {
+            file.title = makeTitle(directory.pathOf(file.name), nameOf(file), false, collation_);
+        }
+        listed_.push_back({&directory, &file, &*file.title});
+        any = true;
+    }
+    if (any && directory.parent != nullptr) {
+        if (!directory.title) {
+            directory.title =
+                makeTitle(directory.path(), base::validUtf8(directory.name), true, collation_);
+        }
+        listed_.push_back({&directory, nullptr, &*directory.title});
+    }
+}
+
+void InventoryBuilder::leaveOutDoubles() {
+    std::unordered_set<std::uint64_t> ids;
+    std::erase_if(listed_, [&](const Listed& each) {
+        if (ids.insert(each.title->id).second) {
+            return false;
+        }
+        leftOut_.push_back({each.title->path, {}, Reason::SameAsAnother});
+        if (each.file != nullptr) {
+            each.file->meaning = {}; // nobody looks after it from here on
+        }
+        return true;
+    });
+}
+
+/// Before any file is asked for its size, so that those of one directory can be asked together.
+void InventoryBuilder::findMeanings(const std::stop_token& stop) {
+    std::vector<const Listed*> open;
+    for (const Listed& each : listed_) {
+        if (each.file != nullptr &&
+            (mayMeanOtherwise(each.file->meaning) || !each.file->meaning.asked.empty())) {
+            open.push_back(&each);
+        }
+    }
+    const EntryResolver resolver(tree_);
+    shareOut(open.size(), [&](std::size_t index, std::size_t) {
+        const Listed& each = *open[index];
+        MeaningFinder finder(resolver, *each.directory, *each.file);
+        if (mayMeanOtherwise(each.file->meaning)) {
+            finder.findAll(stop);
+        } else {
+            finder.askAgain(stop);
+        }
+    });
+    for (const Listed* const each : open) {
+        for (Directory* const holder : each->file->meaning.holders) {
+            tree_.note(*holder);
+        }
+    }
+}
+
+bool InventoryBuilder::mayMeanOtherwise(const Meaning& meaning) const {
+    const auto isOther = [](const Directory* holder) { return holder->reshaped; };
+    return !meaning.known ||
+           (tree_.news().otherNames && (meaning.hangsOnNames || !meaning.asked.empty() ||
+                                        std::ranges::any_of(meaning.holders, isOther)));
+}
+
+void InventoryBuilder::examineSongs(const std::stop_token& stop) {
+    const auto& touched = tree_.news().touched;
+    shareOut(touched.size(), [&](std::size_t index, std::size_t) {
+        if (!touched[index]->gone && !stop.stop_requested()) {
+            examineListedSongs(*touched[index], tree_.absolute(touched[index]->path()));
+        }
+    });
+}
+
+std::shared_ptr<const Inventory> InventoryBuilder::takeInventory() const {
+    const auto inventory = std::make_shared<Inventory>();
+    inventory->root = tree_.root();
+    inventory->rootFound = tree_.top() != nullptr;
+    inventory->unwatchedDirectories = tree_.unwatchedDirectories();
+    inventory->hasAudio = hasAudio_;
+    inventory->hasMusicVideo = hasMusicVideo_;
+    inventory->leftOut = leftOut_;
+    SongLister lister(*inventory);
+    std::unordered_map<const Directory*, std::vector<SongIndex>> folders;
+    for (const Listed& each : listed_) {
+        if (each.file == nullptr) {
+            folders.try_emplace(each.directory);
+        }
+    }
+    inventory->playlists.reserve(listed_.size());
+    for (const Listed& each : listed_) {
+        Playlist& playlist = inventory->playlists.emplace_back();
+        playlist.id = each.title->id;
+        playlist.name = each.title->name;
+        playlist.path = each.title->path;
+        playlist.folder = each.file == nullptr;
+        if (each.file == nullptr) {
+            continue;
+        }
+        playlist.generated = contentOf(*each.file).generated;
+        lister.list(playlist, *each.file);
+        if (const auto folder = folders.find(each.directory); folder != folders.end()) {
+            folder->second.insert(folder->second.end(), playlist.songs.begin(),
+                                  playlist.songs.end());
+        }
+    }
+    for (std::size_t index = 0; index < listed_.size(); ++index) {
+        if (listed_[index].file == nullptr) {
+            Playlist& folder = inventory->playlists[index];
+            folder.songs = std::move(folders[listed_[index].directory]);
+            folder.songs.shrink_to_fit();
+            folder.revision = lister.revisionOf(folder.songs);
+        }
+    }
+    inventory->songs.shrink();
+    std::ranges::stable_sort(inventory->leftOut, {}, &LeftOut::playlist);
+    inventory->leftOut.shrink_to_fit();
+    return inventory;
 }
 
 } // namespace quorl::media

@@ -62,7 +62,7 @@ std::shared_ptr<const Inventory> scan(const std::filesystem::path& root) {
     FolderTree tree(absoluteRoot(root), nullptr);
     const std::stop_token never;
     static_cast<void>(tree.refresh(never));
-    return buildInventory(tree, never);
+    return InventoryBuilder(tree).build(never);
 }
 
 class MusicFolder::Worker {
@@ -133,7 +133,7 @@ class MusicFolder::Worker {
         if (!tree_.refresh(stop)) {
             return false;
         }
-        auto next = buildInventory(tree_, stop);
+        auto next = builder_.build(stop);
         if (!next) {
             return false;
         }
@@ -204,6 +204,7 @@ class MusicFolder::Worker {
     std::optional<base::MountWatch> mountWatch_;
     base::DirectoryWatch directoryWatch_;
     FolderTree tree_;
+    InventoryBuilder builder_{tree_};
 
     /// Held during each call to outside.
     std::mutex telling_;

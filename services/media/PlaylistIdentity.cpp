@@ -5,6 +5,7 @@
 #include <string>
 
 #include <glib.h>
+#include <xxhash.h>
 
 #include "services/base/Utf8.h"
 
@@ -30,31 +31,25 @@ std::uint64_t playlistId(std::string_view path, bool folder) {
 }
 
 void Fingerprint::add(std::string_view bytes) {
-    for (const char byte : bytes) {
-        addByte(static_cast<unsigned char>(byte));
-    }
-    // Keeps "ab" and "c" apart from "a" and "bc": no path has a NUL.
-    addByte(0);
+    value_ = XXH3_64bits_withSeed(bytes.data(), bytes.size(), value_);
 }
 
 void Fingerprint::add(std::uint64_t number) {
-    for (unsigned shift = 0; shift < 64; shift += 8) {
-        addByte(static_cast<unsigned char>(number >> shift & 0xFF));
-    }
+    const auto bytes = std::bit_cast<std::array<char, sizeof number>>(GUINT64_TO_LE(number));
+    add(std::string_view(bytes.data(), bytes.size()));
 }
 
-void Fingerprint::addByte(unsigned char byte) {
-    // FNV-1a.
-    value_ = (value_ ^ byte) * 0x100000001B3;
-}
-
-std::uint64_t fingerprint(const Song& song) {
+Fingerprint fingerprintOf(std::string_view directory) {
     Fingerprint result;
-    result.add(song.directory);
-    result.add(song.name);
-    result.add(song.size);
-    result.add(static_cast<std::uint64_t>(song.modified));
-    return result.value();
+    result.add(directory);
+    return result;
+}
+
+std::uint64_t fingerprint(Fingerprint directory, const Song& song) {
+    directory.add(song.name);
+    directory.add(song.size);
+    directory.add(static_cast<std::uint64_t>(song.modified));
+    return directory.value();
 }
 
 } // namespace quorl::media

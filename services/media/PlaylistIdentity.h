@@ -22,12 +22,14 @@ class Fingerprint {
     [[nodiscard]] std::uint64_t value() const { return value_; }
 
   private:
-    void addByte(unsigned char byte);
-
-    std::uint64_t value_ = 0xCBF29CE484222325;
+    std::uint64_t value_ = 0;
 };
 
-/// What `song` adds to the revision of a playlist: its path, size and modification time.
-[[nodiscard]] std::uint64_t fingerprint(const Song& song);
+/// What all songs in the directory at this path, relative to the music folder, have in common.
+[[nodiscard]] Fingerprint fingerprintOf(std::string_view directory);
+
+/// What `song` adds to the revision of a playlist: its path, size and modification time. Of its
+/// path only the name is taken from it, the rest from `directory`.
+[[nodiscard]] std::uint64_t fingerprint(Fingerprint directory, const Song& song);
 
 } // namespace quorl::media

@@ -8,7 +8,9 @@
 
 namespace quorl::media {
 
+using language::filled;
 using language::toTranslate;
+using language::translated;
 
 namespace {
 
@@ -75,13 +77,15 @@ std::optional<Reason> reasonOf(std::string_view code) {
     return found == explanations.end() ? std::nullopt : std::optional(found->reason);
 }
 
+std::string describe(const std::string& entry, const std::string& explanation) {
+    return entry.empty() ? explanation
+                         : filled(translated("{name}: {text}"),
+                                  {{"name", base::printable(entry)}, {"text", explanation}});
+}
+
 std::string describe(const LeftOut& leftOut) {
-    std::string line =
-        leftOut.playlist.empty() ? "The music folder" : base::printable(leftOut.playlist);
-    if (!leftOut.entry.empty()) {
-        line += ": " + base::printable(leftOut.entry);
-    }
-    return line + ": " + std::string(sentence(leftOut.reason));
+    const auto place = leftOut.playlist.empty() ? translated("The music folder") : leftOut.playlist;
+    return describe(place, describe(leftOut.entry, translated(sentence(leftOut.reason))));
 }
 
 } // namespace quorl::media

@@ -50,8 +50,12 @@ struct LeftOut {
     bool operator==(const LeftOut&) const = default;
 };
 
-/// `leftOut` as one line for a terminal: playlist, entry and sentence. Valid UTF-8; control
-/// characters, which a hostile playlist could steer the terminal with, are replaced.
+/// `leftOut` as one line for a terminal, in the language that is followed: playlist, entry and
+/// sentence. Valid UTF-8; control characters, which a hostile playlist could steer the terminal
+/// with, are replaced.
 [[nodiscard]] std::string describe(const LeftOut& leftOut);
+
+/// The same of what is known by an explanation, and an entry that may be empty.
+[[nodiscard]] std::string describe(const std::string& entry, const std::string& explanation);
 
 } // namespace quorl::media

@@ -5,11 +5,6 @@
 
 namespace quorl::media {
 
-std::string_view TextList::operator[](std::uint32_t index) const {
-    const std::uint32_t begin = index == 0 ? 0 : ends_[index - 1];
-    return std::string_view(text_).substr(begin, ends_[index] - begin);
-}
-
 std::uint32_t TextList::add(std::string_view text) {
     if (text.size() > std::numeric_limits<std::uint32_t>::max() - text_.size()) {
         throw std::length_error("A list of texts holds 4 GiB at most.");

@@ -19,7 +19,10 @@ class TextList {
     [[nodiscard]] std::size_t bytes() const { return text_.size(); }
 
     /// The text at `index`, which is below `size()`. Valid until the next `add` or `shrink`.
-    [[nodiscard]] std::string_view operator[](std::uint32_t index) const;
+    [[nodiscard]] std::string_view operator[](std::uint32_t index) const {
+        const std::uint32_t begin = index == 0 ? 0 : ends_[index - 1];
+        return std::string_view(text_).substr(begin, ends_[index] - begin);
+    }
 
     /// Appends a copy of `text` and gives its index back. Throws `std::length_error` beyond 4 GiB.
     std::uint32_t add(std::string_view text);
