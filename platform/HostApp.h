@@ -10,11 +10,11 @@ class QPSNotificationAppController : public PSListController {
     /// What the pane is called, in the user's language.
     [[nodiscard]] virtual std::string localizedPaneTitle() = 0;
 
-    /// The bundle that the pane comes from.
-    [[nodiscard]] virtual std::shared_ptr<NSBundle> bundle() = 0;
+    /// The bundle that the pane comes from. Unless overridden: that of its class.
+    [[nodiscard]] virtual std::shared_ptr<NSBundle> bundle();
 
-    /// The identifier under which the app knows the pane.
-    [[nodiscard]] virtual std::optional<std::string> applicationBundleIdentifier() = 0;
+    /// The identifier under which the app knows the pane. Unless overridden: that of its bundle.
+    [[nodiscard]] virtual std::optional<std::string> applicationBundleIdentifier();
 
   protected:
     /// The row that switches the glance of the app with this identifier on the wearable; null where

@@ -1,7 +1,10 @@
-# Writes the registration of the bundle in the directory BUNDLE, whose other files are all there, from
-# TEMPLATE, for VERSION of the interface.
+# Writes the digests of the other files of the bundle in the directory BUNDLE into its registration. What else stands
+# there is taken from the file REGISTRATION, or stays as it is where none is given.
 if(NOT IS_ABSOLUTE "${BUNDLE}")
   message(FATAL_ERROR "\"${BUNDLE}\" has to be the full path of the bundle.")
+endif()
+if(NOT REGISTRATION)
+  set(REGISTRATION ${BUNDLE}/registration.json)
 endif()
 file(GLOB_RECURSE files RELATIVE ${BUNDLE} ${BUNDLE}/*)
 list(REMOVE_ITEM files registration.json)
@@ -9,6 +12,7 @@ foreach(file ${files})
   file(SHA256 ${BUNDLE}/${file} digest)
   list(APPEND digests "    \"${file}\": \"${digest}\"")
 endforeach()
-list(JOIN digests ",\n" QUORL_DIGESTS)
-set(QUORL_INTERFACE_VERSION ${VERSION})
-configure_file(${TEMPLATE} ${BUNDLE}/registration.json @ONLY)
+list(JOIN digests ",\n" digests)
+file(READ ${REGISTRATION} text)
+string(REGEX REPLACE "(\"sha256\": {)[^}]*}" "\\1\n${digests}\n  }" text "${text}")
+file(WRITE ${BUNDLE}/registration.json "${text}")

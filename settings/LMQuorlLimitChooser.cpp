@@ -3,9 +3,9 @@
 #include <algorithm>
 #include <array>
 
+#include "platform/LocalizedText.h"
 #include "platform/SizeFormatter.h"
 #include "platform/SyncPreferences.h"
-#include "settings/LocalizedText.h"
 
 namespace {
 

@@ -4,9 +4,9 @@
 #include <array>
 
 #include "platform/HostApp.h"
+#include "platform/LocalizedText.h"
 #include "platform/SyncPreferences.h"
 #include "settings/LMQuorlPlaylistCell.h"
-#include "settings/LocalizedText.h"
 #include "sync/LMQuorlSyncManager.h"
 #include "sync/LMSyncDefaults+Extras.h"
 

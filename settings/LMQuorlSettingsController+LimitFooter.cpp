@@ -5,12 +5,12 @@
 #include <cmath>
 #include <limits>
 
+#include "platform/LocalizedText.h"
 #include "platform/MediaLibrary.h"
 #include "platform/SizeFormatter.h"
 #include "platform/SyncPreferences.h"
 #include "settings/LMQuorlSettingsController.h"
 #include "settings/LMSyncLimitType.h"
-#include "settings/LocalizedText.h"
 #include "sync/LMQuorlSyncManager.h"
 #include "sync/LMSyncDefaults+Extras.h"
 

@@ -1,13 +1,13 @@
 #include "settings/LMQuorlSettingsController.h"
 
 #include "platform/Dispatch.h"
+#include "platform/LocalizedText.h"
 #include "platform/MediaLibrary.h"
 #include "platform/SizeFormatter.h"
 #include "platform/SyncPreferences.h"
 #include "settings/LMQuorlLimitChooser.h"
 #include "settings/LMQuorlPlaylistChooser.h"
 #include "settings/LMSyncLimitType.h"
-#include "settings/LocalizedText.h"
 #include "sync/LMQuorlSyncManager.h"
 #include "sync/LMSyncDefaults+Extras.h"
 

@@ -2,6 +2,7 @@
 
 #include <filesystem>
 #include <variant>
+#include <vector>
 
 #include "platform/HostApp.h"
 
@@ -16,5 +17,9 @@ using LoadedPane = std::variant<Class, PaneProblem>;
 
 /// The class of the root pane of the first bundle in `directories`.
 [[nodiscard]] LoadedPane loadPane(const std::vector<std::filesystem::path>& directories);
+
+/// The classes of the root panes of all bundles in `directories`, of those of one name the first.
+[[nodiscard]] std::vector<LoadedPane>
+loadPanes(const std::vector<std::filesystem::path>& directories);
 
 } // namespace quorl

@@ -37,6 +37,11 @@ std::string statusOf(const engine::EngineState& state) {
                                       "quorl-syncd, or log in again.");
 }
 
+std::shared_ptr<PSSpecifier> rowOf(const Class& pane, const std::string& name) {
+    return PSSpecifier::preferenceSpecifierNamed_target_set_get_detail_cell_edit(
+        name, nullptr, std::nullopt, std::nullopt, pane, PSCellType::LinkList, std::nullopt);
+}
+
 } // namespace
 
 std::shared_ptr<FrontPage> FrontPage::over(PageServices& services, const Class& pane,
@@ -47,9 +52,16 @@ std::shared_ptr<FrontPage> FrontPage::over(PageServices& services, const Class& 
     }
     page->setServices(services);
     page->setTitle("Velora");
-    page->paneRow_ = PSSpecifier::preferenceSpecifierNamed_target_set_get_detail_cell_edit(
-        paneName, nullptr, std::nullopt, std::nullopt, pane, PSCellType::LinkList, std::nullopt);
+    page->paneRow_ = rowOf(pane, paneName);
     return page;
+}
+
+void FrontPage::addPane(const Class& pane, const std::string& name) {
+    otherRows_.push_back(rowOf(pane, name));
+}
+
+void FrontPage::addProblem(const std::string& text) {
+    otherRows_.push_back(group(std::nullopt, text));
 }
 
 AppPage::Rows FrontPage::rows() {
@@ -58,6 +70,7 @@ AppPage::Rows FrontPage::rows() {
         addWearable(rows);
     }
     rows.push_back(paneRow_);
+    rows.insert(rows.end(), otherRows_.begin(), otherRows_.end());
     return rows;
 }
 

@@ -13,6 +13,10 @@ class FrontPage final : public AppPage {
     [[nodiscard]] static std::shared_ptr<FrontPage> over(PageServices& services, const Class& pane,
                                                          const std::string& paneName);
 
+    /// Before the page is shown: one more pane that it opens, or why it does not.
+    void addPane(const Class& pane, const std::string& name);
+    void addProblem(const std::string& text);
+
     /// The row that opens the pane.
     [[nodiscard]] const std::shared_ptr<PSSpecifier>& paneRow() const { return paneRow_; }
 
@@ -25,6 +29,7 @@ class FrontPage final : public AppPage {
     void setOnCharger(const std::shared_ptr<NSObject>& isOn, const Row& row);
 
     Row paneRow_;
+    Rows otherRows_;
 };
 
 } // namespace quorl

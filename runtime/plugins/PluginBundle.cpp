@@ -47,19 +47,56 @@ Digests digests(const json& object, const std::filesystem::path& file) {
     return field->get<Digests>();
 }
 
-int interfaceVersion(const json& object, const std::filesystem::path& file) {
-    const auto field = object.find("interfaceVersion");
+json numberField(const json& object, const char* name, const std::filesystem::path& file) {
+    const auto field = object.find(name);
     if (field == object.end() || !field->is_number_integer()) {
-        throw BundleError(file, "the field \"interfaceVersion\" is missing or not a whole number; "
-                                "install the plug-in again");
+        throw BundleError(file, std::string("the field \"") + name +
+                                    "\" is missing or not a whole number; "
+                                    "install the plug-in again");
     }
-    if (*field != QuorlInterfaceVersion) {
-        throw BundleError(file, "it was built against version " + field->dump() +
-                                    " of the interface and this app has version " +
-                                    std::to_string(QuorlInterfaceVersion) +
-                                    "; install the plug-in and the app from one release");
+    return *field;
+}
+
+/// Registrations of the first minor version of an interface say nothing of it.
+json minorVersion(const json& object, const std::filesystem::path& file) {
+    constexpr auto name = "interfaceMinorVersion";
+    return object.contains(name) ? numberField(object, name, file) : json(0);
+}
+
+/// A plug-in knows nothing of what came after it, and needs all that came before.
+void takeVersion(const json& object, Registration& registration,
+                 const std::filesystem::path& file) {
+    const json version = numberField(object, "interfaceVersion", file);
+    const json minor = minorVersion(object, file);
+    const std::pair built(version.get<double>(), minor.get<double>()); // for numbers of any size
+    const std::pair<double, double> own(QuorlInterfaceVersion, QuorlInterfaceMinorVersion);
+    if (built > own || built.first != own.first || built.second < 0) {
+        throw BundleError(file, "it was built against version " + version.dump() + "." +
+                                    minor.dump() + " of the interface and this app has version " +
+                                    std::to_string(QuorlInterfaceVersion) + "." +
+                                    std::to_string(QuorlInterfaceMinorVersion) + "; update the " +
+                                    (built > own ? "app" : "plug-in") +
+                                    ", or install the plug-in and the app from one release");
     }
-    return QuorlInterfaceVersion;
+    registration.interfaceVersion = version.get<int>();
+    registration.interfaceMinorVersion = minor.get<int>();
+}
+
+/// The directories named `name` of what is installed with this program, and of the user; each once.
+std::vector<std::filesystem::path> installedDirectories(const std::filesystem::path& name) {
+    std::error_code ignored; // without /proc the other places remain
+    const auto program = std::filesystem::read_symlink("/proc/self/exe", ignored);
+    const auto prefix = program.parent_path().parent_path();
+    const char* const home = std::getenv("HOME");
+    std::vector<std::filesystem::path> directories;
+    for (const auto& place : {prefix / "lib", prefix / QUORL_LIBDIR,
+                              std::filesystem::path(home ? home : "") / ".local/lib"}) {
+        const auto directory = place / "quorl" / name;
+        if (std::ranges::find(directories, directory) == directories.end()) {
+            directories.push_back(directory);
+        }
+    }
+    return directories;
 }
 
 } // namespace
@@ -68,7 +105,7 @@ std::shared_ptr<PluginBundle> PluginBundle::open(const std::filesystem::path& di
     const auto file = directory / "registration.json";
     const json object = readObject(file);
     Registration registration;
-    registration.interfaceVersion = quorl::interfaceVersion(object, file);
+    takeVersion(object, registration, file);
     registration.identifier = textField(object, "identifier", file);
     registration.rootClass = textField(object, "rootClass", file);
     registration.library = textField(object, "library", file);
@@ -141,20 +178,19 @@ PluginBundle::localizedStringForKey_value_table(const std::string& key,
 }
 
 std::vector<std::filesystem::path> pluginDirectories(const std::filesystem::path& preferred) {
-    std::error_code ignored; // without /proc the other places remain
-    const auto program = std::filesystem::read_symlink("/proc/self/exe", ignored);
-    const auto prefix = program.parent_path().parent_path();
-    const char* const home = std::getenv("HOME");
     std::vector<std::filesystem::path> directories;
-    for (const auto& directory :
-         {preferred, prefix / "lib/quorl/plugins", prefix / QUORL_LIBDIR "/quorl/plugins",
-          std::filesystem::path(home ? home : "") / ".local/lib/quorl/plugins"}) {
-        if (!directory.empty() && std::ranges::find(directories, directory) == directories.end()) {
+    if (!preferred.empty()) {
+        directories.push_back(preferred);
+    }
+    for (const auto& directory : installedDirectories("plugins")) {
+        if (directory != preferred) {
             directories.push_back(directory);
         }
     }
     return directories;
 }
+
+std::vector<std::filesystem::path> paneDirectories() { return installedDirectories("panes"); }
 
 std::vector<std::filesystem::path>
 findBundles(const std::vector<std::filesystem::path>& directories) {

@@ -15,6 +15,7 @@ struct Registration {
     std::string rootClass;
     std::string library; ///< the shared object, a file of the bundle's directory
     int interfaceVersion = 0;
+    int interfaceMinorVersion = 0;
     /// Of every other file of the bundle. What is not among them is not used: a bundle without
     /// digests is refused, though its interface version, which is about declarations, may fit.
     Digests digests;
@@ -24,7 +25,8 @@ struct Registration {
 class PluginBundle : public NSBundle {
   public:
     /// Reads and checks the registration; nothing is loaded. Throws `BundleError` where it is
-    /// missing, malformed, or made for another version of the platform's interface.
+    /// missing, malformed, or made for a version of the platform's interface that this program does
+    /// not have.
     [[nodiscard]] static std::shared_ptr<PluginBundle> open(const std::filesystem::path& directory);
 
     /// Made by `open`.
@@ -68,6 +70,9 @@ class PluginBundle : public NSBundle {
 /// empty, then those beside this program's own directory, then that of the user.
 [[nodiscard]] std::vector<std::filesystem::path>
 pluginDirectories(const std::filesystem::path& preferred);
+
+/// The directories that further panes are looked for in, in the same order.
+[[nodiscard]] std::vector<std::filesystem::path> paneDirectories();
 
 /// The directories named `*.bundle` in `directories`, in the order of those and then by name. A
 /// directory that does not exist holds none.

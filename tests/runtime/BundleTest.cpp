@@ -351,6 +351,59 @@ TEST_F(Bundles, MadeForAnotherVersionAreRefusedWithBothVersions) {
     }
 }
 
+/// A registration that says its minor version.
+std::string withMinorVersion(std::string text, const std::string& minor) {
+    const std::string before = "\"interfaceVersion\": ";
+    return text.replace(text.find(before), 0, "\"interfaceMinorVersion\": " + minor + ", ");
+}
+
+TEST_F(Bundles, OfThisAndOfEachSmallerMinorVersionAreOpened) {
+    makeBundle();
+    EXPECT_EQ(PluginBundle::open(bundle_)->registration().interfaceMinorVersion, 0)
+        << "where nothing is said";
+
+    for (int minor = 0; minor <= QuorlInterfaceMinorVersion; ++minor) {
+        write(registration_, withMinorVersion(registration(), std::to_string(minor)));
+        EXPECT_EQ(PluginBundle::open(bundle_)->registration().interfaceMinorVersion, minor);
+    }
+}
+
+TEST_F(Bundles, OfALaterMinorVersionAreRefusedAndTheAppIsToBeUpdated) {
+    makeBundle();
+    const std::string version = std::to_string(QuorlInterfaceVersion) + ".";
+    const std::string own = version + std::to_string(QuorlInterfaceMinorVersion);
+
+    for (const std::string& later :
+         {std::to_string(QuorlInterfaceMinorVersion + 1), std::string("18446744073709551615")}) {
+        EXPECT_THAT(problemOfRegistration(withMinorVersion(registration(), later)),
+                    testing::AllOf(HasSubstr("against version " + version + later),
+                                   HasSubstr("has version " + own + "; update the app")));
+    }
+}
+
+TEST_F(Bundles, OfAMinorVersionThatIsNoneAreRefused) {
+    makeBundle();
+
+    for (const std::string none : {"\"1\"", "0.5", "null", "[]"}) {
+        EXPECT_THAT(problemOfRegistration(withMinorVersion(registration(), none)),
+                    HasSubstr("\"interfaceMinorVersion\""));
+    }
+    EXPECT_THAT(problemOfRegistration(withMinorVersion(registration(), "-1")),
+                HasSubstr("version " + std::to_string(QuorlInterfaceVersion) + ".-1"));
+}
+
+TEST_F(Bundles, OfAnotherVersionSayWhichOfBothIsToBeUpdated) {
+    makeBundle();
+    const std::string own = std::to_string(QuorlInterfaceVersion);
+    const std::string earlier = std::to_string(QuorlInterfaceVersion - 1);
+    const std::string later = std::to_string(QuorlInterfaceVersion + 1);
+
+    EXPECT_THAT(problemOfRegistration(registration(own, earlier)), HasSubstr("update the plug-in"));
+    EXPECT_THAT(problemOfRegistration(registration(own, later)), HasSubstr("update the app"));
+    EXPECT_THAT(problemOfRegistration(withMinorVersion(registration(own, earlier), "99")),
+                HasSubstr("update the plug-in"));
+}
+
 TEST_F(Bundles, WhoseLibraryIsNotTheirsAreRefused) {
     makeBundle();
 

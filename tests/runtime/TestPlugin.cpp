@@ -9,14 +9,6 @@ class TestPane : public QPSNotificationAppController {
     [[nodiscard]] std::string localizedPaneTitle() override {
         return bundle()->localizedStringForKey_value_table("TITLE", "Default title", std::nullopt);
     }
-
-    [[nodiscard]] std::shared_ptr<NSBundle> bundle() override {
-        return NSBundle::bundleForClass(Class::ofObject(*this));
-    }
-
-    [[nodiscard]] std::optional<std::string> applicationBundleIdentifier() override {
-        return bundle()->bundleIdentifier();
-    }
 };
 
 bool TestPane::init() {

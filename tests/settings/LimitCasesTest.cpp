@@ -2,6 +2,8 @@
 
 #include "tests/limits/LimitCases.h"
 
+#include <limits>
+
 #include "platform/SizeFormatter.h"
 #include "tests/settings/Pane.h"
 
@@ -16,6 +18,9 @@ TEST_F(LimitOfThePane, IsTheOneOfTheEngine) {
     sendMorning();
     for (const auto& each : quorl::limits::cases) {
         SCOPED_TRACE(each.situation);
+        if (each.amount > std::numeric_limits<NSUInteger>::max()) {
+            continue; // the engine knows larger ones than a pane with words of 32 bits
+        }
         std::vector<std::optional<std::uint64_t>> sizes;
         for (const auto& listed : each.playlist) {
             sizes.emplace_back(listed.size);

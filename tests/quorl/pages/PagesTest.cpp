@@ -81,6 +81,18 @@ TEST_F(Pages, frontSaysNothingOfAWearableWhereThereIsNoEngine) {
                               HasSubstr("  1  Music\n"), Not(HasSubstr("Storage"))));
 }
 
+TEST_F(Pages, frontOpensFurtherPanesAndSaysWhyOneIsNotThere) {
+    services_.state = {};
+    const auto page = FrontPage::over(services_, Class::of<LeftOutPage>(), "Music");
+    page->addPane(Class::of<SyncPage>(), "Alarm");
+    page->addProblem("A plug-in cannot be shown.");
+    show(page);
+    EXPECT_THAT(text(), AllOf(HasSubstr("  1  Music\n  2  Alarm\n"),
+                              HasSubstr("A plug-in cannot be shown.\n")));
+    tap("Alarm");
+    EXPECT_EQ(navigation_->top()->title(), "Sync");
+}
+
 TEST_F(Pages, syncShowsWhatIsUnderWay) {
     services_.state.sessions = {session()};
     services_.state.engine.playlistName = "Road Trip";

@@ -2,7 +2,7 @@
 
 #include "platform/Foundation.h"
 
-/// A text of this plug-in: its key in the default strings table, and its English default.
+/// A text of a plug-in: its key in the plug-in's default strings table, and its English default.
 struct LocalizedText {
     const char* key;
     const char* english;

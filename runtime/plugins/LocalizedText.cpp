@@ -1,4 +1,4 @@
-#include "settings/LocalizedText.h"
+#include "platform/LocalizedText.h"
 
 std::string localized(const NSObject& receiver, const LocalizedText& text) {
     return NSBundle::bundleForClass(Class::ofObject(receiver))
