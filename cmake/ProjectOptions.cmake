@@ -37,6 +37,9 @@ target_compile_options(project_options INTERFACE
   # g++ 12 sees overlapping copies in its own std::string where none can be.
   $<$<CXX_COMPILER_ID:GNU>:-Wno-restrict>
   $<$<BOOL:${QUORL_WARNINGS_AS_ERRORS}>:-Werror>)
+# Nobody puts another function in the place of one of a shared library of ours: within one, calls are direct.
+target_compile_options(project_options INTERFACE
+  $<$<STREQUAL:$<TARGET_PROPERTY:TYPE>,SHARED_LIBRARY>:-fno-semantic-interposition>)
 if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(i.86|x86_64|AMD64)$" AND CMAKE_SIZEOF_VOID_P EQUAL 4)
   # The x87 unit keeps more digits in its registers than in memory, so that what a comparison of two
   # figures finds would hang on which of them was stored. The others round each operation alike.

@@ -1,4 +1,4 @@
-"""What shells offer after "quorl": each option of the program and nothing else, and playlists by name."""
+"""What shells offer after the names of the programs: each option and nothing else, and playlists by name."""
 
 import os
 import pathlib
@@ -10,8 +10,7 @@ import unittest
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 BUILD = pathlib.Path(os.environ["BUILD"])
 COMPLETIONS = ROOT / "resources/completions"
-BASH, ZSH, FISH = (COMPLETIONS / name for name in ("quorl.bash", "_quorl", "quorl.fish"))
-MANUAL = ROOT / "docs/man/quorl.1"
+PROGRAMS = "quorl", "quorl-script", "quorl-syncd"
 
 PLAYLISTS = r"""#!/bin/sh
 [ "$*" = --playlists ] && printf '1\t3\t9\tRoad Trip\n2\t1\t5\tRobert & "Co"\n3\t1\t5\tLong Run\n'
@@ -22,8 +21,19 @@ def text_of(path):
     return path.read_text(encoding="utf-8")
 
 
-def help_text():
-    return subprocess.run([BUILD / "bin/quorl", "--help"], capture_output=True, text=True, check=True).stdout
+def help_text(program="quorl"):
+    return subprocess.run([BUILD / "bin" / program, "--help"], capture_output=True, text=True, check=True).stdout
+
+
+def manual_of(program):
+    """Its manual page, without the options of systemctl."""
+    lines = text_of(ROOT / f"docs/man/{program}.1").replace("\\-", "-").splitlines()
+    return "\n".join(line for line in lines if "systemctl" not in line)
+
+
+def in_bash_words(text):
+    """Each list of words that a script for bash gives to compgen."""
+    return " ".join(re.findall(r"compgen -W '([^']*)'", text))
 
 
 def options_in(text):
@@ -37,25 +47,31 @@ def panes_in(text):
 
 class Options(unittest.TestCase):
     def setUp(self):
-        self.help = help_text()
-        self.options = options_in(self.help)
+        self.options = {program: options_in(help_text(program)) for program in PROGRAMS}
+
+    def check_each(self, offered):
+        for program, options in self.options.items():
+            with self.subTest(program):
+                self.assertEqual(offered(program), options)
 
     def test_are_found_in_the_help(self):
-        self.assertLessEqual({"--text", "--choose", "--version"}, self.options)
+        self.assertLessEqual({"--text", "--choose", "--version"}, self.options["quorl"])
+        self.assertLessEqual({"--plugins", "--help"}, self.options["quorl-script"])
+        self.assertLessEqual({"--trial", "--rate-limit"}, self.options["quorl-syncd"])
 
     def test_are_all_in_the_manual(self):
-        manual = text_of(MANUAL).replace("\\-", "-")
-        self.assertEqual(options_in(manual), self.options)
-        self.assertEqual(panes_in(manual), panes_in(self.help))
+        self.check_each(lambda program: options_in(manual_of(program)))
+        self.assertEqual(panes_in(manual_of("quorl")), panes_in(help_text()))
 
-    def test_are_all_offered_by_bash_and_zsh(self):
-        for path in (BASH, ZSH):
-            with self.subTest(path.name):
-                self.assertEqual(options_in(text_of(path)), self.options)
+    def test_are_all_offered_by_bash(self):
+        self.check_each(lambda program: options_in(in_bash_words(text_of(COMPLETIONS / f"{program}.bash"))))
+
+    def test_are_all_offered_by_zsh(self):
+        self.check_each(lambda program: options_in(text_of(COMPLETIONS / f"_{program}")))
 
     def test_are_all_offered_by_fish(self):
-        long_options = re.findall(r" -l ([a-z-]+)", text_of(FISH))
-        self.assertEqual({f"--{name}" for name in long_options}, self.options)
+        self.check_each(lambda program: {f"--{name}" for name in re.findall(
+            r" -l ([a-z-]+)", text_of(COMPLETIONS / f"{program}.fish"))})
 
 
 class Offered(unittest.TestCase):
@@ -72,13 +88,14 @@ class Offered(unittest.TestCase):
         self.assertEqual(result.stderr, "")
         return result.stdout.splitlines()
 
-    def by_bash(self, *words):
-        script = ('source "$0"; COMP_WORDS=(quorl "$@"); COMP_CWORD=$#; compopt() { :; }; _quorl quorl; '
-                  'printf "%s\\n" "${COMPREPLY[@]}"')
-        return self.lines_of("bash", "--norc", "-c", script, BASH, *words)
+    def by_bash(self, *words, program="quorl"):
+        script = ('source "$0"; program=$1; shift; COMP_WORDS=("$program" "$@"); COMP_CWORD=$#; compopt() { :; }; '
+                  '"_${program//-/_}" "$program"; printf "%s\\n" "${COMPREPLY[@]}"')
+        return self.lines_of("bash", "--norc", "-c", script, COMPLETIONS / f"{program}.bash", program, *words)
 
     def by_fish(self, line):
-        lines = self.lines_of("fish", "--no-config", "-c", f"source {FISH}; complete -C '{line}'")
+        file = COMPLETIONS / f"{line.split()[0]}.fish"
+        lines = self.lines_of("fish", "--no-config", "-c", f"source {file}; complete -C '{line}'")
         return [line.split("\t")[0] for line in lines]
 
     def test_playlists_that_begin_so_by_bash_as_words_of_the_shell(self):
@@ -96,14 +113,26 @@ class Offered(unittest.TestCase):
         panes = panes_in(help_text())
         self.assertEqual(set(self.by_bash("--pane", "")), panes)
         self.assertEqual(set(self.by_fish("quorl --pane ")), panes)
-        self.assertIn(f"({' '.join(self.by_bash('--pane', ''))})", text_of(ZSH))
+        self.assertIn(f"({' '.join(self.by_bash('--pane', ''))})", text_of(COMPLETIONS / "_quorl"))
 
     def test_playlists_that_begin_so_by_fish(self):
         self.assertEqual(self.by_fish("quorl --choose Road"), ["Road Trip"])
         self.assertIn("none", self.by_fish("quorl --choose "))
 
+    def test_folders_for_the_engine_and_scripts_for_their_host(self):
+        home = pathlib.Path(self.environment["HOME"])
+        (home / "Music").mkdir()
+        (home / "a-story.jsonl").touch()
+        self.assertEqual(self.by_bash("--music-folder", f"{home}/", program="quorl-syncd"), [f"{home}/Music"])
+        self.assertEqual(self.by_bash("--ret", program="quorl-syncd"), ["--retry-after"])
+        self.assertEqual(self.by_bash(f"{home}/a", program="quorl-script"), [f"{home}/a-story.jsonl"])
+        self.assertEqual(self.by_bash("--plugins", f"{home}/", program="quorl-script"), [f"{home}/Music"])
+        self.assertEqual(self.by_fish(f"quorl-script {home}/a"), [f"{home}/a-story.jsonl"])
+        self.assertEqual(self.by_fish("quorl-syncd --ret"), ["--retry-after"])
+
     def test_is_written_as_zsh_reads_it(self):
-        self.lines_of("zsh", "--no-rcs", "-n", ZSH)
+        for program in PROGRAMS:
+            self.lines_of("zsh", "--no-rcs", "-n", COMPLETIONS / f"_{program}")
 
 
 if __name__ == "__main__":

@@ -10,7 +10,7 @@ import unittest
 HERE = pathlib.Path(__file__).resolve().parent
 ROOT = HERE.parents[1]
 BUILD = pathlib.Path(os.environ["BUILD"])
-UNIT = BUILD / "lib/systemd/user/quorl-syncd.service"
+UNIT = ROOT / "resources/systemd/quorl-syncd.service.in"
 
 ALLOWED_EXPOSURE = "20"  # tenths; 100 is a service that nothing holds
 NOT_HERE = 77
@@ -75,7 +75,7 @@ class Confinement(unittest.TestCase):
     def session(self, unit, command):
         """What a shell command prints in a session that has this unit for the engine's."""
         (self.folder / "units").mkdir()
-        (self.folder / "units" / UNIT.name).write_text(unit)
+        (self.folder / "units" / UNIT.stem).write_text(unit)
         result = subprocess.run([HERE / "user-manager", self.folder, "bash", "-euc", command],
                                 stdin=subprocess.DEVNULL, capture_output=True, text=True)
         if result.returncode == NOT_HERE:
@@ -85,7 +85,7 @@ class Confinement(unittest.TestCase):
 
     @unittest.skipUnless(shutil.which("systemd-analyze"), "systemd-analyze is missing")
     def test_leaves_little_exposed(self):
-        unit = self.folder / UNIT.name
+        unit = self.folder / UNIT.stem
         unit.write_text(unit_that_starts("/bin/true"))
         result = subprocess.run(
             ["systemd-analyze", "security", "--no-pager", "--offline=true",
