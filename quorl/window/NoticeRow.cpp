@@ -1,7 +1,7 @@
 #include "quorl/window/NoticeRow.h"
 
 #include <QAccessibleWidget>
-#include <QHBoxLayout>
+#include <QGuiApplication>
 
 #include "quorl/window/look/FlatButton.h"
 
@@ -18,10 +18,22 @@ QAccessibleInterface* readAsNotification(const QString& /*className*/, QObject* 
                : nullptr;
 }
 
+/// What a button has on each side of its text.
+int besideText(const FlatButton& button) {
+    return (button.sizeHint().width() - button.fontMetrics().horizontalAdvance(button.text())) / 2;
+}
+
+QMargins fromStart(int start, int others) {
+    return QGuiApplication::isRightToLeft() ? QMargins(others, others, start, others)
+                                            : QMargins(start, others, others, others);
+}
+
 } // namespace
 
 NoticeRow::NoticeRow(const Notice& notice, WindowScreen& screen, QWidget* parent)
-    : QWidget(parent) {
+    : QWidget(parent),
+      line_(new QHBoxLayout(this)),
+      textAndAction_(new QBoxLayout(QBoxLayout::LeftToRight)) {
     QAccessible::installFactory(readAsNotification); // more than once does no harm
     const auto text = QString::fromStdString(notice.text);
     setAccessibleName(text);
@@ -29,20 +41,36 @@ NoticeRow::NoticeRow(const Notice& notice, WindowScreen& screen, QWidget* parent
     label->setWordWrap(true);
     label->setTextFormat(Qt::PlainText);
     label->setTextInteractionFlags(Qt::TextSelectableByMouse);
-    auto* line = new QHBoxLayout(this);
-    line->setContentsMargins(margin, margin / 2, margin / 2, margin / 2);
-    line->addWidget(label, 1);
+    line_->addLayout(textAndAction_, 1);
+    textAndAction_->addWidget(label, 1);
+    int indent = 0; // so that the text begins where that of the button does
     if (!notice.actionName.empty()) {
         auto* action = new FlatButton(screen, nullptr, this);
         action->setText(QString::fromStdString(notice.actionName));
-        line->addWidget(action, 0, Qt::AlignVCenter);
+        indent = besideText(*action);
+        textAndAction_->addWidget(action, 0, Qt::AlignLeft | Qt::AlignVCenter);
         connect(action, &QToolButton::clicked, this, [act = notice.act] { act(); });
     }
     auto* close = new FlatButton(screen, nullptr, this);
     close->setText(QStringLiteral("✕"));
     close->setAccessibleName(tr("Put the notice away"));
-    line->addWidget(close, 0, Qt::AlignTop);
+    line_->addWidget(close, 0, Qt::AlignTop);
+    line_->setContentsMargins(fromStart(margin - indent, margin / 2));
+    label->setContentsMargins(fromStart(indent, 0));
     connect(close, &QToolButton::clicked, this, &NoticeRow::putAway);
+}
+
+void NoticeRow::resizeEvent(QResizeEvent* event) {
+    QWidget::resizeEvent(event);
+    int wanted = 0;
+    for (const auto* label : findChildren<QLabel*>()) {
+        wanted += label->fontMetrics().horizontalAdvance(label->text());
+    }
+    for (const auto* button : findChildren<FlatButton*>()) {
+        wanted += button->sizeHint().width() + line_->spacing();
+    }
+    textAndAction_->setDirection(wanted <= line_->contentsRect().width() ? QBoxLayout::LeftToRight
+                                                                         : QBoxLayout::TopToBottom);
 }
 
 } // namespace quorl

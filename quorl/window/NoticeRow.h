@@ -1,5 +1,6 @@
 #pragma once
 
+#include <QBoxLayout>
 #include <QLabel>
 
 #include "quorl/app/Notices.h"
@@ -7,8 +8,9 @@
 
 namespace quorl {
 
-/// One notice in a window, with a button for what can be done and one that puts it away. To a
-/// screen reader it is a notification. Main thread.
+/// One notice in a window, with a button for what can be done, beside the text where both fit into
+/// one line and else below it, and one that puts it away. To a screen reader it is a notification.
+/// Main thread.
 class NoticeRow final : public QWidget {
     Q_OBJECT
 
@@ -18,6 +20,13 @@ class NoticeRow final : public QWidget {
 
   Q_SIGNALS:
     void putAway();
+
+  protected:
+    void resizeEvent(QResizeEvent* event) override;
+
+  private:
+    QBoxLayout* const line_;
+    QBoxLayout* const textAndAction_;
 };
 
 } // namespace quorl

@@ -1,7 +1,8 @@
 """Every command of the documents is run here, as they say and in their order, or is named below with a reason.
 
 What stands in a fence of sh is run, in a session of its own for each document. Where a fence of text follows, that is
-what it prints; "…" stands for anything. What stands in a fence of jsonl is a script of the pane.
+what it prints; "…" stands for anything. What stands in a fence of jsonl is a script of the pane. What panes.md has one do
+is done by panes_test.py.
 """
 
 import json
@@ -42,6 +43,7 @@ NOT_RUN = {
     "tests/random/random_test.py build/release/bin/quorl-script --seconds": "draws for a minute",
     "tools/build": "builds",
     "tools/fuzz": "goes on for an hour",
+    "tools/packages": "builds",
     "tools/power-cuts": "boots a kernel many times",
     "tools/try-endurance": "takes hours",
 }
@@ -106,7 +108,7 @@ class Plan:
 
 
 def plans(root, not_run):
-    return [Plan(document, not_run) for document in reading.documents(root)]
+    return [Plan(document, not_run) for document in reading.documents(root) if document.path.name != "panes.md"]
 
 
 def printed_as(expected):

@@ -4,6 +4,7 @@
 #include <QCursor>
 #include <QLocale>
 #include <QPainter>
+#include <QRegularExpression>
 #include <filesystem>
 #include <fstream>
 
@@ -23,6 +24,7 @@
 #include "services/wearable/Unseen.h"
 #include "tests/quorl/StoredPreferences.h"
 #include "tests/quorl/pages/MadeUpServices.h"
+#include "tests/quorl/pictures/DrawnTexts.h"
 #include "tests/quorl/pictures/EngineDouble.h"
 #include "tests/quorl/pictures/PictureSheet.h"
 #include "tests/quorl/window/Window.h"
@@ -156,6 +158,7 @@ class Pictures : public testing::TestWithParam<Variant> {
             QCoreApplication::processEvents();
         }
         sheet_.add(pictureOf(window.widget()));
+        texts_.append(drawnTexts(window.widget()));
     }
 
     /// A page over the Music pane, with made-up services.
@@ -179,11 +182,14 @@ class Pictures : public testing::TestWithParam<Variant> {
         return picture;
     }
 
+    void addAll();
+
     MadeUpServices services_;
     PictureSheet sheet_{GetParam().name, phone* GetParam().scale};
+    QList<QList<DrawnText>> texts_; ///< of each picture
 };
 
-TEST_P(Pictures, areAsSomebodyHasFoundThemRight) {
+void Pictures::addAll() {
     const auto stay = [](Window&) {};
     const auto back = [](Window& window) { window.widget().goBack(); };
     add(state(), stay);
@@ -205,6 +211,10 @@ TEST_P(Pictures, areAsSomebodyHasFoundThemRight) {
     });
     add(syncing(), [](Window& window) { window.click(0); });
     add(syncing(), [](Window& window) { window.click(1); });
+}
+
+TEST_P(Pictures, areAsSomebodyHasFoundThemRight) {
+    addAll();
     EXPECT_EQ(sheet_.difference(), "");
 }
 
@@ -230,6 +240,58 @@ INSTANTIATE_TEST_SUITE_P(All, Pictures,
                              std::erase(name, '-');
                              return name;
                          });
+
+/// In a language whose texts have no plain letter, and a mark at each end.
+class PseudoLanguage : public Pictures {};
+
+/// All that was drawn, a line for each text or piece of one.
+QStringList linesOf(const QList<QList<DrawnText>>& pictures) {
+    QStringList lines;
+    for (const auto& picture : pictures) {
+        for (const auto& drawn : picture) {
+            lines << drawn.text;
+        }
+    }
+    return lines;
+}
+
+TEST_P(PseudoLanguage, isSpokenInAllTexts) {
+    addAll();
+    // Names of the devices, units, and what a person has given a name to.
+    const QRegularExpression whatIsNoText(
+        QStringLiteral("\\b(Velora|Zanthe|[MG]B|AM|PM|Camera|Walkman|An old stick with a name that "
+                       "is long.*|Long Run|"
+                       "Road Trip|Two of Three|gone\\.mp3|notes/read me\\.txt)"));
+    const QRegularExpression plain(QStringLiteral("[A-Za-z]"));
+    QStringList untranslated;
+    for (auto line : linesOf(texts_)) {
+        if (line.remove(whatIsNoText).contains(plain)) {
+            untranslated << line;
+        }
+    }
+    EXPECT_EQ(untranslated.join(u'\n').toStdString(), "");
+}
+
+TEST_P(PseudoLanguage, isWrittenToItsEnds) {
+    addAll();
+    const QRegularExpression withoutEnd(QStringLiteral("⟦[^⟦⟧]*(?=⟦|$)"));
+    QStringList cut;
+    for (const auto& picture : texts_) {
+        auto all = withoutEnd.globalMatch(linesOf({picture}).join(u'\n'));
+        while (all.hasNext()) {
+            cut << all.next().captured();
+        }
+        for (const auto& drawn : picture) {
+            if (drawn.left < 0 || drawn.right > phone.width()) {
+                cut << drawn.text;
+            }
+        }
+    }
+    EXPECT_EQ(cut.join(u'\n').toStdString(), "");
+}
+
+INSTANTIATE_TEST_SUITE_P(All, PseudoLanguage,
+                         testing::Values(Variant{.name = "pseudo-language", .language = "en_XA"}));
 
 } // namespace
 

@@ -105,6 +105,28 @@ TEST_F(NoticesOfAWindow, stayAsTheyAreWhereAnotherComes) {
     EXPECT_EQ(rows().front(), before);
 }
 
+/// How far a button begins below the middle of the text beside or above it.
+int stepDown(const NoticeRow& row, const FlatButton& button) {
+    return button.geometry().top() - row.findChild<QLabel*>()->geometry().center().y();
+}
+
+TEST_F(NoticesOfAWindow, haveTheirButtonBelowATextThatFillsTheLine) {
+    notices_.set(Topic::Engine, {"full", "Try Again", [] {}});
+    notices_.set(Topic::Watching,
+                 {"There is no music folder in a place that is far away. Create it.",
+                  "Choose Another Folder For Music…", [] {}});
+    QTest::qWait(0);
+    EXPECT_LT(stepDown(*rows().front(), button(*rows().front(), "Try Again")), 0);
+
+    auto& action = button(*rows().back(), QStringLiteral("Choose Another Folder For Music…"));
+    EXPECT_GT(stepDown(*rows().back(), action), 0);
+    EXPECT_GE(action.width(), action.sizeHint().width()) << "it is cut";
+    window_.resize(1200, 300);
+    bar_.setGeometry(window_.rect());
+    QTest::qWait(0);
+    EXPECT_LT(stepDown(*rows().back(), action), 0);
+}
+
 TEST_F(NoticesOfAWindow, areNotificationsToAScreenReader) {
     notices_.set(Topic::Engine, "full");
     auto* notification = QAccessible::queryAccessibleInterface(rows().front());
