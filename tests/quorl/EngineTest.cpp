@@ -254,6 +254,10 @@ TEST(WithoutEngine, statusSaysSo) {
     QuorlProcess status({"--status"});
     EXPECT_EQ(status.end(), 0);
     EXPECT_THAT(status.output(), HasSubstr("not running; start quorl-syncd"));
+
+    QuorlProcess german({"--status"}, {{"LANGUAGE", "de"}});
+    EXPECT_EQ(german.end(), 0);
+    EXPECT_THAT(german.output(), HasSubstr("Dienst:         läuft nicht; starte quorl-syncd"));
 }
 
 TEST(WithoutEngine, statusDoesNotGuessWhatBecameOfAChoice) {

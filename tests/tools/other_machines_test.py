@@ -34,6 +34,13 @@ class OtherMachines(unittest.TestCase):
         self.assertEqual((result.stdout, result.returncode), (f"{self.cache}/quorl/sysroot-armhf\n", 0))
         self.assertFalse(self.cache.exists())
 
+    def test_another_cache_can_be_named(self):
+        environment = {"PATH": str(self.path), "QUORL_CACHE": "/elsewhere", "HOME": "/nonexistent"}
+        for command in (["sysroot", "arm64", "--prefix"], ["libdispatch", "--target", "arm64", "--prefix"]):
+            folder = subprocess.run([TOOLS / command[0], *command[1:]], capture_output=True, text=True,
+                                    env=environment, check=True).stdout.strip()
+            self.assertEqual(pathlib.Path(folder).parent, pathlib.Path("/elsewhere"))
+
     def test_a_kind_of_machine_that_is_unknown_is_told_with_those_that_are_not(self):
         for arguments in ([], ["riscv64"]):
             result = self.run_tool("sysroot", *arguments)
@@ -48,7 +55,7 @@ class OtherMachines(unittest.TestCase):
 
     def test_what_is_there_already_is_only_named(self):
         folder = self.cache / "quorl" / "sysroot-arm64"
-        folder.mkdir(parents=True)
+        (folder / "var/lib/dpkg").mkdir(parents=True)
         wanted = subprocess.run(
             ["awk", '($1 == "build" || $1 == "test") && $2 ~ /-dev$/ || $1 == "sysroot" { print $2 }',
              TOOLS.parent / "packages.txt"], capture_output=True, text=True, check=True).stdout

@@ -1,8 +1,10 @@
 #include <csignal>
+#include <limits>
 
 #include <gmock/gmock.h>
 #include <sys/wait.h>
 
+#include "platform/NSInteger.h"
 #include "tests/quorl/SampleMusic.h"
 #include "tests/quorl/StoredPreferences.h"
 #include "tests/quorl/terminal/PseudoTerminal.h"
@@ -110,7 +112,8 @@ TEST_F(Terminal, aNumberWithoutARowSaysWhichThereAre) {
     terminal.type("99\r");
     terminal.waitFor("There is no row 99. There are rows 1 to ");
     terminal.type("99999999999999999999\r");
-    terminal.waitFor("There is no row 9223372036854775807.");
+    terminal.waitFor("There is no row " + std::to_string(std::numeric_limits<NSInteger>::max()) +
+                     ".");
     terminal.type("hello\r");
     terminal.waitFor("“hello” is not understood. A number chooses,");
     EXPECT_EQ(terminal.lines()[23], ">");

@@ -1,5 +1,6 @@
 #include <QImage>
 #include <cmath>
+#include <limits>
 
 #include <gmock/gmock.h>
 
@@ -33,9 +34,11 @@ class CellLayout : public testing::TestWithParam<double> {
         return cell;
     }
 
+    /// As near as a length of the platform can be, which has 32 bits where words have.
     [[nodiscard]] bool isOnPixels(CGFloat length) const {
         const double pixels = static_cast<double>(length) * GetParam();
-        return std::abs(pixels - std::round(pixels)) < 1e-6;
+        const double step = static_cast<double>(std::numeric_limits<CGFloat>::epsilon());
+        return std::abs(pixels - std::round(pixels)) <= 4 * step * std::abs(pixels);
     }
 
     WindowScreen screen_;
