@@ -67,10 +67,12 @@ class Json {
     std::string text_;
 };
 
+/// A list that grows; empty at first.
 class JsonList : public Json {
   public:
     JsonList() : Json(Written{"[]"}) {}
 
+    /// Adds a value at the end.
     template <class Value>
     JsonList& add(const Value& value) {
         insert([&value](std::string& text) { append(text, value); });
@@ -78,7 +80,7 @@ class JsonList : public Json {
     }
 };
 
-/// Its members keep their order.
+/// An object that grows; without members at first. They keep their order.
 class JsonObject : public Json {
   public:
     JsonObject() : Json(Written{"{}"}) {}
