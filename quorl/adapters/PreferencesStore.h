@@ -59,15 +59,15 @@ class PreferencesStore final : public SyncPreferencesStore {
     [[nodiscard]] bool setValue(SyncPreference preference,
                                 std::optional<std::uint64_t> value) override;
 
+    /// Brings the copies up to date before another program's change is announced.
+    void takeValues();
+
   private:
     /// Who is told of a change, this object among them.
     struct Listeners;
 
     /// What is stored in this moment.
     [[nodiscard]] std::optional<std::uint64_t> stored(SyncPreference preference) const;
-
-    /// Brings the copies up to date.
-    void takeValues();
 
     template <class T>
     bool store(const preferences::Preference<T>& preference, const std::type_identity_t<T>& value);

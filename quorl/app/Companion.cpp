@@ -182,6 +182,7 @@ void Companion::enterBackground() {
 }
 
 void Companion::enterForeground() {
+    host_->takePreferences(); // what others have just changed may not be announced yet
     NSNotificationCenter::defaultCenter().postNotificationName_object(
         UIApplicationWillEnterForegroundNotification, nullptr);
     for (const auto& pane : navigation_->stack()) {

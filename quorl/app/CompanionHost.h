@@ -37,6 +37,9 @@ class CompanionHost final : public Host, public PageServices {
     /// on the desktop. `told` is called once it knows, or where it cannot; empty for nobody.
     void setSeen(bool isSeen, std::function<void()> told);
 
+    /// Has the panes read the preferences as they are stored in this moment.
+    void takePreferences() { store_.takeValues(); }
+
     /// Asks a person for a folder, beginning at `start`; calls `chosen` where one was chosen.
     using AskForFolder =
         std::function<void(const std::filesystem::path& start,

@@ -30,6 +30,12 @@ TEST_F(TwoStores, readWhatTheOtherHasStoredOnceItIsTold) {
         [this] { return ours_.value(SyncPreference::AssetSyncLimit) == std::optional(50U); });
 }
 
+TEST_F(TwoStores, readItEarlierWhereTheyAreToTakeIt) {
+    storePreference("asset-sync-limit", "50");
+    ours_.takeValues();
+    EXPECT_THAT(ours_.value(SyncPreference::AssetSyncLimit), Optional(50));
+}
+
 TEST_F(TwoStores, replaceWhatTheOtherHasStoredAlsoBeforeItIsTold) {
     const auto before = ours_.value(SyncPreference::AssetSyncLimit);
     EXPECT_TRUE(others_.setValue(SyncPreference::AssetSyncLimit, 50));
