@@ -4,6 +4,7 @@ that a figure is the same in each run and on each machine."""
 import pathlib
 import subprocess
 import sys
+import tempfile
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 QEMU = {"x86_64": "qemu-x86_64", "armhf": "qemu-arm", "arm64": "qemu-aarch64"}
@@ -56,3 +57,16 @@ class Counter:
         root = [] if target == "x86_64" else ["-L", output("tools/sysroot", target, "--prefix").strip()]
         output(QEMU[target], *root, "-plugin", f"file={self._plugin}", "-d", "plugin", "-D", log, program, *arguments)
         return int(log.read_text())
+
+
+def counted():
+    """The instructions of each operation on this machine, and what to hold it against."""
+    folder = built("x86_64", BURST)
+    now, besides = {}, {}
+    with tempfile.TemporaryDirectory() as scratch:
+        counter = Counter(scratch)
+        for program in (file_of(folder, target) for target in (PROGRAM, BURST)):
+            for name, beside in operations(program).items():
+                now[name] = round(counter.per_turn("x86_64", program, name))
+                besides[name] = beside
+    return now, besides
