@@ -18,7 +18,7 @@ install(
         cmake/FindDispatch.cmake resources/QuorlPane.cmake resources/register.cmake resources/registration.json.in
         resources/play.cmake
   DESTINATION ${package} COMPONENT Development)
-install(DIRECTORY examples/alarm DESTINATION ${CMAKE_INSTALL_DATADIR}/quorl/examples COMPONENT Development)
+install(DIRECTORY examples/alarm DESTINATION ${CMAKE_INSTALL_DOCDIR}/examples COMPONENT Development)
 
 # The headers of a libdispatch that is not the system's own.
 if(Dispatch_PRIVATE_LIBRARIES)
