@@ -1,14 +1,17 @@
-// Compares a sync of a whole playlist with `cp` and `sync -f` of the same files, in one run and in
-// turns, so that the figures do not depend on the machine.
+// Compares syncs with `cp` of the same files, in turn in one run, so that the figures do not depend
+// on the machine: of many small songs and of few large ones, until they outlive a loss of power;
+// and one in which nothing has changed. Tells what memory a song takes meanwhile.
 //
-//     quorl-engine-bench [DIRECTORY [SONGS [MEGABYTES-EACH]]]
+//     quorl-engine-bench [--rounds N] [--songs N] [DIRECTORY]
 //
-// Everything is made in DIRECTORY, which must not exist yet, or in a temporary one, and deleted.
+// Everything is made in DIRECTORY, or in the one for temporary files, and deleted. There are 20,000
+// small songs, or as many as `--songs` says, and a hundredth of large ones. Each figure is a line
+// of JSON: medians, and the ratios of the quarter of the rounds that did best and of the quarter
+// that did worst.
 
 #include <algorithm>
-#include <chrono>
+#include <cstdint>
 #include <cstdio>
-#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <random>
@@ -16,8 +19,11 @@
 #include <string>
 #include <vector>
 
+#include <malloc.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
+#include "bench/Comparison.h"
 #include "quorl-syncd/transfer/Sync.h"
 #include "quorl-syncd/transfer/device/PosixVolume.h"
 #include "quorl-syncd/transfer/pace/RateLimit.h"
@@ -28,12 +34,20 @@
 namespace {
 
 using namespace quorl;
-using Seconds = std::chrono::duration<double>;
+using namespace quorl::bench;
+using std::filesystem::path;
 
-constexpr int rounds = 5;
 constexpr std::uint64_t noLimit = 99;
+constexpr std::size_t small = 10'000;
+constexpr std::size_t large = 5'000'000;
 
-void makeLibrary(const std::filesystem::path& root, int songs, std::size_t bytes) {
+std::string songPath(int song) {
+    constexpr int songsOfAlbum = 20;
+    return "Album number " + std::to_string(song / songsOfAlbum) + "/" +
+           std::to_string(song % songsOfAlbum + 10) + " - Song " + std::to_string(song) + ".mp3";
+}
+
+void makeLibrary(const path& root, int songs, std::size_t bytes) {
     std::filesystem::create_directories(root);
     std::mt19937_64 random{1};
     std::string text(bytes, '\0');
@@ -43,97 +57,165 @@ void makeLibrary(const std::filesystem::path& root, int songs, std::size_t bytes
             const auto number = random();
             std::copy_n(reinterpret_cast<const char*>(&number), sizeof number, &text[at]);
         }
-        const auto name = std::to_string(song) + ".mp3";
-        std::ofstream{root / name, std::ios::binary} << text;
-        playlist << name << '\n';
+        std::filesystem::create_directories((root / songPath(song)).parent_path());
+        std::ofstream{root / songPath(song), std::ios::binary} << text;
+        playlist << songPath(song) << '\n';
     }
 }
 
-void run(const std::string& command) {
-    if (std::system(command.c_str()) != 0) {
-        throw std::runtime_error{"failed: " + command};
-    }
+std::string quoted(const path& file) { return "'" + file.string() + "'"; }
+
+void copyAll(const path& music, const path& target) {
+    const auto to = quoted(target);
+    run("cp -r " + quoted(music) + " " + to + " && sync -f " + to);
 }
 
-template <class Act>
-double secondsOf(Act act) {
-    const auto begun = std::chrono::steady_clock::now();
-    act();
-    return Seconds{std::chrono::steady_clock::now() - begun}.count();
+void update(const path& music, const path& target) {
+    run("exec cp -ru " + quoted(music) + "/. " + quoted(target));
 }
 
-double secondsOfCopy(const std::filesystem::path& music, const std::filesystem::path& target) {
-    std::filesystem::create_directories(target);
-    const auto to = target.string();
-    return secondsOf(
-        [&] { run("cp '" + music.string() + "'/*.mp3 '" + to + "' && sync -f '" + to + "'"); });
-}
+/// All songs of a library, to be synced any number of times.
+class Sending {
+  public:
+    explicit Sending(const path& music) : library_(media::scan(music)) {}
 
-double secondsOfSync(const std::filesystem::path& music, const std::filesystem::path& target) {
-    std::filesystem::create_directories(target);
-    const auto library = media::scan(music);
-    const auto& playlist = library->playlists.front();
-    const syncd::Order order{library,
-                             {playlist.id, playlist.revision, noLimit, 0},
-                             wearable::Wearable{target, {}, false}};
-    syncd::RateLimit rate;
-    syncd::PosixSongSource songs;
-    const syncd::SteadyClock clock;
-    const syncd::SyncPorts ports{
-        [](const auto& wearable) { return std::make_unique<syncd::PosixVolume>(wearable); }, songs,
-        rate, clock};
-    return secondsOf([&] {
+    void to(const path& target) {
+        const auto& playlist = library_->playlists.front();
+        const syncd::Order order{library_,
+                                 {playlist.id, playlist.revision, noLimit, 0},
+                                 wearable::Wearable{target, {}, false}};
+        const syncd::SyncPorts ports{
+            [](const auto& wearable) { return std::make_unique<syncd::PosixVolume>(wearable); },
+            songs_, rate_, clock_};
         const auto outcome = syncd::Sync(order, ports, {}, [](const syncd::CopyProgress&) {}).run();
         if (outcome.kind != syncd::Outcome::Kind::Sent) {
             throw std::runtime_error{engine::sentence(outcome.message)};
         }
-    });
-}
-
-double median(std::vector<double> values) {
-    std::ranges::sort(values);
-    return values[values.size() / 2];
-}
-
-void compare(const std::filesystem::path& root, int songs, std::size_t bytes) {
-    const auto music = root / "music";
-    makeLibrary(music, songs, bytes);
-    run("sync -f '" + root.string() + "'");
-    std::vector<double> copies;
-    std::vector<double> syncs;
-    for (int round = 0; round < rounds; ++round) {
-        // In turns, and each first in every other round.
-        for (const bool isSync : {round % 2 == 0, round % 2 != 0}) {
-            const auto target = root / "target";
-            if (isSync) {
-                syncs.push_back(secondsOfSync(music, target));
-            } else {
-                copies.push_back(secondsOfCopy(music, target));
-            }
-            std::filesystem::remove_all(target);
-            run("sync -f '" + root.string() + "'");
-        }
     }
-    const auto megabytes = static_cast<double>(songs) * static_cast<double>(bytes) / 1e6;
-    std::printf("%d songs of %.1f MB: cp and sync %.0f MB/s, engine %.0f MB/s, ratio %.2f "
-                "(medians of %d)\n",
-                songs, static_cast<double>(bytes) / 1e6, megabytes / median(copies),
-                megabytes / median(syncs), median(copies) / median(syncs), rounds);
+
+  private:
+    const std::shared_ptr<const media::Inventory> library_;
+    syncd::RateLimit rate_;
+    syncd::PosixSongSource songs_;
+    const syncd::SteadyClock clock_;
+};
+
+void makeQuiet(const path& root) { run("sync -f " + quoted(root)); }
+
+void compareCopies(const path& root, Sending& sending, int rounds, const std::string& what) {
+    Comparison wall;
+    const auto target = root / "target";
+    const auto timeOfOne = [&](bool isSync) {
+        if (isSync) {
+            std::filesystem::create_directories(target);
+        }
+        const auto time = timeOf([&] {
+            if (isSync) {
+                sending.to(target);
+            } else {
+                copyAll(root / "music", target);
+            }
+        });
+        std::filesystem::remove_all(target);
+        makeQuiet(root);
+        return time;
+    };
+    for (int round = 0; round < rounds; ++round) {
+        const bool isSyncFirst = round % 2 == 0;
+        const auto first = timeOfOne(isSyncFirst);
+        const auto second = timeOfOne(!isSyncFirst);
+        wall.add(isSyncFirst ? first : second, isSyncFirst ? second : first);
+    }
+    wall.print(what, "cp -r, sync -f");
+}
+
+void compareUpdates(const path& root, Sending& sending, int rounds) {
+    Comparison wall;
+    Comparison processor;
+    std::filesystem::create_directories(root / "target");
+    sending.to(root / "target");
+    copyAll(root / "music", root / "copies");
+    for (int round = 0; round < rounds; ++round) {
+        const auto before = processorTime();
+        const auto beforeOfChildren = processorTime(RUSAGE_CHILDREN);
+        const auto ours = timeOf([&] { sending.to(root / "target"); });
+        const auto theirs = timeOf([&] { update(root / "music", root / "copies"); });
+        wall.add(ours, theirs);
+        processor.add(processorTime() - before, processorTime(RUSAGE_CHILDREN) - beforeOfChildren);
+    }
+    wall.print("a sync in which nothing has changed", "cp -ru");
+    processor.print("a sync in which nothing has changed, processor time", "cp -ru");
+}
+
+/// Of this process; `name` as in the file.
+std::uint64_t bytesInStatus(const std::string& name) {
+    std::ifstream status("/proc/self/status");
+    std::string word;
+    while (status >> word && word != name + ":") {
+    }
+    std::uint64_t kilobytes = 0;
+    status >> kilobytes;
+    return kilobytes * 1024;
+}
+
+/// In a process of its own, so that nothing is counted that was there before.
+void measureMemory(Sending& sending, const path& target, int songs, const std::string& what) {
+    std::fflush(stdout);
+    malloc_trim(0);
+    const auto child = fork();
+    if (child == 0) {
+        std::ofstream("/proc/self/clear_refs") << 5 << std::flush; // the most is what there is now
+        const auto before = bytesInStatus("VmRSS");
+        sending.to(target);
+        std::printf(R"({"memory":"%s","bytes a song":%.0f})"
+                    "\n",
+                    what.c_str(), static_cast<double>(bytesInStatus("VmHWM") - before) / songs);
+        std::fflush(stdout);
+        _exit(0);
+    }
+    int status = 0;
+    if (child < 0 || waitpid(child, &status, 0) != child || status != 0) {
+        throw std::runtime_error("The memory cannot be measured.");
+    }
+}
+
+void measureMany(const path& root, int songs, int rounds) {
+    makeLibrary(root / "music", songs, small);
+    makeQuiet(root);
+    Sending sending(root / "music");
+    std::filesystem::create_directories(root / "first");
+    measureMemory(sending, root / "first", songs, "the first sync");
+    measureMemory(sending, root / "first", songs, "a sync in which nothing has changed");
+    std::filesystem::remove_all(root / "first");
+    compareUpdates(root, sending, rounds);
+    std::filesystem::remove_all(root / "target");
+    compareCopies(root, sending, rounds, "a sync of " + std::to_string(songs) + " songs of 10 kB");
+}
+
+void measureLarge(const path& root, int songs, int rounds) {
+    makeLibrary(root / "music", songs, large);
+    makeQuiet(root);
+    Sending sending(root / "music");
+    compareCopies(root, sending, rounds, "a sync of " + std::to_string(songs) + " songs of 5 MB");
 }
 
 } // namespace
 
 int main(int argc, char** argv) {
-    const auto root = argc > 1 ? std::filesystem::path{argv[1]}
-                               : std::filesystem::temp_directory_path() /
-                                     ("quorl-engine-bench-" + std::to_string(getpid()));
-    constexpr std::size_t megabyte = 1'000'000;
-    const int songs = argc > 2 ? std::atoi(argv[2]) : 60;
-    const auto bytes = (argc > 3 ? static_cast<std::size_t>(std::atoi(argv[3])) : 5) * megabyte;
-    try {
-        compare(root, songs, bytes);
-    } catch (const std::exception& error) {
-        std::fprintf(stderr, "quorl-engine-bench: %s\n", error.what());
+    int rounds = 5;
+    int songs = 20'000;
+    const std::vector<std::string> words(argv + 1, argv + argc);
+    for (std::size_t at = 0; at < words.size(); ++at) {
+        if (words[at] == "--rounds" && at + 1 < words.size()) {
+            rounds = std::stoi(words[++at]);
+        } else if (words[at] == "--songs" && at + 1 < words.size()) {
+            songs = std::stoi(words[++at]);
+        } else {
+            setenv("TMPDIR", words[at].c_str(), 1);
+        }
     }
-    std::filesystem::remove_all(root);
+    const Temporary temporary("quorl-engine-bench");
+    measureMany(temporary.path() + "/many", songs, rounds);
+    std::filesystem::remove_all(temporary.path() + "/many");
+    measureLarge(temporary.path() + "/large", songs / 100, rounds);
 }

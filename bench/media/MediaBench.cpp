@@ -23,18 +23,17 @@
 #include <vector>
 
 #include <poll.h>
-#include <sys/resource.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "bench/Comparison.h"
 #include "services/base/DirectoryWatch.h"
 #include "services/base/FileStatus.h"
 #include "services/media/MusicFolder.h"
 
 namespace {
 
-using Clock = std::chrono::steady_clock;
-using Seconds = std::chrono::duration<double>;
+using namespace quorl::bench;
 
 constexpr int artists = 500;
 constexpr int albumsEach = 4;
@@ -80,60 +79,8 @@ void growLibrary(const std::filesystem::path& root, int first, int end) {
     }
 }
 
-Seconds timeOf(const std::function<void()>& act) {
-    const Clock::time_point begin = Clock::now();
-    act();
-    return Clock::now() - begin;
-}
-
-/// That of this process, or of its children that have ended.
-Seconds processorTime(int whose = RUSAGE_SELF) {
-    rusage usage{};
-    getrusage(whose, &usage);
-    const auto seconds = [](const timeval& time) {
-        return Seconds(static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) / 1e6);
-    };
-    return seconds(usage.ru_utime) + seconds(usage.ru_stime);
-}
-
-double quantile(std::vector<double> values, double part) {
-    std::ranges::sort(values);
-    return values[static_cast<std::size_t>(part * static_cast<double>(values.size() - 1))];
-}
-
-/// Two ways to do the same, of which each round has one after the other: they meet the same state
-/// of the machine.
-class Comparison {
-  public:
-    void add(Seconds ours, Seconds theirs) {
-        ours_.push_back(ours.count());
-        theirs_.push_back(theirs.count());
-        ratios_.push_back(ours / theirs);
-    }
-
-    void print(const std::string& what, const std::string& beside) const {
-        std::printf(R"({"what":"%s","beside":"%s","ratio":%.3f,"spread":[%.3f,%.3f],"rounds":%zu,)"
-                    R"("seconds":[%.4f,%.4f]})"
-                    "\n",
-                    what.c_str(), beside.c_str(), quantile(ratios_, 0.5), quantile(ratios_, 0.25),
-                    quantile(ratios_, 0.75), ratios_.size(), quantile(ours_, 0.5),
-                    quantile(theirs_, 0.5));
-        std::fflush(stdout);
-    }
-
-  private:
-    std::vector<double> ours_;
-    std::vector<double> theirs_;
-    std::vector<double> ratios_;
-};
-
 void runFind(const std::filesystem::path& root) {
-    const std::string command =
-        "exec find '" + root.string() + "' -type f -printf '%s %T@\\n' >/dev/null";
-    // NOLINTNEXTLINE(concurrency-mt-unsafe): nobody changes the handling of signals here
-    if (std::system(command.c_str()) != 0) {
-        throw std::runtime_error("find failed.");
-    }
+    run("exec find '" + root.string() + "' -type f -printf '%s %T@\\n' >/dev/null");
 }
 
 void compareScan(const std::filesystem::path& root, int rounds) {
@@ -268,26 +215,6 @@ void measureGrowth(const std::filesystem::path& root, double seconds) {
     std::printf("]}\n");
 }
 
-/// A directory that is gone when it is no longer needed.
-class Temporary {
-  public:
-    Temporary() : path_(std::filesystem::temp_directory_path() / "quorl-media-bench-XXXXXX") {
-        if (mkdtemp(path_.data()) == nullptr) {
-            throw std::runtime_error("No temporary directory can be made.");
-        }
-    }
-
-    ~Temporary() { std::filesystem::remove_all(path_); }
-
-    Temporary(const Temporary&) = delete;
-    Temporary& operator=(const Temporary&) = delete;
-
-    [[nodiscard]] const std::string& path() const { return path_; }
-
-  private:
-    std::string path_;
-};
-
 void measure(const std::filesystem::path& root, int rounds) {
     if (!std::filesystem::exists(root / "Playlists")) {
         growLibrary(root, 0, artists);
@@ -319,7 +246,7 @@ int main(int argc, char** argv) {
             directory = words[at];
         }
     }
-    const Temporary temporary;
+    const Temporary temporary("quorl-media-bench");
     measure(directory.empty() ? temporary.path() + "/library" : directory, rounds);
     if (growth > 0) {
         measureGrowth(temporary.path() + "/growing", growth);
