@@ -26,11 +26,6 @@ std::string checksum(std::string_view text) {
     return {digits.data(), end.ptr};
 }
 
-std::string withHeader(std::uint64_t number, std::string_view text) {
-    const auto numbered = std::to_string(number).append("\n").append(text);
-    return checksum(numbered).append(" ").append(numbered);
-}
-
 struct Generation {
     std::uint64_t number = 0;
     std::string_view text;
@@ -46,8 +41,10 @@ std::optional<Generation> generationIn(const std::optional<std::string>& file) {
     }
     Generation generation{0, contents.substr(line + 1)};
     std::from_chars(&contents[space] + 1, &contents[line], generation.number);
-    const bool isWhole =
-        generation.number > 0 && withHeader(generation.number, generation.text) == contents;
+    const auto numbered = contents.substr(space + 1);
+    const bool isWhole = generation.number > 0 &&
+                         numbered.starts_with(std::to_string(generation.number) + "\n") &&
+                         contents.substr(0, space) == checksum(numbered);
     return isWhole ? std::optional(generation) : std::nullopt;
 }
 
@@ -65,7 +62,7 @@ std::optional<std::string> readOwnFile(int root, const char* name) {
 } // namespace
 
 StoredManifest newestManifest(const ReadOwnFile& read) {
-    const std::array files{read(generationFiles[0]), read(generationFiles[1])};
+    std::array files{read(generationFiles[0]), read(generationFiles[1])};
     const std::array generations{generationIn(files[0]), generationIn(files[1])};
     if (!generations[0] && !generations[1]) {
         if (files[0] && files[1]) {
@@ -77,17 +74,18 @@ StoredManifest newestManifest(const ReadOwnFile& read) {
     const bool isSecond =
         !generations[0] || (generations[1] && generations[1]->number > generations[0]->number);
     const auto& newest = *generations.at(isSecond ? 1 : 0);
+    files.at(isSecond ? 0 : 1).reset(); // it may be long
     return {parseManifest(newest.text), newest.number, isSecond ? 0U : 1U};
 }
 
 std::string generationText(std::uint64_t number, const Manifest& manifest, std::size_t size) {
-    auto text = toText(manifest);
-    auto whole = withHeader(number, text);
-    while (whole.size() < size) { // again where the new checksum is shorter
-        text.append(size - whole.size(), '\n');
-        whole = withHeader(number, text);
+    auto text = toText(manifest).insert(0, std::to_string(number) + "\n");
+    auto sum = checksum(text);
+    while (sum.size() + 1 + text.size() < size) { // again where the new checksum is shorter
+        text.append(size - sum.size() - 1 - text.size(), '\n');
+        sum = checksum(text);
     }
-    return whole;
+    return text.insert(0, sum + " ");
 }
 
 void requireReadable(bool isRegularFile, std::uint64_t size) {

@@ -1,7 +1,9 @@
 #include "services/wearable/Manifest.h"
 
 #include <algorithm>
+#include <array>
 #include <charconv>
+#include <concepts>
 #include <utility>
 
 #include <nlohmann/json.hpp>
@@ -22,7 +24,7 @@ struct Wrong : std::runtime_error {
 
 using nlohmann::json;
 
-constexpr int format = 1;
+constexpr std::uint64_t format = 1;
 constexpr int hexadecimal = 16;
 
 /// Paths are bytes, and JSON is UTF-8: what is not plain ASCII is kept as %XX.
@@ -63,20 +65,106 @@ std::string decoded(std::string_view text) {
     return bytes;
 }
 
-json toJson(const Entry& entry) {
-    return {{"name", entry.name},
-            {"source", encoded(entry.source)},
-            {"size", entry.size},
-            {"modified", entry.modified},
-            {"hash", entry.hash}};
+/// Most strings are written as they are.
+bool isPlain(std::string_view text) {
+    return std::ranges::all_of(
+        text, [](char byte) { return byte >= ' ' && byte <= '~' && byte != '"' && byte != '\\'; });
 }
 
-json toJson(const std::vector<Entry>& entries) {
-    auto list = json::array();
-    for (const auto& entry : entries) {
-        list.push_back(toJson(entry));
+/// The object of the manifest as text, whose members come one by one, in the order of their names.
+class Writer {
+  public:
+    explicit Writer(std::size_t size) { text_.reserve(size); }
+
+    void begin(char bracket) {
+        text_ += bracket;
+        isFirst_ = true;
+        ++depth_;
     }
-    return list;
+
+    void end(char bracket) {
+        --depth_;
+        if (!isFirst_) {
+            newLine();
+        }
+        text_ += bracket;
+        isFirst_ = false;
+    }
+
+    /// What follows is another element.
+    void next() {
+        text_ += isFirst_ ? "" : ",";
+        isFirst_ = false;
+        newLine();
+    }
+
+    /// What follows is the value of this member.
+    void key(std::string_view name) {
+        next();
+        text_.append("\"").append(name).append("\": ");
+    }
+
+    void member(std::string_view name, const std::string& value) {
+        key(name);
+        if (isPlain(value)) {
+            text_.append("\"").append(value).append("\"");
+        } else {
+            text_ += json(value).dump();
+        }
+    }
+
+    template <std::integral Number>
+    void member(std::string_view name, Number value) {
+        key(name);
+        text_ += std::to_string(value);
+    }
+
+    [[nodiscard]] std::string take() { return std::move(text_.append("\n")); }
+
+  private:
+    void newLine() { text_.append("\n").append(depth_, ' '); }
+
+    std::string text_;
+    std::size_t depth_ = 0;
+    bool isFirst_ = true;
+};
+
+void write(Writer& writer, const Entry& entry) {
+    writer.begin('{');
+    writer.member("hash", entry.hash);
+    writer.member("modified", entry.modified);
+    writer.member("name", entry.name);
+    writer.member("size", entry.size);
+    writer.member("source", encoded(entry.source));
+    writer.end('}');
+}
+
+void write(Writer& writer, const Selection& selection) {
+    writer.begin('{');
+    writer.member("limit", selection.limit);
+    writer.member("limitType", selection.limitType);
+    writer.member("playlist", selection.playlist);
+    writer.member("revision", selection.revision);
+    writer.end('}');
+}
+
+void write(Writer& writer, const std::vector<Entry>& entries) {
+    writer.begin('[');
+    for (const auto& entry : entries) {
+        writer.next();
+        write(writer, entry);
+    }
+    writer.end(']');
+}
+
+/// About as many bytes as they take as text.
+std::size_t sizeOf(const std::vector<Entry>& entries) {
+    constexpr std::size_t beside = 110;
+    std::size_t size = beside;
+    for (const auto& entry : entries) {
+        size += entry.name.size() + entry.source.size() + entry.hash.size() + beside;
+    }
+    return size;
 }
 
 /// The device may have been in other hands, and names are used to remove files.
@@ -90,62 +178,278 @@ std::string checkedName(std::string name) {
     return name;
 }
 
+constexpr auto notWellFormed = toTranslate("it is not well-formed");
+
+/// The value of a member, as far as it matters here.
+struct Field {
+    enum class Kind { Missing, Number, NegativeNumber, Text, Other };
+
+    Kind kind = Kind::Missing;
+    std::uint64_t number = 0;
+    std::int64_t negativeNumber = 0;
+    std::string text = {};
+};
+
+using Kind = Field::Kind;
+
+const std::string& textOf(const Field& field) {
+    if (field.kind != Kind::Text) {
+        throw Wrong{notWellFormed};
+    }
+    return field.text;
+}
+
 template <class Number>
-Number numberOf(const json& value) {
-    const bool fits =
-        value.is_number_unsigned()
-            ? std::in_range<Number>(value.get<std::uint64_t>())
-            : value.is_number_integer() && std::in_range<Number>(value.get<std::int64_t>());
-    if (!fits) {
-        throw Wrong{toTranslate("a number in it is not a whole one, or out of range")};
+Number numberOf(const Field& field) {
+    if (field.kind == Kind::Missing) {
+        throw Wrong{notWellFormed};
     }
-    return value.get<Number>();
-}
-
-Entry entryOf(const json& value) {
-    return {checkedName(value.at("name").get<std::string>()),
-            decoded(value.at("source").get<std::string>()),
-            numberOf<std::uint64_t>(value.at("size")), numberOf<std::int64_t>(value.at("modified")),
-            value.at("hash").get<std::string>()};
-}
-
-Selection selectionOf(const json& value) {
-    return {numberOf<std::uint64_t>(value.at("playlist")),
-            numberOf<std::uint64_t>(value.at("revision")),
-            numberOf<std::uint64_t>(value.at("limitType")),
-            numberOf<std::uint64_t>(value.at("limit"))};
-}
-
-std::vector<Entry> entriesOf(const json& list) {
-    std::vector<Entry> entries;
-    std::ranges::transform(list, std::back_inserter(entries), entryOf);
-    return entries;
-}
-
-Manifest manifestOf(const json& value) {
-    if (value.at("format") != format) {
-        throw Wrong{toTranslate("a later version has written it")};
+    if (field.kind == Kind::Number && std::in_range<Number>(field.number)) {
+        return static_cast<Number>(field.number);
     }
-    Manifest manifest{entriesOf(value.at("songs")), {}, entriesOf(value.at("strays")), {}};
-    if (value.contains("playlist")) {
-        manifest.playlist = entryOf(value.at("playlist"));
+    if (field.kind == Kind::NegativeNumber && std::in_range<Number>(field.negativeNumber)) {
+        return static_cast<Number>(field.negativeNumber);
     }
-    if (value.contains("sent")) {
-        manifest.sent = selectionOf(value.at("sent"));
-    }
-    return manifest;
+    throw Wrong{toTranslate("a number in it is not a whole one, or out of range")};
 }
 
-/// Each level costs memory many times its length.
-json parsed(std::string_view text) {
-    constexpr int deepest = 8;
-    return json::parse(text, [](int depth, json::parse_event_t /*event*/, const json& /*value*/) {
-        if (depth > deepest) {
-            throw Wrong{toTranslate("it is nested too deeply")};
+/// Of an object, those members that have these names.
+class Fields {
+  public:
+    static constexpr std::size_t most = 5;
+    using Names = std::array<std::string_view, most>;
+
+    void begin(const Names& names) {
+        names_ = &names;
+        at_ = most;
+        for (auto& field : fields_) {
+            field.kind = Kind::Missing;
+        }
+    }
+
+    /// The value of this member is the next.
+    void choose(std::string_view name) {
+        at_ = static_cast<std::size_t>(std::ranges::find(*names_, name) - names_->begin());
+    }
+
+    /// Null where it does not matter.
+    [[nodiscard]] Field* chosen() { return at_ < most ? &fields_.at(at_) : nullptr; }
+
+    [[nodiscard]] const Field& operator[](std::size_t at) const { return fields_.at(at); }
+
+  private:
+    const Names* names_ = nullptr;
+    std::array<Field, most> fields_;
+    std::size_t at_ = most;
+};
+
+constexpr Fields::Names namesOfEntry{"name", "source", "size", "modified", "hash"};
+constexpr Fields::Names namesOfSelection{"playlist", "revision", "limitType", "limit"};
+
+Entry entryOf(const Fields& fields) {
+    return {checkedName(textOf(fields[0])), decoded(textOf(fields[1])),
+            numberOf<std::uint64_t>(fields[2]), numberOf<std::int64_t>(fields[3]),
+            textOf(fields[4])};
+}
+
+Selection selectionOf(const Fields& fields) {
+    return {numberOf<std::uint64_t>(fields[0]), numberOf<std::uint64_t>(fields[1]),
+            numberOf<std::uint64_t>(fields[2]), numberOf<std::uint64_t>(fields[3])};
+}
+
+/// Takes the manifest out of its text while that is read, so that a long one is never held twice.
+/// What is wrong with a member only counts when the whole text turns out to be JSON, and nothing is
+/// wrong with those that count before it.
+class ManifestReader final : public nlohmann::json_sax<json> {
+  public:
+    /// Once all was read. Throws `Wrong`.
+    [[nodiscard]] Manifest take() {
+        if (format_.kind == Kind::Missing) {
+            throw Wrong{notWellFormed};
+        }
+        if (format_.kind != Kind::Number || format_.number != format) {
+            throw Wrong{toTranslate("a later version has written it")};
+        }
+        for (auto* const part : {&songs_, &strays_, &playlist_, &sent_}) {
+            const bool mayBeMissing = part == &playlist_ || part == &sent_;
+            if (!part->why.empty() || !(part->isThere || mayBeMissing)) {
+                throw Wrong{part->why.empty() ? notWellFormed : part->why};
+            }
+        }
+        Manifest manifest{std::move(songs_.entries), {}, std::move(strays_.entries), selection_};
+        if (playlist_.isThere) {
+            manifest.playlist = std::move(playlist_.entries.front());
+        }
+        return manifest;
+    }
+
+    bool null() override { return scalar({Kind::Other}); }
+
+    bool boolean(bool /*value*/) override { return scalar({Kind::Other}); }
+
+    bool number_integer(number_integer_t value) override {
+        return scalar({Kind::NegativeNumber, 0, value});
+    }
+
+    bool number_unsigned(number_unsigned_t value) override { return scalar({Kind::Number, value}); }
+
+    bool number_float(number_float_t /*value*/, const string_t& /*text*/) override {
+        return scalar({Kind::Other});
+    }
+
+    bool string(string_t& value) override {
+        requireShallow();
+        if (auto* const field = fieldHere()) {
+            field->kind = Kind::Text;
+            field->text = value;
+        } else {
+            odd();
         }
         return true;
-    });
-}
+    }
+
+    bool binary(binary_t& /*value*/) override { return false; }
+
+    bool start_object(std::size_t /*size*/) override {
+        const bool isEntryOfList = isInList() && depth_ == 2;
+        const bool isOnlyOne = (part_ == &playlist_ || part_ == &sent_) && depth_ == 1;
+        if (isEntryOfList || isOnlyOne) {
+            fields_.begin(part_ == &sent_ ? namesOfSelection : namesOfEntry);
+            depthOfFields_ = depth_ + 1;
+        } else if (depth_ > 0) {
+            scalar({Kind::Other});
+        }
+        return deeper();
+    }
+
+    bool key(string_t& name) override {
+        requireShallow();
+        if (depth_ == 1) {
+            begin(name);
+        } else if (depth_ == depthOfFields_) {
+            fields_.choose(name);
+        }
+        return true;
+    }
+
+    bool end_object() override {
+        if (depth_-- == depthOfFields_) {
+            depthOfFields_ = none;
+            finishFields();
+        }
+        return true;
+    }
+
+    bool start_array(std::size_t /*size*/) override {
+        if (!isInList() || depth_ != 1) {
+            scalar({Kind::Other});
+        }
+        return deeper();
+    }
+
+    bool end_array() override {
+        --depth_;
+        return true;
+    }
+
+    bool parse_error(std::size_t /*position*/, const std::string& /*token*/,
+                     const json::exception& /*error*/) override {
+        return false;
+    }
+
+  private:
+    static constexpr std::size_t none = 0;
+
+    /// A member of the manifest.
+    struct Part {
+        bool isThere = false;
+        std::vector<Entry> entries = {};
+        /// What is wrong with it; empty where nothing is.
+        std::string why = {};
+    };
+
+    [[nodiscard]] bool isInList() const { return part_ == &songs_ || part_ == &strays_; }
+
+    /// Each level costs time and memory.
+    void requireShallow() const {
+        constexpr std::size_t deepest = 8;
+        if (depth_ > deepest) {
+            throw Wrong{toTranslate("it is nested too deeply")};
+        }
+    }
+
+    bool deeper() {
+        requireShallow();
+        ++depth_;
+        return true;
+    }
+
+    /// The last of several members of one name counts.
+    void begin(std::string_view name) {
+        isFormat_ = name == "format";
+        part_ = name == "songs"      ? &songs_
+                : name == "strays"   ? &strays_
+                : name == "playlist" ? &playlist_
+                : name == "sent"     ? &sent_
+                                     : nullptr;
+        if (part_ != nullptr) {
+            *part_ = {true};
+        }
+    }
+
+    [[nodiscard]] Field* fieldHere() {
+        if (depth_ == 1 && isFormat_) {
+            return &format_;
+        }
+        return depth_ == depthOfFields_ ? fields_.chosen() : nullptr;
+    }
+
+    bool scalar(const Field& value) {
+        requireShallow();
+        if (auto* const field = fieldHere()) {
+            *field = value;
+        } else {
+            odd();
+        }
+        return true;
+    }
+
+    /// This is no list, or no entry of one.
+    void odd() {
+        const bool isPart = depth_ == 1 || (isInList() && depth_ == 2);
+        if (isPart && part_ != nullptr) {
+            isWrong(notWellFormed);
+        }
+    }
+
+    void isWrong(const std::string& why) { part_->why = part_->why.empty() ? why : part_->why; }
+
+    void finishFields() {
+        try {
+            if (part_ == &sent_) {
+                selection_ = selectionOf(fields_);
+            } else {
+                part_->entries.push_back(entryOf(fields_));
+            }
+        } catch (const Wrong& wrong) {
+            isWrong(wrong.what());
+        }
+    }
+
+    std::size_t depth_ = 0;
+    /// Of the object whose members are being collected; `none` where no such one is open.
+    std::size_t depthOfFields_ = none;
+    Fields fields_;
+    bool isFormat_ = false;
+    Field format_;
+    /// Null in one that does not matter.
+    Part* part_ = nullptr;
+    Part songs_;
+    Part strays_;
+    Part playlist_;
+    Part sent_;
+    std::optional<Selection> selection_;
+};
 
 } // namespace
 
@@ -157,18 +461,24 @@ void rejectManifest(const std::string& why) {
 }
 
 std::string toText(const Manifest& manifest) {
-    json value{
-        {"format", format}, {"songs", toJson(manifest.songs)}, {"strays", toJson(manifest.strays)}};
+    constexpr std::size_t beside = 1'000;
+    Writer writer(beside + sizeOf(manifest.songs) + sizeOf(manifest.strays));
+    writer.begin('{');
+    writer.member("format", format);
     if (manifest.playlist) {
-        value["playlist"] = toJson(*manifest.playlist);
+        writer.key("playlist");
+        write(writer, *manifest.playlist);
     }
-    if (const auto& sent = manifest.sent) {
-        value["sent"] = {{"playlist", sent->playlist},
-                         {"revision", sent->revision},
-                         {"limitType", sent->limitType},
-                         {"limit", sent->limit}};
+    if (manifest.sent) {
+        writer.key("sent");
+        write(writer, *manifest.sent);
     }
-    return value.dump(1) + "\n";
+    writer.key("songs");
+    write(writer, manifest.songs);
+    writer.key("strays");
+    write(writer, manifest.strays);
+    writer.end('}');
+    return writer.take();
 }
 
 Manifest parseManifest(std::string_view text) {
@@ -176,9 +486,11 @@ Manifest parseManifest(std::string_view text) {
         return {};
     }
     try {
-        return manifestOf(parsed(text));
-    } catch (const json::exception&) {
-        rejectManifest(toTranslate("it is not well-formed"));
+        ManifestReader reader;
+        if (!json::sax_parse(text, &reader)) {
+            throw Wrong{notWellFormed};
+        }
+        return reader.take();
     } catch (const Wrong& error) {
         rejectManifest(error.what());
     }
