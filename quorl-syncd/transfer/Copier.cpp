@@ -1,8 +1,6 @@
 #include "quorl-syncd/transfer/Copier.h"
 
 #include <algorithm>
-#include <iterator>
-#include <memory>
 #include <system_error>
 #include <utility>
 
@@ -20,9 +18,25 @@ constexpr std::size_t largestPiece = 1 << 20;
 } // namespace
 
 Copier::Copier(const Means& means, CopyProgress progress)
-    : means_(means), progress_(std::move(progress)), rule_(means.ports.clock.now()) {}
+    : means_(means),
+      progress_(std::move(progress)),
+      rule_(means.ports.clock.now()),
+      memory_(std::make_unique_for_overwrite<std::byte[]>(largestPiece)) {}
 
 std::vector<engine::Message> Copier::copy(std::vector<Entry>& songs) {
+    std::vector<engine::Message> problems;
+    try {
+        problems = copyAll(songs);
+    } catch (...) {
+        means_.ledger.songsAreThere(songs);
+        throw;
+    }
+    means_.ledger.songsAreThere(songs);
+    std::erase_if(songs, [](const Entry& song) { return song.hash.empty(); });
+    return problems;
+}
+
+std::vector<engine::Message> Copier::copyAll(std::span<Entry> songs) {
     std::vector<engine::Message> problems;
     for (auto& song : songs) {
         if (!song.hash.empty()) {
@@ -43,7 +57,6 @@ std::vector<engine::Message> Copier::copy(std::vector<Entry>& songs) {
     }
     progress_.song.clear();
     commit();
-    std::erase_if(songs, [](const Entry& song) { return song.hash.empty(); });
     return problems;
 }
 
@@ -51,8 +64,9 @@ void Copier::copySong(Entry& song) {
     const auto source =
         means_.ports.songs.open(means_.root, song.source, {song.size, song.modified});
     auto file = means_.device.createUnfinished();
+    std::string hash;
     try {
-        fill(file, *source, song);
+        hash = fill(file, *source, song);
     } catch (const std::system_error& error) {
         if (error.code() != std::errc::file_too_large) {
             throw; // whoever opened the device takes back what was begun
@@ -64,14 +78,15 @@ void Copier::copySong(Entry& song) {
         throw;
     }
     rule_.songWasCopied(song.size);
-    copied_.push_back({song, std::move(file)});
+    copied_.push_back({song, std::move(hash), std::move(file)});
 }
 
-void Copier::fill(UnfinishedFile& destination, OpenSong& source, Entry& song) {
+/// Gives back the hash of the contents.
+std::string Copier::fill(UnfinishedFile& destination, OpenSong& source, const Entry& song) {
     auto hash = copyContents(source, destination, song.size);
     source.requireUnchanged();
     destination.complete(song.modified);
-    song.hash = std::move(hash);
+    return hash;
 }
 
 /// Gives back the hash of the contents, for which they are read in any case; a copy within the
@@ -81,8 +96,7 @@ std::string Copier::copyContents(OpenSong& source, UnfinishedFile& destination,
     const bool isShared = destination.share(source.descriptor());
     const auto mostBytes = progress_.bytes + size;
     wearable::ContentHash hash;
-    const auto memory = std::make_unique_for_overwrite<std::byte[]>(largestPiece);
-    const std::span buffer(memory.get(), largestPiece);
+    const std::span buffer(memory_.get(), largestPiece);
     for (std::uint64_t copied = 0;;) {
         stopIf(means_.stop);
         const auto most = std::min(means_.ports.throttle.chunk(), largestPiece);
@@ -111,17 +125,14 @@ void Copier::pieceWasCopied(std::uint64_t bytes, std::uint64_t mostBytes) {
 /// Brings the copies onto the device, under the names that they are to have.
 void Copier::commit() {
     const auto begun = means_.ports.clock.now();
-    for (auto& copied : copied_) {
-        copied.file.sync();
-    }
-    std::ranges::for_each(copied_, [this](Copied& copied) { finish(copied); });
     if (!copied_.empty()) {
         means_.device.settle();
+        std::ranges::for_each(copied_, [this](Copied& copied) { finish(copied); });
+        means_.device.settle();
     }
-    std::vector<Entry> songs;
-    std::ranges::transform(copied_, std::back_inserter(songs),
-                           [](const Copied& copied) { return copied.song; });
-    means_.ledger.songsAreThere(songs);
+    for (auto& copied : copied_) {
+        copied.song.hash = std::move(copied.hash);
+    }
     progress_.songs += copied_.size();
     copied_.clear();
     rule_.groupWasCommitted(begun, means_.ports.clock.now());
@@ -134,7 +145,7 @@ void Copier::finish(Copied& copied) {
     while (!means_.device.finish(copied.file, song.name)) {
         means_.ledger.revoke(song.name);
         song.name = takeName(means_.names, song);
-        means_.ledger.announce(std::span(&song, 1));
+        means_.ledger.announce({song});
         means_.ledger.save();
     }
 }

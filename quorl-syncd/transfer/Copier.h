@@ -1,7 +1,10 @@
 #pragma once
 
+#include <cstddef>
 #include <filesystem>
 #include <functional>
+#include <memory>
+#include <span>
 #include <stop_token>
 #include <string>
 #include <vector>
@@ -47,11 +50,14 @@ class Copier {
     /// A song whose copy is complete, but perhaps not on the device yet.
     struct Copied {
         wearable::Entry& song;
+        std::string hash;
         UnfinishedFile file;
     };
 
+    [[nodiscard]] std::vector<engine::Message> copyAll(std::span<wearable::Entry> songs);
     void copySong(wearable::Entry& song);
-    void fill(UnfinishedFile& destination, OpenSong& source, wearable::Entry& song);
+    [[nodiscard]] std::string fill(UnfinishedFile& destination, OpenSong& source,
+                                   const wearable::Entry& song);
     [[nodiscard]] std::string copyContents(OpenSong& source, UnfinishedFile& destination,
                                            std::uint64_t size);
     void pieceWasCopied(std::uint64_t bytes, std::uint64_t mostBytes);
@@ -62,6 +68,7 @@ class Copier {
     CopyProgress progress_;
     CommitRule rule_;
     std::vector<Copied> copied_;
+    const std::unique_ptr<std::byte[]> memory_;
 };
 
 } // namespace quorl::syncd

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 #include <iterator>
-#include <unordered_set>
+#include <string_view>
 #include <utility>
 
 namespace quorl::syncd {
@@ -11,68 +11,128 @@ namespace {
 
 using wearable::Entry;
 
-template <class Entries>
-void eraseNamesOf(const Entries& named, std::vector<Entry>& entries) {
-    std::unordered_set<std::string> names;
-    std::ranges::transform(named, std::inserter(names, names.end()), &Entry::name);
-    std::erase_if(entries, [&](const Entry& entry) { return names.contains(entry.name); });
+/// Names of entries that stay as they are meanwhile.
+class Names {
+  public:
+    explicit Names(std::span<const Entry> entries) {
+        names_.reserve(entries.size());
+        std::ranges::transform(entries, std::back_inserter(names_), &Entry::name);
+        std::ranges::sort(names_);
+    }
+
+    [[nodiscard]] bool contains(std::string_view name) const {
+        return std::ranges::binary_search(names_, name);
+    }
+
+  private:
+    std::vector<std::string_view> names_;
+};
+
+/// Whether there were any.
+bool eraseNamesOf(std::span<const Entry> named, std::vector<Entry>& entries) {
+    if (named.empty() || entries.empty()) {
+        return false;
+    }
+    const Names names(named);
+    return std::erase_if(entries, [&](const Entry& entry) { return names.contains(entry.name); }) >
+           0;
 }
 
-void eraseName(const std::string& name, std::vector<Entry>& entries) {
-    std::erase_if(entries, [&](const Entry& entry) { return entry.name == name; });
+void append(std::vector<Entry> more, std::vector<Entry>& entries) {
+    if (entries.empty()) {
+        entries = std::move(more);
+    } else {
+        std::ranges::move(more, std::back_inserter(entries));
+    }
 }
 
 } // namespace
 
-Ledger::Ledger(Device& device)
-    : device_(device), manifest_(device.loadManifest()), saved_(manifest_) {}
+Ledger::Ledger(Device& device) : device_(device), manifest_(device.loadManifest()) {}
 
 void Ledger::save() {
-    if (manifest_ != saved_) {
+    if (!isSaved_) {
         device_.saveManifest(manifest_);
-        saved_ = manifest_;
+        isSaved_ = true;
     }
 }
 
-void Ledger::replaceByWhatIsThere(wearable::Manifest manifest) { manifest_ = std::move(manifest); }
+template <class Value>
+void Ledger::set(Value& value, Value changed) {
+    isSaved_ = isSaved_ && value == changed;
+    value = std::move(changed);
+}
 
-void Ledger::straysAreGone() { manifest_.strays.clear(); }
+void Ledger::addStrays(std::vector<Entry> strays) {
+    isSaved_ = isSaved_ && strays.empty();
+    append(std::move(strays), manifest_.strays);
+}
 
-void Ledger::withdrawClaim() { manifest_.sent.reset(); }
+void Ledger::keepWhatIsThere(const FindFile& find, const Hashes& hashes) {
+    isSaved_ = !forgetWhatIsNotThere(manifest_, find, hashes) && isSaved_;
+}
 
-void Ledger::putAside(const std::vector<Entry>& songs) {
+std::vector<std::string> Ledger::announced() const {
+    std::vector<std::string> names;
+    for (const auto& stray : manifest_.strays) {
+        if (stray.hash.empty()) {
+            names.push_back(stray.name);
+        }
+    }
+    return names;
+}
+
+void Ledger::straysAreGone() { set(manifest_.strays, {}); }
+
+void Ledger::withdrawClaim() { set(manifest_.sent, {}); }
+
+void Ledger::putAside(std::vector<Entry> songs) {
     eraseNamesOf(songs, manifest_.songs);
-    manifest_.strays.insert(manifest_.strays.end(), songs.begin(), songs.end());
+    addStrays(std::move(songs));
 }
 
-void Ledger::announce(std::span<const Entry> entries) {
+void Ledger::announce(std::vector<Entry> entries) {
     eraseNamesOf(entries, manifest_.strays);
-    manifest_.strays.insert(manifest_.strays.end(), entries.begin(), entries.end());
+    addStrays(std::move(entries));
 }
 
-void Ledger::revoke(const std::string& name) { eraseName(name, manifest_.strays); }
+void Ledger::revoke(const std::string& name) {
+    const auto erased =
+        std::erase_if(manifest_.strays, [&](const Entry& entry) { return entry.name == name; });
+    isSaved_ = isSaved_ && erased == 0;
+}
 
 void Ledger::songsAreThere(std::span<const Entry> songs) {
-    eraseNamesOf(songs, manifest_.strays);
-    manifest_.songs.insert(manifest_.songs.end(), songs.begin(), songs.end());
+    if (manifest_.strays.empty()) {
+        return;
+    }
+    const Names strays(manifest_.strays);
+    std::vector<Entry> there;
+    std::ranges::copy_if(songs, std::back_inserter(there), [&](const Entry& song) {
+        return !song.hash.empty() && strays.contains(song.name);
+    });
+    eraseNamesOf(there, manifest_.strays);
+    isSaved_ = isSaved_ && there.empty();
+    append(std::move(there), manifest_.songs);
 }
 
-void Ledger::playlistIsGone() { manifest_.playlist.reset(); }
+void Ledger::playlistIsGone() { set(manifest_.playlist, {}); }
 
 void Ledger::playlistIsThere(const Entry& playlist) {
     revoke(playlist.name);
-    manifest_.playlist = playlist;
+    set(manifest_.playlist, std::optional(playlist));
 }
 
-void Ledger::keepOnly(const std::vector<Entry>& songs) {
-    auto old = std::exchange(manifest_.songs, songs);
-    eraseNamesOf(songs, old);
-    eraseNamesOf(songs, manifest_.strays);
-    manifest_.strays.insert(manifest_.strays.end(), old.begin(), old.end());
+void Ledger::keepOnly(std::vector<Entry> songs) {
+    isSaved_ = !eraseNamesOf(songs, manifest_.strays) && isSaved_;
+    isSaved_ = isSaved_ && manifest_.songs == songs;
+    auto old = std::exchange(manifest_.songs, std::move(songs));
+    eraseNamesOf(manifest_.songs, old);
+    addStrays(std::move(old));
 }
 
 void Ledger::wasSent(const std::optional<wearable::Selection>& selection) {
-    manifest_.sent = selection;
+    set(manifest_.sent, selection);
 }
 
 } // namespace quorl::syncd

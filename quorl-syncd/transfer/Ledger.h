@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "quorl-syncd/transfer/Plan.h"
 #include "quorl-syncd/transfer/device/Device.h"
 #include "services/wearable/Manifest.h"
 
@@ -21,16 +22,19 @@ class Ledger {
     [[nodiscard]] const wearable::Manifest& manifest() const { return manifest_; }
 
     /// Whether the list is as the one on the device.
-    [[nodiscard]] bool isSaved() const { return manifest_ == saved_; }
+    [[nodiscard]] bool isSaved() const { return isSaved_; }
 
     /// Writes the list where it differs from the one on the device.
     void save();
 
-    /// The device was looked through: what is not in `manifest` is not there.
-    void replaceByWhatIsThere(wearable::Manifest manifest);
+    /// The device is looked through with `find`: forgets what is not there.
+    void keepWhatIsThere(const FindFile& find, const Hashes& hashes);
 
     /// Files that an earlier sync has left behind are complete songs.
     void adopt(std::span<const wearable::Entry> songs) { songsAreThere(songs); }
+
+    /// Names of files that were announced and may have come since, though the list does not say so.
+    [[nodiscard]] std::vector<std::string> announced() const;
 
     /// Files that were about to be copied or removed are not there any more.
     void straysAreGone();
@@ -39,15 +43,15 @@ class Ledger {
     void withdrawClaim();
 
     /// These songs are to be removed.
-    void putAside(const std::vector<wearable::Entry>& songs);
+    void putAside(std::vector<wearable::Entry> songs);
 
     /// Files are about to be put on the device under names that are free.
-    void announce(std::span<const wearable::Entry> entries);
+    void announce(std::vector<wearable::Entry> entries);
 
     /// What was announced under this name does not come.
     void revoke(const std::string& name);
 
-    /// Announced songs are there, complete.
+    /// Those of the songs that have a hash are there, complete, where they were announced.
     void songsAreThere(std::span<const wearable::Entry> songs);
 
     /// The playlist was removed, or is somebody else's file by now.
@@ -57,16 +61,19 @@ class Ledger {
     void playlistIsThere(const wearable::Entry& playlist);
 
     /// All other songs, and what was announced and never came, are to be removed.
-    void keepOnly(const std::vector<wearable::Entry>& songs);
+    void keepOnly(std::vector<wearable::Entry> songs);
 
     /// Everything of the selection is there; of none where nothing was sent.
     void wasSent(const std::optional<wearable::Selection>& selection);
 
   private:
+    template <class Value>
+    void set(Value& value, Value changed);
+    void addStrays(std::vector<wearable::Entry> strays);
+
     Device& device_;
     wearable::Manifest manifest_;
-    /// As it was when it was last read or written.
-    wearable::Manifest saved_;
+    bool isSaved_ = true;
 };
 
 } // namespace quorl::syncd

@@ -24,11 +24,6 @@ bool isSameTime(std::int64_t first, std::int64_t second) {
     return static_cast<std::uint64_t>(later) - static_cast<std::uint64_t>(earlier) <= tolerance;
 }
 
-std::optional<base::FileState> fileOf(const Entry& entry, const Files& files) {
-    const auto found = files.find(entry.name);
-    return found == files.end() ? std::nullopt : std::optional(found->second);
-}
-
 bool hasContentsOf(const Entry& entry, const Hashes& hashes) {
     return !entry.hash.empty() && hashes.ofCopy(entry.name) == entry.hash;
 }
@@ -45,25 +40,47 @@ bool isComplete(const Entry& entry, const std::optional<base::FileState>& file,
            hasContentsOf(entry, hashes);
 }
 
-/// By source, of which there may be an old and a new copy.
-using Index = std::unordered_multimap<std::string, const Entry*>;
+/// Entries by source, of which there may be an old and a new copy. They are mostly asked for in
+/// their order, and then nothing has to be looked up.
+class Index {
+  public:
+    explicit Index(const std::vector<Entry>& entries) : entries_(entries) {}
 
-Index indexOf(const std::vector<Entry>& entries) {
-    Index index;
-    for (const auto& entry : entries) {
-        index.emplace(entry.source, &entry);
+    /// One of the entries with this source, which `isWanted`; null: there is none.
+    template <class IsWanted>
+    const Entry* find(const std::string& source, IsWanted isWanted) {
+        const auto* const next = next_ < entries_.size() ? &entries_[next_] : nullptr;
+        const bool isNext = next != nullptr && next->source == source;
+        if (isNext && isWanted(*next)) {
+            ++next_;
+            return next;
+        }
+        if (bySource_.empty()) {
+            build();
+        }
+        const auto [begin, end] = bySource_.equal_range(source);
+        const auto found = std::find_if(begin, end, [&](const auto& each) {
+            return each.second != next && isWanted(*each.second);
+        });
+        if (found == end) {
+            return nullptr;
+        }
+        next_ = static_cast<std::size_t>(found->second - entries_.data()) + 1;
+        return found->second;
     }
-    return index;
-}
 
-/// One of the entries with this source, which `isWanted`; null: there is none.
-template <class IsWanted>
-const Entry* findIn(const Index& index, const std::string& source, IsWanted isWanted) {
-    const auto [begin, end] = index.equal_range(source);
-    const auto found =
-        std::find_if(begin, end, [&](const auto& each) { return isWanted(*each.second); });
-    return found == end ? nullptr : found->second;
-}
+  private:
+    void build() {
+        bySource_.reserve(entries_.size());
+        for (const auto& entry : entries_) {
+            bySource_.emplace(entry.source, &entry);
+        }
+    }
+
+    const std::vector<Entry>& entries_;
+    std::size_t next_ = 0;
+    std::unordered_multimap<std::string_view, const Entry*> bySource_;
+};
 
 /// A song whose time alone has changed need not be copied again.
 bool isCopyOf(const Entry& song, const Entry& copy, const Hashes& hashes) {
@@ -102,10 +119,7 @@ std::uint64_t sum(std::uint64_t first, std::uint64_t second) {
 class Matching {
   public:
     Matching(Plan& plan, const wearable::Manifest& there, const Hashes& hashes)
-        : plan_(plan),
-          hashes_(hashes),
-          songs_(indexOf(there.songs)),
-          strays_(indexOf(there.strays)) {}
+        : plan_(plan), hashes_(hashes), songs_(there.songs), strays_(there.strays) {}
 
     void add(Entry song) {
         try {
@@ -118,13 +132,17 @@ class Matching {
     }
 
     /// An old copy of a song that cannot be read now is better than none.
-    [[nodiscard]] std::vector<Entry> unwantedAmong(std::vector<Entry> songs) const {
+    [[nodiscard]] std::vector<Entry> unwantedAmong(const std::vector<Entry>& songs) const {
+        std::vector<Entry> unwanted;
+        if (std::ranges::equal(songs, plan_.songs, {}, &Entry::name, &Entry::name)) {
+            return unwanted;
+        }
         std::unordered_set<std::string_view> wanted;
         std::ranges::transform(plan_.songs, std::inserter(wanted, wanted.end()), &Entry::name);
-        std::erase_if(songs, [&](const Entry& song) {
-            return wanted.contains(song.name) || troubled_.contains(song.source);
+        std::ranges::copy_if(songs, std::back_inserter(unwanted), [&](const Entry& song) {
+            return !wanted.contains(song.name) && !troubled_.contains(song.source);
         });
-        return songs;
+        return unwanted;
     }
 
   private:
@@ -137,9 +155,9 @@ class Matching {
         bytes = sum(bytes, song.size);
     }
 
-    bool findCopy(Entry& song) const {
-        const auto* const copy = findIn(
-            songs_, song.source, [&](const Entry& each) { return isCopyOf(song, each, hashes_); });
+    bool findCopy(Entry& song) {
+        const auto* const copy = songs_.find(
+            song.source, [&](const Entry& each) { return isCopyOf(song, each, hashes_); });
         if (copy != nullptr) {
             song.name = copy->name;
             song.hash = copy->hash;
@@ -147,8 +165,8 @@ class Matching {
         return copy != nullptr;
     }
 
-    bool findStray(Entry& song) const {
-        const auto* const stray = findIn(strays_, song.source, [&](const Entry& each) {
+    bool findStray(Entry& song) {
+        const auto* const stray = strays_.find(song.source, [&](const Entry& each) {
             song.hash = hashOfBoth(song, each, hashes_);
             return !song.hash.empty();
         });
@@ -161,16 +179,18 @@ class Matching {
 
     Plan& plan_;
     const Hashes& hashes_;
-    const Index songs_;
-    const Index strays_;
+    Index songs_;
+    Index strays_;
     std::unordered_set<std::string> troubled_;
 };
 
-std::vector<Entry> without(const std::vector<Entry>& adopted, std::vector<Entry> strays) {
-    std::erase_if(strays, [&](const Entry& stray) {
-        return std::ranges::find(adopted, stray.name, &Entry::name) != adopted.end();
-    });
-    return strays;
+std::vector<Entry> without(const std::vector<Entry>& adopted, const std::vector<Entry>& strays) {
+    std::unordered_set<std::string_view> names;
+    std::ranges::transform(adopted, std::inserter(names, names.end()), &Entry::name);
+    std::vector<Entry> others;
+    std::ranges::copy_if(strays, std::back_inserter(others),
+                         [&](const Entry& stray) { return !names.contains(stray.name); });
+    return others;
 }
 
 /// The names that are there once `removed` is gone, as devices may spell them.
@@ -188,13 +208,65 @@ TakenNames takenNames(const std::vector<std::string>& names, const std::vector<E
     return taken;
 }
 
-void choosePlaylist(Plan& plan, const Order& order, const std::optional<Entry>& there) {
+/// Without a name where there is none of this title yet.
+Entry playlistOf(const Order& order, const std::vector<Entry>& songs,
+                 const std::optional<Entry>& there) {
     const auto& title = order.playlist().name;
-    const auto text = playlistText(order, plan.songs);
+    const auto text = playlistText(order, songs);
     const bool isNew = !there || there->source != title;
-    plan.playlist = Entry{isNew ? plan.names.take(title + ".m3u8") : there->name, title,
-                          text.size(), 0, hashOf(text)};
+    return {isNew ? "" : there->name, title, text.size(), 0, hashOf(text)};
 }
+
+bool isToBeCopied(const Entry& song) { return song.hash.empty(); }
+
+/// The names on the device are only looked at where something is to get one.
+void giveNames(Plan& plan, const Order& order, const std::optional<Entry>& playlistThere,
+               const std::vector<std::string>& names) {
+    const bool isAnyCopied = std::ranges::any_of(plan.songs, isToBeCopied);
+    if (isAnyCopied) {
+        plan.names = takenNames(names, plan.useless);
+    }
+    for (auto& song : plan.songs) {
+        if (isToBeCopied(song)) {
+            song.name = takeName(plan.names, song);
+        }
+    }
+    if (order.isRemoval()) {
+        return;
+    }
+    plan.playlist = playlistOf(order, plan.songs, playlistThere);
+    if (!isAnyCopied && plan.playlist != playlistThere) {
+        plan.names = takenNames(names, plan.useless);
+    }
+    if (plan.playlist->name.empty()) {
+        plan.playlist->name = plan.names.take(order.playlist().name + ".m3u8");
+    }
+}
+
+/// Which name a song has on the device, asked for in the order of the playlist.
+class NamesBySource {
+  public:
+    explicit NamesBySource(const std::vector<Entry>& songs) : songs_(songs) {}
+
+    /// Empty where it is none of the songs.
+    [[nodiscard]] std::string_view of(const std::string& source) {
+        if (next_ < songs_.size() && songs_[next_].source == source) {
+            return songs_[next_++].name;
+        }
+        if (names_.empty()) {
+            for (const auto& song : songs_) {
+                names_.emplace(song.source, song.name);
+            }
+        }
+        const auto found = names_.find(source);
+        return found == names_.end() ? std::string_view() : found->second;
+    }
+
+  private:
+    const std::vector<Entry>& songs_;
+    std::size_t next_ = 0;
+    std::unordered_map<std::string_view, std::string_view> names_;
+};
 
 } // namespace
 
@@ -207,23 +279,23 @@ bool isOurPlaylist(const Entry& playlist, const std::optional<base::FileState>& 
     return file && file->size == playlist.size && hasContentsOf(playlist, hashes);
 }
 
-wearable::Manifest whatIsThere(wearable::Manifest manifest, const Files& files,
-                               const Hashes& hashes) {
-    std::erase_if(manifest.strays,
-                  [&](const Entry& stray) { return !isOurs(stray, fileOf(stray, files), hashes); });
-    const auto lost = std::erase_if(manifest.songs, [&](const Entry& song) {
-        return !isComplete(song, fileOf(song, files), hashes);
+bool forgetWhatIsNotThere(wearable::Manifest& manifest, const FindFile& find,
+                          const Hashes& hashes) {
+    const auto strays = std::erase_if(manifest.strays, [&](const Entry& stray) {
+        return !isOurs(stray, find(stray.name), hashes);
+    });
+    const auto songs = std::erase_if(manifest.songs, [&](const Entry& song) {
+        return !isComplete(song, find(song.name), hashes);
     });
     const auto& playlist = manifest.playlist;
-    const bool isPlaylistLost =
-        playlist && !isOurPlaylist(*playlist, fileOf(*playlist, files), hashes);
+    const bool isPlaylistLost = playlist && !isOurPlaylist(*playlist, find(playlist->name), hashes);
     if (isPlaylistLost) {
         manifest.playlist.reset();
     }
-    if (lost > 0 || isPlaylistLost) {
+    if (songs > 0 || isPlaylistLost) {
         manifest.sent.reset();
     }
-    return manifest;
+    return strays > 0 || songs > 0 || isPlaylistLost;
 }
 
 std::string takeName(TakenNames& names, const Entry& song) {
@@ -239,15 +311,7 @@ Plan planOf(const Order& order, const wearable::Manifest& there,
     }
     plan.useless = without(plan.adopted, there.strays);
     plan.unwanted = matching.unwantedAmong(there.songs);
-    plan.names = takenNames(names, plan.useless);
-    for (auto& song : plan.songs) {
-        if (song.hash.empty()) {
-            song.name = takeName(plan.names, song);
-        }
-    }
-    if (!order.isRemoval()) {
-        choosePlaylist(plan, order, there.playlist);
-    }
+    giveNames(plan, order, there.playlist, names);
     return plan;
 }
 
@@ -274,19 +338,16 @@ Files removable(Files unfinished, const Files& finished) {
 }
 
 std::string playlistText(const Order& order, const std::vector<Entry>& songs) {
-    std::unordered_map<std::string_view, std::string_view> names;
-    for (const auto& song : songs) {
-        names.emplace(song.source, song.name);
-    }
+    NamesBySource names(songs);
     auto title = order.playlist().name;
     std::ranges::replace_if(
         title, [](unsigned char byte) { return byte < ' '; }, ' ');
     std::string text = "#EXTM3U\n#PLAYLIST:" + title + "\n";
     for (const auto index : songsWithinLimit(order)) {
-        const auto name = names.find(order.library->songs[index].path());
-        if (name != names.end()) {
+        const auto name = names.of(order.library->songs[index].path());
+        if (!name.empty()) {
             // What begins with # would be a comment.
-            text.append(name->second.starts_with('#') ? "./" : "").append(name->second) += '\n';
+            text.append(name.starts_with('#') ? "./" : "").append(name) += '\n';
         }
     }
     return text;

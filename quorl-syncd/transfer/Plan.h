@@ -40,10 +40,12 @@ using Files = std::map<std::string, base::FileState>;
 [[nodiscard]] bool isOurPlaylist(const wearable::Entry& playlist,
                                  const std::optional<base::FileState>& file, const Hashes& hashes);
 
-/// The part of `manifest` that is true of a device.
-/// @param files those that the manifest names, where they are there.
-[[nodiscard]] wearable::Manifest whatIsThere(wearable::Manifest manifest, const Files& files,
-                                             const Hashes& hashes);
+/// Looks for a regular file in a music directory, by name; nothing where there is none.
+using FindFile = std::function<std::optional<base::FileState>(const std::string& name)>;
+
+/// Leaves the part of `manifest` that is true of a device. Whether there was another.
+[[nodiscard]] bool forgetWhatIsNotThere(wearable::Manifest& manifest, const FindFile& find,
+                                        const Hashes& hashes);
 
 /// What an order asks for on a certain device.
 struct Plan {
@@ -58,7 +60,7 @@ struct Plan {
     std::vector<wearable::Entry> unwanted;
     /// The playlist as it will be if all songs can be copied; nothing where none is to be there.
     std::optional<wearable::Entry> playlist;
-    /// All names that are there, or are to be.
+    /// All names that are there, or are to be; none where nothing is to get a name.
     TakenNames names;
     /// Of all songs; those that are there already are done.
     CopyProgress progress;
@@ -67,7 +69,7 @@ struct Plan {
     std::vector<engine::Message> problems;
 };
 
-/// @param there as `whatIsThere` has given it.
+/// @param there as `forgetWhatIsNotThere` has left it.
 /// @param names of all that is in the device's music directory, whoever put it there.
 [[nodiscard]] Plan planOf(const Order& order, const wearable::Manifest& there,
                           const std::vector<std::string>& names, const Hashes& hashes);

@@ -22,21 +22,6 @@ using wearable::Entry;
 
 namespace code = engine::code;
 
-Files filesOf(const wearable::Manifest& manifest, Device& device) {
-    Files files;
-    const auto look = [&](const Entry& entry) {
-        if (const auto file = device.find(entry.name)) {
-            files.emplace(entry.name, *file);
-        }
-    };
-    std::ranges::for_each(manifest.strays, look);
-    std::ranges::for_each(manifest.songs, look);
-    if (manifest.playlist) {
-        look(*manifest.playlist);
-    }
-    return files;
-}
-
 enum class Stage { Finished, Unfinished };
 
 Files filesAmong(const std::vector<std::string>& names, Stage stage, Device& device) {
@@ -109,7 +94,7 @@ void Sync::perform(Device& device) {
     takeStock(device);
     requireRoom(device);
     told_(plan_.progress);
-    device.settle(); // an earlier sync may have been killed before it was durable
+    settlePast(device);
     if (isDone()) {
         return;
     }
@@ -123,24 +108,41 @@ void Sync::perform(Device& device) {
 /// What has been copied counts next time, if the device still can be written to. What could not be
 /// made durable counts for nothing, for the system takes it for durable from then on.
 void Sync::cleanUp(Device& device) {
-    try {
-        device.discardUnsettled();
-        if (ledger_) {
-            ledger_->save();
+    constexpr int tries = 3;
+    for (int each = 0; each < tries; ++each) {
+        try {
+            device.discardUnsettled();
+            if (ledger_ && device.isPastDurable()) {
+                ledger_->save();
+            }
+            return;
+        } catch (const std::system_error&) {
+            // The failure that is under way says more; but what cannot be made durable now is to be
+            // given up as well.
         }
-    } catch (const std::system_error&) {
-        // The failure that is under way says more.
     }
 }
 
 void Sync::takeStock(Device& device) {
     ledger_.emplace(device);
-    const auto files = filesOf(ledger_->manifest(), device);
     const auto names = device.musicNames();
     const auto ask = hashes(device);
-    ledger_->replaceByWhatIsThere(whatIsThere(ledger_->manifest(), files, ask));
+    const auto find = [&](const std::string& name) {
+        auto file = device.find(name);
+        if (!file) {
+            missing_.push_back(name);
+        }
+        return file;
+    };
+    ledger_->keepWhatIsThere(find, ask);
     plan_ = planOf(order_, ledger_->manifest(), names, ask);
     leftovers_ = leftoversAmong(names, device);
+}
+
+/// An earlier sync may have been killed before it was durable.
+void Sync::settlePast(Device& device) {
+    device.mayBeUnsettled(ledger_->announced(), missing_);
+    device.settle();
     ledger_->adopt(plan_.adopted);
 }
 
@@ -179,15 +181,16 @@ std::optional<wearable::Selection> Sync::claim() const {
 }
 
 bool Sync::isDone() const {
-    const wearable::Manifest wished{plan_.songs, plan_.playlist, {}, claim()};
-    return ledger_->isSaved() && ledger_->manifest() == wished && plan_.problems.empty() &&
-           leftovers_.empty();
+    const auto& there = ledger_->manifest();
+    return ledger_->isSaved() && there.strays.empty() && there.sent == claim() &&
+           there.playlist == plan_.playlist && there.songs == plan_.songs &&
+           plan_.problems.empty() && leftovers_.empty();
 }
 
 void Sync::beginChanges(Device& device) {
     ledger_->withdrawClaim();
     if (room_ == Room::EnoughWithoutUnwanted) {
-        ledger_->putAside(plan_.unwanted);
+        ledger_->putAside(std::exchange(plan_.unwanted, {}));
     }
     ledger_->save();
     for (const auto& [name, file] : leftovers_) {
@@ -212,7 +215,7 @@ void Sync::announce() {
     std::vector<Entry> coming;
     std::ranges::copy_if(plan_.songs, std::back_inserter(coming), &std::string::empty,
                          &Entry::hash);
-    ledger_->announce(coming);
+    ledger_->announce(std::move(coming));
     ledger_->save();
 }
 
@@ -243,7 +246,7 @@ void Sync::writePlaylist(Device& device, Entry& playlist) {
     }
     auto file = device.createUnfinished();
     file.write(std::as_bytes(std::span(text)));
-    file.sync();
+    device.settle();
     removePlaylist(device);
     putPlaylist(device, playlist, file);
     device.settle();
@@ -252,7 +255,7 @@ void Sync::writePlaylist(Device& device, Entry& playlist) {
 
 void Sync::putPlaylist(Device& device, Entry& playlist, const UnfinishedFile& file) {
     for (;;) {
-        ledger_->announce(std::span(&playlist, 1));
+        ledger_->announce({playlist});
         ledger_->save();
         if (device.finish(file, playlist.name)) {
             return;
@@ -291,7 +294,7 @@ void Sync::removeStrays(Device& device) {
 /// a song that cannot be sent now is better than none.
 void Sync::keepOnlyWhatIsWished(Device& device) {
     if (plan_.problems.empty()) {
-        ledger_->keepOnly(plan_.songs);
+        ledger_->keepOnly(std::exchange(plan_.songs, {}));
         if (!ledger_->manifest().strays.empty()) {
             ledger_->save();
             removeStrays(device);
@@ -307,7 +310,8 @@ Outcome Sync::outcome() const {
     }
     if (plan_.problems.empty()) {
         const auto leftOut = order_.library->leftOutOf(order_.playlist()).size();
-        return {Outcome::Kind::Sent, synced(plan_.songs.size(), leftOut), false, false};
+        return {Outcome::Kind::Sent, synced(ledger_->manifest().songs.size(), leftOut), false,
+                false};
     }
     // A song that can be read again, or stays as it is, tells nobody.
     return {Outcome::Kind::Failed, notAllSent(plan_.problems), true, true, plan_.problems};

@@ -41,6 +41,7 @@ class Sync {
 
     void takeStock(Device& device);
     void requireRoom(Device& device);
+    void settlePast(Device& device);
     [[nodiscard]] std::optional<wearable::Selection> claim() const;
     [[nodiscard]] bool isDone() const;
     void beginChanges(Device& device);
@@ -65,6 +66,8 @@ class Sync {
 
     /// Nothing before the device's list was read.
     std::optional<Ledger> ledger_;
+    /// Names that the device's list has, and no file.
+    std::vector<std::string> missing_;
     Plan plan_;
     /// Unfinished files of earlier syncs, which may be removed.
     Files leftovers_;

@@ -26,13 +26,14 @@ char upperCase(char letter) {
     return letter >= 'a' && letter <= 'z' ? static_cast<char>(letter - 'a' + 'A') : letter;
 }
 
-std::string readToEnd(Reader& reader) {
+std::string readToEnd(Reader& reader, std::uint64_t size) {
     constexpr std::size_t pieceSize = 65536;
     std::string text;
+    text.reserve(static_cast<std::size_t>(size));
     const auto memory = std::make_unique_for_overwrite<char[]>(pieceSize);
     const std::span piece(memory.get(), pieceSize);
-    while (const auto size = reader.read(std::as_writable_bytes(piece))) {
-        text.append(piece.data(), size);
+    while (const auto count = reader.read(std::as_writable_bytes(piece))) {
+        text.append(piece.data(), count);
     }
     return text;
 }
@@ -60,7 +61,7 @@ void Device::makeDirectories() {
         made.push_back(Directory::Own);
     }
     if (!made.empty()) {
-        makeDurable(made);
+        syncTop(made);
     }
 }
 
@@ -76,7 +77,7 @@ bool Device::makeOwn() {
     return volume_->makeDirectory(Directory::Own);
 }
 
-void Device::makeDurable(const std::vector<Directory>& made) {
+void Device::syncTop(const std::vector<Directory>& made) {
     try {
         volume_->syncDirectory(Directory::Top);
     } catch (const std::system_error&) {
@@ -95,7 +96,7 @@ std::optional<std::string> Device::readOwn(const std::string& name) {
     }
     const auto file = volume_->find(Directory::Own, name);
     wearable::requireReadable(file.has_value(), file ? file->size : 0);
-    return readToEnd(*volume_->open(Directory::Own, name));
+    return readToEnd(*volume_->open(Directory::Own, name), file->size);
 }
 
 wearable::Manifest Device::loadManifest() {
@@ -105,19 +106,36 @@ wearable::Manifest Device::loadManifest() {
     return std::move(stored.manifest);
 }
 
-void Device::writeGeneration(const std::string& name, const wearable::Manifest& manifest) {
-    const auto old = volume_->find(Directory::Own, name);
-    // It was read, or made by us, and so fits the memory.
-    const auto size = static_cast<std::size_t>(old.value_or(base::FileState()).size);
-    const auto text = wearable::generationText(generation_ + 1, manifest, size);
+/// Of what an earlier sync has left there, the name may be lost, though the system does not know.
+/// So the file is made anew, and its name durable while nobody believes what is in it.
+std::unique_ptr<VolumeFile> Device::openGeneration(std::size_t index) {
+    const std::string name = wearable::generationFiles.at(index);
+    if (isOurs_.at(index)) {
+        return volume_->overwrite(Directory::Own, name);
+    }
+    removeIfThere(Directory::Own, name);
+    auto file = volume_->create(Directory::Own, name);
+    file->sync();
+    volume_->syncDirectory(Directory::Own);
+    isOurs_.at(index) = true;
+    return file;
+}
+
+void Device::writeGeneration(std::size_t index, const wearable::Manifest& manifest) {
+    const std::string name = wearable::generationFiles.at(index);
     try {
-        const auto file =
-            old ? volume_->overwrite(Directory::Own, name) : volume_->create(Directory::Own, name);
+        const auto file = openGeneration(index);
+        // It was made by us, and so fits the memory.
+        const auto old = volume_->find(Directory::Own, name).value_or(base::FileState());
+        const auto text =
+            wearable::generationText(generation_ + 1, manifest, static_cast<std::size_t>(old.size));
         file->write(std::as_bytes(std::span(text)));
         file->sync();
         volume_->syncDirectory(Directory::Own);
     } catch (const std::system_error&) {
         // What could not be made durable must not be taken for it by the next sync either.
+        isUnsure_ = true;
+        isOurs_.at(index) = false;
         tryTo([&] { removeIfThere(Directory::Own, name); });
         throw;
     }
@@ -125,10 +143,9 @@ void Device::writeGeneration(const std::string& name, const wearable::Manifest& 
 
 void Device::saveManifest(const wearable::Manifest& manifest) {
     if (!isPastDurable_) {
-        volume_->sync();
-        isPastDurable_ = true;
+        settle();
     }
-    writeGeneration(wearable::generationFiles.at(nextFile_), manifest);
+    writeGeneration(nextFile_, manifest);
     nextFile_ = 1 - nextFile_;
     ++generation_;
     if (generation_ == wearable::generationFiles.size()) {
@@ -156,7 +173,24 @@ void Device::removeIfThere(Directory directory, const std::string& name) {
     }
 }
 
-void Device::removeMusic(const std::string& name) { removeIfThere(Directory::Music, name); }
+void Device::removeMusic(const std::string& name) {
+    removed_.insert(name);
+    removeIfThere(Directory::Music, name);
+}
+
+/// The system may believe that a name is gone for good that is not. Where one comes and goes again,
+/// it writes that it is gone.
+void Device::removeOnceMore(const std::string& name) {
+    try {
+        static_cast<void>(volume_->create(Directory::Music, name));
+    } catch (const std::system_error& error) {
+        if (error.code() == std::errc::file_exists) {
+            return; // it is somebody else's by now
+        }
+        throw;
+    }
+    volume_->remove(Directory::Music, name);
+}
 
 bool Device::isUnfinished(std::string_view name) {
     std::string upper(name);
@@ -170,11 +204,8 @@ bool Device::isUnfinished(std::string_view name) {
 }
 
 UnfinishedFile Device::createUnfinished() {
-    for (int number = 1;; ++number) {
-        auto name = unfinishedName(number);
-        if (unsettled_.contains(name)) {
-            continue;
-        }
+    for (;;) {
+        auto name = unfinishedName(number_++);
         try {
             auto file = volume_->create(Directory::Music, name);
             unsettled_.insert(name);
@@ -198,24 +229,45 @@ bool Device::finish(const UnfinishedFile& file, const std::string& name) {
     }
     unsettled_.erase(file.name());
     unsettled_.insert(name);
+    removed_.erase(name);
     return true;
 }
 
+void Device::mayBeUnsettled(const std::vector<std::string>& given,
+                            const std::vector<std::string>& taken) {
+    unsettled_.insert(given.begin(), given.end());
+    removed_.insert(taken.begin(), taken.end());
+}
+
 void Device::settle() {
-    volume_->sync();
-    volume_->syncDirectory(Directory::Music);
+    try {
+        volume_->sync();
+        volume_->syncDirectory(Directory::Music);
+    } catch (const std::system_error&) {
+        isUnsure_ = true;
+        isPastLost_ = isPastLost_ || !isPastDurable_;
+        throw;
+    }
+    isPastDurable_ = !isPastLost_;
+    removed_.clear();
     std::erase_if(unsettled_, [](const std::string& name) { return !isUnfinished(name); });
+    number_ = unsettled_.empty() ? 1 : number_;
 }
 
 void Device::discard(const UnfinishedFile& file) {
-    removeMusic(file.name());
+    removeIfThere(Directory::Music, file.name());
     unsettled_.erase(file.name());
 }
 
 void Device::discardUnsettled() {
-    while (!unsettled_.empty()) {
+    const auto removed = removed_;
+    for (; !unsettled_.empty(); unsettled_.erase(unsettled_.begin())) {
         removeMusic(*unsettled_.begin());
-        unsettled_.erase(unsettled_.begin());
+    }
+    if (isUnsure_) {
+        std::ranges::for_each(removed, [this](const auto& name) { removeOnceMore(name); });
+        settle();
+        isUnsure_ = false;
     }
 }
 

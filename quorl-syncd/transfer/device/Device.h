@@ -1,5 +1,6 @@
 #pragma once
 
+#include <array>
 #include <cstdint>
 #include <memory>
 #include <optional>
@@ -25,6 +26,10 @@ namespace quorl::syncd {
 /// On FAT a loss of power may leave a file without its name, or a name without its file; within a
 /// rename, both names or none; and a name only tells where its file is once the file was made
 /// durable under it. So a file counts only after `settle`.
+///
+/// Where something could not be made durable, the system takes it for durable from then on, whoever
+/// wrote it. So what an earlier sync may have left unsettled is given up with what this one has not
+/// settled; and a list is only ever valid under a name that is durable.
 class Device {
   public:
     /// Makes the directories that we need.
@@ -35,8 +40,8 @@ class Device {
     [[nodiscard]] wearable::Manifest loadManifest();
 
     /// Puts it in the place of the old one, and returns once it outlives a loss of power, as does
-    /// everything that was done before. At every moment one of the two can be read. A save that
-    /// failed leaves open which of them it is, until the next one.
+    /// everything that earlier syncs have done. At every moment one of the two can be read. A save
+    /// that failed leaves open which of them it is, until the next one.
     void saveManifest(const wearable::Manifest& manifest);
 
     /// What may still be written, in bytes.
@@ -62,37 +67,60 @@ class Device {
     /// Makes an empty file in the music directory.
     [[nodiscard]] UnfinishedFile createUnfinished();
 
-    /// Gives a file that is complete and synced its name. False: there is something of that name
+    /// Gives a file that is complete and settled its name. False: there is something of that name
     /// already, and the file is as it was. Only counts after `settle`.
     [[nodiscard]] bool finish(const UnfinishedFile& file, const std::string& name);
 
-    /// Waits until all that was finished and removed outlives a loss of power. Where it fails,
-    /// nothing that was finished since the last time may be trusted; `discardUnsettled` is due.
+    /// Names in the music directory that an earlier sync may have given or taken away without
+    /// having settled that.
+    /// @param given to files of ours.
+    /// @param taken that no file has.
+    void mayBeUnsettled(const std::vector<std::string>& given,
+                        const std::vector<std::string>& taken);
+
+    /// Waits until all that was written, finished and removed outlives a loss of power. Where it
+    /// fails, nothing of that since the last time may be trusted; `discardUnsettled` is due.
     void settle();
+
+    /// Whether all that earlier syncs have left is settled.
+    [[nodiscard]] bool isPastDurable() const { return isPastDurable_; }
 
     /// Removes an unfinished file.
     void discard(const UnfinishedFile& file);
 
-    /// Removes all that was created and not settled.
+    /// Removes all that was created and not settled. Where something could not be made durable,
+    /// also removes once more what was removed and not settled, and settles that.
     void discardUnsettled();
 
   private:
     [[nodiscard]] bool makeOwn();
-    void makeDurable(const std::vector<Volume::Directory>& made);
+    void syncTop(const std::vector<Volume::Directory>& made);
     [[nodiscard]] std::optional<std::string> readOwn(const std::string& name);
     void makeDirectories();
-    void writeGeneration(const std::string& name, const wearable::Manifest& manifest);
+    void writeGeneration(std::size_t index, const wearable::Manifest& manifest);
+    [[nodiscard]] std::unique_ptr<VolumeFile> openGeneration(std::size_t index);
     void removeIfThere(Volume::Directory directory, const std::string& name);
+    void removeOnceMore(const std::string& name);
 
     const std::unique_ptr<Volume> volume_;
 
     std::uint64_t generation_ = 0;
     std::size_t nextFile_ = 0;
-    /// What earlier syncs have left to the system is durable.
+    /// Whether this sync has made the file of the list, and its name durable.
+    std::array<bool, wearable::generationFiles.size()> isOurs_{};
+
     bool isPastDurable_ = false;
+    /// And never will be.
+    bool isPastLost_ = false;
+    /// Something could not be made durable, and what was not settled then was not given up yet.
+    bool isUnsure_ = false;
 
     /// Files in the music directory, by their present names.
     std::set<std::string> unsettled_;
+    /// Names there that were taken away and not settled.
+    std::set<std::string> removed_;
+    /// For the next unfinished file.
+    int number_ = 1;
 };
 
 } // namespace quorl::syncd

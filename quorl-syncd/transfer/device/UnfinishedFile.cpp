@@ -9,6 +9,9 @@ namespace {
 /// So that little is left to wait for at the end, and progress is not far ahead of the device.
 constexpr std::uint64_t mostHeldBack = 16 << 20;
 
+/// Less is better begun with others.
+constexpr std::uint64_t worthBeginning = 1 << 20;
+
 } // namespace
 
 UnfinishedFile::UnfinishedFile(std::string name, std::unique_ptr<VolumeFile> file)
@@ -25,7 +28,10 @@ void UnfinishedFile::write(std::span<const std::byte> bytes) {
 
 void UnfinishedFile::complete(std::int64_t modified) {
     file_->setModified(modified);
-    file_->flush();
+    if (heldBack_ >= worthBeginning) {
+        file_->flush();
+    }
+    file_.reset();
 }
 
 } // namespace quorl::syncd

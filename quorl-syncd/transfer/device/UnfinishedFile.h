@@ -23,16 +23,13 @@ class UnfinishedFile {
     /// to be written. False: the device cannot, and the file is as it was.
     [[nodiscard]] bool share(int descriptor) { return file_->share(descriptor); }
 
-    /// Appends. What is written need not be on the device before `sync`.
+    /// Appends. What is written need not be on the device before `Device::settle`.
     void write(std::span<const std::byte> bytes);
 
-    /// Nothing more is written. Gives the file its modification time, in nanoseconds since 1970,
-    /// where the device keeps any, and has the device begin with what it still holds back.
+    /// Nothing more is written: gives the file its modification time, in nanoseconds since 1970,
+    /// where the device keeps any, has the device begin with much that it still holds back, and
+    /// closes the file.
     void complete(std::int64_t modified);
-
-    /// Waits until the contents outlive a loss of power. One that has failed must not be tried
-    /// again: the system takes for written what it could not write.
-    void sync() { file_->sync(); }
 
   private:
     std::string name_;

@@ -6,8 +6,8 @@ namespace quorl::syncd {
 
 namespace {
 
-/// All copies of a group are open at a time.
-constexpr std::size_t mostSongs = 16;
+/// Names of unfinished files have three digits.
+constexpr std::size_t mostSongs = 500;
 constexpr std::uint64_t smallestLimit = std::uint64_t{16} << 20;
 constexpr std::uint64_t largestLimit = std::uint64_t{512} << 20;
 constexpr std::chrono::seconds longest{1};

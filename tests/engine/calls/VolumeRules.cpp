@@ -157,17 +157,21 @@ std::string VolumeRules::judgeInOwn(const Step& step) {
         return beginGeneration(file);
     }
     if (operation == "write" && isCurrent) {
+        if (!durableLists_.contains(file)) {
+            return "a list is written before its name is durable";
+        }
+        generation_->isSynced = false;
         generation_->text += detail;
         const auto manifest = manifestIn(generation_->text);
         return manifest ? judgeContents(*manifest) : "";
     }
     if (operation == "fsync" && isCurrent) {
         generation_->isSynced = true;
-        return manifestIn(generation_->text) ? "" : "a list is not whole";
+        const bool isWhole = generation_->text.empty() || manifestIn(generation_->text);
+        return isWhole ? "" : "a list is not whole";
     }
-    if (operation == "remove" && isCurrent) {
-        generation_.reset();
-        return {};
+    if (operation == "remove" && isGeneration(file)) {
+        return removeGeneration(file);
     }
     const bool isFormer = file == std::string(own) + wearable::formerManifestFile;
     return operation == "remove" && isFormer ? "" : "an operation that is none of ours";
@@ -183,6 +187,14 @@ std::string VolumeRules::beginGeneration(const std::string& file) {
         return "a list is written before its directory is durable";
     }
     return file == newestFile_ ? "the newest list is written over" : "";
+}
+
+std::string VolumeRules::removeGeneration(const std::string& file) {
+    durableLists_.erase(file);
+    if (generation_ && generation_->file == file) {
+        generation_.reset();
+    }
+    return file == newestFile_ ? "the newest list is removed" : "";
 }
 
 bool VolumeRules::mayBeLost(const std::string& name) const {
@@ -201,7 +213,10 @@ std::string VolumeRules::judgeContents(const wearable::Manifest& manifest) const
 }
 
 void VolumeRules::generationIsDurable() {
-    if (generation_ && generation_->isSynced) {
+    if (generation_) {
+        durableLists_.insert(generation_->file);
+    }
+    if (generation_ && generation_->isSynced && !generation_->text.empty()) {
         durable_ = manifestIn(generation_->text).value_or(wearable::Manifest());
         newestFile_ = generation_->file;
         generation_.reset();

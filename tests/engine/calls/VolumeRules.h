@@ -37,6 +37,7 @@ class VolumeRules {
     [[nodiscard]] std::string rename(const Step& step, const std::string& name);
     [[nodiscard]] std::string remove(const std::string& name);
     [[nodiscard]] std::string beginGeneration(const std::string& file);
+    [[nodiscard]] std::string removeGeneration(const std::string& file);
     [[nodiscard]] std::string judgeContents(const wearable::Manifest& manifest) const;
     void generationIsDurable();
     void everythingIsSynced();
@@ -47,6 +48,8 @@ class VolumeRules {
 
     wearable::Manifest durable_;
     std::string newestFile_;
+    /// Files of lists that have names which are durable.
+    Names durableLists_;
     std::optional<Generation> generation_;
     Names directories_;
     bool areDirectoriesDurable_ = true;

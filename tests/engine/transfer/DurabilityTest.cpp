@@ -130,7 +130,7 @@ TEST_F(Durability, NoFileGetsItsNameBeforeItsContentsAreThere) {
             ++renames;
             const Steps before(std::make_reverse_iterator(at), steps.rend());
             const auto written = find(before, {"write", at->file, ""});
-            const auto synced = find(before, waitFor(at->file));
+            const auto synced = find(before, {"sync", "", ""});
             EXPECT_LT(synced, written) << at->detail;
             EXPECT_TRUE(Device::isUnfinished(at->file.substr(std::string_view("Music/").size())))
                 << at->file;
@@ -222,7 +222,15 @@ TEST_P(FailingOnce, NothingIsLostWhicheverStepFailsAndTheNextSyncMendsIt) {
 INSTANTIATE_TEST_SUITE_P(Error, FailingOnce, ::testing::Values(EIO, ENOSPC, EROFS, ESTALE));
 
 TEST_F(Durability, ACopyThatOnceCouldNotBeMadeDurableIsMadeAnew) {
-    EXPECT_EQ(syncFailing("fsync", "Music/QUORL001.TMP", EIO).kind, Kind::Failed);
+    bool isWritten = false;
+    const auto outcome = observedSync(wishFor(music_, player_), [&](const Step& step) {
+        if (step.operation == "sync" && std::exchange(isWritten, false)) {
+            fail(EIO);
+        }
+        isWritten = isWritten || isSame(step, {"write", "Music/QUORL001.TMP", ""});
+    });
+    EXPECT_EQ(outcome.kind, Kind::Failed);
+    EXPECT_THAT(player_.music(), Not(Contains(Key("QUORL001.TMP"))));
 
     EXPECT_EQ(copiedBySync(), 2);
     EXPECT_EQ(player_.music(), expected_);
@@ -243,6 +251,64 @@ TEST_F(Durability, AGroupThatOnceCouldNotBeMadeDurableIsCopiedAnew) {
     EXPECT_EQ(player_.music(), expected_);
 }
 
+TEST_F(Durability, AListIsOnlyWrittenUnderANameThatThisSyncHasMadeDurable) {
+    for (int round = 0; round < 2; ++round) {
+        auto steps = stepsOfSync(player_);
+        music_.list({round == 0 ? "one.mp3" : "two.mp3"});
+        std::erase_if(steps, [](const Step& step) { return !step.file.starts_with(".quorl/man"); });
+        for (const auto* const file : {".quorl/manifest.1", ".quorl/manifest.2"}) {
+            const auto first = find(steps, {"remove", file, ""});
+            EXPECT_LT(first, find(steps, {"create", file, ""})) << file;
+            EXPECT_LT(find(steps, {"create", file, ""}), find(steps, waitFor(file))) << file;
+            EXPECT_LT(find(steps, waitFor(file)), find(steps, {"write", file, ""})) << file;
+        }
+    }
+}
+
+TEST_F(Durability, WhatAKilledSyncHasLeftCountsOnlyWhereItCanBeMadeDurable) {
+    const auto kill = [this] {
+        bool isDead = false;
+        bool isNamed = false;
+        const auto outcome = observedSync(wishFor(music_, player_), [&](const Step& step) {
+            isDead = isDead || (isNamed && step.operation == "sync");
+            isNamed = isNamed || step.detail == "four.mp3";
+            if (isDead) {
+                fail(ENODEV);
+            }
+        });
+        EXPECT_EQ(outcome.kind, Kind::Failed);
+        EXPECT_EQ(player_.music().at("three.mp3"), "three");
+    };
+    kill();
+    EXPECT_EQ(syncFailing("sync", "", EIO).kind, Kind::Failed);
+    EXPECT_THAT(player_.music(), Not(Contains(Key("three.mp3"))));
+    EXPECT_THAT(player_.music(), Contains(Key("one.mp3"))) << "it was durable long ago";
+
+    kill();
+    EXPECT_EQ(copiedBySync(), 0);
+    EXPECT_EQ(player_.music(), expected_);
+}
+
+TEST_F(Durability, WhatWasRemovedIsRemovedOnceMoreWhereThatCouldNotBeMadeDurable) {
+    static_cast<void>(stepsOfSync(player_));
+    music_.list({"two.mp3"});
+    Steps steps;
+    bool isRemoved = false;
+    const auto outcome = observedSync(wishFor(music_, player_), [&](const Step& step) {
+        steps.push_back(step);
+        if (step.operation == "sync" && std::exchange(isRemoved, false)) {
+            fail(EIO);
+        }
+        isRemoved = isRemoved || isSame(step, {"remove", "Music/three.mp3", ""});
+    });
+
+    EXPECT_EQ(outcome.kind, Kind::Failed);
+    const auto again = find(steps, {"create", "Music/three.mp3", ""});
+    ASSERT_NE(again, steps.end());
+    EXPECT_TRUE(isSame(*std::next(again), {"remove", "Music/three.mp3", ""}));
+    EXPECT_THAT(player_.music(), Not(Contains(Key("three.mp3"))));
+}
+
 TEST_F(Durability, NamesThatOnceCouldNotBeMadeDurableAreGivenAnew) {
     EXPECT_EQ(syncFailing("fsync", "Music/", EIO).kind, Kind::Failed);
     EXPECT_THAT(player_.music(), Not(Contains(Key("three.mp3"))));
@@ -258,9 +324,9 @@ TEST_F(Durability, AListThatOnceCouldNotBeMadeDurableIsWrittenToTheSameFileAgain
     const auto outcome = observedSync(wishFor(music_, player_), [&](const Step& step) {
         if (isListWritten(step)) {
             written.push_back(step.file);
-        } else if (step.operation == "remove" && removed.empty()) {
+        } else if (step.operation == "remove" && hasFailed && removed.empty()) {
             removed = step.file;
-        } else if (step.operation == "fsync" && step.file == ".quorl/" &&
+        } else if (step.operation == "fsync" && step.file == ".quorl/" && !written.empty() &&
                    !std::exchange(hasFailed, true)) {
             fail(EIO);
         }

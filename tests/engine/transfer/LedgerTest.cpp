@@ -28,6 +28,11 @@ class Ledgers : public ::testing::Test {
     /// What another program would read.
     [[nodiscard]] Manifest onDevice() const { return player_.manifest(); }
 
+    void songsCome(const std::vector<Entry>& songs) {
+        ledger_.announce(songs);
+        ledger_.songsAreThere(songs);
+    }
+
     Player player_;
     int writes_ = 0;
     bool failsSync_ = false;
@@ -94,8 +99,36 @@ TEST_F(Ledgers, AdoptsWhatIsComplete) {
     EXPECT_THAT(ledger_.manifest().strays, ElementsAre(two_));
 }
 
+TEST_F(Ledgers, DoesNotTakeForThereWhatHasNoHashOrWasNotAnnounced) {
+    auto withoutHash = one_;
+    withoutHash.hash.clear();
+    ledger_.announce(std::vector{withoutHash});
+
+    ledger_.songsAreThere(std::vector{withoutHash, two_});
+
+    EXPECT_THAT(ledger_.manifest().strays, ElementsAre(withoutHash));
+    EXPECT_THAT(ledger_.manifest().songs, IsEmpty());
+    EXPECT_THAT(ledger_.announced(), ElementsAre("one"));
+}
+
+TEST_F(Ledgers, ForgetsWhatIsNotThereAndIsOnlyThenNotSaved) {
+    songsCome({one_, two_});
+    ledger_.save();
+    const Hashes hashes{[](const Entry&) { return "hash"; }, [](const auto&) { return "hash"; }};
+    const quorl::base::FileState there{3, 1};
+
+    ledger_.keepWhatIsThere([&](const auto&) { return std::optional(there); }, hashes);
+    EXPECT_TRUE(ledger_.isSaved());
+
+    ledger_.keepWhatIsThere(
+        [&](const auto& name) { return name == "one" ? std::nullopt : std::optional(there); },
+        hashes);
+    EXPECT_FALSE(ledger_.isSaved());
+    EXPECT_THAT(ledger_.manifest().songs, ElementsAre(two_));
+}
+
 TEST_F(Ledgers, KeepsWhatIsToBeRemovedAsStraysUntilItIsGone) {
-    ledger_.songsAreThere(std::vector{one_, two_});
+    songsCome({one_, two_});
     ledger_.announce(std::vector{entry("never came")});
 
     ledger_.keepOnly({two_});
@@ -144,7 +177,7 @@ TEST_F(Ledgers, DoesNotTakeForSavedWhatCouldNotBe) {
 }
 
 TEST_F(Ledgers, GoesOnWithWhatIsOnTheDevice) {
-    ledger_.songsAreThere(std::vector{one_});
+    songsCome({one_});
     ledger_.save();
 
     const Ledger next(device_);

@@ -263,7 +263,14 @@ TEST_F(Planning, NeverTakesTooMuchForALittle) {
 class Stocktaking : public Planning {
   protected:
     [[nodiscard]] Manifest taken(const Files& files) {
-        return whatIsThere(there_, files, hashes());
+        auto manifest = there_;
+        const auto find = [&](const std::string& name) {
+            const auto found = files.find(name);
+            return found == files.end() ? std::nullopt : std::optional(found->second);
+        };
+        const bool isAnyForgotten = forgetWhatIsNotThere(manifest, find, hashes());
+        EXPECT_EQ(isAnyForgotten, manifest != there_);
+        return manifest;
     }
 };
 
