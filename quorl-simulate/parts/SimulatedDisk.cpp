@@ -197,6 +197,9 @@ void SimulatedDisk::note(Node directory, const std::string& name, std::optional<
     } else {
         entries_[directory].erase(name);
     }
+    std::erase_if(changes_, [&](const Change& change) { // written again with this one
+        return change.isLost && change.directory == directory && change.name == name;
+    });
     changes_.push_back({directory, name, entry, step_});
     ++revision_;
 }
@@ -400,6 +403,22 @@ void SimulatedDisk::failSync(Node node) {
         change.isLost = change.isLost || change.directory == node;
     }
     fail(EIO, "fsync");
+}
+
+void SimulatedDisk::failSyncAll() {
+    ++revision_;
+    for (File& file : files_) {
+        file.isLost = !file.isDirectory && (file.isLost || !file.isWhole());
+    }
+    for (const auto& [directory, entries] : entries_) {
+        for (const auto& [name, entry] : entries) {
+            files_[entry.node].isLost = files_[entry.node].isLost || !entry.isRecorded;
+        }
+    }
+    for (Change& change : changes_) {
+        change.isLost = true;
+    }
+    fail(EIO, "syncfs");
 }
 
 /// What is left of a file that was not durable: of its sizes and of each sector, old or new, or

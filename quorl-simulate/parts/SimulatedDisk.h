@@ -117,6 +117,10 @@ class SimulatedDisk {
     /// durable from then on without being so, as Linux has it.
     void failSync(Node node);
 
+    /// The same of `syncAll`: nothing that is not durable by now ever will be, unless it is made
+    /// anew.
+    void failSyncAll();
+
     /// Everything that was not durable becomes what `random` leaves of it.
     void losePower(Random& random);
 

@@ -57,9 +57,10 @@ class SimulatedFile final : public syncd::VolumeFile {
 
     void flush() override {}
 
+    /// On FAT all is written before, in one go.
     void sync() override {
         if (failsSync_()) {
-            disk_.failSync(file_);
+            disk_.rules() == DiskRules::Fat ? disk_.failSyncAll() : disk_.failSync(file_);
         }
         disk_.sync(file_);
     }
@@ -156,7 +157,7 @@ void SimulatedVolume::syncDirectory(Directory directory) {
 
 void SimulatedVolume::sync() {
     if (failsSync_()) {
-        throw std::system_error(EIO, std::generic_category(), "syncfs");
+        disk_.failSyncAll();
     }
     disk_.syncAll();
 }

@@ -129,6 +129,33 @@ TEST_P(AnyDisk, LosesWhatAFailedSyncWasToMakeDurableThoughTheNextOneGoesWell) {
     EXPECT_THAT(found, Contains(Not("12345678")));
 }
 
+TEST_P(AnyDisk, LosesAllThatWasNotDurableWhenNotEverythingCouldBeMadeSo) {
+    const auto use = [](SimulatedDisk& each) {
+        each.append(each.create(top, "old"), "la la la");
+        each.syncAll();
+        each.append(each.create(top, "song"), "12345678");
+        each.remove(top, "old");
+        EXPECT_EQ(errorOf([&] { each.failSyncAll(); }), EIO);
+        each.syncAll();
+    };
+
+    EXPECT_THAT(remains(GetParam(), "song", use), ElementsAre("(no file)"));
+    EXPECT_THAT(remains(GetParam(), "old", use), ElementsAre("la la la"));
+}
+
+TEST_P(AnyDisk, KeepsWhatWasMadeAnewAfterNotEverythingCouldBeMadeDurable) {
+    const auto found = remains(GetParam(), "song", [](SimulatedDisk& each) {
+        each.append(each.create(top, "song"), "12345678");
+        EXPECT_EQ(errorOf([&] { each.failSyncAll(); }), EIO);
+        each.remove(top, "song");
+        each.append(each.create(top, "song"), "12345678");
+        each.syncAll();
+        EXPECT_TRUE(each.isDurable(top, "song"));
+    });
+
+    EXPECT_THAT(found, ElementsAre("12345678"));
+}
+
 TEST_P(AnyDisk, HasADirectoryOnlyWhenItsOwnNameIsDurable) {
     const auto found = namesLeft(GetParam(), [](SimulatedDisk& each) {
         const auto music = each.makeDirectory(top, "Music");
@@ -209,6 +236,20 @@ TEST(FatDisk, MayForgetTheContentsOfAFileThatWasNotMadeDurableUnderItsNewName) {
         each.sync(song);
         each.rename(top, "before", top, "after");
         each.sync(top);
+    });
+
+    EXPECT_THAT(found, ElementsAre("", "la la la"));
+}
+
+TEST(FatDisk, MayForgetTheContentsOfAFileWhoseNewNameOnceCouldNotBeMadeDurable) {
+    const auto found = remains(DiskRules::Fat, "after", [](SimulatedDisk& each) {
+        const auto song = each.create(top, "before");
+        each.append(song, "la la la");
+        each.sync(song);
+        each.rename(top, "before", top, "after");
+        each.sync(top);
+        EXPECT_EQ(errorOf([&] { each.failSyncAll(); }), EIO);
+        each.syncAll();
     });
 
     EXPECT_THAT(found, ElementsAre("", "la la la"));

@@ -125,6 +125,45 @@ TEST(Manifest, ThatIsBrokenSaysWhatToDo) {
     }
 }
 
+/// As they come from hands that write JSON by other rules than ours.
+TEST(Manifest, IsReadWhateverElseStandsInItAndInWhateverOrder) {
+    const Manifest one{{{"a", "a", 1, 2, "h"}}, {}, {}, {}};
+    const std::string song = R"({"size":1,"x":{"name":"z"},"hash":"h","name":"z","source":"a",)"
+                             R"("modified":2,"name":"a","y":[{"size":9}]})";
+    for (const auto& text :
+         {R"({"strays":[],"x":{"songs":[1],"format":2,"y":[[]]},"format":1,"songs":[)" + song +
+              R"(],"z":null})",
+          R"({"format":2,"format":1,"songs":3,"songs":[)" + song + R"(],"strays":[]})"}) {
+        EXPECT_EQ(parseManifest(text), one) << text;
+    }
+}
+
+TEST(Manifest, SaysOfSeveralThingsThatAreWrongWhichCountsFirst) {
+    const std::string number = "a number in it is not a whole one, or out of range";
+    const std::string bad = R"({"name":"a","source":"%","size":1,"modified":1,"hash":""})";
+    const std::string worse = R"({"name":"a","source":"a","size":-1,"modified":1,"hash":""})";
+    for (const auto& [text, why] : std::vector<std::pair<std::string, std::string>>{
+             {R"({"songs":[)" + bad + R"(],"strays":[],"format":2})",
+              "a later version has written it"},
+             {R"({"format":1,"strays":[)" + bad + R"(],"songs":[)" + worse + "]}", number},
+             {R"({"format":1,"songs":[)" + worse + "," + bad + R"(],"strays":[]})", number},
+             {R"({"format":1,"songs":[)" + worse + R"(],"strays":[]}})", "it is not well-formed"},
+             {R"({"format":1,"songs":[)" + worse + R"(],"strays":[)", "it is not well-formed"},
+             {R"({"format":1,"songs":[{"name":"a"}],"strays":[]})", "it is not well-formed"},
+             {R"({"format":1,"songs":[{"name":1}],"strays":[]})", "it is not well-formed"},
+             {R"({"format":1,"songs":[1],"strays":[]})", "it is not well-formed"},
+             {R"({"format":1,"songs":[[]],"strays":[]})", "it is not well-formed"},
+             {R"({"format":1,"songs":[]})", "it is not well-formed"},
+             {R"({"format":1,"songs":[],"strays":[],"sent":null})", "it is not well-formed"},
+             {R"({"format":1,"songs":[],"strays":[],"sent":{"limit":"1"}})",
+              "it is not well-formed"},
+             {R"({"format":1,"songs":[],"strays":[],"playlist":[]})", "it is not well-formed"},
+             {R"({"format":"1","songs":[],"strays":[]})", "a later version has written it"},
+             {R"({"format":null})", "a later version has written it"}}) {
+        EXPECT_THAT(rejectionOf(text), HasSubstr("(" + why + ")")) << text;
+    }
+}
+
 TEST(Manifest, WithNumbersThatWeHaveNeverWrittenIsRejected) {
     const std::string text = toText(everything());
     for (const std::string number :
