@@ -433,8 +433,13 @@ SimulatedDisk::Content SimulatedDisk::remains(const File& file, Random& random) 
     const std::size_t size = std::array{was, is, between}[random.indexBelow(3)];
     left.bytes.assign(size, '\0');
     for (std::size_t begin = 0; begin < size; begin += sectorSize) {
-        const std::string* const source = std::array<const std::string*, 3>{
+        const std::string* const drawn = std::array<const std::string*, 3>{
             &file.durable.bytes, &file.now.bytes, nullptr}[random.indexBelow(3)];
+        // The same over the same changes nothing.
+        const bool isSame =
+            begin < std::min(was, is) &&
+            file.durable.bytes.compare(begin, sectorSize, file.now.bytes, begin, sectorSize) == 0;
+        const std::string* const source = isSame ? &file.now.bytes : drawn;
         for (std::size_t at = begin; at < std::min(begin + sectorSize, size); ++at) {
             if (source != nullptr && at < source->size()) {
                 left.bytes[at] = (*source)[at];

@@ -141,6 +141,17 @@ void Device::writeGeneration(std::size_t index, const wearable::Manifest& manife
     }
 }
 
+/// Who wrote it was perhaps killed before it was durable. Byte for byte over what is there, so that
+/// it is as it was whatever becomes of that; its name was durable before.
+void Device::writeNewestAgain() {
+    const std::string name = wearable::generationFiles.at(1 - nextFile_);
+    if (const auto text = readOwn(name)) {
+        const auto file = volume_->overwrite(Directory::Own, name);
+        file->write(std::as_bytes(std::span(*text)));
+        file->sync();
+    }
+}
+
 void Device::saveManifest(const wearable::Manifest& manifest) {
     if (!isPastDurable_) {
         settle();
@@ -228,6 +239,7 @@ bool Device::finish(const UnfinishedFile& file, const std::string& name) {
         return false;
     }
     unsettled_.erase(file.name());
+    removed_.insert(file.name());
     unsettled_.insert(name);
     removed_.erase(name);
     return true;
@@ -255,7 +267,7 @@ void Device::settle() {
 }
 
 void Device::discard(const UnfinishedFile& file) {
-    removeIfThere(Directory::Music, file.name());
+    removeMusic(file.name());
     unsettled_.erase(file.name());
 }
 
@@ -267,6 +279,10 @@ void Device::discardUnsettled() {
     if (isUnsure_) {
         std::ranges::for_each(removed, [this](const auto& name) { removeOnceMore(name); });
         settle();
+        if (!isPastDurable_) {
+            writeNewestAgain();
+            isPastDurable_ = true;
+        }
         isUnsure_ = false;
     }
 }

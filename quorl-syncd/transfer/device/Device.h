@@ -82,14 +82,15 @@ class Device {
     /// fails, nothing of that since the last time may be trusted; `discardUnsettled` is due.
     void settle();
 
-    /// Whether all that earlier syncs have left is settled.
+    /// Whether all that earlier syncs have left is settled, or given up.
     [[nodiscard]] bool isPastDurable() const { return isPastDurable_; }
 
     /// Removes an unfinished file.
     void discard(const UnfinishedFile& file);
 
     /// Removes all that was created and not settled. Where something could not be made durable,
-    /// also removes once more what was removed and not settled, and settles that.
+    /// also removes once more what was removed and not settled, settles that, and writes the list
+    /// again where that was not durable yet.
     void discardUnsettled();
 
   private:
@@ -99,6 +100,7 @@ class Device {
     void makeDirectories();
     void writeGeneration(std::size_t index, const wearable::Manifest& manifest);
     [[nodiscard]] std::unique_ptr<VolumeFile> openGeneration(std::size_t index);
+    void writeNewestAgain();
     void removeIfThere(Volume::Directory directory, const std::string& name);
     void removeOnceMore(const std::string& name);
 
@@ -110,7 +112,7 @@ class Device {
     std::array<bool, wearable::generationFiles.size()> isOurs_{};
 
     bool isPastDurable_ = false;
-    /// And never will be.
+    /// Nor will it be before it is written again.
     bool isPastLost_ = false;
     /// Something could not be made durable, and what was not settled then was not given up yet.
     bool isUnsure_ = false;
