@@ -288,8 +288,12 @@ bool forgetWhatIsNotThere(wearable::Manifest& manifest, const FindFile& find,
         return !isComplete(song, find(song.name), hashes);
     });
     const auto& playlist = manifest.playlist;
-    const bool isPlaylistLost = playlist && !isOurPlaylist(*playlist, find(playlist->name), hashes);
+    const auto file = playlist ? find(playlist->name) : std::nullopt;
+    const bool isPlaylistLost = playlist && !isOurPlaylist(*playlist, file, hashes);
     if (isPlaylistLost) {
+        if (file && file->size == 0) { // what a loss of power has left of its removal
+            manifest.strays.push_back(*playlist);
+        }
         manifest.playlist.reset();
     }
     if (songs > 0 || isPlaylistLost) {
