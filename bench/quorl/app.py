@@ -102,10 +102,10 @@ def read_until(stream, text):
 def with_all_playlists(quorl, folder):
     """The memory of the app when the chooser is on the screen, in a terminal."""
     with subprocess.Popen([quorl, "--text", "--music", folder], text=True,
-                          stdin=subprocess.PIPE, stdout=subprocess.PIPE) as process:
+                          stdin=subprocess.PIPE, stdout=subprocess.PIPE, stderr=subprocess.DEVNULL) as process:
         process.stdin.write("1\n?\n")
         process.stdin.flush()
-        read_until(process.stdout, "A number taps the row")
+        read_until(process.stdout, "A number chooses the row")
         figure = share(process.pid)
         process.stdin.close()
         process.stdout.read()
@@ -121,7 +121,7 @@ def main():
         empty, large, picture = (pathlib.Path(place, name) for name in ("empty", "large", "picture.png"))
         empty.mkdir()
         shown = subprocess.run([quorl, "--text", "--music", empty], input="q\n", text=True, check=True,
-                               stdout=subprocess.PIPE).stdout
+                               capture_output=True).stdout
         texts = [line.strip() for line in shown.splitlines() if line.strip()]
         starts = [[quorl, "--screenshot", picture, "--music", empty], [plain, "--picture", picture, *texts]]
         for command in starts:
