@@ -95,7 +95,7 @@ Choice choice(Music& music, const std::vector<std::string>& songs) {
 
 void requireSent(const syncd::Outcome& outcome) {
     if (outcome.kind != syncd::Outcome::Kind::Sent) {
-        throw std::runtime_error("the sync has failed: " + sentence(outcome.message));
+        throw std::runtime_error("the sync has failed: " + engine::sentence(outcome.message));
     }
 }
 
