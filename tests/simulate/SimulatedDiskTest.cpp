@@ -229,25 +229,25 @@ TEST(FatDisk, HasAnyOfBothNamesAfterARenameThatWasCutShort) {
                                    ElementsAre("before")));
 }
 
+/// Makes a file durable and then gives it another name, which is made durable in its directory
+/// only.
+void renameSong(SimulatedDisk& disk) {
+    const auto song = disk.create(top, "before");
+    disk.append(song, "la la la");
+    disk.sync(song);
+    disk.rename(top, "before", top, "after");
+    disk.sync(top);
+}
+
 TEST(FatDisk, MayForgetTheContentsOfAFileThatWasNotMadeDurableUnderItsNewName) {
-    const auto found = remains(DiskRules::Fat, "after", [](SimulatedDisk& each) {
-        const auto song = each.create(top, "before");
-        each.append(song, "la la la");
-        each.sync(song);
-        each.rename(top, "before", top, "after");
-        each.sync(top);
-    });
+    const auto found = remains(DiskRules::Fat, "after", renameSong);
 
     EXPECT_THAT(found, ElementsAre("", "la la la"));
 }
 
 TEST(FatDisk, MayForgetTheContentsOfAFileWhoseNewNameOnceCouldNotBeMadeDurable) {
     const auto found = remains(DiskRules::Fat, "after", [](SimulatedDisk& each) {
-        const auto song = each.create(top, "before");
-        each.append(song, "la la la");
-        each.sync(song);
-        each.rename(top, "before", top, "after");
-        each.sync(top);
+        renameSong(each);
         EXPECT_EQ(errorOf([&] { each.failSyncAll(); }), EIO);
         each.syncAll();
     });

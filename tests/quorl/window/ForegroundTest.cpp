@@ -2,6 +2,7 @@
 
 #include <gmock/gmock.h>
 
+#include "platform/SyncPreferences.h"
 #include "tests/quorl/StoredPreferences.h"
 #include "tests/quorl/window/Window.h"
 
@@ -77,6 +78,16 @@ TEST(Foreground, paneShowsHowThingsStandWhenTheWindowComesBack) {
     window.widget().showNormal();
     EXPECT_TRUE(window.waitForRow("✓ 1 GB"));
     EXPECT_THAT(window.rows(), testing::Not(testing::Contains("✓ 500 MB")));
+}
+
+TEST(Foreground, panesReadWhatAnotherProgramHasStoredThoughItIsNotAnnouncedYet) {
+    Window window;
+    window.widget().showMinimized();
+    storePreference("asset-sync-limit", "1024");
+    window.widget().showNormal();
+    const auto limit = LMSyncDefaults::sharedDefaults().assetSyncLimit();
+    ASSERT_NE(limit, nullptr);
+    EXPECT_EQ(limit->unsignedLongLongValue(), 1024);
 }
 
 TEST(Foreground, paneIsTakenOffTheScreenOnceWhereTheWindowIsClosedInTheBackground) {
