@@ -19,6 +19,7 @@
 #include <string>
 #include <vector>
 
+#include <CLI/CLI.hpp>
 #include <malloc.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -204,15 +205,15 @@ void measureLarge(const path& root, int songs, int rounds) {
 int main(int argc, char** argv) {
     int rounds = 5;
     int songs = 20'000;
-    const std::vector<std::string> words(argv + 1, argv + argc);
-    for (std::size_t at = 0; at < words.size(); ++at) {
-        if (words[at] == "--rounds" && at + 1 < words.size()) {
-            rounds = std::stoi(words[++at]);
-        } else if (words[at] == "--songs" && at + 1 < words.size()) {
-            songs = std::stoi(words[++at]);
-        } else {
-            setenv("TMPDIR", words[at].c_str(), 1);
-        }
+    std::string directory;
+    CLI::App program("Compares syncs with cp of the same files.", "quorl-engine-bench");
+    program.add_option("--rounds", rounds);
+    program.add_option("--songs", songs);
+    program.add_option("directory", directory);
+    CLI11_PARSE(program, argc, argv);
+
+    if (!directory.empty()) {
+        setenv("TMPDIR", directory.c_str(), 1);
     }
     const Temporary temporary("quorl-engine-bench");
     measureMany(temporary.path() + "/many", songs, rounds);

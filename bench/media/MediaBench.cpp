@@ -22,6 +22,7 @@
 #include <string>
 #include <vector>
 
+#include <CLI/CLI.hpp>
 #include <poll.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -236,16 +237,13 @@ int main(int argc, char** argv) {
     int rounds = 11;
     double growth = 0;
     std::string directory;
-    const std::vector<std::string> words(argv + 1, argv + argc);
-    for (std::size_t at = 0; at < words.size(); ++at) {
-        if (words[at] == "--rounds" && at + 1 < words.size()) {
-            rounds = std::stoi(words[++at]);
-        } else if (words[at] == "--growth" && at + 1 < words.size()) {
-            growth = std::stod(words[++at]);
-        } else {
-            directory = words[at];
-        }
-    }
+    CLI::App program("Compares the music folder with the bare minimum for the same files.",
+                     "quorl-media-bench");
+    program.add_option("--rounds", rounds);
+    program.add_option("--growth", growth);
+    program.add_option("directory", directory);
+    CLI11_PARSE(program, argc, argv);
+
     const Temporary temporary("quorl-media-bench");
     measure(directory.empty() ? temporary.path() + "/library" : directory, rounds);
     if (growth > 0) {
