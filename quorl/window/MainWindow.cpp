@@ -11,6 +11,7 @@
 #include <QShortcut>
 #include <QUrl>
 #include <QVBoxLayout>
+#include <algorithm>
 
 #include "quorl/window/NoticeBar.h"
 #include "quorl/window/ProblemPage.h"
@@ -24,6 +25,10 @@ namespace {
 
 QString titleOf(const UIViewController& pane) {
     return QString::fromStdString(pane.title().value_or(""));
+}
+
+bool shows(const RowsView* view, const std::shared_ptr<UIViewController>& pane) {
+    return &view->content().pane() == pane.get();
 }
 
 /// Screen readers follow only what is a window by its role; a plain widget is none.
@@ -240,10 +245,14 @@ void MainWindow::draw() {
 
 /// Makes the views those of the stack, and shows the last one.
 void MainWindow::showTopPane() {
+    if (showsStack()) {
+        return;
+    }
     const auto depth = views_.size();
     const bool moves = isVisible() && depth > 0 && screen_.look().motion == Motion::Full;
     const QPixmap before = moves ? pages_->grab(pages_->placeOfTop()) : QPixmap();
-    if (!takeViewsOfStack() || !topView()) {
+    takeViewsOfStack();
+    if (!topView()) {
         return;
     }
     pages_->showPages(frontView(), topView());
@@ -258,15 +267,14 @@ void MainWindow::showTopPane() {
     }
 }
 
-/// Gives back whether they are others now.
-bool MainWindow::takeViewsOfStack() {
+bool MainWindow::showsStack() const {
+    return std::ranges::equal(views_, companion_.navigation().stack(), shows);
+}
+
+void MainWindow::takeViewsOfStack() {
     const auto& stack = companion_.navigation().stack();
-    const auto shows = [](const RowsView* view, const std::shared_ptr<UIViewController>& pane) {
-        return &view->content().pane() == pane.get();
-    };
     const auto kept =
         std::mismatch(views_.begin(), views_.end(), stack.begin(), stack.end(), shows);
-    const bool isChange = kept.first != views_.end() || kept.second != stack.end();
     for (auto left = kept.first; left != views_.end(); ++left) {
         delete *left;
     }
@@ -279,7 +287,6 @@ bool MainWindow::takeViewsOfStack() {
         pages_->add(view);
         views_.push_back(view);
     }
-    return isChange;
 }
 
 void MainWindow::showTitles() {

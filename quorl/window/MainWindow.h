@@ -57,7 +57,8 @@ class MainWindow final : public QWidget {
     void search();
     void draw();
     void showTopPane();
-    [[nodiscard]] bool takeViewsOfStack();
+    [[nodiscard]] bool showsStack() const;
+    void takeViewsOfStack();
     void takeColumns();
     void switchColumn();
     [[nodiscard]] RowsView* viewWithFocus() const;

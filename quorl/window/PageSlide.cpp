@@ -14,7 +14,7 @@ constexpr qreal lag = 0.3;         // the lower page moves less
 PageSlide::PageSlide(QWidget* pages) : QWidget(pages), fade_(slideDuration) {
     hide();
     connect(&fade_, &QVariantAnimation::valueChanged, this, qOverload<>(&QWidget::update));
-    connect(&fade_, &QVariantAnimation::finished, this, &QWidget::hide);
+    connect(&fade_, &QVariantAnimation::finished, this, &PageSlide::end);
 }
 
 void PageSlide::begin(const QRect& place, const QPixmap& before, const QPixmap& after,
@@ -26,6 +26,13 @@ void PageSlide::begin(const QRect& place, const QPixmap& before, const QPixmap& 
     show();
     raise();
     fade_.begin(motion);
+}
+
+/// Pictures of pages take as much memory as a window.
+void PageSlide::end() {
+    hide();
+    before_ = QPixmap();
+    after_ = QPixmap();
 }
 
 void PageSlide::paintEvent(QPaintEvent* /*event*/) {

@@ -29,6 +29,8 @@ class PageSlide final : public QWidget {
     void paintEvent(QPaintEvent* event) override;
 
   private:
+    void end();
+
     QPixmap before_;
     QPixmap after_;
     Direction direction_ = Direction::Forward;

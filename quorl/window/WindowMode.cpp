@@ -29,6 +29,13 @@ ExitCode endWith(const QString& problem) {
     return problem.isEmpty() ? ExitCode::Success : ExitCode::Failure;
 }
 
+/// On Wayland it is the one of the desktop entry, and nothing is loaded that draws it.
+void setIcon() {
+    if (QGuiApplication::platformName() == QStringLiteral("xcb")) {
+        QApplication::setWindowIcon(QIcon(QStringLiteral(":/org.quorl.Velora.svg")));
+    }
+}
+
 /// Until the user closes it.
 ExitCode showWindow(OneApp& app, const Places& places) {
     WindowScreen screen;
@@ -68,7 +75,7 @@ ExitCode runInWindow(char* program, const Places& places) {
     QtSetup setup(program);
     const QApplication application(setup.argumentCount(), setup.arguments());
     QtSetup::followUsersLanguage();
-    QApplication::setWindowIcon(QIcon(QStringLiteral(":/org.quorl.Velora.svg")));
+    setIcon();
     OneApp app(QDBusConnection::sessionBus(), places.purpose());
     if (const auto problem = app.handOver(start)) {
         return endWith(*problem);

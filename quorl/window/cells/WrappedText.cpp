@@ -1,5 +1,6 @@
 #include "quorl/window/cells/WrappedText.h"
 
+#include <QCache>
 #include <QFontMetricsF>
 #include <QTextLayout>
 
@@ -28,10 +29,33 @@ Lines broken(const QString& text, const QFont& font, qreal width, QTextOption::W
     return lines;
 }
 
+struct Paragraph {
+    QString text;
+    QString font;
+    /// Differs with the screen, too.
+    qreal lineSpacing;
+    qreal width;
+
+    bool operator==(const Paragraph&) const = default;
+};
+
+std::size_t qHash(const Paragraph& paragraph, std::size_t seed) {
+    return qHashMulti(seed, paragraph.text, paragraph.width);
+}
+
 } // namespace
 
 QStringList wrappedLines(const QString& text, const QFont& font, qreal width) {
-    return broken(text, font, width, QTextOption::WrapAtWordBoundaryOrAnywhere).texts;
+    // The same few are asked for again whenever something is laid out or painted.
+    constexpr qsizetype most = 64;
+    static QCache<Paragraph, QStringList> known(most);
+    const Paragraph paragraph{text, font.key(), QFontMetricsF(font).lineSpacing(), width};
+    if (const auto* lines = known.object(paragraph)) {
+        return *lines;
+    }
+    auto lines = broken(text, font, width, QTextOption::WrapAtWordBoundaryOrAnywhere).texts;
+    known.insert(paragraph, new QStringList(lines));
+    return lines;
 }
 
 std::optional<QStringList> linesOfWholeWords(const QString& text, const QFont& font, qreal width) {

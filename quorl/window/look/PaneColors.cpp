@@ -1,6 +1,7 @@
 #include "quorl/window/look/PaneColors.h"
 
 #include <algorithm>
+#include <array>
 #include <cmath>
 
 #include "quorl/app/PaneScreen.h"
@@ -31,12 +32,22 @@ QColor mixed(const QColor& color, const QColor& ground, double share) {
     return exact.rgb(); // as a screen shows it
 }
 
+using LinearParts = std::array<double, 256>;
+
+LinearParts linearParts() {
+    LinearParts parts{};
+    for (std::size_t at = 0; at < parts.size(); ++at) {
+        const double part = static_cast<double>(at) / (parts.size() - 1);
+        parts.at(at) = part <= 0.04045 ? part / 12.92 : std::pow((part + 0.055) / 1.055, 2.4);
+    }
+    return parts;
+}
+
 double luminance(const QColor& color) {
-    const auto linear = [](double part) {
-        return part <= 0.04045 ? part / 12.92 : std::pow((part + 0.055) / 1.055, 2.4);
-    };
-    return 0.2126 * linear(color.redF()) + 0.7152 * linear(color.greenF()) +
-           0.0722 * linear(color.blueF());
+    static const LinearParts parts = linearParts();
+    const auto linear = [](int part) { return parts.at(static_cast<std::size_t>(part)); };
+    return 0.2126 * linear(color.red()) + 0.7152 * linear(color.green()) +
+           0.0722 * linear(color.blue());
 }
 
 using Grounds = std::vector<QColor>;

@@ -16,6 +16,11 @@ void RowsView::connectSearch() {
     connect(&finder_, &RowFinder::beginningFound, this, &RowsView::goToPaneRow);
     connect(&finder_, &RowFinder::matchesChanged, this,
             [this](const std::vector<NSInteger>& rows) { showMatches(rows); });
+}
+
+/// Few ever search, and a field for text loads much.
+void RowsView::makeSearchField() {
+    search_ = new SearchField(screen_, this);
     connect(search_, &SearchField::textChanged, this, [this](const QString& text) {
         currentRow_ = 0;
         verticalScrollBar()->setValue(0);
@@ -43,6 +48,9 @@ void RowsView::openSearch() {
     if (!canBeSearched()) {
         return;
     }
+    if (search_ == nullptr) {
+        makeSearchField();
+    }
     search_->open();
     placeSearch();
 }
@@ -53,12 +61,16 @@ void RowsView::placeSearch() {
     if (viewportMargins().top() != height) {
         setViewportMargins(0, height, 0, 0);
     }
-    search_->setGeometry(0, 0, width(), searchHeight);
+    if (search_ != nullptr) {
+        search_->setGeometry(0, 0, width(), searchHeight);
+    }
     scrollBar_->setPage(rect().adjusted(0, height, 0, 0));
 }
 
 void RowsView::showMatches(std::optional<std::vector<NSInteger>> paneRows) {
-    search_->setFound(!paneRows || !paneRows->empty());
+    if (search_ != nullptr) {
+        search_->setFound(!paneRows || !paneRows->empty());
+    }
     content_->showOnly(std::move(paneRows));
     draw(); // at once: no row may be tapped that is not drawn
 }
@@ -67,7 +79,9 @@ void RowsView::closeSearch() {
     const auto found = currentRow();
     const NSInteger paneRow = found ? content_->paneRow(*found) : 0;
     finder_.endFilter();
-    search_->hide();
+    if (search_ != nullptr) {
+        search_->hide();
+    }
     placeSearch();
     showMatches(std::nullopt);
     setFocus(Qt::ShortcutFocusReason);

@@ -26,7 +26,6 @@ RowsView::RowsView(std::unique_ptr<PaneContent> content, WindowScreen& screen, Q
       touch_(screen),
       momentum_(*viewport()),
       finder_(*content_),
-      search_(new SearchField(screen, this)),
       scrollBar_(new OverlayScrollBar(*verticalScrollBar(), screen, this)) {
     RowsAccessible::install();
     setFrameShape(QFrame::NoFrame);

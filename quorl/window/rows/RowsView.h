@@ -70,7 +70,7 @@ class RowsView final : public QAbstractScrollArea {
     /// Shows all rows again, at the one that was found.
     void closeSearch();
 
-    [[nodiscard]] bool isSearched() const { return !search_->isHidden(); }
+    [[nodiscard]] bool isSearched() const { return search_ != nullptr && !search_->isHidden(); }
 
   Q_SIGNALS:
     /// A person asks what there is to know of a row: by the right button, the menu key or a long
@@ -108,6 +108,7 @@ class RowsView final : public QAbstractScrollArea {
 
     void connectScreen();
     void connectSearch();
+    void makeSearchField();
     void drawRows();
     void layOut();
     void keepPlaces(const RowsLayout& before, int scrolled);
@@ -152,7 +153,8 @@ class RowsView final : public QAbstractScrollArea {
     Momentum momentum_;
     RowFinder finder_;
     TypeAhead typeAhead_;
-    SearchField* search_;
+    /// Null until there was a search.
+    SearchField* search_ = nullptr;
     OverlayScrollBar* scrollBar_;
     OpenRow openRow_ = OpenRow::Plain;
     bool wasPressed_ = false;        ///< ever

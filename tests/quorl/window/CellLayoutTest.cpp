@@ -6,6 +6,7 @@
 
 #include "quorl/app/CompanionHost.h"
 #include "quorl/window/cells/CellPainter.h"
+#include "quorl/window/cells/WrappedText.h"
 #include "quorl/window/look/WindowScreen.h"
 
 namespace quorl::tests {
@@ -77,6 +78,19 @@ TEST_P(CellLayout, rowIsAtLeastAsHighAsAFinger) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Scales, CellLayout, testing::Values(1.0, 1.5, 2.0, 3.0));
+
+TEST(WrappedText, isOfItsFontAndItsWidth) {
+    const QString text = QStringLiteral("Songs that are not on the wearable");
+    QFont small;
+    small.setPixelSize(10);
+    QFont large;
+    large.setPixelSize(40);
+    const auto inSmall = wrappedLines(text, small, width);
+    EXPECT_EQ(inSmall.size(), 1);
+    EXPECT_GT(wrappedLines(text, large, width).size(), 1);
+    EXPECT_GT(wrappedLines(text, small, 60).size(), 1);
+    EXPECT_EQ(wrappedLines(text, small, width), inSmall);
+}
 
 } // namespace
 

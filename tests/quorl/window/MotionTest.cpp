@@ -1,4 +1,5 @@
 #include <QPaintEvent>
+#include <QSignalSpy>
 #include <QTest>
 
 #include <gmock/gmock.h>
@@ -107,6 +108,16 @@ TEST(Slide, paneSlidesInAndOutAndThenIsThere) {
     EXPECT_TRUE(slide.isRunning());
     ASSERT_TRUE(QTest::qWaitFor([&slide] { return !slide.isVisible(); }, patience));
     EXPECT_EQ(window.title(), "Music");
+}
+
+TEST(Slide, pageThatStaysIsNotPaintedForASlide) {
+    Window window;
+    allowMotion(window.screen());
+    const PaintWatch watch(*window.view().viewport());
+    QSignalSpy drawing(&window.screen(), &PaneScreen::drawing);
+    window.screen().scheduleDrawing();
+    ASSERT_TRUE(drawing.wait(patience));
+    EXPECT_TRUE(watch.painted.isEmpty());
 }
 
 TEST(Slide, clickWhileItSlidesReachesNoRow) {

@@ -43,6 +43,14 @@ TEST_F(Search, fieldLeavesTheRowsWithItsText) {
                             "Name 1105", "Name 1106", "Name 1107", "Name 1108", "Name 1109"));
 }
 
+TEST_F(Search, fieldIsMadeForTheFirstSearch) {
+    EXPECT_EQ(shown_.view().findChild<QLineEdit*>(), nullptr);
+    shown_.view().closeSearch();
+    EXPECT_FALSE(shown_.view().isSearched());
+    searchFor("latte");
+    EXPECT_TRUE(shown_.view().isSearched());
+}
+
 TEST_F(Search, accentsAndCapitalsMakeNoDifference) {
     searchFor("CAFE");
     EXPECT_THAT(shown_.namesOnScreen(), ElementsAre("Café", "cafe latte"));
