@@ -31,6 +31,7 @@
 #include "services/base/DirectoryWatch.h"
 #include "services/base/FileStatus.h"
 #include "services/media/MusicFolder.h"
+#include "services/media/kept/KeptInventory.h"
 
 namespace {
 
@@ -104,6 +105,24 @@ void compareScan(const std::filesystem::path& root, int rounds) {
     const std::string beside = "find -printf '%s %T@'";
     wall.print(what, beside);
     processor.print(what + ", processor time", beside);
+}
+
+/// What the next start shows before it has read the folder.
+void compareKept(const std::filesystem::path& root, int rounds) {
+    const Temporary temporary("quorl-kept");
+    const std::filesystem::path file = temporary.path() + "/music-folder";
+    quorl::media::keepInventory(file, *quorl::media::scan(root));
+    Comparison wall;
+    for (int round = 0; round < rounds; ++round) {
+        std::shared_ptr<const quorl::media::Inventory> kept;
+        const auto time = timeOf([&] { kept = quorl::media::keptInventory(file, root); });
+        std::shared_ptr<const quorl::media::Inventory> read;
+        wall.add(time, timeOf([&] { read = quorl::media::scan(root); }));
+        if (!kept || *kept != *read) {
+            throw std::runtime_error("What was kept is not what was read.");
+        }
+    }
+    wall.print("what the last start has kept, of 50,000 files and 1,000 playlists", "their scan");
 }
 
 /// A music folder whose news can be waited for.
@@ -222,6 +241,7 @@ void measure(const std::filesystem::path& root, int rounds) {
     }
     measureMemory(root);
     compareScan(root, rounds);
+    compareKept(root, rounds);
     compareChange(root, rounds, "a song that was written again", [&](int round) {
         return Change{root / songPath(round * 7919), "."};
     });

@@ -34,26 +34,46 @@ Playlists playlistsOf(const std::shared_ptr<const media::Inventory>& inventory,
 
 } // namespace
 
-void MusicLibrary::open(const std::filesystem::path& root, Taken taken) {
-    taken_ = std::move(taken);
-    // Held weakly: an inventory on its way keeps no library alive.
-    folder_ = std::make_unique<media::MusicFolder>(
-        root, [reference = weak(this),
-               number = ++foldersOpened_](std::shared_ptr<const media::Inventory> inventory) {
-            dispatch_async(dispatch_get_main_queue(),
-                           [reference, number, inventory = std::move(inventory)] {
-                               const auto self = reference.lock();
-                               if (self && self->foldersOpened_ == number) {
-                                   self->take(inventory);
-                               }
-                           });
-        });
+MusicLibrary::~MusicLibrary() {
+    folder_.reset();
+    if (keeper_) {
+        keeper_->keepLast();
+    }
 }
 
-void MusicLibrary::take(std::shared_ptr<const media::Inventory> inventory) {
+void MusicLibrary::open(const std::filesystem::path& root, Taken taken) {
+    taken_ = std::move(taken);
+    const auto keeper =
+        keptFile_.empty() ? nullptr : std::make_shared<media::InventoryKeeper>(keptFile_, root);
+    // Held weakly: an inventory on its way keeps no library alive.
+    folder_ = std::make_unique<media::MusicFolder>(
+        root, [reference = weak(this), number = ++foldersOpened_,
+               keeper](const std::shared_ptr<const media::Inventory>& inventory) {
+            dispatch_async(dispatch_get_main_queue(), [reference, number, inventory] {
+                const auto self = reference.lock();
+                if (self && self->foldersOpened_ == number) {
+                    self->take(inventory);
+                }
+            });
+            if (keeper) {
+                keeper->take(inventory);
+            }
+        });
+    keeper_ = keeper;
+    if (keeper_ && !inventory_ && keeper_->kept()) {
+        show(keeper_->kept());
+    }
+}
+
+void MusicLibrary::show(std::shared_ptr<const media::Inventory> inventory) {
     playlists_ = playlistsOf(inventory, playlists_);
     inventory_ = std::move(inventory);
     contentsDidChange();
+}
+
+void MusicLibrary::take(std::shared_ptr<const media::Inventory> inventory) {
+    isRead_ = true;
+    show(std::move(inventory));
     taken_(*inventory_);
 }
 

@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include <glib.h>
+
 #include "quorl/facts/EngineTrouble.h"
 #include "quorl/facts/FolderTrouble.h"
 #include "quorl/facts/OfferedPlaylists.h"
@@ -39,6 +41,9 @@ CompanionHost::CompanionHost(const Places& places, Screen& screen, Notices& noti
       wearable_(wearableAt(places.wearable, purpose_)),
       wearableDirectory_(places.wearable),
       engine_(purpose_, [this](const engine::Event& event) { engineDidChange(event); }) {
+    if (purpose_ == base::Purpose::Use) {
+        library_->keepIn(std::filesystem::path(g_get_user_cache_dir()) / "quorl" / "music-folder");
+    }
     takePlaces(places);
 }
 

@@ -41,6 +41,14 @@ class SongTable {
 
     [[nodiscard]] Song operator[](SongIndex index) const;
 
+    /// The directories, by their indices.
+    [[nodiscard]] const TextList& directories() const { return directories_; }
+
+    /// The index of the song's directory.
+    [[nodiscard]] std::uint32_t directoryOf(SongIndex index) const {
+        return records_[index].directory;
+    }
+
     /// Appends a directory, in which songs can then be added; gives its index.
     std::uint32_t addDirectory(std::string_view path) { return directories_.add(path); }
 

@@ -11,6 +11,7 @@ namespace quorl::tests {
 namespace {
 
 using testing::ElementsAre;
+using testing::IsEmpty;
 
 class TheLibrary : public testing::Test {
   protected:
@@ -106,6 +107,83 @@ TEST_F(TheLibrary, propertyIsTheSameObjectEachTime) {
     EXPECT_EQ(number(entity, MPMediaPlaylistPropertyPersistentID), entity.persistentID());
     EXPECT_EQ(number(*playlist(1), MPMediaPlaylistPropertyIsAugurMix), 1U);
     EXPECT_EQ(number(*playlist(1), MPMediaPlaylistPropertyIsAugurPlaylist), 0U);
+}
+
+/// A program that shows the music folder, started again and again.
+class TheLibraryOfTheNextStart : public testing::Test {
+  protected:
+    std::shared_ptr<MusicLibrary> start() {
+        auto library = ::create<MusicLibrary>();
+        library->keepIn(file());
+        library->open(music_.path(), [this](const media::Inventory& /*inventory*/) { ++taken_; });
+        return library;
+    }
+
+    void waitUntilTaken(int times) {
+        ASSERT_TRUE(QTest::qWaitFor([&] { return taken_ >= times; }, 60'000));
+    }
+
+    static std::vector<std::string> namesIn(const MusicLibrary& library) {
+        std::vector<std::string> names;
+        const auto playlists = library.playlistsMatching({});
+        for (const auto& playlist : elements<MPMediaPlaylist>(playlists)) {
+            names.push_back(playlist->name().value_or("none"));
+        }
+        return names;
+    }
+
+    [[nodiscard]] std::filesystem::path file() const { return cache_ / "quorl/music-folder"; }
+
+    SampleMusic music_;
+    TemporaryDirectory cache_;
+    MainQueueNotifier mainQueue_;
+    int taken_ = 0;
+};
+
+TEST_F(TheLibraryOfTheNextStart, isThereAtOnceAndMendedOnceTheFolderHasBeenRead) {
+    auto library = start();
+    EXPECT_THAT(namesIn(*library), IsEmpty());
+    waitUntilTaken(1);
+    library.reset();
+    music_.folder().remove("Long Run.m3u8");
+
+    library = start();
+    EXPECT_THAT(namesIn(*library), ElementsAre("Long Run", "Morning Mix", "Road Trip"));
+    EXPECT_TRUE(library->hasMediaOfType(MPMediaTypeMusic));
+    EXPECT_FALSE(library->isRead());
+    EXPECT_EQ(taken_, 1);
+    waitUntilTaken(2);
+    EXPECT_TRUE(library->isRead());
+    EXPECT_THAT(namesIn(*library), ElementsAre("Morning Mix", "Road Trip"));
+}
+
+TEST_F(TheLibraryOfTheNextStart, hasWhatChangedUntilTheEnd) {
+    auto library = start();
+    waitUntilTaken(1);
+    music_.folder().remove("Long Run.m3u8");
+    waitUntilTaken(2);
+    library.reset();
+    EXPECT_THAT(namesIn(*start()), ElementsAre("Morning Mix", "Road Trip"));
+}
+
+TEST_F(TheLibraryOfTheNextStart, hasPlaylistsThatStayTheObjectsTheyAreWhileNothingChanges) {
+    auto library = start();
+    waitUntilTaken(1);
+    library.reset();
+    library = start();
+    const auto kept = library->playlistsMatching({});
+    waitUntilTaken(2);
+    EXPECT_EQ(*library->playlistsMatching({}), *kept);
+}
+
+TEST_F(TheLibraryOfTheNextStart, showsNothingOfAFolderThatIsOpenedInPlaceOfAnother) {
+    auto library = start();
+    waitUntilTaken(1);
+    const TemporaryDirectory other;
+    library->open(other.path(), [this](const media::Inventory& /*inventory*/) { ++taken_; });
+    EXPECT_THAT(namesIn(*library), ElementsAre("Long Run", "Morning Mix", "Road Trip"));
+    waitUntilTaken(2);
+    EXPECT_THAT(namesIn(*library), IsEmpty());
 }
 
 } // namespace

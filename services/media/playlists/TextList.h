@@ -24,6 +24,12 @@ class TextList {
         return std::string_view(text_).substr(begin, ends_[index] - begin);
     }
 
+    /// All texts, one after the other.
+    [[nodiscard]] std::string_view text() const { return text_; }
+
+    /// Where in that each of them ends.
+    [[nodiscard]] const std::vector<std::uint32_t>& ends() const { return ends_; }
+
     /// Appends a copy of `text` and gives its index back. Throws `std::length_error` beyond 4 GiB.
     std::uint32_t add(std::string_view text);
 

@@ -1,0 +1,33 @@
+#include "services/media/kept/InventoryKeeper.h"
+
+#include <system_error>
+#include <utility>
+
+#include "services/media/kept/KeptInventory.h"
+
+namespace quorl::media {
+
+InventoryKeeper::InventoryKeeper(std::filesystem::path file, const std::filesystem::path& root)
+    : file_(std::move(file)), kept_(keptInventory(file_, root)) {}
+
+void InventoryKeeper::take(std::shared_ptr<const Inventory> inventory) {
+    const bool isFirst = !last_;
+    last_ = std::move(inventory);
+    if (isFirst) {
+        keepLast();
+    }
+}
+
+void InventoryKeeper::keepLast() {
+    if (!last_ || last_ == inFile_ || (inFile_ && *last_ == *inFile_)) {
+        return;
+    }
+    try {
+        keepInventory(file_, *last_);
+        inFile_ = last_;
+    } catch (const std::system_error&) {
+        inFile_.reset();
+    }
+}
+
+} // namespace quorl::media
