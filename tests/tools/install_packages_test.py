@@ -60,9 +60,15 @@ class InstallPackages(unittest.TestCase):
         self.be(user=0, installed=["maker"])
         result = self.install("build", "run")
         self.assertEqual(result.returncode, 0, result.stderr)
-        update, install = self.calls()
+        update, _, install = self.calls()
         self.assertTrue(update.endswith(" update"))
         self.assertTrue(install.endswith("install --yes --no-install-recommends listener"))
+
+    def test_says_how_much_it_fetches(self):
+        self.plant("apt-get", """case " $* " in
+            *" --print-uris "*) printf "'address' a.deb %s MD5Sum:0\\n" 1600000 400001 ;;
+            esac""")
+        self.assertIn("Fetching 3 MB ...", self.install("run").stderr)
 
     def test_without_root_goes_through_sudo(self):
         self.be(user=1000, installed=[])
