@@ -118,7 +118,7 @@ void World::checkSent(const SimulatedWearable& wearable, const wearable::Manifes
     for (const auto& [path, size, modified] : withinLimit(*held, *manifest.sent)) {
         const auto entry = std::ranges::find(manifest.songs, path, &wearable::Entry::source);
         const auto file =
-            entry == manifest.songs.end() ? std::nullopt : wearable.disk.find(music, entry->name);
+            entry == manifest.songs.end() ? std::nullopt : wearable.disk.find(music, entry->name());
         if (!file) {
             breach("called sent, but not there: " + path);
             return;
@@ -126,15 +126,15 @@ void World::checkSent(const SimulatedWearable& wearable, const wearable::Manifes
         const auto& bytes = wearable.disk.read(*file);
         if (bytes.size() != size || !music_.everWas(path, modified, bytes)) {
             breach("called sent, but with other contents: " + path);
-        } else if (!wearable.disk.isDurable(music, entry->name)) {
+        } else if (!wearable.disk.isDurable(music, entry->name())) {
             breach("called sent, but not durable: " + path);
         }
-        names.push_back(entry->name);
+        names.push_back(entry->name());
         sources.insert(path);
     }
     const auto list =
-        manifest.playlist ? wearable.disk.find(music, manifest.playlist->name) : std::nullopt;
-    if (!list || !wearable.disk.isDurable(music, manifest.playlist->name) ||
+        manifest.playlist ? wearable.disk.find(music, manifest.playlist->name()) : std::nullopt;
+    if (!list || !wearable.disk.isDurable(music, manifest.playlist->name()) ||
         linesOf(wearable.disk.read(*list)) != names) {
         breach("called sent, but without its playlist");
     }
@@ -161,10 +161,10 @@ void World::checkPreferences(const SimulatedWearable& wearable) {
 
 void World::checkPlaylist(const SimulatedWearable& wearable, const wearable::Manifest& manifest) {
     const auto list = manifest.playlist
-                          ? wearable.disk.find(wearable.music(), manifest.playlist->name)
+                          ? wearable.disk.find(wearable.music(), manifest.playlist->name())
                           : std::nullopt;
     if (!list || manifest.playlist == wearable.excusedPlaylist ||
-        wearable.filesOfOthers.contains(manifest.playlist->name) ||
+        wearable.filesOfOthers.contains(std::string(manifest.playlist->name())) ||
         wearable.disk.status(*list).size != manifest.playlist->size) {
         return;
     }
@@ -350,13 +350,13 @@ void World::checkNothingElse(const wearable::Manifest& manifest) {
     const auto& disk = device().disk;
     const auto music = device().music();
     std::set<SimulatedDisk::Node> wanted;
-    const auto want = [&](const std::string& name) { wanted.insert(*disk.find(music, name)); };
+    const auto want = [&](std::string_view name) { wanted.insert(*disk.find(music, name)); };
     for (const auto& song : manifest.songs) {
-        want(song.name);
+        want(song.name());
     }
-    want(manifest.playlist->name);
+    want(manifest.playlist->name());
     if (!manifest.strays.empty()) {
-        breach("strays are left at the end: " + manifest.strays.front().name);
+        breach(std::string("strays are left at the end: ").append(manifest.strays.front().name()));
     }
     for (const auto& name : disk.names(music)) {
         const bool isTwin =
@@ -364,7 +364,7 @@ void World::checkNothingElse(const wearable::Manifest& manifest) {
         const bool isOurs = isTwin ||
                             std::ranges::find(manifest.songs, name, &wearable::Entry::name) !=
                                 manifest.songs.end() ||
-                            manifest.playlist->name == name;
+                            manifest.playlist->name() == name;
         if (!isOurs && !device().isExcusedFile(name)) {
             breach("is left at the end: " + name);
         }

@@ -16,8 +16,9 @@ using quorl::wearable::Entry;
 using quorl::wearable::Manifest;
 
 bool isInMusicDirectory(const Entry& entry) {
-    return !entry.name.empty() && entry.name != "." && entry.name != ".." &&
-           entry.name.find_first_of(std::string_view("/\0", 2)) == std::string::npos;
+    const auto name = entry.name();
+    return !name.empty() && name != "." && name != ".." &&
+           name.find_first_of(std::string_view("/\0", 2)) == std::string_view::npos;
 }
 
 Manifest readAgain(const Manifest& manifest, std::string_view otherGeneration) {

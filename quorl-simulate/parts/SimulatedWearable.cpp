@@ -32,9 +32,13 @@ wearable::Manifest manifestOf(const std::string& generation) {
         .manifest;
 }
 
+std::string textOf(const wearable::Entry& entry) {
+    return std::string(entry.name()).append(" <- ").append(entry.source()).append("\n");
+}
+
 bool isListed(const wearable::Manifest& list, const std::string& name, std::uint64_t size) {
     const auto isIt = [&](const wearable::Entry& entry) {
-        return entry.name == name && entry.size == size;
+        return entry.name() == name && entry.size == size;
     };
     return std::ranges::any_of(list.songs, isIt) || std::ranges::any_of(list.strays, isIt) ||
            (list.playlist && isIt(*list.playlist));
@@ -96,7 +100,7 @@ wearable::Usage SimulatedWearable::usage() const {
     const auto& list = manifest();
     wearable::Usage usage{0, disk.available(), 0, 0, list.sent};
     const auto count = [&](const wearable::Entry& entry) {
-        const auto file = disk.find(music(), entry.name);
+        const auto file = disk.find(music(), entry.name());
         const auto size = file ? disk.status(*file).size : 0;
         if (!file || size != entry.size) {
             usage.sent.reset();
@@ -108,7 +112,7 @@ wearable::Usage SimulatedWearable::usage() const {
     }
     if (list.playlist) {
         static_cast<void>(count(*list.playlist));
-        const auto file = disk.find(music(), list.playlist->name);
+        const auto file = disk.find(music(), list.playlist->name());
         if (!file || wearable::hashOf(disk.read(*file)) != list.playlist->hash) {
             usage.sent.reset();
         }
@@ -257,12 +261,12 @@ std::string SimulatedWearable::text() const {
     try {
         const auto& list = manifest();
         for (const auto& song : list.songs) {
-            text += "  song   " + song.name + " <- " + song.source + "\n";
+            text += "  song   " + textOf(song);
         }
         for (const auto& stray : list.strays) {
-            text += "  stray  " + stray.name + " <- " + stray.source + "\n";
+            text += "  stray  " + textOf(stray);
         }
-        text += list.playlist ? "  list   " + list.playlist->name + "\n" : "";
+        text += list.playlist ? "  list   " + textOf(*list.playlist) : "";
         text += list.sent ? "  sent   " + std::to_string(list.sent->playlist) + " in " +
                                 std::to_string(list.sent->revision) + "\n"
                           : "";

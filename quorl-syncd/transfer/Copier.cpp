@@ -32,17 +32,17 @@ std::vector<engine::Message> Copier::copy(std::vector<Entry>& songs) {
         throw;
     }
     means_.ledger.songsAreThere(songs);
-    std::erase_if(songs, [](const Entry& song) { return song.hash.empty(); });
+    std::erase_if(songs, [](const Entry& song) { return !song.hash; });
     return problems;
 }
 
 std::vector<engine::Message> Copier::copyAll(std::span<Entry> songs) {
     std::vector<engine::Message> problems;
     for (auto& song : songs) {
-        if (!song.hash.empty()) {
+        if (song.hash) {
             continue;
         }
-        progress_.song = song.source;
+        progress_.song = song.source();
         try {
             copySong(song);
         } catch (const SongProblem& problem) {
@@ -61,10 +61,10 @@ std::vector<engine::Message> Copier::copyAll(std::span<Entry> songs) {
 }
 
 void Copier::copySong(Entry& song) {
-    const auto source =
-        means_.ports.songs.open(means_.root, song.source, {song.size, song.modified});
+    const std::string path(song.source());
+    const auto source = means_.ports.songs.open(means_.root, path, {song.size, song.modified});
     auto file = means_.device.createUnfinished();
-    std::string hash;
+    wearable::Digest hash;
     try {
         hash = fill(file, *source, song);
     } catch (const std::system_error& error) {
@@ -72,17 +72,17 @@ void Copier::copySong(Entry& song) {
             throw; // whoever opened the device takes back what was begun
         }
         means_.device.discard(file);
-        throw SongProblem(SongTrouble::TooLarge, song.source);
+        throw SongProblem(SongTrouble::TooLarge, path);
     } catch (const SongProblem&) {
         means_.device.discard(file);
         throw;
     }
     rule_.songWasCopied(song.size);
-    copied_.push_back({song, std::move(hash), std::move(file)});
+    copied_.push_back({song, hash, std::move(file)});
 }
 
 /// Gives back the hash of the contents.
-std::string Copier::fill(UnfinishedFile& destination, OpenSong& source, const Entry& song) {
+wearable::Digest Copier::fill(UnfinishedFile& destination, OpenSong& source, const Entry& song) {
     auto hash = copyContents(source, destination, song.size);
     source.requireUnchanged();
     destination.complete(song.modified);
@@ -91,8 +91,8 @@ std::string Copier::fill(UnfinishedFile& destination, OpenSong& source, const En
 
 /// Gives back the hash of the contents, for which they are read in any case; a copy within the
 /// kernel would read them a second time.
-std::string Copier::copyContents(OpenSong& source, UnfinishedFile& destination,
-                                 std::uint64_t size) {
+wearable::Digest Copier::copyContents(OpenSong& source, UnfinishedFile& destination,
+                                      std::uint64_t size) {
     const bool isShared = destination.share(source.descriptor());
     const auto mostBytes = progress_.bytes + size;
     wearable::ContentHash hash;
@@ -102,7 +102,7 @@ std::string Copier::copyContents(OpenSong& source, UnfinishedFile& destination,
         const auto most = std::min(means_.ports.throttle.chunk(), largestPiece);
         const auto piece = buffer.first(source.read(buffer.first(most)));
         if (piece.empty()) {
-            return hash.text();
+            return hash.digest();
         }
         hash.add(piece);
         if (!isShared) {
@@ -130,8 +130,8 @@ void Copier::commit() {
         std::ranges::for_each(copied_, [this](Copied& copied) { finish(copied); });
         means_.device.settle();
     }
-    for (auto& copied : copied_) {
-        copied.song.hash = std::move(copied.hash);
+    for (const auto& copied : copied_) {
+        copied.song.hash = copied.hash;
     }
     progress_.songs += copied_.size();
     copied_.clear();
@@ -142,9 +142,9 @@ void Copier::commit() {
 /// On FAT a name may be taken that nobody can see: a file of a long name has a short one too.
 void Copier::finish(Copied& copied) {
     auto& song = copied.song;
-    while (!means_.device.finish(copied.file, song.name)) {
-        means_.ledger.revoke(song.name);
-        song.name = takeName(means_.names, song);
+    while (!means_.device.finish(copied.file, std::string(song.name()))) {
+        means_.ledger.revoke(song.name());
+        song.rename(takeName(means_.names, song));
         means_.ledger.announce({song});
         means_.ledger.save();
     }

@@ -6,7 +6,6 @@
 #include <memory>
 #include <span>
 #include <stop_token>
-#include <string>
 #include <vector>
 
 #include "quorl-syncd/transfer/CopyProgress.h"
@@ -50,16 +49,16 @@ class Copier {
     /// A song whose copy is complete, but perhaps not on the device yet.
     struct Copied {
         wearable::Entry& song;
-        std::string hash;
+        wearable::Digest hash;
         UnfinishedFile file;
     };
 
     [[nodiscard]] std::vector<engine::Message> copyAll(std::span<wearable::Entry> songs);
     void copySong(wearable::Entry& song);
-    [[nodiscard]] std::string fill(UnfinishedFile& destination, OpenSong& source,
-                                   const wearable::Entry& song);
-    [[nodiscard]] std::string copyContents(OpenSong& source, UnfinishedFile& destination,
-                                           std::uint64_t size);
+    [[nodiscard]] wearable::Digest fill(UnfinishedFile& destination, OpenSong& source,
+                                        const wearable::Entry& song);
+    [[nodiscard]] wearable::Digest copyContents(OpenSong& source, UnfinishedFile& destination,
+                                                std::uint64_t size);
     void pieceWasCopied(std::uint64_t bytes, std::uint64_t mostBytes);
     void commit();
     void finish(Copied& copied);

@@ -7,7 +7,7 @@
 
 namespace quorl::syncd {
 
-std::string hashOf(Reader& reader, const std::stop_token& stop) {
+wearable::Digest hashOf(Reader& reader, const std::stop_token& stop) {
     constexpr std::size_t pieceSize = 1 << 20;
     wearable::ContentHash hash;
     const auto memory = std::make_unique_for_overwrite<std::byte[]>(pieceSize);
@@ -16,7 +16,7 @@ std::string hashOf(Reader& reader, const std::stop_token& stop) {
         stopIf(stop);
         const auto size = reader.read(buffer);
         if (size == 0) {
-            return hash.text();
+            return hash.digest();
         }
         hash.add(buffer.first(size));
     }

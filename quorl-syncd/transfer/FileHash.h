@@ -1,7 +1,6 @@
 #pragma once
 
 #include <stop_token>
-#include <string>
 
 #include "quorl-syncd/transfer/Reader.h"
 #include "services/wearable/ContentHash.h"
@@ -11,6 +10,6 @@ namespace quorl::syncd {
 using wearable::hashOf;
 
 /// Of everything that is left to read. Throws `Stopped` soon after `stop` was requested.
-[[nodiscard]] std::string hashOf(Reader& reader, const std::stop_token& stop);
+[[nodiscard]] wearable::Digest hashOf(Reader& reader, const std::stop_token& stop);
 
 } // namespace quorl::syncd

@@ -2,8 +2,9 @@
 
 #include <algorithm>
 #include <iterator>
-#include <string_view>
 #include <utility>
+
+#include "quorl-syncd/transfer/EntryNames.h"
 
 namespace quorl::syncd {
 
@@ -11,31 +12,14 @@ namespace {
 
 using wearable::Entry;
 
-/// Names of entries that stay as they are meanwhile.
-class Names {
-  public:
-    explicit Names(std::span<const Entry> entries) {
-        names_.reserve(entries.size());
-        std::ranges::transform(entries, std::back_inserter(names_), &Entry::name);
-        std::ranges::sort(names_);
-    }
-
-    [[nodiscard]] bool contains(std::string_view name) const {
-        return std::ranges::binary_search(names_, name);
-    }
-
-  private:
-    std::vector<std::string_view> names_;
-};
-
 /// Whether there were any.
 bool eraseNamesOf(std::span<const Entry> named, std::vector<Entry>& entries) {
     if (named.empty() || entries.empty()) {
         return false;
     }
-    const Names names(named);
-    return std::erase_if(entries, [&](const Entry& entry) { return names.contains(entry.name); }) >
-           0;
+    const EntryNames names(named);
+    return std::erase_if(entries,
+                         [&](const Entry& entry) { return names.contains(entry.name()); }) > 0;
 }
 
 void append(std::vector<Entry> more, std::vector<Entry>& entries) {
@@ -75,8 +59,8 @@ void Ledger::keepWhatIsThere(const FindFile& find, const Hashes& hashes) {
 std::vector<std::string> Ledger::announced() const {
     std::vector<std::string> names;
     for (const auto& stray : manifest_.strays) {
-        if (stray.hash.empty()) {
-            names.push_back(stray.name);
+        if (!stray.hash) {
+            names.emplace_back(stray.name());
         }
     }
     return names;
@@ -96,9 +80,9 @@ void Ledger::announce(std::vector<Entry> entries) {
     addStrays(std::move(entries));
 }
 
-void Ledger::revoke(const std::string& name) {
+void Ledger::revoke(std::string_view name) {
     const auto erased =
-        std::erase_if(manifest_.strays, [&](const Entry& entry) { return entry.name == name; });
+        std::erase_if(manifest_.strays, [&](const Entry& entry) { return entry.name() == name; });
     isSaved_ = isSaved_ && erased == 0;
 }
 
@@ -106,10 +90,10 @@ void Ledger::songsAreThere(std::span<const Entry> songs) {
     if (manifest_.strays.empty()) {
         return;
     }
-    const Names strays(manifest_.strays);
+    const EntryNames strays(manifest_.strays);
     std::vector<Entry> there;
     std::ranges::copy_if(songs, std::back_inserter(there), [&](const Entry& song) {
-        return !song.hash.empty() && strays.contains(song.name);
+        return song.hash && strays.contains(song.name());
     });
     eraseNamesOf(there, manifest_.strays);
     isSaved_ = isSaved_ && there.empty();
@@ -119,7 +103,7 @@ void Ledger::songsAreThere(std::span<const Entry> songs) {
 void Ledger::playlistIsGone() { set(manifest_.playlist, {}); }
 
 void Ledger::playlistIsThere(const Entry& playlist) {
-    revoke(playlist.name);
+    revoke(playlist.name());
     set(manifest_.playlist, std::optional(playlist));
 }
 

@@ -3,6 +3,7 @@
 #include <optional>
 #include <span>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "quorl-syncd/transfer/Plan.h"
@@ -49,7 +50,7 @@ class Ledger {
     void announce(std::vector<wearable::Entry> entries);
 
     /// What was announced under this name does not come.
-    void revoke(const std::string& name);
+    void revoke(std::string_view name);
 
     /// Those of the songs that have a hash are there, complete, where they were announced.
     void songsAreThere(std::span<const wearable::Entry> songs);

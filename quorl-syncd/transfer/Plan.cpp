@@ -6,6 +6,7 @@
 #include <unordered_map>
 #include <unordered_set>
 
+#include "quorl-syncd/transfer/EntryNames.h"
 #include "quorl-syncd/transfer/FileHash.h"
 #include "quorl-syncd/transfer/device/DeviceNames.h"
 #include "quorl-syncd/transfer/songs/SongProblem.h"
@@ -25,11 +26,11 @@ bool isSameTime(std::int64_t first, std::int64_t second) {
 }
 
 bool hasContentsOf(const Entry& entry, const Hashes& hashes) {
-    return !entry.hash.empty() && hashes.ofCopy(entry.name) == entry.hash;
+    return entry.hash && hashes.ofCopy(std::string(entry.name())) == entry.hash;
 }
 
 /// A playlist has none: a file of 1970 may be anybody's.
-bool hasTime(const Entry& entry) { return entry.modified != 0 || entry.hash.empty(); }
+bool hasTime(const Entry& entry) { return entry.modified != 0 || !entry.hash; }
 
 bool isComplete(const Entry& entry, const std::optional<base::FileState>& file,
                 const Hashes& hashes) {
@@ -48,9 +49,9 @@ class Index {
 
     /// One of the entries with this source, which `isWanted`; null: there is none.
     template <class IsWanted>
-    const Entry* find(const std::string& source, IsWanted isWanted) {
+    const Entry* find(std::string_view source, IsWanted isWanted) {
         const auto* const next = next_ < entries_.size() ? &entries_[next_] : nullptr;
-        const bool isNext = next != nullptr && next->source == source;
+        const bool isNext = next != nullptr && next->source() == source;
         if (isNext && isWanted(*next)) {
             ++next_;
             return next;
@@ -73,7 +74,7 @@ class Index {
     void build() {
         bySource_.reserve(entries_.size());
         for (const auto& entry : entries_) {
-            bySource_.emplace(entry.source, &entry);
+            bySource_.emplace(entry.source(), &entry);
         }
     }
 
@@ -89,25 +90,27 @@ bool isCopyOf(const Entry& song, const Entry& copy, const Hashes& hashes) {
 }
 
 /// A copy that an interrupted sync has left behind counts if it is like the song, byte for byte.
-/// Gives back the hash of both; empty where it is not.
-std::string hashOfBoth(const Entry& song, const Entry& stray, const Hashes& hashes) {
+/// Gives back the hash of both; nothing where it is not.
+std::optional<wearable::Digest> hashOfBoth(const Entry& song, const Entry& stray,
+                                           const Hashes& hashes) {
     if (stray.size != song.size || stray.modified != song.modified) {
-        return {};
+        return std::nullopt;
     }
     const auto hash = hashes.ofSong(song);
-    return hashes.ofCopy(stray.name) == hash ? hash : std::string();
+    return hashes.ofCopy(std::string(stray.name())) == hash ? std::optional(hash) : std::nullopt;
 }
 
-std::vector<Entry> wishedFor(const Order& order) {
-    std::vector<Entry> songs;
-    std::unordered_set<media::SongIndex> seen;
+/// Those that are listed several times once.
+std::vector<media::SongIndex> wishedFor(const Order& order) {
+    std::vector<media::SongIndex> wished;
+    std::vector<bool> isWished(order.library->songs.size());
     for (const auto index : songsWithinLimit(order)) {
-        if (seen.insert(index).second) {
-            const auto song = order.library->songs[index];
-            songs.push_back({"", song.path(), song.size, song.modified, ""});
+        if (!isWished[index]) {
+            wished.push_back(index);
+            isWished[index] = true;
         }
     }
-    return songs;
+    return wished;
 }
 
 std::uint64_t sum(std::uint64_t first, std::uint64_t second) {
@@ -127,20 +130,20 @@ class Matching {
             plan_.songs.push_back(std::move(song));
         } catch (const SongProblem& problem) {
             plan_.problems.push_back(problem.message());
-            troubled_.insert(song.source);
+            troubled_.emplace(song.source());
         }
     }
 
     /// An old copy of a song that cannot be read now is better than none.
     [[nodiscard]] std::vector<Entry> unwantedAmong(const std::vector<Entry>& songs) const {
         std::vector<Entry> unwanted;
-        if (std::ranges::equal(songs, plan_.songs, {}, &Entry::name, &Entry::name)) {
+        if (songs.empty() ||
+            std::ranges::equal(songs, plan_.songs, {}, &Entry::name, &Entry::name)) {
             return unwanted;
         }
-        std::unordered_set<std::string_view> wanted;
-        std::ranges::transform(plan_.songs, std::inserter(wanted, wanted.end()), &Entry::name);
+        const EntryNames wanted(plan_.songs);
         std::ranges::copy_if(songs, std::back_inserter(unwanted), [&](const Entry& song) {
-            return !wanted.contains(song.name) && !troubled_.contains(song.source);
+            return !wanted.contains(song.name()) && !troubled_.contains(std::string(song.source()));
         });
         return unwanted;
     }
@@ -157,21 +160,24 @@ class Matching {
 
     bool findCopy(Entry& song) {
         const auto* const copy = songs_.find(
-            song.source, [&](const Entry& each) { return isCopyOf(song, each, hashes_); });
+            song.source(), [&](const Entry& each) { return isCopyOf(song, each, hashes_); });
         if (copy != nullptr) {
-            song.name = copy->name;
-            song.hash = copy->hash;
+            const auto modified = song.modified;
+            song = *copy;
+            song.modified = modified;
         }
         return copy != nullptr;
     }
 
     bool findStray(Entry& song) {
-        const auto* const stray = strays_.find(song.source, [&](const Entry& each) {
+        const auto* const stray = strays_.find(song.source(), [&](const Entry& each) {
             song.hash = hashOfBoth(song, each, hashes_);
-            return !song.hash.empty();
+            return song.hash.has_value();
         });
         if (stray != nullptr) {
-            song.name = stray->name;
+            const auto hash = song.hash;
+            song = *stray;
+            song.hash = hash;
             plan_.adopted.push_back(song);
         }
         return stray != nullptr;
@@ -185,11 +191,10 @@ class Matching {
 };
 
 std::vector<Entry> without(const std::vector<Entry>& adopted, const std::vector<Entry>& strays) {
-    std::unordered_set<std::string_view> names;
-    std::ranges::transform(adopted, std::inserter(names, names.end()), &Entry::name);
+    const EntryNames names(adopted);
     std::vector<Entry> others;
     std::ranges::copy_if(strays, std::back_inserter(others),
-                         [&](const Entry& stray) { return !names.contains(stray.name); });
+                         [&](const Entry& stray) { return !names.contains(stray.name()); });
     return others;
 }
 
@@ -197,7 +202,7 @@ std::vector<Entry> without(const std::vector<Entry>& adopted, const std::vector<
 TakenNames takenNames(const std::vector<std::string>& names, const std::vector<Entry>& removed) {
     std::unordered_set<std::string> free;
     for (const auto& entry : removed) {
-        free.insert(base::composed(entry.name));
+        free.insert(base::composed(entry.name()));
     }
     TakenNames taken;
     for (const auto& name : names) {
@@ -213,11 +218,11 @@ Entry playlistOf(const Order& order, const std::vector<Entry>& songs,
                  const std::optional<Entry>& there) {
     const auto& title = order.playlist().name;
     const auto text = playlistText(order, songs);
-    const bool isNew = !there || there->source != title;
-    return {isNew ? "" : there->name, title, text.size(), 0, hashOf(text)};
+    const bool isNew = !there || there->source() != title;
+    return {isNew ? "" : there->name(), title, text.size(), 0, hashOf(text)};
 }
 
-bool isToBeCopied(const Entry& song) { return song.hash.empty(); }
+bool isToBeCopied(const Entry& song) { return !song.hash; }
 
 /// The names on the device are only looked at where something is to get one.
 void giveNames(Plan& plan, const Order& order, const std::optional<Entry>& playlistThere,
@@ -228,7 +233,7 @@ void giveNames(Plan& plan, const Order& order, const std::optional<Entry>& playl
     }
     for (auto& song : plan.songs) {
         if (isToBeCopied(song)) {
-            song.name = takeName(plan.names, song);
+            song.rename(takeName(plan.names, song));
         }
     }
     if (order.isRemoval()) {
@@ -238,8 +243,8 @@ void giveNames(Plan& plan, const Order& order, const std::optional<Entry>& playl
     if (!isAnyCopied && plan.playlist != playlistThere) {
         plan.names = takenNames(names, plan.useless);
     }
-    if (plan.playlist->name.empty()) {
-        plan.playlist->name = plan.names.take(order.playlist().name + ".m3u8");
+    if (plan.playlist->name().empty()) {
+        plan.playlist->rename(takePlaylistName(plan.names, order.playlist().name));
     }
 }
 
@@ -250,12 +255,12 @@ class NamesBySource {
 
     /// Empty where it is none of the songs.
     [[nodiscard]] std::string_view of(const std::string& source) {
-        if (next_ < songs_.size() && songs_[next_].source == source) {
-            return songs_[next_++].name;
+        if (next_ < songs_.size() && songs_[next_].source() == source) {
+            return songs_[next_++].name();
         }
         if (names_.empty()) {
             for (const auto& song : songs_) {
-                names_.emplace(song.source, song.name);
+                names_.emplace(song.source(), song.name());
             }
         }
         const auto found = names_.find(source);
@@ -282,13 +287,13 @@ bool isOurPlaylist(const Entry& playlist, const std::optional<base::FileState>& 
 bool forgetWhatIsNotThere(wearable::Manifest& manifest, const FindFile& find,
                           const Hashes& hashes) {
     const auto strays = std::erase_if(manifest.strays, [&](const Entry& stray) {
-        return !isOurs(stray, find(stray.name), hashes);
+        return !isOurs(stray, find(std::string(stray.name())), hashes);
     });
     const auto songs = std::erase_if(manifest.songs, [&](const Entry& song) {
-        return !isComplete(song, find(song.name), hashes);
+        return !isComplete(song, find(std::string(song.name())), hashes);
     });
     const auto& playlist = manifest.playlist;
-    const auto file = playlist ? find(playlist->name) : std::nullopt;
+    const auto file = playlist ? find(std::string(playlist->name())) : std::nullopt;
     const bool isPlaylistLost = playlist && !isOurPlaylist(*playlist, file, hashes);
     if (isPlaylistLost) {
         if (file && file->size == 0) { // what a loss of power has left of its removal
@@ -303,15 +308,22 @@ bool forgetWhatIsNotThere(wearable::Manifest& manifest, const FindFile& find,
 }
 
 std::string takeName(TakenNames& names, const Entry& song) {
-    return names.take(std::filesystem::path(song.source).filename().native());
+    return names.take(std::filesystem::path(song.source()).filename().native());
+}
+
+std::string takePlaylistName(TakenNames& names, std::string_view title) {
+    return names.take(std::string(title).append(".m3u8"));
 }
 
 Plan planOf(const Order& order, const wearable::Manifest& there,
             const std::vector<std::string>& names, const Hashes& hashes) {
     Plan plan;
     Matching matching(plan, there, hashes);
-    for (auto& song : wishedFor(order)) {
-        matching.add(std::move(song));
+    const auto wished = wishedFor(order);
+    plan.songs.reserve(wished.size());
+    for (const auto index : wished) {
+        const auto song = order.library->songs[index];
+        matching.add({"", song.path(), song.size, song.modified, std::nullopt});
     }
     plan.useless = without(plan.adopted, there.strays);
     plan.unwanted = matching.unwantedAmong(there.songs);

@@ -5,6 +5,7 @@
 #include <map>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "quorl-syncd/transfer/CopyProgress.h"
@@ -21,9 +22,9 @@ namespace quorl::syncd {
 /// throw ends the planning, but for `SongProblem`, which leaves out the song.
 struct Hashes {
     /// Of a song of the music folder.
-    std::function<std::string(const wearable::Entry& song)> ofSong;
-    /// Of the file of this name in the device's music directory.
-    std::function<std::string(const std::string& name)> ofCopy;
+    std::function<wearable::Digest(const wearable::Entry& song)> ofSong;
+    /// Of the file of this name in the device's music directory; nothing where it is gone.
+    std::function<std::optional<wearable::Digest>(const std::string& name)> ofCopy;
 };
 
 /// Regular files of a music directory, by name.
@@ -76,6 +77,9 @@ struct Plan {
 
 /// Takes a name for the copy of a song that no file on the device has.
 [[nodiscard]] std::string takeName(TakenNames& names, const wearable::Entry& song);
+
+/// The same for a playlist of this title.
+[[nodiscard]] std::string takePlaylistName(TakenNames& names, std::string_view title);
 
 /// Whether new songs find room beside the old ones.
 enum class Room { Enough, EnoughWithoutUnwanted, NotEnough };

@@ -148,22 +148,22 @@ void Sync::settlePast(Device& device) {
 
 Hashes Sync::hashes(Device& device) const {
     return {[this](const Entry& song) {
-                const auto file = ports_.songs.open(order_.library->root, song.source,
-                                                    {song.size, song.modified});
+                const auto file = ports_.songs.open(
+                    order_.library->root, std::string(song.source()), {song.size, song.modified});
                 return hashOf(*file, stop_);
             },
             [this, &device](const std::string& name) { return hashOfCopy(device, name); }};
 }
 
-/// Empty where somebody has removed the file since it was looked at.
-std::string Sync::hashOfCopy(Device& device, const std::string& name) const {
+/// Nothing where somebody has removed the file since it was looked at.
+std::optional<wearable::Digest> Sync::hashOfCopy(Device& device, const std::string& name) const {
     try {
         return hashOf(*device.openMusic(name), stop_);
     } catch (const std::system_error& error) {
         if (error.code() != std::errc::no_such_file_or_directory) {
             throw;
         }
-        return {};
+        return std::nullopt;
     }
 }
 
@@ -207,14 +207,15 @@ void Sync::beginChanges(Device& device) {
 /// Whether what is removed at the beginning may be named by the playlist. What has a hash was
 /// there, complete; an earlier sync may have ended when it was about to remove it.
 bool Sync::removesSongsFirst() const {
-    const auto wasThere = [](const Entry& entry) { return !entry.hash.empty(); };
+    const auto wasThere = [](const Entry& entry) { return entry.hash.has_value(); };
     return room_ == Room::EnoughWithoutUnwanted || std::ranges::any_of(plan_.useless, wasThere);
 }
 
 void Sync::announce() {
+    const auto isComing = [](const Entry& song) { return !song.hash; };
     std::vector<Entry> coming;
-    std::ranges::copy_if(plan_.songs, std::back_inserter(coming), &std::string::empty,
-                         &Entry::hash);
+    coming.reserve(static_cast<std::size_t>(std::ranges::count_if(plan_.songs, isComing)));
+    std::ranges::copy_if(plan_.songs, std::back_inserter(coming), isComing);
     ledger_->announce(std::move(coming));
     ledger_->save();
 }
@@ -257,18 +258,22 @@ void Sync::putPlaylist(Device& device, Entry& playlist, const UnfinishedFile& fi
     for (;;) {
         ledger_->announce({playlist});
         ledger_->save();
-        if (device.finish(file, playlist.name)) {
+        if (device.finish(file, std::string(playlist.name()))) {
             return;
         }
-        ledger_->revoke(playlist.name);
-        playlist.name = plan_.names.take(playlist.source + ".m3u8");
+        ledger_->revoke(playlist.name());
+        playlist.rename(takePlaylistName(plan_.names, playlist.source()));
     }
 }
 
 void Sync::removePlaylist(Device& device) {
     const auto& playlist = ledger_->manifest().playlist;
-    if (playlist && isOurPlaylist(*playlist, device.find(playlist->name), hashes(device))) {
-        device.removeMusic(playlist->name);
+    if (!playlist) {
+        return;
+    }
+    const std::string name(playlist->name());
+    if (isOurPlaylist(*playlist, device.find(name), hashes(device))) {
+        device.removeMusic(name);
     }
 }
 
@@ -282,8 +287,9 @@ void Sync::removeStrays(Device& device) {
         if (order_.isRemoval()) {
             stopIf(stop_);
         }
-        if (isOurs(stray, device.find(stray.name), ask)) {
-            device.removeMusic(stray.name);
+        const std::string name(stray.name());
+        if (isOurs(stray, device.find(name), ask)) {
+            device.removeMusic(name);
         }
     }
     device.settle();

@@ -56,7 +56,8 @@ class Sync {
     void keepOnlyWhatIsWished(Device& device);
 
     [[nodiscard]] Hashes hashes(Device& device) const;
-    [[nodiscard]] std::string hashOfCopy(Device& device, const std::string& name) const;
+    [[nodiscard]] std::optional<wearable::Digest> hashOfCopy(Device& device,
+                                                             const std::string& name) const;
     [[nodiscard]] Outcome outcome() const;
 
     const Order order_;

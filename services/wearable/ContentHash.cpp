@@ -1,11 +1,52 @@
 #include "services/wearable/ContentHash.h"
 
 #include <array>
+#include <charconv>
 #include <new>
 
 #include <xxhash.h>
 
 namespace quorl::wearable {
+
+namespace {
+
+constexpr int hexadecimal = 16;
+constexpr std::size_t digitsOfHalf = 16;
+
+void append(std::uint64_t half, std::string& text) {
+    std::array<char, digitsOfHalf> digits{};
+    const auto end =
+        std::to_chars(digits.data(), digits.data() + digits.size(), half, hexadecimal).ptr;
+    const auto size = static_cast<std::size_t>(end - digits.data());
+    text.append(digitsOfHalf - size, '0').append(digits.data(), size);
+}
+
+/// Whether all of it is a number.
+bool read(std::string_view digits, std::uint64_t& half) {
+    const auto* const end = digits.data() + digits.size();
+    const auto read = std::from_chars(digits.data(), end, half, hexadecimal);
+    return read.ec == std::errc() && read.ptr == end;
+}
+
+Digest digestOf(const XXH128_hash_t& hash) { return {hash.high64, hash.low64}; }
+
+} // namespace
+
+std::string toText(const Digest& digest) {
+    std::string text;
+    text.reserve(2 * digitsOfHalf);
+    append(digest.high, text);
+    append(digest.low, text);
+    return text;
+}
+
+std::optional<Digest> digestIn(std::string_view text) {
+    Digest digest;
+    const bool isDigest = text.size() == 2 * digitsOfHalf &&
+                          read(text.substr(0, digitsOfHalf), digest.high) &&
+                          read(text.substr(digitsOfHalf), digest.low);
+    return isDigest ? std::optional(digest) : std::nullopt;
+}
 
 void ContentHash::Free::operator()(XXH3_state_s* state) const { XXH3_freeState(state); }
 
@@ -19,22 +60,8 @@ void ContentHash::add(std::span<const std::byte> bytes) {
     XXH3_128bits_update(state_.get(), bytes.data(), bytes.size());
 }
 
-std::string ContentHash::text() const {
-    constexpr std::string_view digits = "0123456789abcdef";
-    XXH128_canonical_t canonical;
-    XXH128_canonicalFromHash(&canonical, XXH3_128bits_digest(state_.get()));
-    std::string text;
-    for (const auto byte : canonical.digest) {
-        text += digits[byte >> 4U];
-        text += digits[byte & 0xFU];
-    }
-    return text;
-}
+Digest ContentHash::digest() const { return digestOf(XXH3_128bits_digest(state_.get())); }
 
-std::string hashOf(std::string_view text) {
-    ContentHash hash;
-    hash.add(std::as_bytes(std::span(text)));
-    return hash.text();
-}
+Digest hashOf(std::string_view text) { return digestOf(XXH3_128bits(text.data(), text.size())); }
 
 } // namespace quorl::wearable

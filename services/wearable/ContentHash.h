@@ -1,7 +1,9 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <memory>
+#include <optional>
 #include <span>
 #include <string>
 #include <string_view>
@@ -9,6 +11,20 @@
 struct XXH3_state_s;
 
 namespace quorl::wearable {
+
+/// The hash of some contents.
+struct Digest {
+    std::uint64_t high = 0;
+    std::uint64_t low = 0;
+
+    bool operator==(const Digest&) const = default;
+};
+
+/// 32 hexadecimal digits.
+[[nodiscard]] std::string toText(const Digest& digest);
+
+/// The other way round; nothing where the text is another one.
+[[nodiscard]] std::optional<Digest> digestIn(std::string_view text);
 
 /// Tells contents of files apart: XXH3 with 128 bits. Does not withstand somebody who looks for two
 /// contents with the same hash.
@@ -18,8 +34,8 @@ class ContentHash {
 
     void add(std::span<const std::byte> bytes);
 
-    /// Of everything that was added, in hexadecimal digits.
-    [[nodiscard]] std::string text() const;
+    /// Of everything that was added.
+    [[nodiscard]] Digest digest() const;
 
   private:
     struct Free {
@@ -29,6 +45,6 @@ class ContentHash {
     std::unique_ptr<XXH3_state_s, Free> state_;
 };
 
-[[nodiscard]] std::string hashOf(std::string_view text);
+[[nodiscard]] Digest hashOf(std::string_view text);
 
 } // namespace quorl::wearable

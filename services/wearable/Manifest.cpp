@@ -73,7 +73,7 @@ class Writer {
         text_.append("\"").append(name).append("\": ");
     }
 
-    void member(std::string_view name, const std::string& value) {
+    void member(std::string_view name, std::string_view value) {
         key(name);
         if (isPlain(value)) {
             text_.append("\"").append(value).append("\"");
@@ -100,11 +100,11 @@ class Writer {
 
 void write(Writer& writer, const Entry& entry) {
     writer.begin('{');
-    writer.member("hash", entry.hash);
+    writer.member("hash", entry.hash ? toText(*entry.hash) : "");
     writer.member("modified", entry.modified);
-    writer.member("name", entry.name);
+    writer.member("name", entry.name());
     writer.member("size", entry.size);
-    writer.member("source", encoded(entry.source));
+    writer.member("source", encoded(entry.source()));
     writer.end('}');
 }
 
@@ -128,10 +128,10 @@ void write(Writer& writer, const std::vector<Entry>& entries) {
 
 /// About as many bytes as they take as text.
 std::size_t sizeOf(const std::vector<Entry>& entries) {
-    constexpr std::size_t beside = 110;
+    constexpr std::size_t beside = 140;
     std::size_t size = beside;
     for (const auto& entry : entries) {
-        size += entry.name.size() + entry.source.size() + entry.hash.size() + beside;
+        size += entry.name().size() + entry.source().size() + beside;
     }
     return size;
 }

@@ -6,25 +6,42 @@
 #include <string_view>
 #include <vector>
 
+#include "services/wearable/ContentHash.h"
+#include "services/wearable/TextPair.h"
 #include "services/wearable/Unseen.h"
 
 namespace quorl::wearable {
 
-/// A file in the wearable's music directory that we have put there, or are about to.
-struct Entry {
+/// A file in the wearable's music directory that we have put there, or are about to. Takes little
+/// memory, for there are many; its copies share the texts.
+class Entry {
+  public:
+    Entry() = default;
+
+    Entry(std::string_view name, std::string_view source, std::uint64_t bytes,
+          std::int64_t modifiedAt, std::optional<Digest> hashOfContents)
+        : size(bytes), modified(modifiedAt), hash(hashOfContents), texts_(name, source) {}
+
     /// In the music directory itself, never in a directory below.
-    std::string name;
+    [[nodiscard]] std::string_view name() const { return texts_.first(); }
+
+    void rename(std::string_view name) { texts_ = TextPair(name, source()); }
+
     /// What it is a copy of: a path relative to the music folder, in the bytes of the file system.
     /// For a playlist, its title.
-    std::string source;
+    [[nodiscard]] std::string_view source() const { return texts_.second(); }
+
     /// In bytes.
     std::uint64_t size = 0;
     /// Modification time of the source, which the copy has too; nanoseconds since 1970.
     std::int64_t modified = 0;
-    /// Of the contents; empty as long as it is not known.
-    std::string hash;
+    /// Of the contents; nothing as long as it is not known.
+    std::optional<Digest> hash;
 
     bool operator==(const Entry&) const = default;
+
+  private:
+    TextPair texts_;
 };
 
 /// Which songs are sent: those of a playlist as it was at one moment, up to a limit.

@@ -44,7 +44,7 @@ std::string decoded(std::string_view text) {
 }
 
 /// The device may have been in other hands, and names are used to remove files.
-std::string checkedName(std::string name) {
+const std::string& checkedName(const std::string& name) {
     const bool leadsElsewhere = name.empty() || name == "." || name == ".." ||
                                 name.find('/') != std::string::npos ||
                                 name.find('\0') != std::string::npos;
@@ -122,10 +122,19 @@ class Fields {
 constexpr Fields::Names namesOfEntry{"name", "source", "size", "modified", "hash"};
 constexpr Fields::Names namesOfSelection{"playlist", "revision", "limitType", "limit"};
 
+/// An empty text stands for one that is not known.
+std::optional<Digest> hashIn(const std::string& text) {
+    const auto hash = digestIn(text);
+    if (!hash && !text.empty()) {
+        throw WrongManifest{notWellFormed};
+    }
+    return hash;
+}
+
 Entry entryOf(const Fields& fields) {
     return {checkedName(textOf(fields[0])), decoded(textOf(fields[1])),
             numberOf<std::uint64_t>(fields[2]), numberOf<std::int64_t>(fields[3]),
-            textOf(fields[4])};
+            hashIn(textOf(fields[4]))};
 }
 
 Selection selectionOf(const Fields& fields) {

@@ -48,7 +48,9 @@ std::uint64_t bytesBelow(const std::filesystem::path& root) {
     return bytes;
 }
 
-std::string pathOf(const Entry& entry) { return std::string{musicDirectory} + "/" + entry.name; }
+std::string pathOf(const Entry& entry) {
+    return std::string{musicDirectory}.append("/").append(entry.name());
+}
 
 /// Somebody's own playlist may be as large as ours. What cannot be read is not as it was.
 bool hasContentsOf(int root, const Entry& playlist) {

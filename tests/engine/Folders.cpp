@@ -102,11 +102,12 @@ std::string whatIsWrongWith(const std::filesystem::path& wearable) {
     const auto manifest = wearable::loadManifest(root.get());
     const auto music = wearable / wearable::musicDirectory;
     for (const auto& song : manifest.songs) {
-        if (!std::filesystem::exists(music / song.name)) {
-            return song.name + " is not there";
+        const std::string name(song.name());
+        if (!std::filesystem::exists(music / name)) {
+            return name + " is not there";
         }
-        if (hashOf(textOf(music / song.name)) != song.hash) {
-            return song.name + " is not complete";
+        if (hashOf(textOf(music / name)) != song.hash) {
+            return name + " is not complete";
         }
     }
     return {};

@@ -22,7 +22,7 @@ constexpr auto first = "manifest.1";
 constexpr auto second = "manifest.2";
 
 Manifest manifestOf(const std::string& song) {
-    return {{{song, song, 10, 1, "h"}}, {}, {}, Selection{1, 2, 3, 4}};
+    return {{{song, song, 10, 1, hashOf("h")}}, {}, {}, Selection{1, 2, 3, 4}};
 }
 
 class Generations : public ::testing::Test {
@@ -49,7 +49,7 @@ TEST_F(Generations, AreWrittenAsTheManualShows) {
     const auto [manifest, number, next] = newest();
 
     ASSERT_EQ(manifest.songs.size(), 2);
-    EXPECT_EQ(manifest.songs[1].source, "Café/Evening.mp3");
+    EXPECT_EQ(manifest.songs[1].source(), "Café/Evening.mp3");
     EXPECT_TRUE(manifest.playlist && manifest.sent);
     EXPECT_EQ(generationText(number, manifest), example);
 }

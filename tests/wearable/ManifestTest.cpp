@@ -20,9 +20,9 @@ using ::testing::HasSubstr;
 
 Manifest everything() {
     constexpr auto most = std::numeric_limits<std::uint64_t>::max();
-    return {{{"Añjo.mp3", "Dir/100%\xFF\x01 Añjo.mp3", most, -1, "abc"}},
-            Entry{"List.m3u8", "List.m3u", 7, 0, "def"},
-            {{"old.ogg", "old.ogg", 0, 1, ""}},
+    return {{{"Añjo.mp3", "Dir/100%\xFF\x01 Añjo.mp3", most, -1, hashOf("abc")}},
+            Entry{"List.m3u8", "List.m3u", 7, 0, hashOf("def")},
+            {{"old.ogg", "old.ogg", 0, 1, {}}},
             Selection{most, most - 1, 2, 3}};
 }
 
@@ -33,14 +33,15 @@ TEST(Manifest, GivesBackWhatWasWritten) {
 /// What stands on wearables: later versions have to read it, and write nothing else for it.
 TEST(Manifest, IsWrittenAsItAlwaysWas) {
     const Manifest manifest{
-        {{"Tune.mp3", "a/%\x1F ~\x7F\xFF.mp3", 18446744073709551615U, -1, "abc"}},
-        Entry{"List.m3u8", "List.m3u", 7, 0, "def"},
-        {{"old.ogg", "old.ogg", 0, 1, ""}},
+        {{"Tune.mp3", "a/%\x1F ~\x7F\xFF.mp3", 18446744073709551615U, -1,
+          Digest{0x000910baa2190ef6, 0x1d942b5518a50626}}},
+        Entry{"List.m3u8", "List.m3u", 7, 0, Digest{0x23718075c68c2330, 0x25cc0693d208555d}},
+        {{"old.ogg", "old.ogg", 0, 1, {}}},
         Selection{4, 3, 2, 1}};
     const std::string text = R"({
  "format": 1,
  "playlist": {
-  "hash": "def",
+  "hash": "23718075c68c233025cc0693d208555d",
   "modified": 0,
   "name": "List.m3u8",
   "size": 7,
@@ -54,7 +55,7 @@ TEST(Manifest, IsWrittenAsItAlwaysWas) {
  },
  "songs": [
   {
-   "hash": "abc",
+   "hash": "000910baa2190ef61d942b5518a50626",
    "modified": -1,
    "name": "Tune.mp3",
    "size": 18446744073709551615,
@@ -80,7 +81,7 @@ class HostileManifest : public ::testing::TestWithParam<std::string> {};
 
 TEST_P(HostileManifest, IsRejectedBecauseAFileElsewhereCouldBeRemovedByItsName) {
     auto manifest = everything();
-    manifest.strays.front().name = GetParam();
+    manifest.strays.front().rename(GetParam());
 
     EXPECT_THROW(static_cast<void>(parseManifest(toText(manifest))), BadManifest);
 }
@@ -127,8 +128,9 @@ TEST(Manifest, ThatIsBrokenSaysWhatToDo) {
 
 /// As they come from hands that write JSON by other rules than ours.
 TEST(Manifest, IsReadWhateverElseStandsInItAndInWhateverOrder) {
-    const Manifest one{{{"a", "a", 1, 2, "h"}}, {}, {}, {}};
-    const std::string song = R"({"size":1,"x":{"name":"z"},"hash":"h","name":"z","source":"a",)"
+    const Manifest one{{{"a", "a", 1, 2, hashOf("h")}}, {}, {}, {}};
+    const std::string song = R"({"size":1,"x":{"name":"z"},"hash":")" + toText(hashOf("h")) +
+                             R"(","name":"z","source":"a",)"
                              R"("modified":2,"name":"a","y":[{"size":9}]})";
     for (const auto& text :
          {R"({"strays":[],"x":{"songs":[1],"format":2,"y":[[]]},"format":1,"songs":[)" + song +
@@ -161,6 +163,17 @@ TEST(Manifest, SaysOfSeveralThingsThatAreWrongWhichCountsFirst) {
              {R"({"format":"1","songs":[],"strays":[]})", "a later version has written it"},
              {R"({"format":null})", "a later version has written it"}}) {
         EXPECT_THAT(rejectionOf(text), HasSubstr("(" + why + ")")) << text;
+    }
+}
+
+TEST(Manifest, WithAHashThatIsNoneIsRejected) {
+    const auto hash = toText(hashOf("def"));
+    EXPECT_EQ(hash.size(), 32);
+    for (const auto& other : {std::string("def"), hash.substr(1), hash + "0", "-" + hash.substr(1),
+                              hash.substr(1) + "g", std::string(32, ' ')}) {
+        auto text = toText(everything());
+        text.replace(text.find(hash), hash.size(), other);
+        EXPECT_THAT(rejectionOf(text), HasSubstr("(it is not well-formed)")) << other;
     }
 }
 

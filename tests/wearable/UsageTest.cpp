@@ -58,7 +58,7 @@ class SentTo : public ::testing::Test {
         device_.write("Music/foreign.mp3", std::string(50, 'x'));
         device_.write(
             ".quorl/manifest.1",
-            generationText(1, {.songs = {{"a.mp3", "a", 100, 0, ""}, {"b.mp3", "b", 200, 0, ""}},
+            generationText(1, {.songs = {{"a.mp3", "a", 100, 0, {}}, {"b.mp3", "b", 200, 0, {}}},
                                .playlist = Entry{"List.m3u8", "List", 6, 0, hashOf("a list")},
                                .strays = {},
                                .sent = sent_}));

@@ -46,7 +46,9 @@ std::set<std::string> songsIn(const std::string& playlist) {
 
 std::set<std::string> namesOf(const std::vector<wearable::Entry>& entries) {
     std::set<std::string> names;
-    std::ranges::transform(entries, std::inserter(names, names.end()), &wearable::Entry::name);
+    for (const auto& entry : entries) {
+        names.emplace(entry.name());
+    }
     return names;
 }
 
@@ -135,7 +137,7 @@ std::string VolumeRules::remove(const std::string& name) {
     if (isInPlaylist(name)) {
         return "a song is removed that a playlist names";
     }
-    const bool isPlaylist = durable_.playlist && durable_.playlist->name == name;
+    const bool isPlaylist = durable_.playlist && durable_.playlist->name() == name;
     return isPlaylist || isAnnounced(name)
                ? ""
                : "something is removed that the durable list does not give up";

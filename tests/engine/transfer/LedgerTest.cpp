@@ -16,12 +16,13 @@ namespace {
 using namespace quorl::syncd;
 using namespace quorl::syncd::testing;
 using quorl::wearable::Entry;
+using quorl::wearable::hashOf;
 using quorl::wearable::Manifest;
 using quorl::wearable::Selection;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
-Entry entry(const std::string& name) { return {name, "from " + name, 3, 1, "hash"}; }
+Entry entry(const std::string& name) { return {name, "from " + name, 3, 1, hashOf("contents")}; }
 
 class Ledgers : public ::testing::Test {
   protected:
@@ -101,7 +102,7 @@ TEST_F(Ledgers, AdoptsWhatIsComplete) {
 
 TEST_F(Ledgers, DoesNotTakeForThereWhatHasNoHashOrWasNotAnnounced) {
     auto withoutHash = one_;
-    withoutHash.hash.clear();
+    withoutHash.hash.reset();
     ledger_.announce(std::vector{withoutHash});
 
     ledger_.songsAreThere(std::vector{withoutHash, two_});
@@ -114,7 +115,8 @@ TEST_F(Ledgers, DoesNotTakeForThereWhatHasNoHashOrWasNotAnnounced) {
 TEST_F(Ledgers, ForgetsWhatIsNotThereAndIsOnlyThenNotSaved) {
     songsCome({one_, two_});
     ledger_.save();
-    const Hashes hashes{[](const Entry&) { return "hash"; }, [](const auto&) { return "hash"; }};
+    const Hashes hashes{[](const Entry&) { return hashOf("contents"); },
+                        [](const auto&) { return hashOf("contents"); }};
     const quorl::base::FileState there{3, 1};
 
     ledger_.keepWhatIsThere([&](const auto&) { return std::optional(there); }, hashes);

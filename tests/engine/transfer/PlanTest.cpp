@@ -15,6 +15,7 @@
 namespace {
 
 using namespace quorl::syncd;
+using quorl::wearable::Digest;
 using quorl::wearable::Entry;
 using quorl::wearable::Manifest;
 using ::testing::ElementsAre;
@@ -26,13 +27,13 @@ constexpr quorl::wearable::Selection selection{1, 5, 99, 0};
 
 class Planning : public ::testing::Test {
   protected:
-    /// Adds a song to the playlist; its contents have this hash.
+    /// Adds a song to the playlist; it has these contents.
     void wish(const std::string& source, std::uint64_t size, std::int64_t modified,
-              const std::string& hash) {
+              const std::string& contents) {
         const auto directory = library_->songs.addDirectory("");
         playlist_.songs.push_back(
             library_->songs.add(directory, {"", source, size, modified, media::Kind::Audio}));
-        songHashes_[source] = hash;
+        songHashes_[source] = hashOf(contents);
     }
 
     [[nodiscard]] Order order() const {
@@ -43,11 +44,12 @@ class Planning : public ::testing::Test {
 
     [[nodiscard]] Hashes hashes() {
         return {[this](const Entry& song) {
-                    asked_.push_back("song " + song.source);
-                    if (gone_.contains(song.source)) {
-                        throw SongProblem(SongTrouble::Gone, song.source);
+                    const std::string source(song.source());
+                    asked_.push_back("song " + source);
+                    if (gone_.contains(source)) {
+                        throw SongProblem(SongTrouble::Gone, source);
                     }
-                    return songHashes_.at(song.source);
+                    return songHashes_.at(source);
                 },
                 [this](const std::string& name) {
                     asked_.push_back("copy " + name);
@@ -61,21 +63,24 @@ class Planning : public ::testing::Test {
     [[nodiscard]] static std::vector<std::string> namesOf(const Plan& plan) {
         std::vector<std::string> names;
         for (const auto& song : plan.songs) {
-            names.push_back(song.hash.empty() ? "(" + song.name + ")" : song.name);
+            const std::string name(song.name());
+            names.push_back(song.hash ? name : "(" + name + ")");
         }
         return names;
     }
 
     [[nodiscard]] static std::vector<std::string> namesOf(const std::vector<Entry>& entries) {
         std::vector<std::string> names;
-        std::ranges::transform(entries, std::back_inserter(names), &Entry::name);
+        for (const auto& entry : entries) {
+            names.emplace_back(entry.name());
+        }
         return names;
     }
 
     std::shared_ptr<media::Inventory> library_ = std::make_shared<media::Inventory>();
     media::Playlist playlist_{1, 5, "List", "List.m3u8", false, {}, {}};
-    std::map<std::string, std::string> songHashes_;
-    std::map<std::string, std::string> copyHashes_;
+    std::map<std::string, Digest> songHashes_;
+    std::map<std::string, Digest> copyHashes_;
     std::set<std::string> gone_;
     std::vector<std::string> asked_;
     Manifest there_;
@@ -91,15 +96,15 @@ TEST_F(Planning, CopiesEverythingToAnEmptyDevice) {
     EXPECT_THAT(namesOf(plan), ElementsAre("(one.mp3)", "(two.mp3)"));
     EXPECT_EQ(plan.progress, (CopyProgress{0, 2, 0, 30}));
     EXPECT_EQ(plan.bytesToCopy, 30);
-    EXPECT_EQ(plan.playlist->name, "List.m3u8");
+    EXPECT_EQ(plan.playlist->name(), "List.m3u8");
     EXPECT_EQ(plan.playlist->hash, hashOf("#EXTM3U\n#PLAYLIST:List\none.mp3\ntwo.mp3\n"));
     EXPECT_THAT(asked_, IsEmpty());
 }
 
 TEST_F(Planning, KeepsWhatIsThereWithoutReadingIt) {
     wish("one.mp3", 10, second, "1");
-    there_.songs = {{"one.mp3", "one.mp3", 10, second, "1"}};
-    there_.playlist = Entry{"List.m3u8", "List", 30, 0, "p"};
+    there_.songs = {{"one.mp3", "one.mp3", 10, second, hashOf("1")}};
+    there_.playlist = Entry{"List.m3u8", "List", 30, 0, hashOf("p")};
     names_ = {"one.mp3", "List.m3u8"};
 
     const auto plan = this->plan();
@@ -108,26 +113,27 @@ TEST_F(Planning, KeepsWhatIsThereWithoutReadingIt) {
     EXPECT_EQ(plan.progress, (CopyProgress{1, 1, 10, 10}));
     EXPECT_EQ(plan.bytesToCopy, 0);
     EXPECT_THAT(plan.unwanted, IsEmpty());
-    EXPECT_EQ(plan.playlist->name, "List.m3u8");
+    EXPECT_EQ(plan.playlist->name(), "List.m3u8");
     EXPECT_THAT(asked_, IsEmpty());
 }
 
 TEST_F(Planning, KeepsASongOfWhichOnlyTheTimeHasChanged) {
     wish("one.mp3", 10, 2 * second, "1");
-    there_.songs = {{"one.mp3", "one.mp3", 10, second, "1"}};
+    there_.songs = {{"one.mp3", "one.mp3", 10, second, hashOf("1")}};
     names_ = {"one.mp3"};
 
     const auto plan = this->plan();
 
-    EXPECT_EQ(plan.songs, (std::vector<Entry>{{"one.mp3", "one.mp3", 10, 2 * second, "1"}}));
+    EXPECT_EQ(plan.songs,
+              (std::vector<Entry>{{"one.mp3", "one.mp3", 10, 2 * second, hashOf("1")}}));
     EXPECT_THAT(asked_, ElementsAre("song one.mp3"));
 }
 
 TEST_F(Planning, CopiesASongWithNewContentsBesideTheOldOne) {
     wish("size.mp3", 11, second, "new");
     wish("contents.mp3", 10, 2 * second, "new");
-    there_.songs = {{"size.mp3", "size.mp3", 10, second, "old"},
-                    {"contents.mp3", "contents.mp3", 10, second, "old"}};
+    there_.songs = {{"size.mp3", "size.mp3", 10, second, hashOf("old")},
+                    {"contents.mp3", "contents.mp3", 10, second, hashOf("old")}};
     names_ = {"size.mp3", "contents.mp3"};
 
     EXPECT_THAT(namesOf(plan()), ElementsAre("(size (2).mp3)", "(contents (2).mp3)"));
@@ -137,18 +143,19 @@ TEST_F(Planning, AdoptsACompleteCopyThatWasLeftBehindAndRemovesOthers) {
     wish("whole.mp3", 10, second, "1");
     wish("ruined.mp3", 10, second, "2");
     wish("older.mp3", 10, 2 * second, "3");
-    there_.strays = {{"whole.mp3", "whole.mp3", 10, second, ""},
-                     {"ruined.mp3", "ruined.mp3", 10, second, ""},
-                     {"older.mp3", "older.mp3", 10, second, ""},
-                     {"nobody's.mp3", "nobody's.mp3", 10, second, ""}};
-    copyHashes_ = {{"whole.mp3", "1"}, {"ruined.mp3", "x"}};
+    there_.strays = {{"whole.mp3", "whole.mp3", 10, second, {}},
+                     {"ruined.mp3", "ruined.mp3", 10, second, {}},
+                     {"older.mp3", "older.mp3", 10, second, {}},
+                     {"nobody's.mp3", "nobody's.mp3", 10, second, {}}};
+    copyHashes_ = {{"whole.mp3", hashOf("1")}, {"ruined.mp3", hashOf("x")}};
     names_ = {"whole.mp3", "ruined.mp3", "older.mp3", "nobody's.mp3"};
 
     const auto plan = this->plan();
 
     EXPECT_THAT(namesOf(plan), ElementsAre("whole.mp3", "(ruined.mp3)", "(older.mp3)"))
         << "names of what is removed are free";
-    EXPECT_EQ(plan.adopted, (std::vector<Entry>{{"whole.mp3", "whole.mp3", 10, second, "1"}}));
+    EXPECT_EQ(plan.adopted,
+              (std::vector<Entry>{{"whole.mp3", "whole.mp3", 10, second, hashOf("1")}}));
     EXPECT_THAT(namesOf(plan.useless), ElementsAre("ruined.mp3", "older.mp3", "nobody's.mp3"));
     EXPECT_EQ(plan.progress, (CopyProgress{1, 3, 10, 30}));
     EXPECT_EQ(plan.bytesToCopy, 20);
@@ -156,7 +163,7 @@ TEST_F(Planning, AdoptsACompleteCopyThatWasLeftBehindAndRemovesOthers) {
 
 TEST_F(Planning, FreesTheNameOfARemovedFileHoweverTheDeviceSpellsIt) {
     wish("Bj\u00F6rk.mp3", 10, second, "1");
-    there_.strays = {{"Bj\u00F6rk.mp3", "gone.mp3", 10, second, ""}};
+    there_.strays = {{"Bj\u00F6rk.mp3", "gone.mp3", 10, second, {}}};
     names_ = {"Bjo\u0308rk.mp3"};
 
     EXPECT_THAT(namesOf(plan()), ElementsAre("(Bj\u00F6rk.mp3)"));
@@ -169,7 +176,7 @@ TEST_F(Planning, LeavesFilesOfOthersTheirNames) {
     const auto plan = this->plan();
 
     EXPECT_THAT(namesOf(plan), ElementsAre("(one (2).mp3)"));
-    EXPECT_EQ(plan.playlist->name, "List (2).m3u8");
+    EXPECT_EQ(plan.playlist->name(), "List (2).m3u8");
 }
 
 TEST_F(Planning, ListsASongOnceThatIsListedTwice) {
@@ -191,7 +198,7 @@ TEST_F(Planning, KeepsThePlaylistsNameOnOneLine) {
 TEST_F(Planning, LeavesOutASongThatCannotBeRead) {
     wish("gone.mp3", 10, 2 * second, "1");
     wish("two.mp3", 20, second, "2");
-    there_.songs = {{"gone.mp3", "gone.mp3", 10, second, "1"}};
+    there_.songs = {{"gone.mp3", "gone.mp3", 10, second, hashOf("1")}};
     gone_ = {"gone.mp3"};
     names_ = {"gone.mp3"};
 
@@ -205,7 +212,7 @@ TEST_F(Planning, LeavesOutASongThatCannotBeRead) {
 
 TEST_F(Planning, FindsRoomWithoutSongsThatAreNoLongerWanted) {
     wish("new.mp3", 30, second, "1");
-    there_.songs = {{"old.mp3", "old.mp3", 20, second, "2"}};
+    there_.songs = {{"old.mp3", "old.mp3", 20, second, hashOf("2")}};
     names_ = {"old.mp3"};
 
     auto plan = this->plan();
@@ -234,21 +241,21 @@ TEST_F(Planning, KeepsAnUnfinishedFileThatMayBeASecondNameOfAFinishedOne) {
 
 TEST_F(Planning, IsMadeAsAWholeOrNotAtAll) {
     wish("one.mp3", 10, 2 * second, "1");
-    there_.songs = {{"one.mp3", "one.mp3", 10, second, "1"}};
+    there_.songs = {{"one.mp3", "one.mp3", 10, second, hashOf("1")}};
 
-    EXPECT_THROW((void)planOf(order(), there_, {},
-                              {[](const Entry&) -> std::string { throw Stopped(); }, {}}),
-                 Stopped);
+    EXPECT_THROW(
+        (void)planOf(order(), there_, {}, {[](const Entry&) -> Digest { throw Stopped(); }, {}}),
+        Stopped);
 }
 
 TEST_F(Planning, ReplacesAPlaylistOfAnotherTitle) {
-    there_.playlist = Entry{"Old.m3u8", "Old", 30, 0, "p"};
+    there_.playlist = Entry{"Old.m3u8", "Old", 30, 0, hashOf("p")};
     names_ = {"Old.m3u8"};
 
     const auto plan = this->plan();
 
-    EXPECT_EQ(plan.playlist->name, "List.m3u8");
-    EXPECT_EQ(plan.playlist->source, "List");
+    EXPECT_EQ(plan.playlist->name(), "List.m3u8");
+    EXPECT_EQ(plan.playlist->source(), "List");
 }
 
 TEST_F(Planning, NeverTakesTooMuchForALittle) {
@@ -275,19 +282,19 @@ class Stocktaking : public Planning {
 };
 
 TEST_F(Stocktaking, BelievesAListOfWhichAllIsThere) {
-    there_ = {{{"one.mp3", "one.mp3", 10, second, "1"}},
-              Entry{"List.m3u8", "List", 30, 0, "p"},
+    there_ = {{{"one.mp3", "one.mp3", 10, second, hashOf("1")}},
+              Entry{"List.m3u8", "List", 30, 0, hashOf("p")},
               {},
               selection};
-    copyHashes_ = {{"List.m3u8", "p"}};
+    copyHashes_ = {{"List.m3u8", hashOf("p")}};
 
     EXPECT_EQ(taken({{"one.mp3", {10, 0}}, {"List.m3u8", {30, 0}}}), there_);
 }
 
 TEST_F(Stocktaking, ForgetsSongsThatAreGoneOrCutOff) {
-    there_.songs = {{"there.mp3", "there.mp3", 10, second, "1"},
-                    {"gone.mp3", "gone.mp3", 10, second, "2"},
-                    {"cut.mp3", "cut.mp3", 10, second, "3"}};
+    there_.songs = {{"there.mp3", "there.mp3", 10, second, hashOf("1")},
+                    {"gone.mp3", "gone.mp3", 10, second, hashOf("2")},
+                    {"cut.mp3", "cut.mp3", 10, second, hashOf("3")}};
     there_.sent = selection;
 
     const auto manifest = taken({{"there.mp3", {10, second}}, {"cut.mp3", {4, second}}});
@@ -297,10 +304,10 @@ TEST_F(Stocktaking, ForgetsSongsThatAreGoneOrCutOff) {
 }
 
 TEST_F(Stocktaking, LeavesAFileToSomebodyElseThatIsNotWhatWasPutThere) {
-    there_.songs = {{"later.mp3", "later.mp3", 10, second, "1"},
-                    {"other.mp3", "other.mp3", 10, second, "2"}};
+    there_.songs = {{"later.mp3", "later.mp3", 10, second, hashOf("1")},
+                    {"other.mp3", "other.mp3", 10, second, hashOf("2")}};
     there_.sent = selection;
-    copyHashes_ = {{"later.mp3", "1"}, {"other.mp3", "x"}};
+    copyHashes_ = {{"later.mp3", hashOf("1")}, {"other.mp3", hashOf("x")}};
 
     const auto manifest = taken({{"later.mp3", {10, 9 * second}}, {"other.mp3", {10, 9 * second}}});
 
@@ -309,10 +316,10 @@ TEST_F(Stocktaking, LeavesAFileToSomebodyElseThatIsNotWhatWasPutThere) {
 }
 
 TEST_F(Stocktaking, LeavesAPlaylistToSomebodyElseThatIsNotAsItWas) {
-    there_.playlist = Entry{"List.m3u8", "List", 30, 0, "p"};
+    there_.playlist = Entry{"List.m3u8", "List", 30, 0, hashOf("p")};
     there_.sent = selection;
 
-    copyHashes_ = {{"List.m3u8", "x"}};
+    copyHashes_ = {{"List.m3u8", hashOf("x")}};
 
     for (const auto& files : {Files{{"List.m3u8", {31, 0}}}, Files{{"List.m3u8", {30, 0}}}, {}}) {
         const auto manifest = taken(files);
@@ -323,15 +330,15 @@ TEST_F(Stocktaking, LeavesAPlaylistToSomebodyElseThatIsNotAsItWas) {
 }
 
 TEST_F(Stocktaking, TakesOnlyFilesForOursThatCanBeOurs) {
-    there_.strays = {{"same.mp3", "", 10, second, ""},
-                     {"rounded.mp3", "", 10, second, ""},
-                     {"late.mp3", "", 10, second, ""},
-                     {"late but same.mp3", "", 10, second, "h"},
-                     {"late and other.mp3", "", 10, second, "h"},
-                     {"larger.mp3", "", 10, second, ""},
-                     {"empty.mp3", "", 10, second, ""},
-                     {"gone.mp3", "", 10, second, ""}};
-    copyHashes_ = {{"late but same.mp3", "h"}, {"late and other.mp3", "x"}};
+    there_.strays = {{"same.mp3", "", 10, second, {}},
+                     {"rounded.mp3", "", 10, second, {}},
+                     {"late.mp3", "", 10, second, {}},
+                     {"late but same.mp3", "", 10, second, hashOf("h")},
+                     {"late and other.mp3", "", 10, second, hashOf("h")},
+                     {"larger.mp3", "", 10, second, {}},
+                     {"empty.mp3", "", 10, second, {}},
+                     {"gone.mp3", "", 10, second, {}}};
+    copyHashes_ = {{"late but same.mp3", hashOf("h")}, {"late and other.mp3", hashOf("x")}};
 
     const auto manifest = taken({{"same.mp3", {10, second}},
                                  {"rounded.mp3", {10, 3 * second}},
@@ -347,8 +354,9 @@ TEST_F(Stocktaking, TakesOnlyFilesForOursThatCanBeOurs) {
 }
 
 TEST_F(Stocktaking, KnowsAPlaylistThatWasAboutToComeByItsContentsAlone) {
-    there_.strays = {{"ours.m3u8", "Ours", 30, 0, "p"}, {"theirs.m3u8", "Theirs", 30, 0, "p"}};
-    copyHashes_ = {{"ours.m3u8", "p"}, {"theirs.m3u8", "x"}};
+    there_.strays = {{"ours.m3u8", "Ours", 30, 0, hashOf("p")},
+                     {"theirs.m3u8", "Theirs", 30, 0, hashOf("p")}};
+    copyHashes_ = {{"ours.m3u8", hashOf("p")}, {"theirs.m3u8", hashOf("x")}};
 
     const auto manifest = taken({{"ours.m3u8", {30, 9 * second}}, {"theirs.m3u8", {30, 0}}});
 
@@ -356,13 +364,13 @@ TEST_F(Stocktaking, KnowsAPlaylistThatWasAboutToComeByItsContentsAlone) {
 }
 
 TEST_F(Stocktaking, KnowsASongOf1970ThatWasAboutToComeByItsTime) {
-    there_.strays = {{"a.mp3", "a.mp3", 10, 0, ""}};
+    there_.strays = {{"a.mp3", "a.mp3", 10, 0, {}}};
 
     EXPECT_THAT(namesOf(taken({{"a.mp3", {10, 0}}}).strays), ElementsAre("a.mp3"));
 }
 
 TEST_F(Stocktaking, ComparesTimesThatAreFurtherApartThanANumberHolds) {
-    there_.strays = {{"a.mp3", "", 10, std::numeric_limits<std::int64_t>::min(), ""}};
+    there_.strays = {{"a.mp3", "", 10, std::numeric_limits<std::int64_t>::min(), {}}};
 
     EXPECT_THAT(taken({{"a.mp3", {10, std::numeric_limits<std::int64_t>::max()}}}).strays,
                 IsEmpty());

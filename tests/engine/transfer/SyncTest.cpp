@@ -100,7 +100,7 @@ TEST_F(SyncedWearable, GetsTheNewContentsOfASong) {
 
     EXPECT_EQ(copiedSongs_, 1);
     EXPECT_EQ(player_.music().size(), 3);
-    EXPECT_EQ(player_.music().at(player_.manifest().songs.back().name), "neu");
+    EXPECT_EQ(player_.music().at(std::string(player_.manifest().songs.back().name())), "neu");
     EXPECT_EQ(whatIsWrongWith(player_.path()), "");
 }
 

@@ -149,8 +149,8 @@ TEST_F(Trouble, ACopyThatWasLeftBehindByAKilledSyncIsUsedAndARuinedOneIsNot) {
                                          std::filesystem::last_write_time(music_.path() / name));
     }
     quorl::wearable::Manifest manifest;
-    manifest.strays = {{"second.mp3", "second.mp3", 6, song(1).modified, ""},
-                       {"third.mp3", "third.mp3", 5, song(2).modified, ""}};
+    manifest.strays = {{"second.mp3", "second.mp3", 6, song(1).modified, {}},
+                       {"third.mp3", "third.mp3", 5, song(2).modified, {}}};
     player_.write(".quorl/manifest.json", toText(manifest));
     std::optional<std::uint64_t> kept;
 
@@ -165,7 +165,7 @@ TEST_F(Trouble, ACopyThatWasLeftBehindByAKilledSyncIsUsedAndARuinedOneIsNot) {
 TEST_F(Trouble, AFileOfSomebodyElseThatTookTheNameOfAnUnfinishedCopyIsKept) {
     const auto order = wishFor(music_, player_);
     quorl::wearable::Manifest manifest;
-    manifest.strays = {{"second.mp3", "second.mp3", 6, 1, ""}};
+    manifest.strays = {{"second.mp3", "second.mp3", 6, 1, {}}};
     player_.write(".quorl/manifest.json", toText(manifest));
     player_.write("Music/second.mp3", "not ours");
 
@@ -177,7 +177,7 @@ TEST_F(Trouble, AFileOfSomebodyElseThatTookTheNameOfAnUnfinishedCopyIsKept) {
 
 TEST_F(Trouble, AFileOf1970ThatTookTheNameOfAnUnfinishedPlaylistIsKept) {
     quorl::wearable::Manifest manifest;
-    manifest.strays = {{"List.m3u8", "List", 8, 0, "0123456789abcdef"}};
+    manifest.strays = {{"List.m3u8", "List", 8, 0, quorl::wearable::hashOf("our list")}};
     player_.write(".quorl/manifest.json", toText(manifest));
     player_.write("Music/List.m3u8", "not ours");
     std::filesystem::last_write_time(player_.path() / "Music/List.m3u8",
