@@ -95,23 +95,26 @@ std::string deviceName(std::string_view name) {
     return result.empty() ? std::string{replacement} : result;
 }
 
-void TakenNames::add(std::string_view name) { folded_.insert(folded(name)); }
+TakenNames::Key TakenNames::keyOf(std::string_view name) { return wearable::hashOf(folded(name)); }
 
-bool TakenNames::insert(std::string_view name) {
+void TakenNames::add(std::string_view name) { taken_.insert(keyOf(name)); }
+
+bool TakenNames::insert(const Key& key) {
     ++lookUps_;
-    return folded_.insert(folded(name)).second;
+    return taken_.insert(key).second;
 }
 
 std::string TakenNames::take(std::string_view name) {
     constexpr int firstNumber = 2;
     auto wanted = deviceName(name);
-    if (insert(wanted)) {
+    const auto key = keyOf(wanted);
+    if (insert(key)) {
         return wanted;
     }
-    auto& number = numbers_.try_emplace(folded(wanted), firstNumber).first->second;
+    auto& number = numbers_.try_emplace(key, firstNumber).first->second;
     for (;;) {
         auto free = withSuffix(wanted, " (" + std::to_string(number++) + ")");
-        if (insert(free)) {
+        if (insert(keyOf(free))) {
             return free;
         }
     }

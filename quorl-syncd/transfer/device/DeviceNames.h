@@ -6,6 +6,8 @@
 #include <unordered_map>
 #include <unordered_set>
 
+#include "services/wearable/ContentHash.h"
+
 namespace quorl::syncd {
 
 /// `name` as every file system of a wearable can hold it, FAT above all: characters, endings and
@@ -14,6 +16,8 @@ namespace quorl::syncd {
 [[nodiscard]] std::string deviceName(std::string_view name);
 
 /// The names in one directory of a file system that does not tell capital letters from small ones.
+/// Only their hashes are kept: were two of them ever the same, a name would count as taken that is
+/// free, and another one be given out.
 class TakenNames {
   public:
     void add(std::string_view name);
@@ -26,11 +30,19 @@ class TakenNames {
     [[nodiscard]] std::size_t lookUps() const { return lookUps_; }
 
   private:
-    [[nodiscard]] bool insert(std::string_view name);
+    /// Of a name as it is compared.
+    using Key = wearable::Digest;
 
-    std::unordered_set<std::string> folded_;
+    struct HashOfKey {
+        std::size_t operator()(const Key& key) const { return static_cast<std::size_t>(key.low); }
+    };
+
+    [[nodiscard]] static Key keyOf(std::string_view name);
+    [[nodiscard]] bool insert(const Key& key);
+
+    std::unordered_set<Key, HashOfKey> taken_;
     /// For names that were wished for before, the number to go on with.
-    std::unordered_map<std::string, int> numbers_;
+    std::unordered_map<Key, int, HashOfKey> numbers_;
     std::size_t lookUps_ = 0;
 };
 
