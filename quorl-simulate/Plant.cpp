@@ -26,8 +26,8 @@ class HonestVolume : public syncd::Volume {
         return volume_->find(directory, name);
     }
 
-    [[nodiscard]] std::unique_ptr<syncd::Reader> open(Directory directory,
-                                                      const std::string& name) override {
+    [[nodiscard]] std::unique_ptr<base::Reader> open(Directory directory,
+                                                     const std::string& name) override {
         return volume_->open(directory, name);
     }
 

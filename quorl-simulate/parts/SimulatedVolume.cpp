@@ -17,7 +17,7 @@ std::string nameOf(Volume::Directory directory) {
                                                  : wearable::ownDirectory;
 }
 
-class SimulatedReader final : public syncd::Reader {
+class SimulatedReader final : public base::Reader {
   public:
     SimulatedReader(const SimulatedDisk& disk, SimulatedDisk::Node file)
         : disk_(disk), file_(file) {}
@@ -123,7 +123,7 @@ std::optional<base::FileState> SimulatedVolume::find(Directory directory, const 
     return base::FileState{status.size, status.modified};
 }
 
-std::unique_ptr<syncd::Reader> SimulatedVolume::open(Directory directory, const std::string& name) {
+std::unique_ptr<base::Reader> SimulatedVolume::open(Directory directory, const std::string& name) {
     disk_.look("open", name);
     return std::make_unique<SimulatedReader>(disk_, file(directory, name));
 }

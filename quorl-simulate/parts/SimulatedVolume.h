@@ -26,8 +26,8 @@ class SimulatedVolume final : public syncd::Volume {
     [[nodiscard]] std::vector<std::string> names(Directory directory) override;
     [[nodiscard]] std::optional<base::FileState> find(Directory directory,
                                                       const std::string& name) override;
-    [[nodiscard]] std::unique_ptr<syncd::Reader> open(Directory directory,
-                                                      const std::string& name) override;
+    [[nodiscard]] std::unique_ptr<base::Reader> open(Directory directory,
+                                                     const std::string& name) override;
     [[nodiscard]] std::unique_ptr<syncd::VolumeFile> create(Directory directory,
                                                             const std::string& name) override;
     [[nodiscard]] std::unique_ptr<syncd::VolumeFile> overwrite(Directory directory,

@@ -7,7 +7,7 @@
 
 namespace quorl::syncd {
 
-wearable::Digest hashOf(Reader& reader, const std::stop_token& stop) {
+wearable::Digest hashOf(base::Reader& reader, const std::stop_token& stop) {
     constexpr std::size_t pieceSize = 1 << 20;
     wearable::ContentHash hash;
     const auto memory = std::make_unique_for_overwrite<std::byte[]>(pieceSize);

@@ -2,7 +2,7 @@
 
 #include <stop_token>
 
-#include "quorl-syncd/transfer/Reader.h"
+#include "services/base/Reader.h"
 #include "services/wearable/ContentHash.h"
 
 namespace quorl::syncd {
@@ -10,6 +10,6 @@ namespace quorl::syncd {
 using wearable::hashOf;
 
 /// Of everything that is left to read. Throws `Stopped` soon after `stop` was requested.
-[[nodiscard]] wearable::Digest hashOf(Reader& reader, const std::stop_token& stop);
+[[nodiscard]] wearable::Digest hashOf(base::Reader& reader, const std::stop_token& stop);
 
 } // namespace quorl::syncd

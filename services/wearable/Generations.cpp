@@ -1,15 +1,18 @@
 #include "services/wearable/Generations.h"
 
+#include <algorithm>
 #include <cerrno>
-#include <charconv>
+#include <span>
 #include <string_view>
+#include <utility>
 
 #include <fcntl.h>
-#include <xxhash.h>
 
 #include "services/base/AtomicFile.h"
 #include "services/base/FileStatus.h"
 #include "services/language/Translated.h"
+#include "services/wearable/Checksum.h"
+#include "services/wearable/GenerationReader.h"
 #include "services/wearable/Wearable.h"
 
 namespace quorl::wearable {
@@ -18,34 +21,109 @@ using language::toTranslate;
 
 namespace {
 
-std::string checksum(std::string_view text) {
-    constexpr int hexadecimal = 16;
-    std::array<char, hexadecimal> digits{};
-    const auto end = std::to_chars(digits.data(), digits.data() + digits.size(),
-                                   XXH3_64bits(text.data(), text.size()), hexadecimal);
-    return {digits.data(), end.ptr};
-}
+/// A text in memory.
+class TextReader final : public base::Reader {
+  public:
+    explicit TextReader(std::string text) : text_(std::move(text)) {}
 
-struct Generation {
-    std::uint64_t number = 0;
-    std::string_view text;
+    [[nodiscard]] std::size_t read(std::span<std::byte> buffer) override {
+        const auto size = text_.copy(reinterpret_cast<char*>(buffer.data()), buffer.size(), at_);
+        at_ += size;
+        return size;
+    }
+
+  private:
+    const std::string text_;
+    std::size_t at_ = 0;
 };
 
-/// Nothing where the file is not as it was written.
-std::optional<Generation> generationIn(const std::optional<std::string>& file) {
-    const std::string_view contents = file ? *file : std::string_view();
-    const auto space = contents.find(' ');
-    const auto line = contents.find('\n');
-    if (line == std::string_view::npos || space > line) {
-        return std::nullopt;
+/// Gives on a text in pieces of one size.
+class EvenPieces {
+  public:
+    explicit EvenPieces(const TextSink& sink) : sink_(sink) { piece_.reserve(size); }
+
+    void add(std::string_view text) {
+        while (piece_.size() + text.size() >= size) {
+            const auto rest = size - piece_.size();
+            sink_(piece_.append(text.substr(0, rest)));
+            piece_.clear();
+            text.remove_prefix(rest);
+        }
+        piece_ += text;
     }
-    Generation generation{0, contents.substr(line + 1)};
-    std::from_chars(&contents[space] + 1, &contents[line], generation.number);
-    const auto numbered = contents.substr(space + 1);
-    const bool isWhole = generation.number > 0 &&
-                         numbered.starts_with(std::to_string(generation.number) + "\n") &&
-                         contents.substr(0, space) == checksum(numbered);
-    return isWhole ? std::optional(generation) : std::nullopt;
+
+    void finish() {
+        if (!piece_.empty()) {
+            sink_(piece_);
+        }
+    }
+
+  private:
+    static constexpr std::size_t size = 65536;
+
+    const TextSink& sink_;
+    std::string piece_;
+};
+
+void writeLineFeeds(std::uint64_t count, const TextSink& sink) {
+    constexpr std::uint64_t most = 4096;
+    const std::string lineFeeds(std::min(count, most), '\n');
+    for (; count > most; count -= most) {
+        sink(lineFeeds);
+    }
+    sink(std::string_view(lineFeeds).substr(0, static_cast<std::size_t>(count)));
+}
+
+/// What stands in the file behind its checksum and a space, without having been written yet.
+struct Numbered {
+    std::string checksum;
+    std::uint64_t lineFeeds = 0;
+};
+
+Numbered measured(const std::string& line, const Manifest& manifest, std::uint64_t size) {
+    Checksum checksum;
+    std::uint64_t length = 0;
+    const TextSink measure = [&](std::string_view text) {
+        checksum.add(text);
+        length += text.size();
+    };
+    measure(line);
+    writeText(manifest, measure);
+    Numbered numbered{checksum.text()};
+    const auto missing = [&] {
+        const auto used = numbered.checksum.size() + 1 + length;
+        return used < size ? size - used : 0;
+    };
+    while (const auto count = missing()) { // again where the new checksum is shorter
+        writeLineFeeds(count, measure);
+        numbered.lineFeeds += count;
+        numbered.checksum = checksum.text();
+    }
+    return numbered;
+}
+
+using OpenGenerations = std::array<std::optional<GenerationReader>, generationFiles.size()>;
+
+void openAll(OpenGenerations& files, const OpenOwnFile& open) {
+    for (std::size_t index = 0; index < files.size(); ++index) {
+        if (auto file = open(generationFiles.at(index))) {
+            files.at(index).emplace(std::move(file));
+        }
+    }
+}
+
+/// Which of them counts where it is whole.
+std::size_t likelyNewest(const OpenGenerations& files) {
+    return files[1] && (!files[0] || files[1]->number() > files[0]->number()) ? 1 : 0;
+}
+
+Manifest formerManifest(const OpenOwnFile& open) {
+    auto file = open(formerManifestFile);
+    if (!file) {
+        return {};
+    }
+    TextInPieces text(std::move(file));
+    return parseManifest(text);
 }
 
 std::optional<std::string> readOwnFile(int root, const char* name) {
@@ -61,31 +139,46 @@ std::optional<std::string> readOwnFile(int root, const char* name) {
 
 } // namespace
 
-StoredManifest newestManifest(const ReadOwnFile& read) {
-    std::array files{read(generationFiles[0]), read(generationFiles[1])};
-    const std::array generations{generationIn(files[0]), generationIn(files[1])};
-    if (!generations[0] && !generations[1]) {
-        if (files[0] && files[1]) {
-            rejectManifest(toTranslate("both copies of it are damaged"));
+StoredManifest newestManifest(const OpenOwnFile& open) {
+    OpenGenerations files;
+    openAll(files, open);
+    const auto likely = likelyNewest(files);
+    for (const auto index : {likely, 1 - likely}) {
+        auto& file = files.at(index);
+        if (auto manifest = file ? file->read() : std::nullopt) {
+            return {std::move(*manifest), file->number(), 1 - index};
         }
-        const auto former = read(formerManifestFile);
-        return {former ? parseManifest(*former) : Manifest(), 0, files[1] ? 1U : 0U};
     }
-    const bool isSecond =
-        !generations[0] || (generations[1] && generations[1]->number > generations[0]->number);
-    const auto& newest = *generations.at(isSecond ? 1 : 0);
-    files.at(isSecond ? 0 : 1).reset(); // it may be long
-    return {parseManifest(newest.text), newest.number, isSecond ? 0U : 1U};
+    if (files[0] && files[1]) {
+        rejectManifest(toTranslate("both copies of it are damaged"));
+    }
+    return {formerManifest(open), 0, files[1] ? 1U : 0U};
 }
 
-std::string generationText(std::uint64_t number, const Manifest& manifest, std::size_t size) {
-    auto text = toText(manifest).insert(0, std::to_string(number) + "\n");
-    auto sum = checksum(text);
-    while (sum.size() + 1 + text.size() < size) { // again where the new checksum is shorter
-        text.append(size - sum.size() - 1 - text.size(), '\n');
-        sum = checksum(text);
-    }
-    return text.insert(0, sum + " ");
+StoredManifest newestManifest(const ReadOwnFile& read) {
+    const OpenOwnFile open = [&](const char* name) -> std::unique_ptr<base::Reader> {
+        auto text = read(name);
+        return text ? std::make_unique<TextReader>(std::move(*text)) : nullptr;
+    };
+    return newestManifest(open);
+}
+
+void writeGeneration(std::uint64_t number, const Manifest& manifest, std::uint64_t size,
+                     const TextSink& write) {
+    const auto line = std::to_string(number) + "\n";
+    const auto [checksum, lineFeeds] = measured(line, manifest, size);
+    EvenPieces pieces(write);
+    const TextSink add = [&](std::string_view text) { pieces.add(text); };
+    add(checksum + " " + line);
+    writeText(manifest, add);
+    writeLineFeeds(lineFeeds, add);
+    pieces.finish();
+}
+
+std::string generationText(std::uint64_t number, const Manifest& manifest, std::uint64_t size) {
+    std::string text;
+    writeGeneration(number, manifest, size, [&](std::string_view piece) { text += piece; });
+    return text;
 }
 
 void requireReadable(bool isRegularFile, std::uint64_t size) {
@@ -98,8 +191,9 @@ void requireReadable(bool isRegularFile, std::uint64_t size) {
     }
 }
 
+/// The text is read at once, so that a sync has little time to write over it meanwhile.
 Manifest loadManifest(int root) {
-    const auto read = [root](const char* name) { return readOwnFile(root, name); };
+    const ReadOwnFile read = [root](const char* name) { return readOwnFile(root, name); };
     try {
         return newestManifest(read).manifest;
     } catch (const BadManifest&) {

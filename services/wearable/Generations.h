@@ -4,9 +4,11 @@
 #include <cstddef>
 #include <cstdint>
 #include <functional>
+#include <memory>
 #include <optional>
 #include <string>
 
+#include "services/base/Reader.h"
 #include "services/wearable/Manifest.h"
 
 /// The manifest on a wearable. It is kept twice, in two files of our own directory, each with a
@@ -28,17 +30,26 @@ struct StoredManifest {
     std::size_t next = 0;
 };
 
+/// Opens a file of our own directory; null where there is none.
+using OpenOwnFile = std::function<std::unique_ptr<base::Reader>(const char* name)>;
+
 /// Gives back the contents of a file of our own directory, nothing where there is none.
 using ReadOwnFile = std::function<std::optional<std::string>(const char* name)>;
 
 /// Empty where nothing was ever saved, or the very first saving was cut short. Throws `BadManifest`
-/// where what there is cannot be used, and what `read` throws.
+/// where what there is cannot be used, and what opening and reading throw.
+[[nodiscard]] StoredManifest newestManifest(const OpenOwnFile& open);
 [[nodiscard]] StoredManifest newestManifest(const ReadOwnFile& read);
 
-/// The contents of the file for the generation of this number, from 1 on.
+/// Writes the contents of the file for the generation of this number, from 1 on, in pieces of
+/// 64 KiB.
 /// @param size of the file that they are to be written over, in bytes; they fill it at least.
+void writeGeneration(std::uint64_t number, const Manifest& manifest, std::uint64_t size,
+                     const TextSink& write);
+
+/// The same in one piece.
 [[nodiscard]] std::string generationText(std::uint64_t number, const Manifest& manifest,
-                                         std::size_t size = 0);
+                                         std::uint64_t size = 0);
 
 /// The device may have been in other hands: what could be waited for without end, or would fill the
 /// memory, must not be read. Throws `BadManifest` for such a file.

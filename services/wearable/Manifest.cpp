@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <concepts>
-#include <utility>
 
 #include <nlohmann/json.hpp>
 
@@ -43,7 +42,7 @@ bool isPlain(std::string_view text) {
 /// The object of the manifest as text, whose members come one by one, in the order of their names.
 class Writer {
   public:
-    explicit Writer(std::size_t size) { text_.reserve(size); }
+    explicit Writer(const TextSink& sink) : sink_(sink) {}
 
     void begin(char bracket) {
         text_ += bracket;
@@ -88,11 +87,21 @@ class Writer {
         text_ += std::to_string(value);
     }
 
-    [[nodiscard]] std::string take() { return std::move(text_.append("\n")); }
+    /// The sink gets what has come so far.
+    void giveOn() {
+        sink_(text_);
+        text_.clear();
+    }
+
+    void finish() {
+        text_ += '\n';
+        giveOn();
+    }
 
   private:
     void newLine() { text_.append("\n").append(depth_, ' '); }
 
+    const TextSink& sink_;
     std::string text_;
     std::size_t depth_ = 0;
     bool isFirst_ = true;
@@ -122,18 +131,18 @@ void write(Writer& writer, const std::vector<Entry>& entries) {
     for (const auto& entry : entries) {
         writer.next();
         write(writer, entry);
+        writer.giveOn();
     }
     writer.end(']');
 }
 
-/// About as many bytes as they take as text.
-std::size_t sizeOf(const std::vector<Entry>& entries) {
-    constexpr std::size_t beside = 140;
-    std::size_t size = beside;
-    for (const auto& entry : entries) {
-        size += entry.name().size() + entry.source().size() + beside;
+template <class Text>
+Manifest parsed(Text& text) {
+    try {
+        return readManifest(text);
+    } catch (const WrongManifest& error) {
+        rejectManifest(error.what());
     }
-    return size;
 }
 
 } // namespace
@@ -145,9 +154,8 @@ void rejectManifest(const std::string& why) {
                           "/manifest.* from it to begin anew; the music that is on it then stays."};
 }
 
-std::string toText(const Manifest& manifest) {
-    constexpr std::size_t beside = 1'000;
-    Writer writer(beside + sizeOf(manifest.songs) + sizeOf(manifest.strays));
+void writeText(const Manifest& manifest, const TextSink& sink) {
+    Writer writer(sink);
     writer.begin('{');
     writer.member("format", manifestFormat);
     if (manifest.playlist) {
@@ -163,18 +171,20 @@ std::string toText(const Manifest& manifest) {
     writer.key("strays");
     write(writer, manifest.strays);
     writer.end('}');
-    return writer.take();
+    writer.finish();
 }
 
-Manifest parseManifest(std::string_view text) {
-    if (text.empty()) {
-        return {};
-    }
-    try {
-        return readManifest(text);
-    } catch (const WrongManifest& error) {
-        rejectManifest(error.what());
-    }
+std::string toText(const Manifest& manifest) {
+    std::string text;
+    writeText(manifest, [&](std::string_view piece) { text += piece; });
+    return text;
 }
+
+Manifest parseManifest(std::streambuf& text) {
+    const bool isEmpty = text.sgetc() == std::streambuf::traits_type::eof();
+    return isEmpty ? Manifest() : parsed(text);
+}
+
+Manifest parseManifest(std::string_view text) { return text.empty() ? Manifest() : parsed(text); }
 
 } // namespace quorl::wearable

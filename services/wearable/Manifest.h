@@ -1,7 +1,9 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <optional>
+#include <streambuf>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -81,11 +83,18 @@ class BadManifest : public CannotBeSeen {
 /// @param why in English; whoever words the message translates it.
 [[noreturn]] void rejectManifest(const std::string& why);
 
+/// Takes a text, one piece after the other.
+using TextSink = std::function<void(std::string_view piece)>;
+
 /// As text, to be read by `parseManifest`.
+void writeText(const Manifest& manifest, const TextSink& sink);
+
+/// All of it in one piece.
 [[nodiscard]] std::string toText(const Manifest& manifest);
 
-/// An empty text gives an empty manifest. Throws `BadManifest`, whose text says what to do. No name
-/// in the result leads out of the music directory.
+/// An empty text gives an empty manifest. Throws `BadManifest`, whose text says what to do, and
+/// what reading `text` throws. No name in the result leads out of the music directory.
+[[nodiscard]] Manifest parseManifest(std::streambuf& text);
 [[nodiscard]] Manifest parseManifest(std::string_view text);
 
 } // namespace quorl::wearable

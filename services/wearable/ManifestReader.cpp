@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <array>
 #include <charconv>
+#include <istream>
 #include <optional>
 #include <string>
 #include <utility>
@@ -336,14 +337,22 @@ class ManifestReader final : public nlohmann::json_sax<json> {
     std::optional<Selection> selection_;
 };
 
-} // namespace
-
-Manifest readManifest(std::string_view text) {
+template <class Text>
+Manifest read(Text&& text) {
     ManifestReader reader;
-    if (!json::sax_parse(text, &reader)) {
+    if (!json::sax_parse(std::forward<Text>(text), &reader)) {
         throw WrongManifest{notWellFormed};
     }
     return reader.take();
 }
+
+} // namespace
+
+Manifest readManifest(std::streambuf& text) {
+    std::istream stream(&text);
+    return read(stream);
+}
+
+Manifest readManifest(std::string_view text) { return read(text); }
 
 } // namespace quorl::wearable

@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <stdexcept>
+#include <streambuf>
 #include <string_view>
 
 #include "services/wearable/Manifest.h"
@@ -16,7 +17,8 @@ struct WrongManifest : std::runtime_error {
 /// The only one there has been so far.
 inline constexpr std::uint64_t manifestFormat = 1;
 
-/// The manifest that `toText` made this of. Throws `WrongManifest`.
+/// The manifest that `writeText` made this of. Throws `WrongManifest`, and what reading throws.
+[[nodiscard]] Manifest readManifest(std::streambuf& text);
 [[nodiscard]] Manifest readManifest(std::string_view text);
 
 } // namespace quorl::wearable

@@ -2,7 +2,12 @@
 
 #include "services/wearable/Generations.h"
 
+#include <algorithm>
+#include <cerrno>
 #include <fstream>
+#include <map>
+#include <numeric>
+#include <system_error>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -126,6 +131,97 @@ TEST_F(Generations, AreNotBelievedWhereverTheyAreCutOff) {
         EXPECT_EQ(newest().manifest, manifestOf("old")) << size;
         EXPECT_EQ(newest().next, 0) << size;
     }
+}
+
+/// Of more than one piece.
+Manifest longManifest() {
+    Manifest manifest;
+    for (int song = 0; song < 2'000; ++song) {
+        const auto name = "song " + std::to_string(song);
+        manifest.songs.emplace_back(name, "folder/" + name, 10, 1, hashOf(name));
+    }
+    return manifest;
+}
+
+TEST_F(Generations, AreWrittenInPiecesWhereTheyAreLong) {
+    const auto manifest = longManifest();
+    const auto text = generationText(7, manifest);
+    ASSERT_TRUE(text.ends_with(toText(manifest)));
+    for (const auto size : {std::size_t{0}, text.size() + 200'000}) {
+        std::vector<std::string> pieces;
+        writeGeneration(7, manifest, size,
+                        [&](std::string_view piece) { pieces.emplace_back(piece); });
+
+        const auto& last = pieces.back();
+        EXPECT_EQ(pieces.size(), std::max(size, text.size()) / 65'536 + 1);
+        EXPECT_TRUE(std::all_of(pieces.begin(), pieces.end() - 1,
+                                [](const auto& piece) { return piece.size() == 65'536; }));
+        EXPECT_TRUE(!last.empty() && last.size() < 65'536);
+        files_[first] = std::accumulate(pieces.begin(), pieces.end(), std::string());
+        EXPECT_TRUE(newest().manifest == manifest);
+    }
+    EXPECT_EQ(files_[first].size(), text.size() + 200'000);
+}
+
+TEST_F(Generations, ThatAreLongAreNotBelievedEitherWhereTheyAreDamaged) {
+    const auto whole = generationText(2, longManifest());
+    for (const auto at : {std::size_t{0}, std::size_t{65'536}, whole.size() - 1}) {
+        auto damaged = whole;
+        damaged[at] = static_cast<char>(damaged[at] ^ 1);
+        for (const auto& other : {damaged, whole.substr(0, at)}) {
+            files_ = {{first, generationText(1, manifestOf("old"))}, {second, other}};
+
+            EXPECT_EQ(newest().manifest, manifestOf("old")) << at;
+            EXPECT_EQ(newest().next, 1) << at;
+        }
+    }
+}
+
+/// Gives on few bytes at a time, and fails in the end where it is to.
+class SlowReader final : public quorl::base::Reader {
+  public:
+    SlowReader(std::string text, bool fails) : text_(std::move(text)), fails_(fails) {}
+
+    [[nodiscard]] std::size_t read(std::span<std::byte> buffer) override {
+        const auto size =
+            text_.copy(reinterpret_cast<char*>(buffer.data()), std::min(buffer.size(), most_), at_);
+        at_ += size;
+        if (size == 0 && fails_) {
+            throw std::system_error(EIO, std::generic_category());
+        }
+        return size;
+    }
+
+  private:
+    const std::string text_;
+    const bool fails_;
+    static constexpr std::size_t most_ = 1'000;
+    std::size_t at_ = 0;
+};
+
+TEST_F(Generations, AreReadHoweverLittleTheDeviceGivesAtATime) {
+    const auto manifest = longManifest();
+    for (const bool fails : {false, true}) {
+        const auto open = [&](std::string_view name) {
+            return name == second ? std::make_unique<SlowReader>(generationText(2, manifest), fails)
+                                  : nullptr;
+        };
+        if (fails) {
+            EXPECT_THROW(static_cast<void>(newestManifest(open)), std::system_error);
+        } else {
+            EXPECT_TRUE(newestManifest(open).manifest == manifest);
+        }
+    }
+}
+
+TEST_F(Generations, SayWhatIsWrongWithTheNewestWhereItIsWhole) {
+    const auto elsewhere = manifestOf("..");
+    files_ = {{first, generationText(1, manifestOf("old"))},
+              {second, generationText(2, elsewhere)}};
+    EXPECT_THROW(static_cast<void>(newest()), BadManifest);
+
+    files_[second].back() = ' ';
+    EXPECT_EQ(newest().manifest, manifestOf("old"));
 }
 
 TEST_F(Generations, AreNoneWhereTheVeryFirstWasCutOffAndThatFileIsWrittenAgain) {

@@ -26,13 +26,12 @@ char upperCase(char letter) {
     return letter >= 'a' && letter <= 'z' ? static_cast<char>(letter - 'a' + 'A') : letter;
 }
 
-std::string readToEnd(Reader& reader, std::uint64_t size) {
+std::string readToEnd(std::unique_ptr<base::Reader> reader) {
     constexpr std::size_t pieceSize = 65536;
     std::string text;
-    text.reserve(static_cast<std::size_t>(size));
     const auto memory = std::make_unique_for_overwrite<char[]>(pieceSize);
     const std::span piece(memory.get(), pieceSize);
-    while (const auto count = reader.read(std::as_writable_bytes(piece))) {
+    while (const auto count = reader->read(std::as_writable_bytes(piece))) {
         text.append(piece.data(), count);
     }
     return text;
@@ -89,18 +88,19 @@ void Device::syncTop(const std::vector<Directory>& made) {
     }
 }
 
-std::optional<std::string> Device::readOwn(const std::string& name) {
+/// Null where there is none.
+std::unique_ptr<base::Reader> Device::openOwn(const std::string& name) {
     const auto names = volume_->names(Directory::Own);
     if (std::ranges::find(names, name) == names.end()) {
-        return std::nullopt;
+        return nullptr;
     }
     const auto file = volume_->find(Directory::Own, name);
     wearable::requireReadable(file.has_value(), file ? file->size : 0);
-    return readToEnd(*volume_->open(Directory::Own, name), file->size);
+    return volume_->open(Directory::Own, name);
 }
 
 wearable::Manifest Device::loadManifest() {
-    auto stored = wearable::newestManifest([this](const char* name) { return readOwn(name); });
+    auto stored = wearable::newestManifest([this](const char* name) { return openOwn(name); });
     generation_ = stored.number;
     nextFile_ = stored.next;
     return std::move(stored.manifest);
@@ -125,11 +125,10 @@ void Device::writeGeneration(std::size_t index, const wearable::Manifest& manife
     const std::string name = wearable::generationFiles.at(index);
     try {
         const auto file = openGeneration(index);
-        // It was made by us, and so fits the memory.
         const auto old = volume_->find(Directory::Own, name).value_or(base::FileState());
-        const auto text =
-            wearable::generationText(generation_ + 1, manifest, static_cast<std::size_t>(old.size));
-        file->write(std::as_bytes(std::span(text)));
+        wearable::writeGeneration(generation_ + 1, manifest, old.size, [&](std::string_view piece) {
+            file->write(std::as_bytes(std::span(piece)));
+        });
         file->sync();
         volume_->syncDirectory(Directory::Own);
     } catch (const std::system_error&) {
@@ -145,9 +144,10 @@ void Device::writeGeneration(std::size_t index, const wearable::Manifest& manife
 /// it is as it was whatever becomes of that; its name was durable before.
 void Device::writeNewestAgain() {
     const std::string name = wearable::generationFiles.at(1 - nextFile_);
-    if (const auto text = readOwn(name)) {
+    if (auto newest = openOwn(name)) {
+        const auto text = readToEnd(std::move(newest));
         const auto file = volume_->overwrite(Directory::Own, name);
-        file->write(std::as_bytes(std::span(*text)));
+        file->write(std::as_bytes(std::span(text)));
         file->sync();
     }
 }
@@ -170,7 +170,7 @@ std::optional<base::FileState> Device::find(const std::string& name) {
     return volume_->find(Directory::Music, name);
 }
 
-std::unique_ptr<Reader> Device::openMusic(const std::string& name) {
+std::unique_ptr<base::Reader> Device::openMusic(const std::string& name) {
     return volume_->open(Directory::Music, name);
 }
 

@@ -54,7 +54,7 @@ class Device {
     [[nodiscard]] std::optional<base::FileState> find(const std::string& name);
 
     /// Opens a file of the music directory. Reading throws `std::system_error`.
-    [[nodiscard]] std::unique_ptr<Reader> openMusic(const std::string& name);
+    [[nodiscard]] std::unique_ptr<base::Reader> openMusic(const std::string& name);
 
     /// Removes a file of the music directory; one that is gone already is no failure. Only outlives
     /// a loss of power after `settle`.
@@ -96,7 +96,7 @@ class Device {
   private:
     [[nodiscard]] bool makeOwn();
     void syncTop(const std::vector<Volume::Directory>& made);
-    [[nodiscard]] std::optional<std::string> readOwn(const std::string& name);
+    [[nodiscard]] std::unique_ptr<base::Reader> openOwn(const std::string& name);
     void makeDirectories();
     void writeGeneration(std::size_t index, const wearable::Manifest& manifest);
     [[nodiscard]] std::unique_ptr<VolumeFile> openGeneration(std::size_t index);

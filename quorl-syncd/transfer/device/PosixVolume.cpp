@@ -78,7 +78,7 @@ std::vector<std::string> namesIn(int directory) {
     return names;
 }
 
-class PosixReader final : public Reader {
+class PosixReader final : public base::Reader {
   public:
     explicit PosixReader(FileDescriptor file) : file_(std::move(file)) {}
 
@@ -288,7 +288,7 @@ std::optional<base::FileState> PosixVolume::find(Directory directory, const std:
     return S_ISREG(status.st_mode) ? std::optional(base::stateOf(status)) : std::nullopt;
 }
 
-std::unique_ptr<Reader> PosixVolume::open(Directory directory, const std::string& name) {
+std::unique_ptr<base::Reader> PosixVolume::open(Directory directory, const std::string& name) {
     return std::make_unique<PosixReader>(openFile(descriptorOf(directory), name, O_RDONLY));
 }
 

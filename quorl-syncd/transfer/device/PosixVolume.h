@@ -29,8 +29,8 @@ class PosixVolume final : public Volume {
     [[nodiscard]] std::vector<std::string> names(Directory directory) override;
     [[nodiscard]] std::optional<base::FileState> find(Directory directory,
                                                       const std::string& name) override;
-    [[nodiscard]] std::unique_ptr<Reader> open(Directory directory,
-                                               const std::string& name) override;
+    [[nodiscard]] std::unique_ptr<base::Reader> open(Directory directory,
+                                                     const std::string& name) override;
     [[nodiscard]] std::unique_ptr<VolumeFile> create(Directory directory,
                                                      const std::string& name) override;
     [[nodiscard]] std::unique_ptr<VolumeFile> overwrite(Directory directory,

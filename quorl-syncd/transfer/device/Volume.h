@@ -8,8 +8,8 @@
 #include <string>
 #include <vector>
 
-#include "quorl-syncd/transfer/Reader.h"
 #include "services/base/FileStatus.h"
+#include "services/base/Reader.h"
 
 namespace quorl::syncd {
 
@@ -64,8 +64,8 @@ class Volume {
                                                               const std::string& name) = 0;
 
     /// Opens a regular file. Never waits for a pipe. Reading throws `std::system_error`.
-    [[nodiscard]] virtual std::unique_ptr<Reader> open(Directory directory,
-                                                       const std::string& name) = 0;
+    [[nodiscard]] virtual std::unique_ptr<base::Reader> open(Directory directory,
+                                                             const std::string& name) = 0;
 
     /// Makes an empty file, for its owner alone to write. Throws `EEXIST` where there is anything
     /// of that name.

@@ -4,14 +4,14 @@
 #include <memory>
 #include <string>
 
-#include "quorl-syncd/transfer/Reader.h"
 #include "quorl-syncd/transfer/songs/SongProblem.h"
 #include "services/base/FileStatus.h"
+#include "services/base/Reader.h"
 
 namespace quorl::syncd {
 
 /// A song of the music folder, open for reading. Reading throws `SongProblem`.
-class OpenSong : public Reader {
+class OpenSong : public base::Reader {
   public:
     /// Throws `SongProblem` where the song is no longer in the state that was expected.
     virtual void requireUnchanged() const = 0;

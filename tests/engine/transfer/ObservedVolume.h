@@ -41,8 +41,8 @@ class ObservedVolume final : public Volume {
         return volume_->find(directory, name);
     }
 
-    [[nodiscard]] std::unique_ptr<Reader> open(Directory directory,
-                                               const std::string& name) override {
+    [[nodiscard]] std::unique_ptr<base::Reader> open(Directory directory,
+                                                     const std::string& name) override {
         before_({"open", path(directory, name), ""});
         return volume_->open(directory, name);
     }

@@ -3,7 +3,7 @@
 #include <cstddef>
 #include <span>
 
-namespace quorl::syncd {
+namespace quorl::base {
 
 /// The contents of an open file, from the beginning to the end, once.
 class Reader {
@@ -15,4 +15,4 @@ class Reader {
     [[nodiscard]] virtual std::size_t read(std::span<std::byte> buffer) = 0;
 };
 
-} // namespace quorl::syncd
+} // namespace quorl::base
