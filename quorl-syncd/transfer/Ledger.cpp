@@ -18,8 +18,12 @@ bool eraseNamesOf(std::span<const Entry> named, std::vector<Entry>& entries) {
         return false;
     }
     const EntryNames names(named);
-    return std::erase_if(entries,
-                         [&](const Entry& entry) { return names.contains(entry.name()); }) > 0;
+    const auto erased =
+        std::erase_if(entries, [&](const Entry& entry) { return names.contains(entry.name()); });
+    if (entries.empty()) {
+        entries.shrink_to_fit(); // mostly for good
+    }
+    return erased > 0;
 }
 
 void append(std::vector<Entry> more, std::vector<Entry>& entries) {
@@ -90,14 +94,20 @@ void Ledger::songsAreThere(std::span<const Entry> songs) {
     if (manifest_.strays.empty()) {
         return;
     }
-    const EntryNames strays(manifest_.strays);
-    std::vector<Entry> there;
-    std::ranges::copy_if(songs, std::back_inserter(there), [&](const Entry& song) {
-        return song.hash && strays.contains(song.name());
-    });
+    const auto before = manifest_.songs.size();
+    addAnnounced(songs);
+    const auto there = std::span(manifest_.songs).subspan(before);
     eraseNamesOf(there, manifest_.strays);
     isSaved_ = isSaved_ && there.empty();
-    append(std::move(there), manifest_.songs);
+}
+
+void Ledger::addAnnounced(std::span<const Entry> songs) {
+    const EntryNames strays(manifest_.strays);
+    manifest_.songs.reserve(manifest_.songs.size() +
+                            std::min(songs.size(), manifest_.strays.size()));
+    std::ranges::copy_if(songs, std::back_inserter(manifest_.songs), [&](const Entry& song) {
+        return song.hash && strays.contains(song.name());
+    });
 }
 
 void Ledger::playlistIsGone() { set(manifest_.playlist, {}); }

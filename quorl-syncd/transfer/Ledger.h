@@ -71,6 +71,7 @@ class Ledger {
     template <class Value>
     void set(Value& value, Value changed);
     void addStrays(std::vector<wearable::Entry> strays);
+    void addAnnounced(std::span<const wearable::Entry> songs);
 
     Device& device_;
     wearable::Manifest manifest_;

@@ -1,7 +1,7 @@
 #pragma once
 
 #include <memory>
-#include <vector>
+#include <span>
 
 #include "services/media/Inventory.h"
 #include "services/wearable/Manifest.h"
@@ -27,7 +27,7 @@ struct Order {
 
 /// The songs from the top of the playlist to the first one that does not fit, as the pane's footer
 /// counts them; later ones are not tried. A song that is listed twice counts twice. None for a
-/// removal.
-[[nodiscard]] std::vector<media::SongIndex> songsWithinLimit(const Order& order);
+/// removal. They live as long as the library is there.
+[[nodiscard]] std::span<const media::SongIndex> songsWithinLimit(const Order& order);
 
 } // namespace quorl::syncd

@@ -273,6 +273,15 @@ class NamesBySource {
     std::unordered_map<std::string_view, std::string_view> names_;
 };
 
+/// Of a playlist that lists each song once.
+std::size_t bytesOfLines(const std::vector<Entry>& songs) {
+    std::size_t bytes = 0;
+    for (const auto& song : songs) {
+        bytes += song.name().size() + 1;
+    }
+    return bytes;
+}
+
 } // namespace
 
 bool isOurs(const Entry& entry, const std::optional<base::FileState>& file, const Hashes& hashes) {
@@ -359,6 +368,7 @@ std::string playlistText(const Order& order, const std::vector<Entry>& songs) {
     std::ranges::replace_if(
         title, [](unsigned char byte) { return byte < ' '; }, ' ');
     std::string text = "#EXTM3U\n#PLAYLIST:" + title + "\n";
+    text.reserve(text.size() + bytesOfLines(songs));
     for (const auto index : songsWithinLimit(order)) {
         const auto name = names.of(order.library->songs[index].path());
         if (!name.empty()) {
