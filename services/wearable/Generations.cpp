@@ -1,6 +1,5 @@
 #include "services/wearable/Generations.h"
 
-#include <algorithm>
 #include <cerrno>
 #include <span>
 #include <string_view>
@@ -66,9 +65,8 @@ class EvenPieces {
 };
 
 void writeLineFeeds(std::uint64_t count, const TextSink& sink) {
-    constexpr std::uint64_t most = 4096;
-    const std::string lineFeeds(std::min(count, most), '\n');
-    for (; count > most; count -= most) {
+    const std::string lineFeeds(4096, '\n');
+    for (; count > lineFeeds.size(); count -= lineFeeds.size()) {
         sink(lineFeeds);
     }
     sink(std::string_view(lineFeeds).substr(0, static_cast<std::size_t>(count)));
