@@ -45,6 +45,7 @@ void MusicLibrary::open(const std::filesystem::path& root, Taken taken) {
     taken_ = std::move(taken);
     const auto keeper =
         keptFile_.empty() ? nullptr : std::make_shared<media::InventoryKeeper>(keptFile_, root);
+    const auto kept = keeper ? keeper->kept() : nullptr;
     // Held weakly: an inventory on its way keeps no library alive.
     folder_ = std::make_unique<media::MusicFolder>(
         root, [reference = weak(this), number = ++foldersOpened_,
@@ -60,8 +61,8 @@ void MusicLibrary::open(const std::filesystem::path& root, Taken taken) {
             }
         });
     keeper_ = keeper;
-    if (keeper_ && !inventory_ && keeper_->kept()) {
-        show(keeper_->kept());
+    if (!inventory_ && kept) {
+        show(kept);
     }
 }
 

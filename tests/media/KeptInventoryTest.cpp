@@ -144,11 +144,20 @@ TEST_F(KeptFolder, keeperKeepsTheFirstAndTheLast) {
 
 TEST_F(KeptFolder, keeperWritesNothingThatIsThere) {
     keepInventory(file(), *scan(music_.path()));
+    fs::create_hard_link(file(), cache_ / "the same file");
     InventoryKeeper keeper(file(), music_.path());
-    const auto before = fs::last_write_time(file());
     keeper.take(scan(music_.path()));
     keeper.keepLast();
-    EXPECT_EQ(fs::last_write_time(file()), before);
+    EXPECT_EQ(fs::hard_link_count(file()), 2U);
+}
+
+TEST_F(KeptFolder, keeperHoldsWhatWasKeptUntilTheFolderWasRead) {
+    keepInventory(file(), *scan(music_.path()));
+    InventoryKeeper keeper(file(), music_.path());
+    const std::weak_ptr<const Inventory> kept = keeper.kept();
+    EXPECT_FALSE(kept.expired());
+    keeper.take(scan(music_.path()));
+    EXPECT_TRUE(kept.expired());
 }
 
 TEST_F(KeptFolder, keeperGoesOnWhereItCannotWrite) {

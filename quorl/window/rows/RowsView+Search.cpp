@@ -76,12 +76,13 @@ void RowsView::showMatches(std::optional<std::vector<NSInteger>> paneRows) {
 }
 
 void RowsView::closeSearch() {
+    if (!isSearched()) {
+        return;
+    }
     const auto found = currentRow();
     const NSInteger paneRow = found ? content_->paneRow(*found) : 0;
     finder_.endFilter();
-    if (search_ != nullptr) {
-        search_->hide();
-    }
+    search_->hide();
     placeSearch();
     showMatches(std::nullopt);
     setFocus(Qt::ShortcutFocusReason);

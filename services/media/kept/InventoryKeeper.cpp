@@ -13,20 +13,22 @@ InventoryKeeper::InventoryKeeper(std::filesystem::path file, const std::filesyst
 void InventoryKeeper::take(std::shared_ptr<const Inventory> inventory) {
     const bool isFirst = !last_;
     last_ = std::move(inventory);
+    isLastInFile_ = isFirst && kept_ && *kept_ == *last_;
+    kept_.reset();
     if (isFirst) {
         keepLast();
     }
 }
 
 void InventoryKeeper::keepLast() {
-    if (!last_ || last_ == inFile_ || (inFile_ && *last_ == *inFile_)) {
+    if (!last_ || isLastInFile_) {
         return;
     }
     try {
         keepInventory(file_, *last_);
-        inFile_ = last_;
+        isLastInFile_ = true;
     } catch (const std::system_error&) {
-        inFile_.reset();
+        // The next start has nothing to show at first.
     }
 }
 

@@ -18,21 +18,22 @@ class InventoryKeeper {
     /// Reads what is kept in `file` of the music folder at `root`.
     InventoryKeeper(std::filesystem::path file, const std::filesystem::path& root);
 
-    /// What was kept when the keeper was made; null for nothing.
+    /// What was kept when the keeper was made; null for nothing, and after the first `take`, when
+    /// it is only held by whoever shows it.
     [[nodiscard]] const std::shared_ptr<const Inventory>& kept() const { return kept_; }
 
-    /// Takes note of what the folder holds now, and keeps it where it is the first.
+    /// Takes note of what the folder holds now, which is not what it held before, and keeps it
+    /// where it is the first.
     void take(std::shared_ptr<const Inventory> inventory);
 
-    /// Keeps what was last taken.
+    /// Keeps what was last taken, where that is not in the file.
     void keepLast();
 
   private:
     const std::filesystem::path file_;
-    const std::shared_ptr<const Inventory> kept_;
-    /// That is in the file; null where nobody knows.
-    std::shared_ptr<const Inventory> inFile_ = kept_;
+    std::shared_ptr<const Inventory> kept_;
     std::shared_ptr<const Inventory> last_;
+    bool isLastInFile_ = false;
 };
 
 } // namespace quorl::media
