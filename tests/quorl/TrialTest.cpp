@@ -88,6 +88,22 @@ TEST_F(Trial, leavesWhatIsChosenAsItIs) {
     EXPECT_THAT(usual.output(), HasSubstr("Synced Playlist: None"));
 }
 
+TEST_F(Trial, keepsNothingOfItsFolderForTheNextStart) {
+    const auto kept =
+        std::filesystem::path(qgetenv("XDG_CACHE_HOME").toStdString()) / "quorl/music-folder";
+    {
+        QuorlProcess quorl(arguments());
+        chooseTheOnlyPlaylist(quorl);
+        EXPECT_EQ(quorl.end(), 0);
+    }
+    EXPECT_FALSE(std::filesystem::exists(kept));
+    QuorlProcess usual({"--text"});
+    usual.say("1");
+    usual.readUntil("Long Run");
+    EXPECT_EQ(usual.end(), 0);
+    EXPECT_TRUE(std::filesystem::exists(kept));
+}
+
 TEST_F(Trial, hasAnEngineForAsLongAsItIsThere) {
     TrialWatch watch;
     {
