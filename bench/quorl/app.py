@@ -11,6 +11,7 @@ of JSON: medians, and the ratios of the quarter of the rounds that did best and 
 import json
 import os
 import pathlib
+import select
 import statistics
 import subprocess
 import sys
@@ -58,11 +59,14 @@ def picture_of(command, picture):
 
     The picture goes into a pipe of that name.
     """
-    began = time.monotonic()
-    process = subprocess.Popen(command, stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
-    with open(picture, "rb") as pipe:
+    with open(os.open(picture, os.O_RDONLY | os.O_NONBLOCK), "rb") as pipe:
+        began = time.monotonic()
+        process = subprocess.Popen(command, stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
+        with open(os.pidfd_open(process.pid), "rb") as end:
+            select.select([pipe, end], [], [])  # it may end before it opens the pipe
+        os.set_blocking(pipe.fileno(), True)
         written = pipe.read()
-    seconds = time.monotonic() - began
+        seconds = time.monotonic() - began
     _, status, usage = os.wait4(process.pid, 0)
     process.returncode = os.waitstatus_to_exitcode(status)
     if process.returncode != 0 or not written:
