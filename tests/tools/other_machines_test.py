@@ -69,6 +69,22 @@ class OtherMachines(unittest.TestCase):
             self.assertEqual(result.returncode, 1)
             self.assertIn("Say for instance: tools/emulate armhf true", result.stderr)
 
+    def test_where_the_kernel_starts_programs_of_i386_their_libraries_are_where_they_look(self):
+        if subprocess.run(["unshare", "--user", "--map-root-user", "--mount", "true"], capture_output=True).returncode:
+            self.skipTest("no user namespaces here")
+        library = "usr/lib/i386-linux-gnu/libonly.so"
+        root = self.cache / "quorl" / "sysroot-i386"
+        (root / "lib").mkdir(parents=True)
+        (root / library).parent.joinpath("cmake").mkdir(parents=True)
+        (root / library).touch()
+        loader = root / "lib/ld-linux.so.2"
+        loader.write_text("#!/bin/sh\n")
+        loader.chmod(0o755)
+        result = subprocess.run([TOOLS / "emulate", "i386", "ls", f"/{library}"], capture_output=True, text=True,
+                                env={**os.environ, "QUORL_CACHE": str(root.parent)})
+        self.assertEqual((result.stdout, result.stderr), (f"/{library}\n", ""))
+        self.assertFalse(pathlib.Path("/", library).exists())
+
 
 class ProgramsBehindScripts(unittest.TestCase):
     """What tools/link-emulated makes of what a linker has made, which here is a text."""
