@@ -41,8 +41,14 @@ std::uint64_t LibraryItem::persistentID() const {
     return fingerprint.value();
 }
 
+/// Asked for each song: with the name that the platform declares, there are no letters to compare.
+bool isFileSize(MPMediaProperty property) {
+    const MPMediaProperty name = MPMediaItemPropertyFileSize;
+    return property.size() == name.size() && (property.data() == name.data() || property == name);
+}
+
 std::shared_ptr<NSObject> LibraryItem::valueForProperty(MPMediaProperty property) const {
-    if (property != MPMediaItemPropertyFileSize) {
+    if (!isFileSize(property)) {
         return nullptr;
     }
     return {items_->shared_from_this(), &*fileSize_};
