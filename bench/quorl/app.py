@@ -127,7 +127,9 @@ def main():
     rounds = int(sys.argv[2]) if len(sys.argv) > 2 else 11
     quorl, plain = programs / "quorl", programs / "plain-window"
     os.environ["QT_QPA_PLATFORM"] = "offscreen"
-    with tempfile.TemporaryDirectory() as place:
+    # Not in /tmp: the app watches what is above the folder, too, and for whoever watches a directory the kernel goes
+    # through all names that were ever looked for there.
+    with tempfile.TemporaryDirectory(dir=programs) as place:
         empty, large, picture = (pathlib.Path(place, name) for name in ("empty", "large", "picture.png"))
         empty.mkdir()
         shown = subprocess.run([quorl, "--text", "--music", empty], input="q\n", text=True, check=True,
