@@ -70,8 +70,9 @@ class OtherMachines(unittest.TestCase):
             self.assertIn("Say for instance: tools/emulate armhf true", result.stderr)
 
     def test_where_the_kernel_starts_programs_of_i386_their_libraries_are_where_they_look(self):
-        if subprocess.run(["unshare", "--user", "--map-root-user", "--mount", "true"], capture_output=True).returncode:
-            self.skipTest("no user namespaces here")
+        can_mount = subprocess.run(["unshare", "--mount", "true"], capture_output=True).returncode == 0
+        if not can_mount or "overlay" not in pathlib.Path("/proc/filesystems").read_text():
+            self.skipTest("nothing can be laid over anything here")
         library = "usr/lib/i386-linux-gnu/libonly.so"
         root = self.cache / "quorl" / "sysroot-i386"
         (root / "lib").mkdir(parents=True)
