@@ -41,7 +41,7 @@ std::uint64_t LibraryItem::persistentID() const {
     return fingerprint.value();
 }
 
-/// Asked for each song: with the name that the platform declares, there are no letters to compare.
+/// Of each song: who asks with the declared name itself need not have its letters compared.
 bool isFileSize(MPMediaProperty property) {
     const MPMediaProperty name = MPMediaItemPropertyFileSize;
     return property.size() == name.size() && (property.data() == name.data() || property == name);

@@ -45,6 +45,7 @@ void MusicLibrary::open(const std::filesystem::path& root, Taken taken) {
     taken_ = std::move(taken);
     const auto keeper =
         keptFile_.empty() ? nullptr : std::make_shared<media::InventoryKeeper>(keptFile_, root);
+    // Before there is a folder, whose thread has the keeper from then on.
     const auto kept = keeper ? keeper->kept() : nullptr;
     // Held weakly: an inventory on its way keeps no library alive.
     folder_ = std::make_unique<media::MusicFolder>(

@@ -69,6 +69,10 @@ TEST_F(TheLibrary, itemsTellTheSizeOfTheirFiles) {
     ASSERT_EQ(items->size(), 3U);
     EXPECT_EQ(number(*items->front(), MPMediaItemPropertyFileSize), std::uint64_t{1} << 20U);
     EXPECT_EQ(items->front()->valueForProperty(MPMediaPlaylistPropertyIsFolder), nullptr);
+    std::string spelt(MPMediaItemPropertyFileSize);
+    EXPECT_EQ(number(*items->front(), spelt), std::uint64_t{1} << 20U);
+    spelt.back() = '?';
+    EXPECT_EQ(items->front()->valueForProperty(spelt), nullptr);
     EXPECT_NE((*items)[0]->persistentID(), (*items)[1]->persistentID());
 }
 
